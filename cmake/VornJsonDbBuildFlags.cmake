@@ -1,0 +1,60 @@
+# Compiler and linker flags of this project's own targets; none of them reaches a user of the
+# library.
+
+include(CheckCXXCompilerFlag)
+
+get_property(VORNJSONDB_MULTI_CONFIG GLOBAL PROPERTY GENERATOR_IS_MULTI_CONFIG)
+if(VORNJSONDB_TOP_LEVEL)
+    if(NOT VORNJSONDB_MULTI_CONFIG AND NOT CMAKE_BUILD_TYPE)
+        set(CMAKE_BUILD_TYPE Release CACHE STRING "Build type" FORCE)
+    endif()
+    # The library is small and waits for SQLite: -O3 only makes it larger.
+    if(CMAKE_CXX_FLAGS_RELEASE STREQUAL "-O3 -DNDEBUG")
+        set(CMAKE_CXX_FLAGS_RELEASE "-O2 -DNDEBUG")
+    endif()
+endif()
+
+
+# ---- for every target of the project ---------------------------------------------------------
+add_library(vornjsondb_build_flags INTERFACE)
+target_compile_options(vornjsondb_build_flags INTERFACE
+    -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Wformat=2
+    $<$<BOOL:${VORNJSONDB_WERROR}>:-Werror>)
+
+# Also handed to what the tests compile and link by themselves.
+set(VORNJSONDB_INSTRUMENT_FLAGS "")
+if(VORNJSONDB_SANITIZE)
+    list(APPEND VORNJSONDB_INSTRUMENT_FLAGS
+        -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+endif()
+if(VORNJSONDB_COVERAGE)
+    # Atomic counters: the tests run side by side and fork.
+    list(APPEND VORNJSONDB_INSTRUMENT_FLAGS --coverage -fprofile-update=atomic)
+endif()
+target_compile_options(vornjsondb_build_flags INTERFACE ${VORNJSONDB_INSTRUMENT_FLAGS})
+target_link_options(vornjsondb_build_flags INTERFACE ${VORNJSONDB_INSTRUMENT_FLAGS})
+
+# ---- for the library alone -------------------------------------------------------------------
+add_library(vornjsondb_hardening INTERFACE)
+foreach(VORNJSONDB_FLAG -fstack-protector-strong -fstack-clash-protection)
+    string(MAKE_C_IDENTIFIER "VORNJSONDB_HAS${VORNJSONDB_FLAG}" VORNJSONDB_HAS_FLAG)
+    check_cxx_compiler_flag(${VORNJSONDB_FLAG} ${VORNJSONDB_HAS_FLAG})
+    if(${VORNJSONDB_HAS_FLAG})
+        target_compile_options(vornjsondb_hardening INTERFACE ${VORNJSONDB_FLAG})
+    endif()
+endforeach()
+target_link_options(vornjsondb_hardening INTERFACE
+    LINKER:-z,relro LINKER:-z,now LINKER:-z,noexecstack)
+if(NOT VORNJSONDB_SANITIZE)
+    # The checked C library calls hide memory errors from the sanitizer, whose run time the
+    # program brings; without it the library must name everything that it needs.
+    # -U first: some distributions' compilers define the macro by themselves.
+    set(VORNJSONDB_OPTIMISED $<CONFIG:Release,RelWithDebInfo,MinSizeRel>)
+    if(CMAKE_VERSION VERSION_LESS 3.19)
+        set(VORNJSONDB_OPTIMISED
+            $<OR:$<CONFIG:Release>,$<CONFIG:RelWithDebInfo>,$<CONFIG:MinSizeRel>>)
+    endif()
+    target_compile_options(vornjsondb_hardening INTERFACE
+        "$<${VORNJSONDB_OPTIMISED}:-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=2>")
+    target_link_options(vornjsondb_hardening INTERFACE LINKER:-z,defs)
+endif()

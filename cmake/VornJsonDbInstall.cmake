@@ -1,0 +1,39 @@
+# What `cmake --install` lays down: header, library with its links, CMake package, pkg-config file.
+
+set(VORNJSONDB_PACKAGE_DIR "${CMAKE_INSTALL_LIBDIR}/cmake/vornjsondb")
+
+install(TARGETS vornjsondb EXPORT vornjsondbTargets
+    LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
+        COMPONENT runtime NAMELINK_COMPONENT development)
+install(FILES include/VornJsonDbApi.h
+    DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}" COMPONENT development)
+
+install(EXPORT vornjsondbTargets NAMESPACE vornjsondb::
+    DESTINATION "${VORNJSONDB_PACKAGE_DIR}" COMPONENT development)
+configure_package_config_file(cmake/vornjsondbConfig.cmake.in vornjsondbConfig.cmake
+    INSTALL_DESTINATION "${VORNJSONDB_PACKAGE_DIR}"
+    NO_SET_AND_CHECK_MACRO)
+write_basic_package_version_file(vornjsondbConfigVersion.cmake COMPATIBILITY SameMajorVersion)
+install(FILES
+    "${CMAKE_CURRENT_BINARY_DIR}/vornjsondbConfig.cmake"
+    "${CMAKE_CURRENT_BINARY_DIR}/vornjsondbConfigVersion.cmake"
+    cmake/VornJsonDbJsonCpp.cmake
+    DESTINATION "${VORNJSONDB_PACKAGE_DIR}" COMPONENT development)
+
+# With the usual relative folders the prefix is taken from where the .pc file lies, so that
+# `cmake --install --prefix` and a moved tree stay right.
+set(VORNJSONDB_PC_DIR "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
+if(IS_ABSOLUTE "${CMAKE_INSTALL_LIBDIR}" OR IS_ABSOLUTE "${CMAKE_INSTALL_INCLUDEDIR}")
+    set(VORNJSONDB_PC_PREFIX "${CMAKE_INSTALL_PREFIX}")
+    set(VORNJSONDB_PC_LIBDIR "${CMAKE_INSTALL_FULL_LIBDIR}")
+    set(VORNJSONDB_PC_INCLUDEDIR "${CMAKE_INSTALL_FULL_INCLUDEDIR}")
+else()
+    file(RELATIVE_PATH VORNJSONDB_PC_UP "/${VORNJSONDB_PC_DIR}" "/")
+    string(REGEX REPLACE "/$" "" VORNJSONDB_PC_UP "${VORNJSONDB_PC_UP}")
+    set(VORNJSONDB_PC_PREFIX "\${pcfiledir}/${VORNJSONDB_PC_UP}")
+    set(VORNJSONDB_PC_LIBDIR "\${prefix}/${CMAKE_INSTALL_LIBDIR}")
+    set(VORNJSONDB_PC_INCLUDEDIR "\${prefix}/${CMAKE_INSTALL_INCLUDEDIR}")
+endif()
+configure_file(cmake/vornjsondb.pc.in vornjsondb.pc @ONLY)
+install(FILES "${CMAKE_CURRENT_BINARY_DIR}/vornjsondb.pc"
+    DESTINATION "${VORNJSONDB_PC_DIR}" COMPONENT development)

@@ -1,0 +1,10 @@
+#ifndef VORN_CORE_VORN_JSON_DB_API_ROWS_H
+#define VORN_CORE_VORN_JSON_DB_API_ROWS_H
+
+// The row callback for sqlite3_exec: turns one row into a record by the member types of the
+// current table and appends it to the array that pArg points to (Json::Value*, array or null).
+// Returns 0, or -1 to stop the statement; the array then holds the rows before. Never throws:
+// an exception must not pass through SQLite's frames.
+int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** column_name);
+
+#endif  // VORN_CORE_VORN_JSON_DB_API_ROWS_H

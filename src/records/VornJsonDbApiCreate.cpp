@@ -1,0 +1,44 @@
+// Create one record: defaults, type check, insert, read-back.
+
+#include <VornJsonDbApi.h>
+
+#include "../core/LogLine.h"
+#include "../schema/Defaults.h"
+#include "../util/JsonText.h"
+#include "SaveRecord.h"
+#include "UniqueFailure.h"
+
+int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) {
+    Json::Value jCompleted;
+    Json::Value* pjParam = &jParamIn;
+    Json::Value jStored;
+    const auto Create = [&]() -> int {
+        // Log readers know the record by the name jRecIn.
+        VORN_FAIL_IF_TEXT(jParamIn.empty(), "jRecIn.empty()");
+        const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+        const vornjsondb::TableTypes& Types = vornjsondb::TableTypes::Of(jType);
+        // The caller's record is copied only where there is something to fill in. A value that is
+        // no object is left for the type check to refuse.
+        if (jParamIn.isObject() && vornjsondb::LacksDefaults(Types, jParamIn)) {
+            jCompleted = jParamIn;
+            vornjsondb::FillDefaults(Types, jCompleted);
+            pjParam = &jCompleted;
+        }
+        VORN_FAIL_IF_TEXT(0 > checkJsonType(*pjParam), "0 > checkJsonType(jParam)");
+        // Looked up anew, as each step does: a name that was refused is reported at each.
+        const Json::Value& jTypeOfSave = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+        VORN_FAIL_IF_TEXT(0 > vornjsondb::SaveRecord(*this, {m_pDb, m_strName, m_strSqlError},
+                                                     jTypeOfSave, *pjParam, jStored, true),
+                          "0 > recSave(jParam, true)");
+        return 0;
+    };
+    if (0 <= Create()) {
+        jParamOut.swap(jStored);
+        return 0;
+    }
+    VORN_LOG_PLAIN("call create rec, rec=%s", vornjsondb::ToString(*pjParam).c_str());
+    if (vornjsondb::IsUniqueFailure(m_strSqlError)) {
+        m_strErrMsg = vornjsondb::kDuplicateKeyMessage;
+    }
+    return -1;
+}

@@ -1,0 +1,112 @@
+// Delete records: by query object, all of them, by values of a string member.
+
+#include <VornJsonDbApi.h>
+
+#include "../core/LogLine.h"
+#include "../core/TableParts.h"
+#include "../util/JsonMember.h"
+
+namespace {
+
+// "a,b,c" for the failure line.
+std::string Joined(const std::vector<std::string>& strVector) {
+    std::string strText;
+    for (const std::string& strValue : strVector) {
+        if (&strValue != &strVector.front()) {
+            strText += ',';
+        }
+        strText += strValue;
+    }
+    return strText;
+}
+
+}  // namespace
+
+int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
+    std::string strSqlRun;
+    const auto Delete = [&]() -> int {
+        std::string strSql;
+        int err = -1;
+        VORN_FAIL_IF(jRecParam.type() != Json::objectValue);
+        VORN_FAIL_IF(0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND));
+        VORN_FAIL_IF_TEXT(strSql.empty() && !blAllowAll, "strSql.empty()");
+        // Two blanks before WHERE, as in a list.
+        strSqlRun.append("DELETE FROM ").append(m_strName).append(" ");
+        if (!strSql.empty()) {
+            strSqlRun.append(" WHERE ").append(strSql);
+        }
+        strSqlRun.append(";");
+        VORN_FAIL_IF_TEXT(0 > (err = vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError},
+                                                        strSqlRun, nullptr, nullptr)),
+                          "0 > (err = runSqlEx(strSqlRun))");
+        if (!m_strSqlError.empty()) {
+            VORN_LOG_LOCATED("sql error, sql=%s", strSqlRun.c_str());
+            return -1;
+        }
+        VORN_LOG_DEBUG("delete rec number=%d", err);
+        return err;
+    };
+    const int nResult = Delete();
+    if (0 > nResult && !m_strSqlError.empty()) {
+        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", m_strSqlError.c_str(), strSqlRun.c_str());
+    }
+    return nResult;
+}
+
+int VornJsonDbApi::recDeleteAll() {
+    Json::Value jEverything(Json::objectValue);
+    return recDelete(jEverything, true);
+}
+
+int VornJsonDbApi::recDeleteByArray(std::vector<std::string>& strVector, const char* szKey) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const auto Delete = [&]() -> int {
+        Json::Value jParam(Json::objectValue);
+        int err = -1;
+        VORN_FAIL_IF(0 >= strVector.size());
+        VORN_FAIL_IF(!szKey || !szKey[0]);
+        const Json::Value* pjDefinition = vornjsondb::FindMember(jType, szKey);
+        VORN_FAIL_IF_TEXT(pjDefinition == nullptr, "!jType.isMember(szKey)");
+        VORN_FAIL_IF(jType[szKey]["cpptype"].asString() != "string");
+        VORN_FAIL_IF(0 > VectorParamToJson(strVector, szKey, jParam));
+        VORN_FAIL_IF(0 > (err = recDelete(jParam)));
+        return err;
+    };
+    const int nResult = Delete();
+    if (0 > nResult) {
+        VORN_LOG_PLAIN("recDeleteByArray failed, name=%s, strVector=%s", szKey,
+                       Joined(strVector).c_str());
+    }
+    return nResult;
+}
+
+int VornJsonDbApi::recDeleteByName(std::string& strValue, const char* szKey) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const auto Delete = [&]() -> int {
+        int err = -1;
+        VORN_FAIL_IF(strValue.empty());
+        VORN_FAIL_IF(!szKey || !szKey[0]);
+        VORN_FAIL_IF_TEXT(vornjsondb::FindMember(jType, szKey) == nullptr,
+                          "!jType.isMember(szKey)");
+        std::vector<std::string> strVector{strValue};
+        VORN_FAIL_IF(0 > (err = recDeleteByArray(strVector, szKey)));
+        return err;
+    };
+    const int nResult = Delete();
+    if (0 > nResult) {
+        VORN_LOG_PLAIN("recDeleteByName failed, name=%s, strValue=%s", szKey, strValue.c_str());
+    }
+    return nResult;
+}
+
+int VornJsonDbApi::VectorParamToJson(std::vector<std::string>& strVector, const char* szKey,
+                                     Json::Value& jParamOut) {
+    VORN_FAIL_IF(jParamOut.type() != Json::objectValue && jParamOut.type() != Json::nullValue);
+    VORN_FAIL_IF(!szKey || !szKey[0]);
+    Json::Value jList(Json::arrayValue);
+    for (const std::string& strValue : strVector) {
+        jList.append(strValue);
+    }
+    jParamOut[szKey] = jList;
+    return 0;
+}

@@ -1,0 +1,69 @@
+// Change stored records.
+
+#include <VornJsonDbApi.h>
+
+#include "../core/LogLine.h"
+#include "../core/TableParts.h"
+#include "../util/JsonMember.h"
+#include "../util/JsonText.h"
+#include "UniqueFailure.h"
+
+int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {
+    std::string strSql;
+    const auto Update = [&]() -> int {
+        // An empty condition would change the whole table.
+        VORN_FAIL_IF(strSqlWhere.empty());
+        VORN_FAIL_IF(jRecIn.empty());
+        std::string strSql2;
+        strSql.append("UPDATE ").append(m_strName).append(" SET ");
+        // Raw condition text in a record must not become an assignment.
+        Json::Value jWithoutFilter;
+        const bool blFilter = vornjsondb::FindMember(jRecIn, "vornSqlWhereFilter") != nullptr;
+        if (blFilter) {
+            jWithoutFilter = jRecIn;
+            jWithoutFilter.removeMember("vornSqlWhereFilter");
+        }
+        Json::Value& jColumnList = blFilter ? jWithoutFilter : jRecIn;
+        VORN_FAIL_IF(0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA));
+        strSql.append(strSql2).append(" WHERE ").append(strSqlWhere).append(";");
+        VORN_FAIL_IF_TEXT(
+            0 > vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSql, nullptr, nullptr),
+            "0 > runSqlEx(strSql, NULL, NULL)");
+        if (!m_strSqlError.empty()) {
+            VORN_LOG_LOCATED("sql error msg=%s, sql=%s", m_strSqlError.c_str(), strSql.c_str());
+            return -1;
+        }
+        return 0;
+    };
+    if (0 <= Update()) {
+        return 0;
+    }
+    VORN_LOG_PLAIN("jRecIn=%s", vornjsondb::ToString(jRecIn).c_str());
+    if (!m_strSqlError.empty()) {
+        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", m_strSqlError.c_str(), strSql.c_str());
+    }
+    return -1;
+}
+
+int VornJsonDbApi::recUpdateByFilter(Json::Value& jFilterIn, Json::Value& jParamIn) {
+    const auto Update = [&]() -> int {
+        std::string strSql;
+        VORN_FAIL_IF(jFilterIn.empty());
+        VORN_FAIL_IF(jFilterIn.type() != Json::objectValue);
+        VORN_FAIL_IF(jParamIn.type() != Json::objectValue);
+        VORN_FAIL_IF(0 > SqlExpandMemberList(jFilterIn, strSql, VORN_SQL_WHERE_TYPE_AND));
+        // A filter of unknown members must not change the whole table.
+        VORN_FAIL_IF(strSql.empty());
+        VORN_FAIL_IF(0 > checkJsonType(jParamIn));
+        VORN_FAIL_IF(0 > recUpdateByWhere(jParamIn, strSql));
+        return 0;
+    };
+    if (0 <= Update()) {
+        return 0;
+    }
+    VORN_LOG_PLAIN("recUpdateByFilter failed, jParamIn=%s", vornjsondb::ToString(jParamIn).c_str());
+    if (vornjsondb::IsUniqueFailure(m_strSqlError)) {
+        m_strErrMsg = vornjsondb::kDuplicateKeyMessage;
+    }
+    return -1;
+}

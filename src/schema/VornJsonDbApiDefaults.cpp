@@ -1,0 +1,51 @@
+// Members that a record lacks.
+
+#include <VornJsonDbApi.h>
+
+#include "../core/LogLine.h"
+#include "../util/JsonText.h"
+#include "Defaults.h"
+
+namespace vornjsondb {
+
+bool LacksDefaults(const TableTypes& Types, const Json::Value& jRec) {
+    MemberCursor Record(jRec);
+    for (const TypedMember& Member : Types.Members()) {
+        if (Member.pjDefault != nullptr && Record.Find(Member.Name) == nullptr) {
+            return true;
+        }
+    }
+    return false;
+}
+
+void FillDefaults(const TableTypes& Types, Json::Value& jRec) {
+    MemberCursor Record(jRec);
+    for (const TypedMember& Member : Types.Members()) {
+        if (Member.pjDefault != nullptr && Record.Find(Member.Name) == nullptr) {
+            *jRec.demand(Member.Name.pBegin, Member.Name.pEnd) = *Member.pjDefault;
+        }
+    }
+}
+
+}  // namespace vornjsondb
+
+int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const vornjsondb::TableTypes& Types = vornjsondb::TableTypes::Of(jType);
+    if (!blStrict) {
+        // A value of another kind is left for the type check to refuse.
+        if (jParam.isObject() || jParam.isNull()) {
+            vornjsondb::FillDefaults(Types, jParam);
+        }
+        return 0;
+    }
+    vornjsondb::MemberCursor Record(jParam);
+    for (const vornjsondb::TypedMember& Member : Types.Members()) {
+        if (Record.Find(Member.Name) == nullptr) {
+            VORN_LOG_LOCATED("lost data member=%s", Member.Name.pBegin);
+            VORN_LOG_DEBUG("jParam=%s", vornjsondb::ToString(jParam).c_str());
+            return -1;
+        }
+    }
+    return 0;
+}

@@ -1,0 +1,50 @@
+// The growing text of a value list.
+//
+// The list is defined by formatting all text so far again with every value: what an earlier value
+// or a name brought in is read as a format by the later ones. "%%" thus becomes "%" at each later
+// value. Any other conversion in that text would take an argument that nobody passed, or make the
+// formatter stop and cut the statement, so that the next value would stand outside its quotes; it
+// is refused before it is formatted.
+// Text without a percent sign does not change by being formatted: then the new value alone is
+// formatted and appended, which keeps the work linear.
+
+#ifndef VORN_SQL_ACCUMULATED_FORMAT_H
+#define VORN_SQL_ACCUMULATED_FORMAT_H
+
+#include <string>
+
+#include <json/json.h>
+
+#include "../schema/MemberType.h"
+
+namespace vornjsondb {
+
+class AccumulatedFormat {
+  public:
+    // Starts from a copy of the caller's text.
+    explicit AccumulatedFormat(const std::string& strText);
+
+    // Formats the text so far together with one value of a type that can be stored. Returns false,
+    // with the text as it was, when the text so far holds a conversion. Throws Json::Exception for
+    // a value that cannot be converted, std::logic_error when the formatter gives no text.
+    bool Format(const MemberType& Type, const Json::Value& jValue);
+
+    // Appends text that later values format too; it holds no percent sign.
+    void Append(const char* szText) { m_strText += szText; }
+
+    std::string& Text() { return m_strText; }
+
+  private:
+    bool FormatAgain(const MemberType& Type, const Json::Value& jValue);
+
+    std::string m_strText;
+    bool m_blLiteral;  // neither percent sign nor NUL: formatting the text leaves it as it is
+};
+
+// Whether szFormat, up to nSpecifier (where this library's own conversion begins), holds no
+// conversion but "%%".
+bool IsPlainFormat(const std::string& strFormat, size_t nSpecifier);
+
+}  // namespace vornjsondb
+
+#endif  // VORN_SQL_ACCUMULATED_FORMAT_H

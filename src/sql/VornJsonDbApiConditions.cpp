@@ -1,0 +1,175 @@
+// Conditions and assignments: one member, and whole query objects.
+
+#include <VornJsonDbApi.h>
+
+#include <cstring>
+
+#include "../core/LogLine.h"
+#include "../schema/TableTypes.h"
+#include "../util/JsonText.h"
+#include "../util/SqlText.h"
+
+namespace {
+
+using vornjsondb::ConditionForm;
+using vornjsondb::MemberName;
+using vornjsondb::SqlText;
+using vornjsondb::TableTypes;
+using vornjsondb::TypedMember;
+
+constexpr char kFilterKey[] = "vornSqlWhereFilter";
+
+// The value as text with quotes doubled; no text when SQLite has no memory or the value has no
+// such form.
+SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
+    if (eForm == ConditionForm::kBoolean) {
+        return SqlText(sqlite3_mprintf("%d", jValue.asInt()));
+    }
+    if (eForm == ConditionForm::kQuotedJson) {
+        return SqlText(sqlite3_mprintf("%q", vornjsondb::ToString(jValue).c_str()));
+    }
+    return SqlText(jValue.isString() ? sqlite3_mprintf("%q", jValue.asCString())
+                                     : sqlite3_mprintf("%q", jValue.asString().c_str()));
+} catch (const Json::Exception&) {
+    return nullptr;
+}
+
+const char* Quote(ConditionForm eForm) {
+    const bool blQuoted =
+        eForm == ConditionForm::kQuotedText || eForm == ConditionForm::kQuotedJson;
+    return blQuoted ? "'" : "";
+}
+
+void LogNoText(ConditionForm eForm) {
+    switch (eForm) {
+        case ConditionForm::kBoolean:
+            VORN_LOG_CONDITION("NULL == (szSql = sqlite3_mprintf(\"%d\", jParam.asInt()))");
+            break;
+        case ConditionForm::kQuotedJson:
+            VORN_LOG_CONDITION(
+                "NULL == (szSql = sqlite3_mprintf(\"%q\", jParam.toString().c_str()))");
+            break;
+        default:
+            VORN_LOG_CONDITION(
+                "NULL == (szSql = sqlite3_mprintf(\"%q\", jParam.asString().c_str()))");
+    }
+}
+
+// "name=value" of a member.
+int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::string& strSqlOut) {
+    const ConditionForm eForm = Member.pType->eCondition;
+    const SqlText szSql = EscapedValue(eForm, jParam);
+    if (!szSql) {
+        LogNoText(eForm);
+        return -1;
+    }
+    const size_t nValue = std::strlen(szSql.get());
+    // Room for all of it first: memory that runs out in between must not leave half a condition.
+    strSqlOut.reserve(strSqlOut.length() + Member.Name.Length() + nValue + 3);
+    strSqlOut.append(Member.Name.pBegin, Member.Name.pEnd).append("=");
+    strSqlOut.append(Quote(eForm)).append(szSql.get(), nValue).append(Quote(eForm));
+    return 0;
+}
+
+// "name in (value )" of a member.
+// The elements follow each other without a separator, so that several make one literal. Hosts
+// pass one element; a list that suddenly matched more rows would delete more. Pinned by
+// MemberCondition.ElementsFollowEachOtherWithoutSeparator.
+int AppendList(const TypedMember& Member, const Json::Value& jList, std::string& strSqlOut) {
+    const ConditionForm eForm = Member.pType->eCondition;
+    // In a list a boolean is written by its string form, unlike after "=".
+    const ConditionForm eElement =
+        eForm == ConditionForm::kBoolean ? ConditionForm::kBareText : eForm;
+    std::string strList;
+    for (const Json::Value& jElement : jList) {
+        const SqlText szSql = EscapedValue(eElement, jElement);
+        VORN_FAIL_IF_TEXT(!szSql && eElement == ConditionForm::kQuotedJson,
+                          "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].toString().c_str()))");
+        VORN_FAIL_IF_TEXT(!szSql,
+                          "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
+        if (strList.empty()) {
+            strList.append(Member.Name.pBegin, Member.Name.pEnd).append(" in (");
+        }
+        strList.append(Quote(eElement)).append(szSql.get()).append(Quote(eElement));
+    }
+    if (!strList.empty()) {
+        strSqlOut.append(strList.append(" )"));
+    }
+    return 0;
+}
+
+struct JoinMode {
+    const char* szJoiner;
+    bool blWrapped;
+};
+
+// By VORN_SQL_WHERE_TYPE_...
+constexpr JoinMode kJoinModes[] = {{" or ", true}, {" and ", true}, {" , ", false}};
+constexpr int kJoinModeCount = sizeof(kJoinModes) / sizeof(kJoinModes[0]);
+
+}  // namespace
+
+int VornJsonDbApi::SqlMakeByMatchField(std::string& strField, Json::Value& jParam,
+                                       std::string& strSqlOut) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const TypedMember* pMember = TableTypes::Of(jType).Find(vornjsondb::NameOf(strField));
+    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strField)");
+    return AppendMatch(*pMember, jParam, strSqlOut);
+}
+
+int VornJsonDbApi::SqlMakeByListField(const char* szField, Json::Value& jList,
+                                      std::string& strSqlOut) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    VORN_FAIL_IF(!szField || !szField[0]);
+    const TypedMember* pMember = TableTypes::Of(jType).Find(vornjsondb::NameOf(szField));
+    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(szField)");
+    VORN_FAIL_IF(jList.type() != Json::arrayValue);
+    return AppendList(*pMember, jList, strSqlOut);
+}
+
+int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strSqlWhereOut,
+                                       int andType) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
+    if (andType < 0 || andType >= kJoinModeCount) {
+        VORN_LOG_LOCATED("error andType=%d", andType);
+        return -1;
+    }
+    const JoinMode& Mode = kJoinModes[andType];
+    bool blWritten = false;
+    vornjsondb::TypeCursor Types(TableTypes::Of(jType));
+    const Json::Value::iterator itEnd = jRecParam.end();
+    for (Json::Value::iterator it = jRecParam.begin(); it != itEnd; ++it) {
+        const MemberName Name = vornjsondb::NameOf(it);
+        const bool blFilter = Name.Is(kFilterKey);
+        const TypedMember* pMember = Types.Find(Name);
+        if (!blFilter && pMember == nullptr) {
+            continue;
+        }
+        // Written before the member's own text: an empty list, which writes nothing, leaves its
+        // joiner, and SQLite refuses the statement instead of running it without the condition.
+        // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
+        strSqlWhereOut += blWritten ? Mode.szJoiner : (Mode.blWrapped ? " (" : "");
+        Json::Value& jTmp = *it;
+        if (blFilter) {
+            VORN_FAIL_IF_TEXT(!jTmp.isString(), "!jRecParam[jmFieldName[i]].isString()");
+            strSqlWhereOut.append(" ").append(jTmp.asString()).append(" ");
+        } else if (jTmp.isArray()) {
+            // Through the public call, which ends the name at a NUL.
+            VORN_FAIL_IF_TEXT(
+                0 > SqlMakeByListField(Name.pBegin, jTmp, strSqlWhereOut),
+                "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)");
+        } else {
+            VORN_FAIL_IF_TEXT(0 > AppendMatch(*pMember, jTmp, strSqlWhereOut),
+                              "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)");
+        }
+        blWritten = true;
+    }
+    if (!blWritten) {
+        return 1;
+    }
+    if (Mode.blWrapped) {
+        strSqlWhereOut += " )";
+    }
+    return 0;
+}

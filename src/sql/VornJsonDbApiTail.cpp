@@ -1,0 +1,38 @@
+// Sort, limit and offset.
+
+#include <VornJsonDbApi.h>
+
+#include <string>
+
+#include "../core/LogLine.h"
+#include "../util/JsonMember.h"
+#include "../util/JsonText.h"
+#include "../util/SqlText.h"
+
+using vornjsondb::FindMember;
+
+int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string& strSqlOut) {
+    VORN_FAIL_IF(jFilter.type() != Json::objectValue && jFilter.type() != Json::nullValue);
+    if (const Json::Value* pjSortBy = FindMember(jFilter, "sort_by")) {
+        // In single quotes SQLite sorts by a constant. The order that hosts see is that of the
+        // table, and it stays so. Pinned by
+        // List.SortTermIsAConstantSoTheDirectionDoesNotOrderTheRows.
+        const vornjsondb::SqlText szSql(
+            pjSortBy->isString() ? sqlite3_mprintf(" order by '%q'", pjSortBy->asCString())
+                                 : nullptr);
+        VORN_FAIL_IF(!szSql);
+        strSqlOut += szSql.get();
+        if (const Json::Value* pjDirection = FindMember(jFilter, "sort_direction")) {
+            strSqlOut.append(*pjDirection == "desc" ? " DESC" : " ASC");
+        }
+    }
+    const Json::Value* pjLimit = FindMember(jFilter, "limit");
+    if (pjLimit == nullptr) {
+        return 0;
+    }
+    strSqlOut.append(" LIMIT ").append(vornjsondb::ToString(*pjLimit));
+    if (const Json::Value* pjOffset = FindMember(jFilter, "offset")) {
+        strSqlOut.append(" OFFSET ").append(vornjsondb::ToString(*pjOffset));
+    }
+    return 0;
+}

@@ -1,0 +1,79 @@
+// Member access that no JSON kind makes throw.
+
+#ifndef VORN_UTIL_JSON_MEMBER_H
+#define VORN_UTIL_JSON_MEMBER_H
+
+#include <cstring>
+#include <string>
+
+#include <json/json.h>
+
+namespace vornjsondb {
+
+// A member's name where the JSON value keeps it; followed by a NUL, which it may also hold.
+struct MemberName {
+    const char* pBegin;
+    const char* pEnd;
+
+    size_t Length() const { return static_cast<size_t>(pEnd - pBegin); }
+
+    bool Is(const char* szName) const {
+        return Length() == std::strlen(szName) && std::memcmp(pBegin, szName, Length()) == 0;
+    }
+};
+
+inline MemberName NameOf(const char* szName) {
+    return MemberName{szName, szName + std::strlen(szName)};
+}
+
+inline MemberName NameOf(const std::string& strName) {
+    return MemberName{strName.data(), strName.data() + strName.length()};
+}
+
+template <typename Iterator>
+MemberName NameOf(const Iterator& It) {
+    MemberName Name = {};
+    Name.pBegin = It.memberName(&Name.pEnd);
+    return Name;
+}
+
+// The order of JSON objects: by bytes, a name before its continuations. Negative, 0 or positive.
+inline int Compare(const MemberName& Left, const MemberName& Right) {
+    const size_t nCommon = Left.Length() < Right.Length() ? Left.Length() : Right.Length();
+    const int nOrder = std::memcmp(Left.pBegin, Right.pBegin, nCommon);
+    if (nOrder != 0 || Left.Length() == Right.Length()) {
+        return nOrder;
+    }
+    return Left.Length() < Right.Length() ? -1 : 1;
+}
+
+// The member of that name, or nullptr: also when jValue is no object.
+inline const Json::Value* FindMember(const Json::Value& jValue, const MemberName& Name) {
+    return jValue.isObject() ? jValue.find(Name.pBegin, Name.pEnd) : nullptr;
+}
+
+inline const Json::Value* FindMember(const Json::Value& jValue, const char* szName) {
+    return FindMember(jValue, NameOf(szName));
+}
+
+inline const Json::Value* FindMember(const Json::Value& jValue, const std::string& strName) {
+    return FindMember(jValue, NameOf(strName));
+}
+
+// Finds members of one value by names that are asked for in ascending order, which is the order
+// in which JSON objects keep theirs: one step a member instead of a search for each.
+class MemberCursor {
+  public:
+    explicit MemberCursor(const Json::Value& jValue);
+
+    // As FindMember. Names must not be asked for in descending order.
+    const Json::Value* Find(const MemberName& Name);
+
+  private:
+    Json::Value::const_iterator m_it;
+    Json::Value::const_iterator m_itEnd;
+};
+
+}  // namespace vornjsondb
+
+#endif  // VORN_UTIL_JSON_MEMBER_H

@@ -1,0 +1,51 @@
+#include "JsonText.h"
+
+#include <cstring>
+#include <memory>
+#include <sstream>
+
+#include "PlainJson.h"
+
+namespace vornjsondb {
+
+namespace {
+
+std::unique_ptr<Json::StreamWriter> MakeWriter() {
+    Json::StreamWriterBuilder Builder;
+    Builder["indentation"] = "";
+    Builder["commentStyle"] = "None";
+    Builder["emitUTF8"] = true;
+    return std::unique_ptr<Json::StreamWriter>(Builder.newStreamWriter());
+}
+
+std::unique_ptr<Json::CharReader> MakeReader() {
+    Json::CharReaderBuilder Builder;
+    Builder["collectComments"] = false;
+    return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
+}
+
+}  // namespace
+
+// Writer and reader are dear to make and are used for every JSON column: one of each for the
+// process, which is single-threaded here as everywhere.
+
+std::string ToString(const Json::Value& jValue) {
+    static const std::unique_ptr<Json::StreamWriter> s_pWriter = MakeWriter();
+    std::ostringstream Stream;
+    // Without this a stream swallows std::bad_alloc and the text is silently cut.
+    Stream.exceptions(std::ios::badbit | std::ios::failbit);
+    s_pWriter->write(jValue, &Stream);
+    return Stream.str();
+}
+
+void FromString(const char* szText, Json::Value& jOut) {
+    Json::Value jRead;
+    if (ReadPlainJson(szText, jRead)) {
+        jOut.swapPayload(jRead);
+        return;
+    }
+    static const std::unique_ptr<Json::CharReader> s_pReader = MakeReader();
+    s_pReader->parse(szText, szText + std::strlen(szText), &jOut, nullptr);
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,19 @@
+#ifndef VORN_UTIL_SQL_TEXT_H
+#define VORN_UTIL_SQL_TEXT_H
+
+#include <memory>
+
+#include <sqlite3.h>
+
+namespace vornjsondb {
+
+struct SqliteFree {
+    void operator()(char* szText) const { sqlite3_free(szText); }
+};
+
+// Owner of a text that SQLite allocated (sqlite3_mprintf, sqlite3_exec's error text).
+using SqlText = std::unique_ptr<char, SqliteFree>;
+
+}  // namespace vornjsondb
+
+#endif  // VORN_UTIL_SQL_TEXT_H

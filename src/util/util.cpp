@@ -1,0 +1,129 @@
+// The free functions: member types with their cache, member copy, time text.
+
+#include <VornJsonDbApi.h>
+
+#include <ctime>
+#include <utility>
+
+#include "../core/LogLine.h"
+#include "JsonMember.h"
+#include "JsonText.h"
+
+namespace {
+
+using vornjsondb::FindMember;
+
+// Copies what the lookup keeps of each member definition into jEntry. On failure jEntry holds the
+// members before the faulty one.
+int CopyMemberTypes(const Json::Value& jMember, Json::Value& jEntry) {
+    for (const std::string& strKey : jMember.getMemberNames()) {
+        const Json::Value* pjType = FindMember(jMember[strKey], "cpptype");
+        VORN_FAIL_IF_TEXT(pjType == nullptr,
+                          "!jTableDef[strJsonName][\"member\"][strKey].isMember(\"cpptype\")");
+        VORN_FAIL_IF_TEXT(!pjType->isString(),
+                          "!jTableDef[strJsonName][\"member\"][strKey][\"cpptype\"].isString()");
+        Json::Value& jOne = jEntry[strKey] = Json::Value(Json::objectValue);
+        jOne["cpptype"] = *pjType;
+        if (const Json::Value* pjDefault = FindMember(jMember[strKey], "cppDefaultValue")) {
+            jOne["cppDefaultValue"] = *pjDefault;
+        }
+    }
+    return 0;
+}
+
+// Adds the table's entry to the cache jType. Built aside and moved in: running out of memory half
+// way must not leave a part of the members for good. A faulty definition does leave that part;
+// hosts run on it. Pinned by RecTypeTest.FaultyMemberLeavesTheEarlierOnesAsTheWholeEntry.
+int AddToCache(Json::Value& jType, Json::Value& jTableDef, std::string& strJsonName) {
+    VORN_FAIL_IF(jTableDef.empty());
+    const Json::Value* pjTable = FindMember(jTableDef, strJsonName);
+    VORN_FAIL_IF_TEXT(pjTable == nullptr, "!jTableDef.isMember(strJsonName)");
+    VORN_FAIL_IF_TEXT(!pjTable->isObject(), "!jTableDef[strJsonName].isObject()");
+    const Json::Value* pjMember = FindMember(*pjTable, "member");
+    VORN_FAIL_IF_TEXT(pjMember == nullptr, "!jTableDef[strJsonName].isMember(\"member\")");
+    VORN_FAIL_IF_TEXT(!pjMember->isObject(), "!jTableDef[strJsonName][\"member\"].isObject()");
+    VORN_FAIL_IF(strJsonName.empty());
+
+    Json::Value jEntry;
+    const int nResult = CopyMemberTypes(*pjMember, jEntry);
+    if (!jEntry.isNull()) {
+        jType[strJsonName] = std::move(jEntry);
+    }
+    if (0 > nResult) {
+        return -1;
+    }
+    VORN_FAIL_IF(jType == Json::nullValue || !jType.isMember(strJsonName));
+    return 0;
+}
+
+int CheckCached(const Json::Value& jEntry) {
+    VORN_FAIL_IF_TEXT(jEntry.type() != Json::objectValue,
+                      "jType[strJsonName].type() != Json::objectValue");
+    return 0;
+}
+
+}  // namespace
+
+Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) {
+    static Json::Value jType;
+    if (const Json::Value* pjEntry = FindMember(jType, strJsonName)) {
+        if (0 <= CheckCached(*pjEntry)) {
+            // Found in a value that is not const: asked for every row, so not searched again.
+            return const_cast<Json::Value&>(*pjEntry);
+        }
+    } else if (0 <= AddToCache(jType, jTableDef, strJsonName)) {
+        return jType[strJsonName];
+    }
+    VORN_LOG_PLAIN("strJsonName=%s", strJsonName.c_str());
+    VORN_LOG_PLAIN("jTableDef=%s", vornjsondb::ToString(jTableDef).c_str());
+    VORN_LOG_PLAIN("jType=%s", vornjsondb::ToString(jType).c_str());
+    // Makes a null entry where there is none, so that the name stays refused: a host that got its
+    // first definition wrong sees the same failure for as long as it runs.
+    // Pinned by RecTypeTest.EmptyDefinitionIsRefused.
+    return jType[strJsonName];
+}
+
+int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool blOverwrite) {
+    VORN_FAIL_IF(jIn.type() != Json::nullValue && jIn.type() != Json::objectValue);
+    VORN_FAIL_IF(jSubSet.type() != Json::objectValue);
+    for (const std::string& strName : jSubSet.getMemberNames()) {
+        if (blOverwrite || !jIn.isMember(strName)) {
+            jIn[strName] = jSubSet[strName];
+        }
+    }
+    return 0;
+}
+
+int VORN_JSON_DB::getTimeAfterNow(int offsetSecond, long& now) {
+    // Added in 64 bits: where time_t has 32, a far offset wraps instead of being undefined.
+    now = static_cast<long>(static_cast<long long>(std::time(nullptr)) + offsetSecond);
+    return 0;
+}
+
+int VORN_JSON_DB::convert2ReadableTime(long now, std::string& strOut, int iType) {
+    char szTime[1024] = {};
+    struct tm sTime = {};
+    const time_t ullTimeStamp = now;
+    if ((iType & 1) != 0) {
+        VORN_FAIL_IF(NULL == gmtime_r(&ullTimeStamp, &sTime));
+    } else {
+        VORN_FAIL_IF(NULL == localtime_r(&ullTimeStamp, &sTime));
+    }
+    if ((iType & 2) != 0) {
+        VORN_FAIL_IF(0 == strftime(szTime, sizeof(szTime), "%a, %d %b %Y %T GMT", &sTime));
+    } else if ((iType & 4) != 0) {
+        VORN_FAIL_IF(0 == strftime(szTime, sizeof(szTime), "%Y-%m-%d %H:%M:%S", &sTime));
+    } else {
+        VORN_LOG_LOCATED("bad iType value=%d", iType);
+        return -1;
+    }
+    strOut = szTime;
+    return 0;
+}
+
+int VORN_JSON_DB::getTimeAfterNow(int offsetSecond, std::string& strOut, int iType) {
+    long now = 0;
+    VORN_FAIL_IF(0 > getTimeAfterNow(offsetSecond, now));
+    VORN_FAIL_IF(0 > convert2ReadableTime(now, strOut, iType));
+    return 0;
+}

@@ -1,0 +1,174 @@
+// The row callback called as SQLite would call it, with what SQLite itself never hands over. The
+// library gives its callback to sqlite3_exec and to nobody else, so it is caught there.
+#include <cerrno>
+
+#include "../support/TableFixture.h"
+
+using namespace testhost;
+
+namespace {
+
+using Lines = std::vector<std::string>;
+
+const char* const kFieldCheck =
+    "0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))";
+const char* const kRecCheck = "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)";
+
+// m_fnCallback is the library's, and m_strTable the table whose statement ran last.
+class RowCallbackTest : public TableTest {
+  protected:
+    void SetUp() override {
+        TableTest::SetUp();
+        Json::Value jNoQuery;
+        Json::Value jRows;
+        ASSERT_EQ(m_pHandle->recList(jNoQuery, jRows), 0);
+        m_fnCallback = LastRowCallback();
+        ASSERT_NE(m_fnCallback, nullptr);
+        errno = 0;
+    }
+
+    RowCallback m_fnCallback = nullptr;
+    char m_szId[3] = "id";
+    char m_szName[5] = "name";
+    char m_szSeven[2] = "7";
+    char m_szText[2] = "x";
+    char* m_aszNames[2] = {m_szId, m_szName};
+    char* m_aszValues[2] = {m_szSeven, m_szText};
+};
+
+}  // namespace
+
+TEST_F(RowCallbackTest, RowIsAppendedToAnArrayAndToNull) {
+    Json::Value jRows;
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(m_fnCallback(&jRows, 1, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":7,"name":"x"},{"id":7}])");
+    EXPECT_EQ(TakeLog(), Lines());
+}
+
+TEST_F(RowCallbackTest, MissingArrayIsRefused) {
+    EXPECT_EQ(m_fnCallback(nullptr, 2, m_aszValues, m_aszNames), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check("!pjRecArray")}));
+}
+
+TEST_F(RowCallbackTest, ArrayArgumentOfAnotherKindIsRefusedAndLeftAlone) {
+    for (const char* szArgument : {"{}", "{\"a\":1}", "1", "\"text\"", "true"}) {
+        Json::Value jArgument = ParseJson(szArgument);
+        EXPECT_EQ(m_fnCallback(&jArgument, 2, m_aszValues, m_aszNames), -1);
+        EXPECT_EQ(Compact(jArgument), szArgument);
+        EXPECT_EQ(TakeLog(), (Lines{Check("pjRecArray->type() != Json::arrayValue && "
+                                          "pjRecArray->type() != Json::nullValue")}));
+    }
+}
+
+TEST_F(RowCallbackTest, ObjectAsArrayArgumentMakesTheFirstRowStopTheStatement) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b')");
+    const std::string strSql = "SELECT * FROM " + m_strTable;
+    Json::Value jObject(Json::objectValue);
+    EXPECT_EQ(m_pHandle->runSqlEx(strSql, m_fnCallback, &jObject), -1);
+    EXPECT_EQ(TakeLog(),
+              (Lines{Check("pjRecArray->type() != Json::arrayValue && "
+                           "pjRecArray->type() != Json::nullValue"),
+                     Plain("i=0,errno=0, run sql failed, error=" +
+                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+}
+
+TEST_F(RowCallbackTest, RowidColumnFailsTheStatementBecauseTheDefinitionLacksIt) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    const std::string strSql = "SELECT id, rowid AS rowid FROM " + m_strTable;
+    Json::Value jRows;
+    EXPECT_EQ(m_pHandle->runSqlEx(strSql, m_fnCallback, &jRows), -1);
+    EXPECT_EQ(TakeLog(),
+              (Lines{Check("!jType.isMember(strName)"), Check(kFieldCheck),
+                     Plain("column_name[1]=rowid"), Plain("column_value[1]=1"), Check(kRecCheck),
+                     Plain("i=0,errno=0, run sql failed, error=" +
+                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+    EXPECT_TRUE(jRows.isNull());
+}
+
+TEST_F(RowCallbackTest, RowWithoutNamesOrValuesIsRefused) {
+    Json::Value jRows(Json::arrayValue);
+    EXPECT_EQ(m_fnCallback(&jRows, 2, nullptr, m_aszNames), -1);
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, nullptr), -1);
+    EXPECT_EQ(m_fnCallback(&jRows, 0, nullptr, nullptr), -1);
+    const std::string strCheck = Check("NULL == column_name || NULL == column_value");
+    EXPECT_EQ(TakeLog(), (Lines{strCheck, Check(kRecCheck), strCheck, Check(kRecCheck), strCheck,
+                                Check(kRecCheck)}));
+    EXPECT_EQ(Compact(jRows), "[]");
+}
+
+TEST_F(RowCallbackTest, RowWithoutColumnsIsAnEmptyRecord) {
+    Json::Value jRows;
+    EXPECT_EQ(m_fnCallback(&jRows, 0, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(m_fnCallback(&jRows, -1, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(Compact(jRows), "[{},{}]");
+    EXPECT_EQ(TakeLog(), Lines());
+}
+
+TEST_F(RowCallbackTest, FirstColumnWithoutANameLogsOnlyTheConditions) {
+    Json::Value jRows(Json::arrayValue);
+    m_aszNames[0] = nullptr;
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRecCheck)}));
+    EXPECT_EQ(Compact(jRows), "[]");
+}
+
+TEST_F(RowCallbackTest, LaterColumnWithoutANameAlsoLogsItsValue) {
+    Json::Value jRows(Json::arrayValue);
+    m_aszNames[1] = nullptr;
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Plain("column_name[1]=(null)"),
+                                Plain("column_value[1]=x"), Check(kRecCheck)}));
+    EXPECT_EQ(Compact(jRows), "[]");
+}
+
+TEST_F(RowCallbackTest, SecondColumnOfTheSameNameWins) {
+    Json::Value jRows;
+    m_aszNames[1] = m_szId;
+    char szEight[] = "8";
+    m_aszValues[1] = szEight;
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":8}])");
+}
+
+TEST_F(RowCallbackTest, TypesAreThoseOfTheTableWhoseStatementRanLast) {
+    const std::string strOther = UniqueTable();
+    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "string"}}),
+                                  "CREATE TABLE " + strOther + " (id)");
+    Json::Value jNoQuery;
+    Json::Value jRows;
+    EXPECT_EQ(pOther->recList(jNoQuery, jRows), 0);
+    EXPECT_EQ(m_fnCallback(&jRows, 1, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), 0);
+    EXPECT_EQ(m_fnCallback(&jRows, 1, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":"7"},{"id":7}])");
+}
+
+TEST_F(RowCallbackTest, LookupByTheCallbackAloneSpoilsTheTableNameForGood) {
+    const std::string strTable = UniqueTable();
+    const Json::Value jDefinition = Definition(strTable, {{"id", "int"}});
+    const auto pHandle =
+        NewHandle(m_pDb, strTable, jDefinition, "CREATE TABLE " + strTable + " (id)");
+    Sql("INSERT INTO " + strTable + " VALUES (1)");
+    const std::string strSql = "SELECT id FROM " + strTable;
+    Json::Value jRows;
+    EXPECT_EQ(pHandle->runSqlEx(strSql, m_fnCallback, &jRows), -1);
+    Lines vecLog = TakeLog();
+    ASSERT_EQ(vecLog.size(), 8U);
+    EXPECT_EQ(vecLog[3].compare(0, 18, "util plain: jType="), 0) << vecLog[3];
+    vecLog.erase(vecLog.begin() + 3);  // the whole cache, whatever other tests left in it
+    EXPECT_EQ(vecLog,
+              (Lines{UtilCheck("jTableDef.empty()"), UtilPlain("strJsonName=" + strTable),
+                     UtilPlain("jTableDef=null"), Check("!jType.isMember(strName)"),
+                     Check(kFieldCheck), Check(kRecCheck),
+                     Plain("i=0,errno=0, run sql failed, error=" +
+                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+    Json::Value jNoQuery;
+    EXPECT_EQ(pHandle->recList(jNoQuery, jRows), -1);
+    vecLog = TakeLog();
+    ASSERT_GE(vecLog.size(), 3U);
+    EXPECT_EQ(vecLog[0], UtilCheck("jType[strJsonName].type() != Json::objectValue"));
+    EXPECT_EQ(vecLog[1], UtilPlain("strJsonName=" + strTable));
+    EXPECT_EQ(vecLog[2], UtilPlain("jTableDef=" + Compact(jDefinition)));
+    EXPECT_TRUE(jRows.isNull());
+}

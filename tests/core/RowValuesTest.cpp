@@ -1,0 +1,158 @@
+// Rows into records: what each type makes of a column's text.
+#include <limits>
+
+#include "RowsFixture.h"
+
+using namespace testhost;
+
+namespace {
+
+std::string Repeated(const std::string& str, size_t nTimes) {
+    std::string strAll;
+    for (size_t i = 0; i < nTimes; ++i) {
+        strAll += str;
+    }
+    return strAll;
+}
+
+// The smallest and largest long, as the 32-bit integer that a conversion keeps of them.
+const Json::Int kOfLongMax = sizeof(long) == 8 ? -1 : std::numeric_limits<Json::Int>::max();
+const Json::Int kOfLongMin = sizeof(long) == 8 ? 0 : std::numeric_limits<Json::Int>::min();
+
+}  // namespace
+
+TEST_F(RowsTest, NullColumnLeavesTheMemberOutWhateverItsType) {
+    Open({{"a", "string"},
+          {"b", "int"},
+          {"c", "bool"},
+          {"d", "long long"},
+          {"e", "Json::Value"},
+          {"f", "double"},
+          {"g", "no such type"},
+          {"h", "unsigned int"},
+          {"i", "Json::arrayValue"}});
+    Insert("(NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL)");
+    Insert("('x', NULL, NULL, NULL, NULL, NULL, NULL, 8, NULL)");
+    EXPECT_EQ(Compact(Listed()), R"([{},{"a":"x","h":8}])");
+}
+
+TEST_F(RowsTest, StringIsTheTextItself) {
+    for (const char* szText : {"", " ", "abc", "12", "null", "it's", "100%", "%s%n", "a\nb\t\"c\"",
+                               "\xC3\xBC\xE2\x82\xAC\xF0\x9F\x98\x80", "{\"a\":1}"}) {
+        ExpectRead("string", szText, Json::Value(szText));
+    }
+}
+
+TEST_F(RowsTest, StringOfANumberColumnIsItsText) {
+    Open({{"a", "string"}, {"b", "string"}});
+    Insert("(12, -1.5)");
+    EXPECT_EQ(Compact(Listed()), R"([{"a":"12","b":"-1.5"}])");
+}
+
+TEST_F(RowsTest, IntFollowsTheRulesOfTheCLibrary) {
+    for (const char* szType : {"int", "unsigned int"}) {
+        ExpectRead(szType, "42", Json::Value(Json::Int(42)));
+        ExpectRead(szType, "-7", Json::Value(Json::Int(-7)));
+        ExpectRead(szType, "+5", Json::Value(Json::Int(5)));
+        ExpectRead(szType, " \t\n12", Json::Value(Json::Int(12)));
+        ExpectRead(szType, "12abc", Json::Value(Json::Int(12)));
+        ExpectRead(szType, "3.9", Json::Value(Json::Int(3)));
+        ExpectRead(szType, "010", Json::Value(Json::Int(10)));
+        ExpectRead(szType, "0x10", Json::Value(Json::Int(0)));
+        ExpectRead(szType, "abc", Json::Value(Json::Int(0)));
+        ExpectRead(szType, "", Json::Value(Json::Int(0)));
+        ExpectRead(szType, "2147483647", Json::Value(Json::Int(2147483647)));
+        ExpectRead(szType, "-2147483648", Json::Value(Json::Int(-2147483647 - 1)));
+    }
+}
+
+TEST_F(RowsTest, IntBeyondItsRangeKeepsTheLowBitsOfALongOrClampsToIt) {
+    const bool blLong64 = sizeof(long) == 8;
+    const Json::Int nMax = std::numeric_limits<Json::Int>::max();
+    const Json::Int nMin = std::numeric_limits<Json::Int>::min();
+    for (const char* szType : {"int", "unsigned int"}) {
+        ExpectRead(szType, "2147483648", Json::Value(blLong64 ? nMin : nMax));
+        ExpectRead(szType, "-2147483649", Json::Value(blLong64 ? nMax : nMin));
+        ExpectRead(szType, "4294967297", Json::Value(blLong64 ? Json::Int(1) : nMax));
+        ExpectRead(szType, "99999999999999999999", Json::Value(kOfLongMax));
+        ExpectRead(szType, "-99999999999999999999", Json::Value(kOfLongMin));
+    }
+}
+
+TEST_F(RowsTest, UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion) {
+    const bool blLong64 = sizeof(long) == 8;
+    const Json::Int nMax = std::numeric_limits<Json::Int>::max();
+    ExpectRead("unsigned int", "3000000000", Json::Value(blLong64 ? Json::Int(-1294967296) : nMax));
+    ExpectRead("unsigned int", "4294967295", Json::Value(blLong64 ? Json::Int(-1) : nMax));
+}
+
+TEST_F(RowsTest, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
+    const Json::Int64 nMax = std::numeric_limits<Json::Int64>::max();
+    const Json::Int64 nMin = std::numeric_limits<Json::Int64>::min();
+    for (const char* szType : {"long long", "unsigned long long"}) {
+        ExpectRead(szType, "42", Json::Value(Json::Int64(42)));
+        ExpectRead(szType, "-1", Json::Value(Json::Int64(-1)));
+        ExpectRead(szType, "  -8 9", Json::Value(Json::Int64(-8)));
+        ExpectRead(szType, "7e3", Json::Value(Json::Int64(7)));
+        ExpectRead(szType, "abc", Json::Value(Json::Int64(0)));
+        ExpectRead(szType, "", Json::Value(Json::Int64(0)));
+        ExpectRead(szType, "4294967296", Json::Value(Json::Int64(4294967296)));
+        ExpectRead(szType, "9223372036854775807", Json::Value(nMax));
+        ExpectRead(szType, "9223372036854775808", Json::Value(nMax));
+        ExpectRead(szType, "18446744073709551615", Json::Value(nMax));
+        ExpectRead(szType, "-9223372036854775808", Json::Value(nMin));
+        ExpectRead(szType, "-9223372036854775809", Json::Value(nMin));
+    }
+}
+
+TEST_F(RowsTest, BoolIsTrueForTheNumberOneOnly) {
+    for (const char* szTrue : {"1", " 1", "+1", "01", "1.9", "1x"}) {
+        ExpectRead("bool", szTrue, Json::Value(true));
+    }
+    for (const char* szFalse : {"0", "2", "-1", "11", "true", "TRUE", "", "x1", "4294967297"}) {
+        ExpectRead("bool", szFalse, Json::Value(false));
+    }
+}
+
+TEST_F(RowsTest, JsonTypesParseTheirTextWhateverKindItHolds) {
+    for (const char* szType : {"Json::Value", "Json::objectValue", "Json::arrayValue"}) {
+        for (const char* szText : {R"({"a":[1,-2,true,null,"x"],"b":{}})", R"([[],{"k":"v"},1.5])",
+                                   "{}", "[]", R"({"u":18446744073709551615,"i":-5})"}) {
+            ExpectRead(szType, szText, ParseJson(szText));
+        }
+    }
+}
+
+TEST_F(RowsTest, JsonTypesReadScalarsToo) {
+    for (const char* szText : {"5", "-1.5", "true", "null", "\"text\""}) {
+        ExpectRead("Json::Value", szText, ParseJson(szText));
+    }
+}
+
+TEST_F(RowsTest, TextThatIsNoJsonIsNoFailure) {
+    Open({{"a", "Json::objectValue"}, {"b", "int"}});
+    Insert("('no json', 1), ('{\"x\":', 2), ('', 3), ('{\"x\":1}', 4), ('\xFF', 5)");
+    const Json::Value jRows = Listed();
+    ASSERT_EQ(jRows.size(), 5U);
+    for (Json::ArrayIndex i = 0; i < 5; ++i) {
+        EXPECT_EQ(jRows[i]["b"], Json::Value(Json::Int(i + 1)));
+    }
+    EXPECT_EQ(Compact(jRows[3]), R"({"a":{"x":1},"b":4})");
+}
+
+TEST_F(RowsTest, JsonNestedTooDeepFailsTheStatementAndTheHandleWorksOn) {
+    Open({{"a", "Json::arrayValue"}});
+    Insert("('[1]'), ('" + Repeated("[", 5000) + Repeated("]", 5000) + "'), ('[2]')");
+    Json::Value jRows;
+    EXPECT_EQ(List(jRows), -1);
+    EXPECT_EQ(Compact(jRows), R"([{"a":[1]}])");
+    EXPECT_EQ(SqlErrorOf(*m_pHandle), sqlite3_errstr(SQLITE_ABORT));
+    Sql("DELETE FROM " + m_strTable + " WHERE length(a) > 100");
+    EXPECT_EQ(Compact(Listed()), R"([{"a":[1]},{"a":[2]}])");
+}
+
+TEST_F(RowsTest, NumberOutOfRangeInStoredJsonIsNoFailure) {
+    Open({{"a", "Json::arrayValue"}, {"b", "int"}});
+    Insert("('[1e999, 99999999999999999999999]', 1)");
+    EXPECT_EQ(Listed()[0]["b"], Json::Value(Json::Int(1)));
+}

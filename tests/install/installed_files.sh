@@ -1,0 +1,30 @@
+#!/usr/bin/env bash
+# Installs the build into an empty folder, for this test and for those of its users, and looks at
+# what lies there.
+set -euo pipefail
+
+rm -rf "$STAGE"
+"$CMAKE" --install "$BUILD_DIR" --config "$CONFIG" --prefix "$STAGE" >/dev/null
+
+# lib may be lib64 or lib/<triplet>, by the system's custom.
+(cd "$STAGE" && find . -mindepth 1 ! -type d) | sed -E 's|^\./lib[^/]*(/[^/]*-linux-[^/]*)?/|lib/|; s|^\./||' |
+    LC_ALL=C sort >"$WORK_DIR/installed.txt"
+diff -u - "$WORK_DIR/installed.txt" <<LIST
+include/VornJsonDbApi.h
+lib/cmake/vornjsondb/VornJsonDbJsonCpp.cmake
+lib/cmake/vornjsondb/vornjsondbConfig.cmake
+lib/cmake/vornjsondb/vornjsondbConfigVersion.cmake
+lib/cmake/vornjsondb/vornjsondbTargets-${CONFIG,,}.cmake
+lib/cmake/vornjsondb/vornjsondbTargets.cmake
+lib/libvornjsondb.so
+lib/libvornjsondb.so.6
+lib/libvornjsondb.so.6.0.0
+lib/pkgconfig/vornjsondb.pc
+LIST
+
+# A tree that names the folder it was built in breaks when it is moved. Debug information and
+# instrumented code may name sources.
+if grep -rlF --include='*.cmake' --include='*.pc' -e "$BUILD_DIR" -e "$SOURCE_DIR" -e "$STAGE" "$STAGE"; then
+    echo "the files above name a folder of the build" >&2
+    exit 1
+fi

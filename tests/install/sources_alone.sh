@@ -1,0 +1,13 @@
+#!/usr/bin/env bash
+# Every source of the library compiles in any build system: with the include folder, the language
+# level and JsonCpp's flags alone, from another directory, with no generated file.
+set -euo pipefail
+
+read -ra json_flags <<<"$JSONCPP_CFLAGS"
+mapfile -t sources < <(find "$SOURCE_DIR/src" -name '*.cpp' | LC_ALL=C sort)
+((${#sources[@]} > 0))
+
+cd "$WORK_DIR"
+printf '%s\n' "${sources[@]}"
+printf '%s\0' "${sources[@]}" |
+    xargs -0 -n 4 -P 2 "$CXX" -std=c++17 -fsyntax-only "-I$SOURCE_DIR/include" "${json_flags[@]}"

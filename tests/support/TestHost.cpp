@@ -1,0 +1,137 @@
+#include "TestHost.h"
+
+#include <sys/types.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <memory>
+
+#include "Recorder.h"
+
+namespace testhost {
+namespace {
+
+int AppendRow(void* pArg, int nColumns, char** aszValues, char**) {
+    std::string& strRows = *static_cast<std::string*>(pArg);
+    if (!strRows.empty()) {
+        strRows += '\n';
+    }
+    for (int i = 0; i < nColumns; ++i) {
+        strRows += i > 0 ? "|" : "";
+        strRows += aszValues[i] == nullptr ? "NULL" : aszValues[i];
+    }
+    return 0;
+}
+
+// A directory of this process alone; a forked child that ends early must not remove it.
+class TempDirectory {
+  public:
+    TempDirectory() : m_nOwner(::getpid()) {
+        std::string strPattern =
+            (std::filesystem::temp_directory_path() / "vornjsondb-XXXXXX").string();
+        if (::mkdtemp(strPattern.data()) == nullptr) {
+            std::perror("cannot create a temporary directory");
+            std::abort();
+        }
+        m_path = strPattern;
+    }
+    ~TempDirectory() {
+        if (::getpid() == m_nOwner) {
+            std::error_code error;
+            std::filesystem::remove_all(m_path, error);
+        }
+    }
+    TempDirectory(const TempDirectory&) = delete;
+    TempDirectory& operator=(const TempDirectory&) = delete;
+
+    std::string File(const std::string& strName) const { return (m_path / strName).string(); }
+
+  private:
+    pid_t m_nOwner;
+    std::filesystem::path m_path;
+};
+
+}  // namespace
+
+int BareExec(sqlite3* pDb, const std::string& strSql, std::string* pstrError) {
+    char* szError = nullptr;
+    const int nResult = RealExec(pDb, strSql.c_str(), nullptr, nullptr, &szError);
+    if (pstrError != nullptr) {
+        *pstrError = szError == nullptr ? "" : szError;
+    }
+    sqlite3_free(szError);
+    return nResult;
+}
+
+std::string BareRows(sqlite3* pDb, const std::string& strSql) {
+    std::string strRows;
+    char* szError = nullptr;
+    const int nResult = RealExec(pDb, strSql.c_str(), AppendRow, &strRows, &szError);
+    EXPECT_EQ(nResult, SQLITE_OK) << strSql << ": " << (szError == nullptr ? "" : szError);
+    sqlite3_free(szError);
+    return strRows;
+}
+
+void DbTest::SetUp() {
+    ASSERT_EQ(sqlite3_open(":memory:", &m_pDb), SQLITE_OK);
+    ResetHost();
+}
+
+void DbTest::TearDown() {
+    ResetHost();
+    EXPECT_EQ(sqlite3_close(m_pDb), SQLITE_OK);
+}
+
+void DbTest::Sql(const std::string& strSql) {
+    std::string strError;
+    ASSERT_EQ(BareExec(m_pDb, strSql, &strError), SQLITE_OK) << strSql << ": " << strError;
+}
+
+std::string DbTest::Rows(const std::string& strSql) {
+    return BareRows(m_pDb, strSql);
+}
+
+Json::Value ParseJson(const std::string& strText) {
+    Json::CharReaderBuilder builder;
+    Json::CharReaderBuilder::strictMode(&builder.settings_);
+    builder["strictRoot"] = false;
+    const std::unique_ptr<Json::CharReader> pReader(builder.newCharReader());
+    Json::Value jValue;
+    std::string strError;
+    const bool blParsed =
+        pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, &strError);
+    EXPECT_TRUE(blParsed) << strText << "\n" << strError;
+    return jValue;
+}
+
+std::string Compact(const Json::Value& jValue) {
+    Json::StreamWriterBuilder builder;
+    builder["indentation"] = "";
+    builder["emitUTF8"] = true;
+    return Json::writeString(builder, jValue);
+}
+
+Json::Value Definition(const std::string& strTable,
+                       std::initializer_list<std::pair<const char*, const char*>> listMembers) {
+    Json::Value jDefinition(Json::objectValue);
+    Json::Value& jMember = jDefinition[strTable]["member"] = Json::Value(Json::objectValue);
+    for (const auto& member : listMembers) {
+        jMember[member.first]["cpptype"] = member.second;
+    }
+    return jDefinition;
+}
+
+std::string UniqueTable() {
+    static int nTables = 0;
+    return "t" + std::to_string(++nTables);
+}
+
+std::string TempFile(const char* szStem) {
+    static const TempDirectory directory;
+    static int nFiles = 0;
+    return directory.File(std::string(szStem) + "-" + std::to_string(++nFiles));
+}
+
+}  // namespace testhost
