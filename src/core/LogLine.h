@@ -81,7 +81,8 @@ __attribute__((noinline, cold)) void WriteLine(const LineFormats& Formats, const
 #pragma GCC diagnostic pop
 
 // The long condition check, the most frequent line.
-void LogFailedCondition(const char* szFile, int nLine, const char* szCondition);
+__attribute__((cold)) void LogFailedCondition(const char* szFile, int nLine,
+                                              const char* szCondition);
 
 }  // namespace vornjsondb
 

@@ -30,6 +30,10 @@ std::unique_ptr<Json::CharReader> MakeReader() {
 // process, which is single-threaded here as everywhere.
 
 std::string ToString(const Json::Value& jValue) {
+    std::string strText;
+    if (WritePlainJson(jValue, strText)) {
+        return strText;
+    }
     static const std::unique_ptr<Json::StreamWriter> s_pWriter = MakeWriter();
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.

@@ -3,6 +3,8 @@
 #include <cstring>
 #include <utility>
 
+#include "JsonMember.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -136,10 +138,76 @@ class PlainJson {
     const char* m_pNext;
 };
 
+bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
+    for (const char* p = pBegin; p != pEnd; ++p) {
+        if (*p == '"' || *p == '\\' || static_cast<unsigned char>(*p) < 0x20) {
+            return false;
+        }
+    }
+    strOut.append(1, '"').append(pBegin, pEnd).append(1, '"');
+    return true;
+}
+
+bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut);
+
+bool WriteMembers(const Json::Value& jValue, int nLevel, std::string& strOut) {
+    const bool blObject = jValue.isObject();
+    char cBefore = blObject ? '{' : '[';
+    const Json::Value::const_iterator itEnd = jValue.end();
+    for (Json::Value::const_iterator it = jValue.begin(); it != itEnd; ++it) {
+        strOut += cBefore;
+        cBefore = ',';
+        if (blObject) {
+            const MemberName Name = NameOf(it);
+            if (!WriteText(Name.pBegin, Name.pEnd, strOut)) {
+                return false;
+            }
+            strOut += ':';
+        }
+        if (!WriteValue(*it, nLevel + 1, strOut)) {
+            return false;
+        }
+    }
+    if (cBefore != ',') {
+        strOut += cBefore;
+    }
+    strOut += blObject ? '}' : ']';
+    return true;
+}
+
+bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
+    switch (jValue.type()) {
+        case Json::nullValue:
+            strOut += "null";
+            return true;
+        case Json::booleanValue:
+            strOut += jValue.asBool() ? "true" : "false";
+            return true;
+        case Json::intValue:
+            strOut += std::to_string(jValue.asInt64());
+            return true;
+        case Json::stringValue: {
+            const char* pBegin = nullptr;
+            const char* pEnd = nullptr;
+            jValue.getString(&pBegin, &pEnd);
+            return WriteText(pBegin, pEnd, strOut);
+        }
+        case Json::arrayValue:
+        case Json::objectValue:
+            return nLevel < kMaxLevels && WriteMembers(jValue, nLevel, strOut);
+        default:
+            return false;
+    }
+}
+
 }  // namespace
 
 bool ReadPlainJson(const char* szText, Json::Value& jOut) {
     return PlainJson(szText).ReadWhole(jOut);
+}
+
+bool WritePlainJson(const Json::Value& jValue, std::string& strOut) {
+    return WriteValue(jValue, 0, strOut);
 }
 
 }  // namespace vornjsondb

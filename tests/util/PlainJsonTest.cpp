@@ -1,0 +1,168 @@
+// The fast reader and writer against JsonCpp's own: whatever they accept must come out the same.
+
+#include <memory>
+#include <string>
+
+#include <gtest/gtest.h>
+#include <json/json.h>
+
+#include "../../src/util/PlainJson.h"
+
+namespace {
+
+std::string ByJsonCpp(const Json::Value& jValue) {
+    Json::StreamWriterBuilder Builder;
+    Builder["indentation"] = "";
+    Builder["commentStyle"] = "None";
+    Builder["emitUTF8"] = true;
+    return Json::writeString(Builder, jValue);
+}
+
+Json::Value ParsedByJsonCpp(const std::string& strText) {
+    Json::CharReaderBuilder Builder;
+    const std::unique_ptr<Json::CharReader> pReader(Builder.newCharReader());
+    Json::Value jValue;
+    std::string strErrors;
+    EXPECT_TRUE(
+        pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, &strErrors))
+        << strErrors;
+    return jValue;
+}
+
+// Equality of JSON values compares kinds at the top only where numbers differ in kind.
+std::string KindsOf(const Json::Value& jValue) {
+    std::string strKinds = std::to_string(jValue.type());
+    for (const Json::Value& jChild : jValue) {
+        strKinds += "(" + KindsOf(jChild) + ")";
+    }
+    return strKinds;
+}
+
+const char* const kPlainTexts[] = {
+    "null",
+    "true",
+    "false",
+    "0",
+    "-0",
+    "7",
+    "-7",
+    "2147483648",
+    "-2147483649",
+    "999999999999999999",
+    "-999999999999999999",
+    "\"\"",
+    "\"text\"",
+    "\"O'Neil 100%\"",
+    "\"Gr\xc3\xbc\xc3\x9f"
+    "e \xf0\x9f\x8c\x8d\"",
+    "\"\x7f\"",
+    "[]",
+    "{}",
+    "[1,\"two\",3]",
+    "[[],[[]],{}]",
+    "{\"a\":1,\"b\":[true,null],\"\":{}}",
+    "{\"b\":1,\"a\":2}",
+    "{\"a\":[1],\"a\":{\"b\":2}}",
+    "[[[[[[[[1]]]]]]]]",
+};
+
+TEST(PlainJson, PlainTextsReadAsJsonCppReadsThem) {
+    for (const char* szText : kPlainTexts) {
+        Json::Value jRead;
+        ASSERT_TRUE(vornjsondb::ReadPlainJson(szText, jRead)) << szText;
+        const Json::Value jExpected = ParsedByJsonCpp(szText);
+        EXPECT_EQ(jRead, jExpected) << szText;
+        EXPECT_EQ(KindsOf(jRead), KindsOf(jExpected)) << szText;
+    }
+}
+
+TEST(PlainJson, ValuesAreWrittenAsJsonCppWritesThem) {
+    for (const char* szText : kPlainTexts) {
+        const Json::Value jValue = ParsedByJsonCpp(szText);
+        std::string strWritten;
+        ASSERT_TRUE(vornjsondb::WritePlainJson(jValue, strWritten)) << szText;
+        EXPECT_EQ(strWritten, ByJsonCpp(jValue)) << szText;
+    }
+}
+
+TEST(PlainJson, WritingAppendsToTheText) {
+    std::string strWritten = "limit ";
+    ASSERT_TRUE(vornjsondb::WritePlainJson(Json::Value(5), strWritten));
+    EXPECT_EQ(strWritten, "limit 5");
+}
+
+TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
+    const char* const szOthers[] = {
+        "",
+        " ",
+        " 1",
+        "1 ",
+        "[1, 2]",
+        "{\"a\" :1}",
+        "01",
+        "-",
+        "-a",
+        "00",
+        "1.5",
+        "1e3",
+        "1x",
+        "+1",
+        "[",
+        "[1",
+        "[1,",
+        "[1,]",
+        "[,]",
+        "[1}",
+        "]",
+        "{",
+        "{\"a\"",
+        "{\"a\":",
+        "{\"a\":1",
+        "{\"a\":1,",
+        "{\"a\":1,}",
+        "{a:1}",
+        "{\"a\"}",
+        "{1:2}",
+        "{\"a\":1]",
+        "\"",
+        "\"a",
+        "\"a\\n\"",
+        "\"\t\"",
+        "tru",
+        "nul",
+        "falsey",
+        "nullx",
+        "NaN",
+        "// comment\n1",
+        "[1]x",
+        "1000000000000000000",
+        "-1000000000000000000",
+        "[[[[[[[[[1]]]]]]]]]",
+        "{\"a\\\"\":1}",
+    };
+    for (const char* szText : szOthers) {
+        Json::Value jRead;
+        EXPECT_FALSE(vornjsondb::ReadPlainJson(szText, jRead)) << szText;
+    }
+}
+
+TEST(PlainJson, ValuesOutOfTheOrdinaryAreLeftToJsonCpp) {
+    const Json::Value jOthers[] = {
+        Json::Value(1.5),
+        Json::Value(3.0),
+        Json::Value(Json::UInt64(5)),
+        Json::Value("a \"quoted\" word"),
+        Json::Value("a\\b"),
+        Json::Value("a\nb"),
+        Json::Value(std::string("a\0b", 3)),
+        ParsedByJsonCpp("{\"a\\\"b\":1}"),
+        ParsedByJsonCpp("[[1,[2.5]]]"),
+        ParsedByJsonCpp("[[[[[[[[[1]]]]]]]]]"),
+    };
+    for (const Json::Value& jValue : jOthers) {
+        std::string strWritten;
+        EXPECT_FALSE(vornjsondb::WritePlainJson(jValue, strWritten)) << ByJsonCpp(jValue);
+    }
+}
+
+}  // namespace
