@@ -1,0 +1,52 @@
+# Sourced by the other scripts: how a build folder under build/ is made.
+# shellcheck shell=bash
+
+jobs=$(nproc)
+
+# configure NAME [CMAKE-OPTION...] makes build/NAME. Ninja and ccache are used where they are at hand.
+configure() {
+    local folder=build/$1
+    shift
+    local -a options=()
+    if [[ ! -e $folder/CMakeCache.txt ]] && command -v ninja >/dev/null; then
+        options+=(-G Ninja)
+    fi
+    if command -v ccache >/dev/null; then
+        options+=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache)
+    fi
+    mkdir -p "$folder"
+    if ! cmake -S . -B "$folder" "${options[@]}" "$@" >"$folder/configure.log" 2>&1; then
+        cat "$folder/configure.log" >&2
+        return 1
+    fi
+}
+
+# build NAME [TARGET...]
+build() {
+    local folder=build/$1
+    shift
+    local -a targets=()
+    if (($# > 0)); then
+        targets=(--target "$@")
+    fi
+    cmake --build "$folder" --parallel "$jobs" "${targets[@]}"
+}
+
+# build_quietly NAME [TARGET...] says something only when the build fails.
+build_quietly() {
+    if ! build "$@" >"build/$1/build.log" 2>&1; then
+        cat "build/$1/build.log" >&2
+        return 1
+    fi
+}
+
+# What the scripts need. Where the compiler is given with CXX, it counts in the place of g++.
+# shellcheck disable=SC2034  # used by those who source this file
+{
+    compiler_packages=("g++:${CXX:-g++}" cmake:cmake)
+    if ! command -v ninja >/dev/null; then
+        compiler_packages+=(make:make)
+    fi
+    library_packages=(libsqlite3-dev libjsoncpp-dev)
+    test_packages=(libgtest-dev libgmock-dev pkg-config:pkg-config iso-codes)
+}

@@ -1,0 +1,32 @@
+#!/usr/bin/env bash
+# Runs the tests with gcc's coverage counters and prints the line and branch coverage of src/.
+#
+#    scripts/coverage.sh [--fail-under N] [GCOVR-OPTION...]
+#
+# --fail-under N fails below N percent of the lines or of the branches. What else is given goes to
+# gcovr, --html-details build/coverage/index.html for example.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+source scripts/install-packages.sh
+source scripts/build.sh
+
+options=()
+if [[ ${1:-} == --fail-under ]]; then
+    options=(--fail-under-line "$2" --fail-under-branch "$2")
+    shift 2
+fi
+
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" gcovr:gcovr
+configure coverage -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_COVERAGE=ON \
+    -DVORNJSONDB_EXAMPLES=OFF
+# Counters of an earlier build do not fit, those of an earlier run would add up.
+find build/coverage -name '*.gcda' -delete
+build coverage
+
+(cd build/coverage && ctest --output-on-failure --parallel "$jobs" --label-exclude 'install|campaign')
+
+# Branches that only an exception takes are not counted. First the branches file by file, then the
+# lines with the figures of both.
+report=(gcovr --root . --filter src/ --exclude-throw-branches)
+"${report[@]}" --branches build/coverage
+"${report[@]}" --print-summary "${options[@]}" "$@" build/coverage
