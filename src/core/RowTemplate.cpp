@@ -13,39 +13,48 @@ namespace {
 // More statement shapes than a process has; tables without end are read column by column.
 constexpr size_t kMaxTemplates = 256;
 
+// Never freed: records may outlive every static of this library, and they use the names.
+std::vector<const RowTemplate*>& Templates() {
+    static std::vector<const RowTemplate*>& s_vecTemplates = *new std::vector<const RowTemplate*>;
+    return s_vecTemplates;
+}
+
 }  // namespace
 
-const RowTemplate* RowTemplate::Find(const Json::Value& jType, int nColumns, char** szNames) {
-    // Never freed: records may outlive every static of this library, and they use the names.
-    static std::vector<const RowTemplate*>& s_vecTemplates = *new std::vector<const RowTemplate*>;
-    for (const RowTemplate*& pTemplate : s_vecTemplates) {
-        if (pTemplate->Matches(jType, nColumns, szNames)) {
+const RowTemplate* RowTemplate::Find(const std::string& strTable, int nColumns, char** szNames) {
+    for (const RowTemplate*& pTemplate : Templates()) {
+        if (pTemplate->Matches(strTable, nColumns, szNames)) {
             // To the front: the next row is of the same statement.
-            std::swap(pTemplate, s_vecTemplates.front());
-            return s_vecTemplates.front();
+            std::swap(pTemplate, Templates().front());
+            return Templates().front();
         }
     }
-    if (s_vecTemplates.size() == kMaxTemplates) {
+    return nullptr;
+}
+
+const RowTemplate* RowTemplate::Make(const std::string& strTable, const Json::Value& jType,
+                                     int nColumns, char** szNames) {
+    if (Templates().size() == kMaxTemplates) {
         return nullptr;
     }
-    std::unique_ptr<RowTemplate> pMade(new RowTemplate(jType, nColumns, szNames));
-    if (!pMade->Prepare()) {
+    std::unique_ptr<RowTemplate> pMade(new RowTemplate(strTable, nColumns, szNames));
+    if (!pMade->Prepare(jType)) {
         return nullptr;
     }
-    s_vecTemplates.push_back(pMade.get());
+    Templates().push_back(pMade.get());
     return pMade.release();
 }
 
-RowTemplate::RowTemplate(const Json::Value& jType, int nColumns, char** szNames)
-    : m_pjType(&jType), m_jEmpty(Json::objectValue) {
+RowTemplate::RowTemplate(const std::string& strTable, int nColumns, char** szNames)
+    : m_strTable(strTable), m_jEmpty(Json::objectValue) {
     for (int i = 0; i < nColumns; ++i) {
         m_vecNames.emplace_back(szNames[i] == nullptr ? "" : szNames[i]);
     }
 }
 
-bool RowTemplate::Prepare() {
+bool RowTemplate::Prepare(const Json::Value& jType) {
     for (size_t i = 0; i < m_vecNames.size(); ++i) {
-        const Json::Value* pjDefinition = FindMember(*m_pjType, m_vecNames[i]);
+        const Json::Value* pjDefinition = FindMember(jType, m_vecNames[i]);
         if (pjDefinition == nullptr || TypeOfMember(*pjDefinition).pfnRead == nullptr ||
             m_jEmpty.isMember(m_vecNames[i])) {
             return false;
@@ -53,16 +62,15 @@ bool RowTemplate::Prepare() {
         m_jEmpty[Json::StaticString(m_vecNames[i].c_str())] = static_cast<Json::UInt64>(i);
     }
     for (Json::Value::iterator it = m_jEmpty.begin(); it != m_jEmpty.end(); ++it) {
-        const Json::Value* pjDefinition = FindMember(*m_pjType, NameOf(it));
-        m_vecColumns.push_back(
-            Column{&TypeOfMember(*pjDefinition), static_cast<size_t>((*it).asUInt64())});
+        const MemberType& Type = TypeOfMember(*FindMember(jType, NameOf(it)));
+        m_vecColumns.push_back(Column{&Type, static_cast<size_t>((*it).asUInt64())});
         *it = Json::Value();
     }
     return true;
 }
 
-bool RowTemplate::Matches(const Json::Value& jType, int nColumns, char** szNames) const {
-    if (m_pjType != &jType || m_vecNames.size() != static_cast<size_t>(nColumns)) {
+bool RowTemplate::Matches(const std::string& strTable, int nColumns, char** szNames) const {
+    if (m_vecNames.size() != static_cast<size_t>(nColumns) || m_strTable != strTable) {
         return false;
     }
     for (size_t i = 0; i < m_vecNames.size(); ++i) {

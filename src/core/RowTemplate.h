@@ -18,9 +18,14 @@ namespace vornjsondb {
 
 class RowTemplate {
   public:
-    // The template for these columns of the table with these member types; nullptr when a column
-    // is not declared, cannot be read or comes twice. Kept for the statements to come.
-    static const RowTemplate* Find(const Json::Value& jType, int nColumns, char** szNames);
+    // The template for these columns of the table, of one row or more; nullptr when none has been
+    // made.
+    static const RowTemplate* Find(const std::string& strTable, int nColumns, char** szNames);
+
+    // Makes it, for the rows and statements to come, of the table's member types; nullptr when a
+    // column is not declared, cannot be read or comes twice.
+    static const RowTemplate* Make(const std::string& strTable, const Json::Value& jType,
+                                   int nColumns, char** szNames);
 
     RowTemplate(const RowTemplate&) = delete;
     RowTemplate& operator=(const RowTemplate&) = delete;
@@ -34,11 +39,11 @@ class RowTemplate {
         size_t nIndex;
     };
 
-    RowTemplate(const Json::Value& jType, int nColumns, char** szNames);
-    bool Prepare();
-    bool Matches(const Json::Value& jType, int nColumns, char** szNames) const;
+    RowTemplate(const std::string& strTable, int nColumns, char** szNames);
+    bool Prepare(const Json::Value& jType);
+    bool Matches(const std::string& strTable, int nColumns, char** szNames) const;
 
-    const Json::Value* m_pjType;          // lives as long as the process and never changes
+    std::string m_strTable;               // stands for its member types, which never change
     std::vector<std::string> m_vecNames;  // as the statement has them
     std::vector<Column> m_vecColumns;     // in key order
     Json::Value m_jEmpty;                 // every column, with null; its keys lie in m_vecNames

@@ -74,14 +74,22 @@ int FillColumns(Json::Value& jRec, const Json::Value& jType, int n_column, char*
 int DbCallBackFillRec(Json::Value* pjRec, int n_column, char** column_value, char** column_name) {
     VORN_FAIL_IF(NULL == column_name || NULL == column_value);
     if (n_column < 1) {
+        *pjRec = Json::Value(Json::objectValue);
         return 0;
     }
     VORN_FAIL_IF_TEXT(NULL == column_name[0], "NULL == column_name[i]");
-    const Json::Value& jType = CurrentMemberTypes();
-    const RowTemplate* pTemplate = RowTemplate::Find(jType, n_column, column_name);
+    const RowTemplate* pTemplate = RowTemplate::Find(g_strCurTable, n_column, column_name);
     if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
         return 0;
     }
+    const Json::Value& jType = CurrentMemberTypes();
+    if (pTemplate == nullptr) {
+        pTemplate = RowTemplate::Make(g_strCurTable, jType, n_column, column_name);
+        if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
+            return 0;
+        }
+    }
+    *pjRec = Json::Value(Json::objectValue);
     return FillColumns(*pjRec, jType, n_column, column_value, column_name);
 }
 
@@ -91,7 +99,7 @@ int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** col
     Json::Value* pjRecArray = static_cast<Json::Value*>(pArg);
     VORN_FAIL_IF(!pjRecArray);
     VORN_FAIL_IF(pjRecArray->type() != Json::arrayValue && pjRecArray->type() != Json::nullValue);
-    Json::Value jTmp(Json::objectValue);
+    Json::Value jTmp;
     VORN_FAIL_IF(0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name));
     pjRecArray->append(std::move(jTmp));
     return 0;

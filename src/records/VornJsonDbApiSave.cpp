@@ -7,6 +7,12 @@
 #include "../util/JsonText.h"
 #include "SaveRecord.h"
 
+namespace {
+
+constexpr size_t kUsualLength = 256;  // of a statement: spares it growing step by step
+
+}  // namespace
+
 // Beside the class, so that a create can store the caller's record without changing or copying it.
 // The condition texts are those of recSave, which log readers know.
 int vornjsondb::SaveRecord(VornJsonDbApi& Handle, const TableParts& Table, const Json::Value& jType,
@@ -14,6 +20,7 @@ int vornjsondb::SaveRecord(VornJsonDbApi& Handle, const TableParts& Table, const
     std::string strSql;
     const auto Save = [&]() -> int {
         Json::Value jArrayTmp(Json::arrayValue);
+        strSql.reserve(kUsualLength);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
         strSql.append(Table.strName).append(" (");
         VORN_FAIL_IF_TEXT(0 > Handle.SqlExpandMemberName(strSql, &jRec),

@@ -8,13 +8,19 @@
 #include "../util/JsonText.h"
 #include "UniqueFailure.h"
 
+namespace {
+
+constexpr size_t kUsualLength = 256;  // of a statement: spares it growing step by step
+
+}  // namespace
+
 int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {
     std::string strSql;
     const auto Update = [&]() -> int {
         // An empty condition would change the whole table.
         VORN_FAIL_IF(strSqlWhere.empty());
         VORN_FAIL_IF(jRecIn.empty());
-        std::string strSql2;
+        strSql.reserve(kUsualLength);
         strSql.append("UPDATE ").append(m_strName).append(" SET ");
         // Raw condition text in a record must not become an assignment.
         Json::Value jWithoutFilter;
@@ -24,8 +30,14 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
             jWithoutFilter.removeMember("vornSqlWhereFilter");
         }
         Json::Value& jColumnList = blFilter ? jWithoutFilter : jRecIn;
-        VORN_FAIL_IF(0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA));
-        strSql.append(strSql2).append(" WHERE ").append(strSqlWhere).append(";");
+        const size_t nHead = strSql.length();
+        if (0 > SqlExpandMemberList(jColumnList, strSql, VORN_SQL_WHERE_TYPE_COMMA)) {
+            strSql.resize(nHead);  // what is logged of a failed statement is the head alone
+            VORN_LOG_CONDITION(
+                "0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA)");
+            return -1;
+        }
+        strSql.append(" WHERE ").append(strSqlWhere).append(";");
         VORN_FAIL_IF_TEXT(
             0 > vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSql, nullptr, nullptr),
             "0 > runSqlEx(strSql, NULL, NULL)");

@@ -9,6 +9,8 @@ namespace vornjsondb {
 
 namespace {
 
+constexpr size_t kUsualValues = 256;  // room for them, to spare the text growing step by step
+
 SqlText FormatOrThrow(const MemberType& Type, const char* szFormat, const Json::Value& jValue) {
     SqlText szText(Type.pfnFormat(szFormat, jValue));
     if (!szText) {
@@ -33,9 +35,11 @@ bool IsPlainFormat(const std::string& strFormat, size_t nSpecifier) {
 }
 
 AccumulatedFormat::AccumulatedFormat(const std::string& strText)
-    : m_strText(strText),
-      m_blLiteral(strText.find('%') == std::string::npos &&
-                  strText.find('\0') == std::string::npos) {}
+    : m_blLiteral(strText.find('%') == std::string::npos &&
+                  strText.find('\0') == std::string::npos) {
+    m_strText.reserve(strText.length() + kUsualValues);
+    m_strText.append(strText);
+}
 
 bool AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue) {
     if (!m_blLiteral) {
