@@ -25,16 +25,15 @@
 #endif
 
 // Plain line: the message as it stands.
-// The printf is never run: there the compiler checks the text against the arguments, which the
-// formats made of it do not show. __extension__: %m is not ISO C++, and is meant.
-#define VORN_LOG_AT(szFile, nLine, szText, ...)                                                \
-    do {                                                                                       \
-        if (false) {                                                                           \
-            __extension__ std::printf(szText, __VA_ARGS__);                                    \
-        }                                                                                      \
-        vornjsondb::WriteLine(                                                                 \
-            {"(%u) %s:%d " szText "\n", "%s:%d (%u)(%m)" szText, "%s:%d (%u)" szText}, szFile, \
-            nLine, __VA_ARGS__);                                                               \
+// The printf is never run: there the compiler checks the message against its arguments, which it
+// cannot where the format is put together. __extension__: %m is not ISO C++, and is meant.
+#define VORN_LOG_AT(szFile, nLine, szMessage, ...)                                   \
+    do {                                                                             \
+        static_assert(sizeof(szMessage) <= vornjsondb::LineFormat::kMaxMessage, ""); \
+        if (false) {                                                                 \
+            __extension__ std::printf(szMessage, __VA_ARGS__);                       \
+        }                                                                            \
+        vornjsondb::WriteLine(szMessage, szFile, nLine, __VA_ARGS__);                \
     } while (false)
 #define VORN_LOG_PLAIN(szText, ...) VORN_LOG_AT(VORN_LOG_FILE, __LINE__, szText, __VA_ARGS__)
 
@@ -56,26 +55,33 @@
 
 namespace vornjsondb {
 
-// The same message for each place where it may go.
-struct LineFormats {
-    const char* szStdout;
-    const char* szSyslogErrno;  // errno is set
-    const char* szSyslog;
+// A line's whole format, put together when the line is written, which is rare: so each message
+// text is in the library once instead of once for each place where lines may go.
+class LineFormat {
+  public:
+    LineFormat(const char* szBefore, const char* szMessage, const char* szAfter);
+    const char* Text() const { return m_szText; }
+
+    static constexpr size_t kMaxMessage = 128;  // with its NUL
+
+  private:
+    char m_szText[kMaxMessage + 32];
 };
 
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
 
-// Out of line, one for each list of argument types: the call sites are many and the lines rare.
+// Out of line, one for each list of argument types: the call sites are many.
 template <typename... Arguments>
-__attribute__((noinline, cold)) void WriteLine(const LineFormats& Formats, const char* szFile,
-                                               int nLine, Arguments... args) {
+__attribute__((noinline, cold)) void WriteLine(const char* szMessage, const char* szFile, int nLine,
+                                               Arguments... args) {
     if (blLogToStdout) {
-        std::printf(Formats.szStdout, static_cast<unsigned>(getpid()), szFile, nLine, args...);
+        const LineFormat Format("(%u) %s:%d ", szMessage, "\n");
+        std::printf(Format.Text(), static_cast<unsigned>(getpid()), szFile, nLine, args...);
         return;
     }
-    const char* szFormat = errno != 0 ? Formats.szSyslogErrno : Formats.szSyslog;
-    syslog(LOG_ERR, szFormat, szFile, nLine, static_cast<unsigned>(getpid()), args...);
+    const LineFormat Format(errno != 0 ? "%s:%d (%u)(%m)" : "%s:%d (%u)", szMessage, "");
+    syslog(LOG_ERR, Format.Text(), szFile, nLine, static_cast<unsigned>(getpid()), args...);
 }
 
 #pragma GCC diagnostic pop
