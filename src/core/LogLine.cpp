@@ -3,7 +3,8 @@
 namespace vornjsondb {
 
 LineFormat::LineFormat(const char* szBefore, const char* szMessage, const char* szAfter) {
-    std::snprintf(m_szText, sizeof(m_szText), "%s%s%s", szBefore, szMessage, szAfter);
+    static_cast<void>(
+        std::snprintf(m_szText, sizeof(m_szText), "%s%s%s", szBefore, szMessage, szAfter));
 }
 
 void LogFailedCondition(const char* szFile, int nLine, const char* szCondition) {

@@ -45,8 +45,8 @@ const RowTemplate* RowTemplate::Make(const std::string& strTable, const Json::Va
     return pMade.release();
 }
 
-RowTemplate::RowTemplate(const std::string& strTable, int nColumns, char** szNames)
-    : m_strTable(strTable), m_jEmpty(Json::objectValue) {
+RowTemplate::RowTemplate(std::string strTable, int nColumns, char** szNames)
+    : m_strTable(std::move(strTable)), m_jEmpty(Json::objectValue) {
     for (int i = 0; i < nColumns; ++i) {
         m_vecNames.emplace_back(szNames[i] == nullptr ? "" : szNames[i]);
     }

@@ -27,9 +27,6 @@ class RowTemplate {
     static const RowTemplate* Make(const std::string& strTable, const Json::Value& jType,
                                    int nColumns, char** szNames);
 
-    RowTemplate(const RowTemplate&) = delete;
-    RowTemplate& operator=(const RowTemplate&) = delete;
-
     // Makes the record of one row. Returns false, with jRec as it was, when a text cannot be read.
     bool Fill(char** szTexts, Json::Value& jRec) const;
 
@@ -39,7 +36,7 @@ class RowTemplate {
         size_t nIndex;
     };
 
-    RowTemplate(const std::string& strTable, int nColumns, char** szNames);
+    RowTemplate(std::string strTable, int nColumns, char** szNames);
     bool Prepare(const Json::Value& jType);
     bool Matches(const std::string& strTable, int nColumns, char** szNames) const;
 

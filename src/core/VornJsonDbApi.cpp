@@ -4,6 +4,7 @@
 
 #include <utility>
 
+#include "../util/JsonMemory.h"
 #include "LogLine.h"
 
 // The only short condition checks: a constructor cannot return -1 and goes on in any case.
@@ -15,7 +16,7 @@
     } while (false)
 
 VornJsonDbApi::VornJsonDbApi(sqlite3* pDb, std::string& strName, Json::Value& jTableDef,
-                             std::string& strSqlCreate)
+                             std::string& strSqlCreate) try
     : m_pDb(pDb), m_strName(strName), m_jTableDef(jTableDef), m_strSqlCreate(strSqlCreate) {
     VORN_WARN_IF(!pDb);
     VORN_WARN_IF(strName.empty());
@@ -26,6 +27,7 @@ VornJsonDbApi::VornJsonDbApi(sqlite3* pDb, std::string& strName, Json::Value& jT
         VORN_LOG_CONDITION("0 > tableCreate()");
     }
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 VornJsonDbApi::~VornJsonDbApi() {
     m_pDb = nullptr;

@@ -77,6 +77,7 @@ int vornjsondb::RunSql(const TableParts& Table, const std::string& strSql,
     return Failed(-1);
 }
 
+// NOLINTNEXTLINE(performance-unnecessary-value-param): by value in the ABI.
 int VornJsonDbApi::runSqlEx(std::string strSql, int (*callback)(void*, int, char**, char**),
                             void* pArg) {
     return vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSql, callback, pArg);

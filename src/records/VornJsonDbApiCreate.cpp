@@ -4,11 +4,12 @@
 
 #include "../core/LogLine.h"
 #include "../schema/Defaults.h"
+#include "../util/JsonMemory.h"
 #include "../util/JsonText.h"
 #include "SaveRecord.h"
 #include "UniqueFailure.h"
 
-int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) {
+int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) try {
     Json::Value jCompleted;
     Json::Value* pjParam = &jParamIn;
     Json::Value jStored;
@@ -42,3 +43,4 @@ int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) {
     }
     return -1;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC

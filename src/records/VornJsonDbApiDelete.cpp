@@ -5,6 +5,7 @@
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
 #include "../util/JsonMember.h"
+#include "../util/JsonMemory.h"
 
 namespace {
 
@@ -100,7 +101,7 @@ int VornJsonDbApi::recDeleteByName(std::string& strValue, const char* szKey) {
 }
 
 int VornJsonDbApi::VectorParamToJson(std::vector<std::string>& strVector, const char* szKey,
-                                     Json::Value& jParamOut) {
+                                     Json::Value& jParamOut) try {
     VORN_FAIL_IF(jParamOut.type() != Json::objectValue && jParamOut.type() != Json::nullValue);
     VORN_FAIL_IF(!szKey || !szKey[0]);
     Json::Value jList(Json::arrayValue);
@@ -110,3 +111,4 @@ int VornJsonDbApi::VectorParamToJson(std::vector<std::string>& strVector, const 
     jParamOut[szKey] = jList;
     return 0;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC

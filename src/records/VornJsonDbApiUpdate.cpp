@@ -5,6 +5,7 @@
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
 #include "../util/JsonMember.h"
+#include "../util/JsonMemory.h"
 #include "../util/JsonText.h"
 #include "UniqueFailure.h"
 
@@ -14,7 +15,7 @@ constexpr size_t kUsualLength = 256;  // of a statement: spares it growing step 
 
 }  // namespace
 
-int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {
+int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) try {
     std::string strSql;
     const auto Update = [&]() -> int {
         // An empty condition would change the whole table.
@@ -56,6 +57,7 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
     }
     return -1;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 int VornJsonDbApi::recUpdateByFilter(Json::Value& jFilterIn, Json::Value& jParamIn) {
     const auto Update = [&]() -> int {

@@ -3,6 +3,7 @@
 #include <VornJsonDbApi.h>
 
 #include "../core/LogLine.h"
+#include "../util/JsonMemory.h"
 #include "../util/JsonText.h"
 #include "Defaults.h"
 
@@ -29,7 +30,7 @@ void FillDefaults(const TableTypes& Types, Json::Value& jRec) {
 
 }  // namespace vornjsondb
 
-int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) {
+int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
     const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
     const vornjsondb::TableTypes& Types = vornjsondb::TableTypes::Of(jType);
     if (!blStrict) {
@@ -49,3 +50,4 @@ int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) {
     }
     return 0;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC

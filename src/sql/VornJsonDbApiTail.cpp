@@ -23,7 +23,8 @@ int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string&
         VORN_FAIL_IF(!szSql);
         strSqlOut += szSql.get();
         if (const Json::Value* pjDirection = FindMember(jFilter, "sort_direction")) {
-            strSqlOut.append(*pjDirection == "desc" ? " DESC" : " ASC");
+            const bool blDescending = pjDirection->isString() && pjDirection->asString() == "desc";
+            strSqlOut.append(blDescending ? " DESC" : " ASC");
         }
     }
     const Json::Value* pjLimit = FindMember(jFilter, "limit");

@@ -7,6 +7,7 @@
 
 #include "../core/LogLine.h"
 #include "JsonMember.h"
+#include "JsonMemory.h"
 #include "JsonText.h"
 
 namespace {
@@ -64,7 +65,7 @@ int CheckCached(const Json::Value& jEntry) {
 
 }  // namespace
 
-Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) {
+Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) try {
     static Json::Value jType;
     if (const Json::Value* pjEntry = FindMember(jType, strJsonName)) {
         if (0 <= CheckCached(*pjEntry)) {
@@ -82,8 +83,9 @@ Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonN
     // Pinned by RecTypeTest.EmptyDefinitionIsRefused.
     return jType[strJsonName];
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
-int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool blOverwrite) {
+int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool blOverwrite) try {
     VORN_FAIL_IF(jIn.type() != Json::nullValue && jIn.type() != Json::objectValue);
     VORN_FAIL_IF(jSubSet.type() != Json::objectValue);
     for (const std::string& strName : jSubSet.getMemberNames()) {
@@ -93,6 +95,7 @@ int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool bl
     }
     return 0;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 int VORN_JSON_DB::getTimeAfterNow(int offsetSecond, long& now) {
     // Added in 64 bits: where time_t has 32, a far offset wraps instead of being undefined.

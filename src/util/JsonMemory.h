@@ -1,0 +1,16 @@
+#ifndef VORN_UTIL_JSON_MEMORY_H
+#define VORN_UTIL_JSON_MEMORY_H
+
+#include <new>
+
+#include <json/json.h>
+
+// Ends a public function whose body is a try block and copies texts into JSON values: JsonCpp
+// reports that malloc gave nothing by an exception of its own, and callers are promised
+// std::bad_alloc.
+#define VORN_JSON_MEMORY_TO_BAD_ALLOC   \
+    catch (const Json::RuntimeError&) { \
+        throw std::bad_alloc();         \
+    }
+
+#endif  // VORN_UTIL_JSON_MEMORY_H

@@ -1,0 +1,141 @@
+// JsonCpp's texts come from malloc. Under AddressSanitizer, which brings its own, this is left out.
+
+#ifndef __SANITIZE_ADDRESS__
+
+#include <VornJsonDbApi.h>
+
+#include <cstddef>
+#include <functional>
+#include <new>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "../support/TestHost.h"
+
+extern "C" void* __libc_malloc(size_t nBytes);
+
+namespace {
+
+// 0: never. Counts down to the one allocation that fails.
+int g_nFailAt = 0;
+
+}  // namespace
+
+extern "C" void* malloc(size_t nBytes) {
+    if (g_nFailAt > 0 && --g_nFailAt == 0) {
+        return nullptr;
+    }
+    return __libc_malloc(nBytes);
+}
+
+namespace {
+
+using testhost::DbTest;
+using testhost::Definition;
+using testhost::UniqueTable;
+
+class JsonMemoryTest : public DbTest {
+  protected:
+    // Runs the call while each of its allocations fails in turn, until none does. Returns how
+    // often it threw; any exception but std::bad_alloc fails the test.
+    static int ThrowsOutOf(const std::function<void()>& Call) {
+        int nThrown = 0;
+        for (int nAt = 1; nAt < 10000; ++nAt) {
+            g_nFailAt = nAt;
+            bool blThrown = false;
+            std::string strOther;
+            try {
+                Call();
+            } catch (const std::bad_alloc&) {
+                blThrown = true;
+            } catch (const std::logic_error&) {
+                blThrown = true;  // SQLite's formatter had no memory
+            } catch (const std::exception& Error) {
+                strOther = Error.what();
+            }
+            const bool blUntouched = g_nFailAt > 0;
+            g_nFailAt = 0;
+            EXPECT_EQ(strOther, "") << "allocation " << nAt;
+            nThrown += static_cast<int>(blThrown);
+            if (blUntouched) {
+                return nThrown;
+            }
+        }
+        ADD_FAILURE() << "the call never passed";
+        return nThrown;
+    }
+
+    std::string m_strTable = UniqueTable();
+    std::string m_strCreate =
+        "CREATE TABLE IF NOT EXISTS " + m_strTable + " (id INTEGER PRIMARY KEY, name TEXT)";
+    Json::Value m_jDefinition = Definition(m_strTable, {{"id", "int"}, {"name", "string"}});
+    const std::string m_strLong = std::string(100, 'x');
+};
+
+TEST_F(JsonMemoryTest, ConstructorThrowsBadAllocOnly) {
+    EXPECT_GT(
+        ThrowsOutOf([&] { VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate); }),
+        0);
+}
+
+TEST_F(JsonMemoryTest, FirstTypeLookupThrowsBadAllocOnly) {
+    EXPECT_GT(ThrowsOutOf([&] { VORN_JSON_DB::recType(m_jDefinition, m_strTable); }), 0);
+}
+
+TEST_F(JsonMemoryTest, MemberCopyThrowsBadAllocOnly) {
+    Json::Value jSource;
+    jSource["name"] = m_strLong;
+    EXPECT_GT(ThrowsOutOf([&] {
+                  Json::Value jCopy;
+                  VORN_JSON_DB::jsonCopyMember(jCopy, jSource, true);
+              }),
+              0);
+}
+
+TEST_F(JsonMemoryTest, DefaultsThrowBadAllocOnly) {
+    m_jDefinition[m_strTable]["member"]["name"]["cppDefaultValue"] = m_strLong;
+    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    EXPECT_GT(ThrowsOutOf([&] {
+                  Json::Value jRecord;
+                  Handle.fillDefaultValue(jRecord, false);
+              }),
+              0);
+    Json::Value jRecord;
+    jRecord["id"] = 1;
+    EXPECT_GT(ThrowsOutOf([&] {
+                  Json::Value jStored;
+                  Handle.recCreate(jRecord, jStored);
+              }),
+              0);
+}
+
+TEST_F(JsonMemoryTest, UpdateWithAFilterInTheRecordThrowsBadAllocOnly) {
+    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    Json::Value jRecord;
+    jRecord["name"] = m_strLong;
+    jRecord["vornSqlWhereFilter"] = "1";
+    std::string strWhere = "id = 1";
+    EXPECT_GT(ThrowsOutOf([&] { Handle.recUpdateByWhere(jRecord, strWhere); }), 0);
+}
+
+TEST_F(JsonMemoryTest, DeleteByNameThrowsBadAllocOnly) {
+    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    std::string strValue = m_strLong;
+    EXPECT_GT(ThrowsOutOf([&] { Handle.recDeleteByName(strValue, "name"); }), 0);
+}
+
+TEST_F(JsonMemoryTest, SortedListAndGetThrowBadAllocOnly) {
+    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a name that is not short')");
+    Json::Value jQuery;
+    jQuery["sort_by"] = "name";
+    jQuery["sort_direction"] = "desc";
+    Json::Value jFound;
+    jFound["kept"] = 1;
+    EXPECT_GT(ThrowsOutOf([&] { Handle.recGetOne(jQuery, jFound); }), 0);
+}
+
+}  // namespace
+
+#endif  // __SANITIZE_ADDRESS__
