@@ -24,11 +24,14 @@
 // 1  Limits
 //
 // Threads: one thread at a time per process, not per handle. The name of the running table and
-// the cache of member types are shared by all handles, and nothing is locked.
+// the cache of member types are shared by all handles, and nothing is locked. For the same reason
+// no call may be made from inside another: from an SQL function, say, that a statement calls.
+// Arguments must not change while a call with them runs.
 // Waiting: a locked database blocks the caller for about five seconds (500 attempts, 10 ms apart).
 // The table name is the key of the type cache: the first definition seen under a name serves
 // every later handle on that name, in any database, until the process ends.
-// Texts are C strings inside SQL: a text value ends at its first NUL byte. UTF-8 is expected.
+// Texts are C strings inside SQL: a text value ends at its first NUL byte, and a statement at a
+// NUL byte in a name or filter text. UTF-8 is expected.
 // Names and filter texts go into SQL as they stand: they must come from the program, never from
 // its users. The same holds for a number member that is given as text in a query object.
 // A percent sign in a text value can halve ("%%" becomes "%") or get the record refused, when
@@ -60,8 +63,9 @@
 //    "Json::Value"           parsed JSON text           refused           quoted JSON text
 //    "long", "unsigned long", "unsigned", "double", "float"
 //                            refused                    refused           bare
-//    "uid_t", "time_t"       refused                    not stored        bare
+//    "uid_t", "time_t"       refused                    not created (1)   bare
 //
+//    (1) An update stores them; rows with them can then not be read.
 //    recSave stores all of these but "Json::Value", "uid_t" and "time_t"; it checks no kinds
 //    except those that cannot be converted at all.
 //
@@ -90,7 +94,9 @@
 // 3  Log flags
 //
 // The host's, read afresh for every line. The library brings weak ones that are false, so that a
-// host without a logging library of its own links too; a definition of the host's own wins.
+// host without a logging library of its own links too. A definition in the program wins; so does
+// one in a shared library that is linked before this one. One that is linked after it shares the
+// flags as well, but its initial values are lost: set them at run time there.
 //    blLogToStdout   true: lines go to standard output; false: to syslog, at LOG_ERR
 //    blDebugOutput   true: four debug lines are written besides the errors (retries of a locked
 //                    statement, its failure, the count of deleted rows, a record that lacks
@@ -111,12 +117,12 @@ namespace VORN_JSON_DB {
 // Returns the member types of the table strJsonName: an object with one entry per member, each
 // holding "cpptype" and, where defined, "cppDefaultValue". The first call for a name takes them
 // from jTableDef and keeps them; later calls answer from the cache, whatever they pass (an empty
-// jTableDef is fine then). The reference is shared and lives as long as the process; do not
-// change what it refers to.
+// jTableDef is fine then). The reference is shared and lives as long as the process. Do not
+// change what it refers to: the library keeps pointers into it.
 // On failure (no entry, no "member" object, an entry without a "cpptype" text) the definition
 // and the whole cache are logged, and a value that is no object is returned. Note: a name whose
 // first lookup failed stays unusable until the process ends; if some members came before the
-// faulty one, those stay cached and later calls return them as the whole.
+// faulty one, this call and later ones return those as the whole.
 VORN_JSON_DB_EXPORT Json::Value& recType(Json::Value& jTableDef, std::string& strJsonName);
 
 // Copies the members of the object jSubSet into jIn (object or null): all of them when

@@ -1,5 +1,6 @@
 #include "RowTemplate.h"
 
+#include <algorithm>
 #include <cstring>
 #include <memory>
 #include <utility>
@@ -22,11 +23,12 @@ std::vector<const RowTemplate*>& Templates() {
 }  // namespace
 
 const RowTemplate* RowTemplate::Find(const std::string& strTable, int nColumns, char** szNames) {
-    for (const RowTemplate*& pTemplate : Templates()) {
+    std::vector<const RowTemplate*>& vecTemplates = Templates();
+    for (const RowTemplate*& pTemplate : vecTemplates) {
         if (pTemplate->Matches(strTable, nColumns, szNames)) {
             // To the front: the next row is of the same statement.
-            std::swap(pTemplate, Templates().front());
-            return Templates().front();
+            std::swap(pTemplate, vecTemplates.front());
+            return vecTemplates.front();
         }
     }
     return nullptr;
@@ -34,27 +36,27 @@ const RowTemplate* RowTemplate::Find(const std::string& strTable, int nColumns, 
 
 const RowTemplate* RowTemplate::Make(const std::string& strTable, const Json::Value& jType,
                                      int nColumns, char** szNames) {
-    if (Templates().size() == kMaxTemplates) {
+    const bool blUnnamed = std::find(szNames, szNames + nColumns, nullptr) != szNames + nColumns;
+    if (blUnnamed || !jType.isObject() || Templates().size() == kMaxTemplates) {
         return nullptr;
     }
-    std::unique_ptr<RowTemplate> pMade(new RowTemplate(strTable, nColumns, szNames));
-    if (!pMade->Prepare(jType)) {
-        return nullptr;
-    }
+    std::unique_ptr<RowTemplate> pMade(new RowTemplate(strTable, jType, nColumns, szNames));
+    pMade->m_blUsable = pMade->Prepare();
     Templates().push_back(pMade.get());
     return pMade.release();
 }
 
-RowTemplate::RowTemplate(std::string strTable, int nColumns, char** szNames)
-    : m_strTable(std::move(strTable)), m_jEmpty(Json::objectValue) {
+RowTemplate::RowTemplate(std::string strTable, const Json::Value& jType, int nColumns,
+                         char** szNames)
+    : m_strTable(std::move(strTable)), m_pjType(&jType), m_jEmpty(Json::objectValue) {
     for (int i = 0; i < nColumns; ++i) {
-        m_vecNames.emplace_back(szNames[i] == nullptr ? "" : szNames[i]);
+        m_vecNames.emplace_back(szNames[i]);
     }
 }
 
-bool RowTemplate::Prepare(const Json::Value& jType) {
+bool RowTemplate::Prepare() {
     for (size_t i = 0; i < m_vecNames.size(); ++i) {
-        const Json::Value* pjDefinition = FindMember(jType, m_vecNames[i]);
+        const Json::Value* pjDefinition = FindMember(*m_pjType, m_vecNames[i]);
         if (pjDefinition == nullptr || TypeOfMember(*pjDefinition).pfnRead == nullptr ||
             m_jEmpty.isMember(m_vecNames[i])) {
             return false;
@@ -62,7 +64,7 @@ bool RowTemplate::Prepare(const Json::Value& jType) {
         m_jEmpty[Json::StaticString(m_vecNames[i].c_str())] = static_cast<Json::UInt64>(i);
     }
     for (Json::Value::iterator it = m_jEmpty.begin(); it != m_jEmpty.end(); ++it) {
-        const MemberType& Type = TypeOfMember(*FindMember(jType, NameOf(it)));
+        const MemberType& Type = TypeOfMember(*FindMember(*m_pjType, NameOf(it)));
         m_vecColumns.push_back(Column{&Type, static_cast<size_t>((*it).asUInt64())});
         *it = Json::Value();
     }
@@ -82,6 +84,9 @@ bool RowTemplate::Matches(const std::string& strTable, int nColumns, char** szNa
 }
 
 bool RowTemplate::Fill(char** szTexts, Json::Value& jRec) const {
+    if (!m_blUsable) {
+        return false;
+    }
     Json::Value jFilled = m_jEmpty;
     Json::Value::iterator itMember = jFilled.begin();
     bool blAllPresent = true;

@@ -18,16 +18,24 @@ namespace vornjsondb {
 
 class RowTemplate {
   public:
-    // The template for these columns of the table, of one row or more; nullptr when none has been
-    // made.
+    // The template that was made for these columns of the table, or nullptr.
     static const RowTemplate* Find(const std::string& strTable, int nColumns, char** szNames);
 
-    // Makes it, for the rows and statements to come, of the table's member types; nullptr when a
-    // column is not declared, cannot be read or comes twice.
+    // Makes one, for this row and those to come, with the table's member types; nullptr when there
+    // are too many, or there is nothing to make it of.
     static const RowTemplate* Make(const std::string& strTable, const Json::Value& jType,
                                    int nColumns, char** szNames);
 
-    // Makes the record of one row. Returns false, with jRec as it was, when a text cannot be read.
+    // Records and templates share names, so a template stays what and where it is.
+    RowTemplate(const RowTemplate&) = delete;
+    RowTemplate& operator=(const RowTemplate&) = delete;
+    ~RowTemplate() = default;
+
+    // The member types that it was made with.
+    const Json::Value& Types() const { return *m_pjType; }
+
+    // Makes the record of one row. Returns false, with jRec as it was, when a column is not
+    // declared, comes twice or cannot be read: such rows are gone through column by column.
     bool Fill(char** szTexts, Json::Value& jRec) const;
 
   private:
@@ -36,11 +44,13 @@ class RowTemplate {
         size_t nIndex;
     };
 
-    RowTemplate(std::string strTable, int nColumns, char** szNames);
-    bool Prepare(const Json::Value& jType);
+    RowTemplate(std::string strTable, const Json::Value& jType, int nColumns, char** szNames);
+    bool Prepare();
     bool Matches(const std::string& strTable, int nColumns, char** szNames) const;
 
-    std::string m_strTable;               // stands for its member types, which never change
+    std::string m_strTable;
+    const Json::Value* m_pjType;  // never changes, and lives as long as the process
+    bool m_blUsable = false;
     std::vector<std::string> m_vecNames;  // as the statement has them
     std::vector<Column> m_vecColumns;     // in key order
     Json::Value m_jEmpty;                 // every column, with null; its keys lie in m_vecNames

@@ -4,7 +4,6 @@
 
 #include <VornJsonDbApi.h>
 
-#include <cstring>
 #include <exception>
 #include <utility>
 
@@ -39,7 +38,7 @@ int DbCallBackFillField(Json::Value& jRec, const Json::Value& jType, const char*
 // The member types come from the cache alone: the operation that runs the statement has looked
 // them up with the table's definition before.
 const Json::Value& CurrentMemberTypes() {
-    static Json::Value jNoDefinition;
+    static Json::Value& jNoDefinition = *new Json::Value;
     return VORN_JSON_DB::recType(jNoDefinition, g_strCurTable);
 }
 
@@ -79,15 +78,12 @@ int DbCallBackFillRec(Json::Value* pjRec, int n_column, char** column_value, cha
     }
     VORN_FAIL_IF_TEXT(NULL == column_name[0], "NULL == column_name[i]");
     const RowTemplate* pTemplate = RowTemplate::Find(g_strCurTable, n_column, column_name);
-    if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
-        return 0;
-    }
-    const Json::Value& jType = CurrentMemberTypes();
+    const Json::Value& jType = pTemplate != nullptr ? pTemplate->Types() : CurrentMemberTypes();
     if (pTemplate == nullptr) {
         pTemplate = RowTemplate::Make(g_strCurTable, jType, n_column, column_name);
-        if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
-            return 0;
-        }
+    }
+    if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
+        return 0;
     }
     *pjRec = Json::Value(Json::objectValue);
     return FillColumns(*pjRec, jType, n_column, column_value, column_name);

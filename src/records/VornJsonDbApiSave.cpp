@@ -5,13 +5,8 @@
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRows.h"
 #include "../util/JsonText.h"
+#include "../util/SqlText.h"
 #include "SaveRecord.h"
-
-namespace {
-
-constexpr size_t kUsualLength = 256;  // of a statement: spares it growing step by step
-
-}  // namespace
 
 // Beside the class, so that a create can store the caller's record without changing or copying it.
 // The condition texts are those of recSave, which log readers know.
@@ -20,22 +15,25 @@ int vornjsondb::SaveRecord(VornJsonDbApi& Handle, const TableParts& Table, const
     std::string strSql;
     const auto Save = [&]() -> int {
         Json::Value jArrayTmp(Json::arrayValue);
-        strSql.reserve(kUsualLength);
+        strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
         strSql.append(Table.strName).append(" (");
-        VORN_FAIL_IF_TEXT(0 > Handle.SqlExpandMemberName(strSql, &jRec),
+        VORN_FAIL_IF_TEXT(0 > Handle.SqlExpandMemberName(strSql, &jRec),  // GCOVR_EXCL_BR_LINE
                           "0 > SqlExpandMemberName(strSql, &jRecInOut)");
         strSql.append(") VALUES (");
         VORN_FAIL_IF_TEXT(0 > Handle.SqlExpandMemberSymbol(strSql, jRec),
                           "0 > SqlExpandMemberSymbol(strSql, jRecInOut)");
         strSql.append(";select * from ").append(Table.strName);
         strSql.append(" where rowid == last_insert_rowid();");
+        VORN_FAIL_IF(strSql.empty());  // GCOVR_EXCL_BR_LINE: never is; kept as a guard
         VORN_FAIL_IF_TEXT(0 > RunSql(Table, strSql, DbCallBackFillList, &jArrayTmp),
                           "0 > runSqlEx(strSql, DbCallBackFillList, &jArrayTmp)");
+        // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!Table.strSqlError.empty()) {
             VORN_LOG_LOCATED("sql error, sql=%s", strSql.c_str());
             return -1;
         }
+        // GCOVR_EXCL_STOP
         VORN_FAIL_IF(0 == jArrayTmp.size());
         jStored.swap(jArrayTmp[0]);
         return 0;

@@ -56,11 +56,20 @@ char* FormatJson(const char* szFormat, const Json::Value& jValue) {
     return sqlite3_mprintf(szFormat, ToString(jValue).c_str());
 }
 
+// JsonCpp takes the first number beyond a range for the last one in it, which would change sign.
+void RefuseFrom(double dFirstBeyond, const Json::Value& jValue) {
+    if (jValue.type() == Json::realValue && jValue.asDouble() >= dFirstBeyond) {
+        Json::throwLogicError("vornjsondb: the number is out of range");
+    }
+}
+
 char* FormatSigned(const char* szFormat, const Json::Value& jValue) {
+    RefuseFrom(9223372036854775808.0, jValue);
     return sqlite3_mprintf(szFormat, static_cast<sqlite3_int64>(jValue.asInt64()));
 }
 
 char* FormatUnsigned(const char* szFormat, const Json::Value& jValue) {
+    RefuseFrom(18446744073709551616.0, jValue);
     return sqlite3_mprintf(szFormat, static_cast<sqlite3_uint64>(jValue.asUInt64()));
 }
 
@@ -72,6 +81,13 @@ char* FormatDouble(const char* szFormat, const Json::Value& jValue) {
     return sqlite3_mprintf(szFormat, jValue.asDouble());
 }
 
+// ---- whether a value fits ----
+
+template <bool (Json::Value::*pfnIs)() const>
+bool Fits(const Json::Value& jValue) {
+    return (jValue.*pfnIs)();
+}
+
 using Json::Value;
 constexpr ConditionForm kText = ConditionForm::kQuotedText;
 constexpr ConditionForm kJson = ConditionForm::kQuotedJson;
@@ -80,25 +96,25 @@ constexpr ConditionForm kBare = ConditionForm::kBareText;
 
 // clang-format off
 constexpr MemberType kMemberTypes[] = {
-    {"string",             ReadText,   &Value::isString,   "%Q",    FormatText,     kText},
-    {"int",                ReadInt,    &Value::isIntegral, "%lld",  FormatSigned,   kBare},
-    {"long long",          ReadInt64,  &Value::isIntegral, "%lld",  FormatSigned,   kBare},
-    {"bool",               ReadBool,   &Value::isBool,     "%lld",  FormatSigned,   kFlag},
-    {"Json::objectValue",  FromString, &Value::isObject,   "%Q",    FormatJson,     kJson},
-    {"Json::arrayValue",   FromString, &Value::isArray,    "%Q",    FormatJson,     kJson},
-    {"Json::Value",        FromString, nullptr,            nullptr, nullptr,        kJson},
-    {"unsigned int",       ReadInt,    nullptr,            "%llu",  FormatUnsigned, kBare},
-    {"unsigned long long", ReadInt64,  nullptr,            "%llu",  FormatUnsigned, kBare},
-    {"long",               nullptr,    nullptr,            "%lld",  FormatSigned,   kBare},
-    {"unsigned long",      nullptr,    nullptr,            "%llu",  FormatUnsigned, kBare},
-    {"unsigned",           nullptr,    nullptr,            "%llu",  FormatUnsigned, kBare},
-    {"double",             nullptr,    nullptr,            "%lf",   FormatDouble,   kBare},
-    {"float",              nullptr,    nullptr,            "%f",    FormatFloat,    kBare},
-    {"uid_t",              nullptr,    &Value::isIntegral, nullptr, nullptr,        kBare},
-    {"time_t",             nullptr,    &Value::isIntegral, nullptr, nullptr,        kBare},
+    {"string",             ReadText,   Fits<&Value::isString>,   "%Q",    FormatText,     kText},
+    {"int",                ReadInt,    Fits<&Value::isIntegral>, "%lld",  FormatSigned,   kBare},
+    {"long long",          ReadInt64,  Fits<&Value::isIntegral>, "%lld",  FormatSigned,   kBare},
+    {"bool",               ReadBool,   Fits<&Value::isBool>,     "%lld",  FormatSigned,   kFlag},
+    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   "%Q",    FormatJson,     kJson},
+    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    "%Q",    FormatJson,     kJson},
+    {"Json::Value",        FromString, nullptr,                  nullptr, nullptr,        kJson},
+    {"unsigned int",       ReadInt,    nullptr,                  "%llu",  FormatUnsigned, kBare},
+    {"unsigned long long", ReadInt64,  nullptr,                  "%llu",  FormatUnsigned, kBare},
+    {"long",               nullptr,    nullptr,                  "%lld",  FormatSigned,   kBare},
+    {"unsigned long",      nullptr,    nullptr,                  "%llu",  FormatUnsigned, kBare},
+    {"unsigned",           nullptr,    nullptr,                  "%llu",  FormatUnsigned, kBare},
+    {"double",             nullptr,    nullptr,                  "%lf",   FormatDouble,   kBare},
+    {"float",              nullptr,    nullptr,                  "%f",    FormatFloat,    kBare},
+    {"uid_t",              nullptr,    Fits<&Value::isIntegral>, nullptr, nullptr,        kBare},
+    {"time_t",             nullptr,    Fits<&Value::isIntegral>, nullptr, nullptr,        kBare},
 };
 constexpr MemberType kUnknownType =
-    {"",                   nullptr,    nullptr,            nullptr, nullptr,        kBare};
+    {"",                   nullptr,    nullptr,                  nullptr, nullptr,        kBare};
 // clang-format on
 
 }  // namespace
@@ -114,17 +130,17 @@ const MemberType& FindMemberType(const char* pBegin, const char* pEnd) {
 }
 
 const MemberType& TypeOfMember(const Json::Value& jDefinition) {
-    const char* pBegin = nullptr;
-    const char* pEnd = nullptr;
-    const Json::Value* pjName = FindMember(jDefinition, "cpptype");
-    if (pjName == nullptr || !pjName->getString(&pBegin, &pEnd)) {
-        return kUnknownType;
+    const char* pBegin = "";
+    const char* pEnd = pBegin;
+    if (const Json::Value* pjName = FindMember(jDefinition, "cpptype")) {
+        pjName->getString(&pBegin, &pEnd);  // what is no text leaves the name empty
     }
     return FindMemberType(pBegin, pEnd);
 }
 
 const char* TypeName(const Json::Value& jDefinition) {
-    return jDefinition["cpptype"].asCString();
+    const Json::Value* pjName = FindMember(jDefinition, "cpptype");
+    return pjName != nullptr && pjName->isString() ? pjName->asCString() : "";
 }
 
 bool ReadColumn(const MemberType& Type, const char* szText, Json::Value& jOut) {

@@ -24,7 +24,7 @@ struct MemberType {
     void (*pfnRead)(const char* szText, Json::Value& jOut);
 
     // Whether a record's value fits; nullptr: the record check refuses every value.
-    bool (Json::Value::*pfnFits)() const;
+    bool (*pfnFits)(const Json::Value& jValue);
 
     // Formatting for a value list; nullptr: cannot be stored. pfnFormat hands szFormat, which
     // holds szSpecifier as its one conversion that takes an argument, and the value to
@@ -39,7 +39,7 @@ struct MemberType {
 // The row of that name; for an unknown name a row that refuses all but bare conditions.
 const MemberType& FindMemberType(const char* pBegin, const char* pEnd);
 
-// The same for a member's entry in the member types. Its "cpptype" is a string.
+// The same for a member's entry in the member types.
 const MemberType& TypeOfMember(const Json::Value& jDefinition);
 
 // The "cpptype" text of a member's entry, for messages.

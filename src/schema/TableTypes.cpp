@@ -7,8 +7,9 @@
 namespace vornjsondb {
 
 const TableTypes& TableTypes::Of(const Json::Value& jType) {
-    static const TableTypes s_None;
-    static std::map<const Json::Value*, TableTypes> s_mapTypes;
+    static const TableTypes& s_None = *new TableTypes;
+    static std::map<const Json::Value*, TableTypes>& s_mapTypes =
+        *new std::map<const Json::Value*, TableTypes>;
     const auto itKnown = s_mapTypes.find(&jType);
     if (itKnown != s_mapTypes.end()) {
         return itKnown->second;

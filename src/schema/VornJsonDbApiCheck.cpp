@@ -22,7 +22,7 @@ int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
             VORN_LOG_LOCATED("type not found!!, key=%s", Key.pBegin);
             return -1;
         }
-        if (!((*it).*pfnFits)()) {
+        if (!pfnFits(*it)) {
             VORN_LOG_LOCATED("type failed, strKey=%s, jRecParam=%s", Key.pBegin,
                              vornjsondb::ToString(jParam).c_str());
             return -1;

@@ -9,8 +9,6 @@ namespace vornjsondb {
 
 namespace {
 
-constexpr size_t kUsualValues = 256;  // room for them, to spare the text growing step by step
-
 SqlText FormatOrThrow(const MemberType& Type, const char* szFormat, const Json::Value& jValue) {
     SqlText szText(Type.pfnFormat(szFormat, jValue));
     if (!szText) {
@@ -21,49 +19,44 @@ SqlText FormatOrThrow(const MemberType& Type, const char* szFormat, const Json::
 
 }  // namespace
 
-bool IsPlainFormat(const std::string& strFormat, size_t nSpecifier) {
-    size_t nPos = strFormat.find('%');
-    while (nPos < nSpecifier) {
-        const size_t nNext = nPos + 1;
-        // A last "%" is written as it is.
-        if (nNext < strFormat.length() && strFormat[nNext] != '%') {
-            return false;
-        }
-        nPos = strFormat.find('%', nNext + 1);
-    }
-    return true;
-}
-
 AccumulatedFormat::AccumulatedFormat(const std::string& strText)
     : m_blLiteral(strText.find('%') == std::string::npos &&
                   strText.find('\0') == std::string::npos) {
-    m_strText.reserve(strText.length() + kUsualValues);
+    m_strText.reserve(strText.length() + kUsualStatement);
     m_strText.append(strText);
 }
 
-bool AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue) {
+// Each "%%" is passed over. A last "%" joins the one of the value's own specifier to another "%%",
+// or stands before a NUL, where the formatter writes it as it is.
+bool AccumulatedFormat::HoldsConversion() const {
+    if (m_blLiteral) {
+        return false;
+    }
+    const char* p = m_strText.c_str();
+    while ((p = std::strchr(p, '%')) != nullptr && p[1] != '\0') {
+        if (p[1] != '%') {
+            return true;
+        }
+        p += 2;
+    }
+    return false;
+}
+
+void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue) {
     if (!m_blLiteral) {
-        return FormatAgain(Type, jValue);
+        FormatAgain(Type, jValue);
+        return;
     }
     const SqlText szText = FormatOrThrow(Type, Type.szSpecifier, jValue);
     const size_t nLength = std::strlen(szText.get());
     m_strText.append(szText.get(), nLength);
     m_blLiteral = std::memchr(szText.get(), '%', nLength) == nullptr;
-    return true;
 }
 
-bool AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& jValue) {
-    std::string strFormat = m_strText;
-    const size_t nSpecifier = strFormat.length();
-    strFormat += Type.szSpecifier;
-    // The formatter reads a C string.
-    strFormat.resize(std::strlen(strFormat.c_str()));
-    if (!IsPlainFormat(strFormat, nSpecifier)) {
-        return false;
-    }
+void AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& jValue) {
+    const std::string strFormat = m_strText + Type.szSpecifier;
     m_strText = FormatOrThrow(Type, strFormat.c_str(), jValue).get();
     m_blLiteral = m_strText.find('%') == std::string::npos;
-    return true;
 }
 
 }  // namespace vornjsondb

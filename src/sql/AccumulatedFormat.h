@@ -24,10 +24,13 @@ class AccumulatedFormat {
     // Starts from a copy of the caller's text.
     explicit AccumulatedFormat(const std::string& strText);
 
-    // Formats the text so far together with one value of a type that can be stored. Returns false,
-    // with the text as it was, when the text so far holds a conversion. Throws Json::Exception for
-    // a value that cannot be converted, std::logic_error when the formatter gives no text.
-    bool Format(const MemberType& Type, const Json::Value& jValue);
+    // Whether the text so far holds a conversion, so that no further value can be formatted.
+    bool HoldsConversion() const;
+
+    // Formats the text so far, which holds no conversion, together with one value of a type that
+    // can be stored. Throws Json::Exception for a value that cannot be converted,
+    // std::logic_error when the formatter gives no text; the text is then as it was.
+    void Format(const MemberType& Type, const Json::Value& jValue);
 
     // Appends text that later values format too; it holds no percent sign.
     void Append(const char* szText) { m_strText += szText; }
@@ -35,15 +38,11 @@ class AccumulatedFormat {
     std::string& Text() { return m_strText; }
 
   private:
-    bool FormatAgain(const MemberType& Type, const Json::Value& jValue);
+    void FormatAgain(const MemberType& Type, const Json::Value& jValue);
 
     std::string m_strText;
     bool m_blLiteral;  // neither percent sign nor NUL: formatting the text leaves it as it is
 };
-
-// Whether szFormat, up to nSpecifier (where this library's own conversion begins), holds no
-// conversion but "%%".
-bool IsPlainFormat(const std::string& strFormat, size_t nSpecifier);
 
 }  // namespace vornjsondb
 

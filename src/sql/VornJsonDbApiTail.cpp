@@ -9,7 +9,11 @@
 #include "../util/JsonText.h"
 #include "../util/SqlText.h"
 
+namespace {
+
 using vornjsondb::FindMember;
+
+}  // namespace
 
 int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string& strSqlOut) {
     VORN_FAIL_IF(jFilter.type() != Json::objectValue && jFilter.type() != Json::nullValue);

@@ -8,8 +8,12 @@
 #include "../util/JsonText.h"
 #include "AccumulatedFormat.h"
 
+namespace {
+
 using vornjsondb::MemberCursor;
 using vornjsondb::MemberName;
+
+}  // namespace
 
 // In both lists the separator is decided by the member's place in the definition, not by what the
 // record holds: a record that lacks the last declared member gets an unfinished statement, and
@@ -58,7 +62,8 @@ int VornJsonDbApi::SqlExpandMemberSymbol(std::string& strSql, Json::Value& jRec)
             return -1;
         }
         try {
-            VORN_FAIL_IF(!Text.Format(Type, *pjValue));
+            VORN_FAIL_IF(Text.HoldsConversion());
+            Text.Format(Type, *pjValue);
         } catch (const Json::Exception&) {
             VORN_LOG_LOCATED("type failed, strKey=%s, jRecParam=%s", Key.pBegin,
                              vornjsondb::ToString(jRec).c_str());

@@ -27,18 +27,18 @@ std::unique_ptr<Json::CharReader> MakeReader() {
 }  // namespace
 
 // Writer and reader are dear to make and are used for every JSON column: one of each for the
-// process, which is single-threaded here as everywhere.
+// process, which is single-threaded here as everywhere. Never freed, like the type cache.
 
 std::string ToString(const Json::Value& jValue) {
     std::string strText;
     if (WritePlainJson(jValue, strText)) {
         return strText;
     }
-    static const std::unique_ptr<Json::StreamWriter> s_pWriter = MakeWriter();
+    static Json::StreamWriter& s_Writer = *MakeWriter().release();
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.
     Stream.exceptions(std::ios::badbit | std::ios::failbit);
-    s_pWriter->write(jValue, &Stream);
+    s_Writer.write(jValue, &Stream);
     return Stream.str();
 }
 
@@ -48,8 +48,8 @@ void FromString(const char* szText, Json::Value& jOut) {
         jOut.swapPayload(jRead);
         return;
     }
-    static const std::unique_ptr<Json::CharReader> s_pReader = MakeReader();
-    s_pReader->parse(szText, szText + std::strlen(szText), &jOut, nullptr);
+    static Json::CharReader& s_Reader = *MakeReader().release();
+    s_Reader.parse(szText, szText + std::strlen(szText), &jOut, nullptr);
 }
 
 }  // namespace vornjsondb

@@ -1,6 +1,7 @@
 #ifndef VORN_UTIL_SQL_TEXT_H
 #define VORN_UTIL_SQL_TEXT_H
 
+#include <cstddef>
 #include <memory>
 
 #include <sqlite3.h>
@@ -13,6 +14,9 @@ struct SqliteFree {
 
 // Owner of a text that SQLite allocated (sqlite3_mprintf, sqlite3_exec's error text).
 using SqlText = std::unique_ptr<char, SqliteFree>;
+
+// Room for most statements: spares a text that grows piece by piece its first allocations.
+constexpr size_t kUsualStatement = 256;
 
 }  // namespace vornjsondb
 

@@ -66,7 +66,8 @@ int CheckCached(const Json::Value& jEntry) {
 }  // namespace
 
 Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) try {
-    static Json::Value jType;
+    // Never freed: a host's own statics may use the library when this one's would be gone.
+    static Json::Value& jType = *new Json::Value;
     if (const Json::Value* pjEntry = FindMember(jType, strJsonName)) {
         if (0 <= CheckCached(*pjEntry)) {
             // Found in a value that is not const: asked for every row, so not searched again.
@@ -88,9 +89,12 @@ VORN_JSON_MEMORY_TO_BAD_ALLOC
 int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool blOverwrite) try {
     VORN_FAIL_IF(jIn.type() != Json::nullValue && jIn.type() != Json::objectValue);
     VORN_FAIL_IF(jSubSet.type() != Json::objectValue);
-    for (const std::string& strName : jSubSet.getMemberNames()) {
+    // Copied as a whole first: the source may lie inside the destination, or the other way round.
+    Json::Value jSource = jSubSet;
+    for (Json::Value::iterator it = jSource.begin(); it != jSource.end(); ++it) {
+        const std::string strName = it.name();
         if (blOverwrite || !jIn.isMember(strName)) {
-            jIn[strName] = jSubSet[strName];
+            jIn[strName].swap(*it);
         }
     }
     return 0;
@@ -126,7 +130,7 @@ int VORN_JSON_DB::convert2ReadableTime(long now, std::string& strOut, int iType)
 
 int VORN_JSON_DB::getTimeAfterNow(int offsetSecond, std::string& strOut, int iType) {
     long now = 0;
-    VORN_FAIL_IF(0 > getTimeAfterNow(offsetSecond, now));
+    VORN_FAIL_IF(0 > getTimeAfterNow(offsetSecond, now));  // GCOVR_EXCL_BR_LINE: cannot fail
     VORN_FAIL_IF(0 > convert2ReadableTime(now, strOut, iType));
     return 0;
 }

@@ -72,6 +72,12 @@ TEST_F(Names, UnknownMembersOfTheRecordAreIgnored) {
     EXPECT_EQ("a,b", Written(Open({{"a", "int"}, {"b", "int"}}), R"({"a":1,"ab":0,"b":2,"z":3})"));
 }
 
+TEST_F(Names, UnknownMemberThatBeginsADeclaredNameIsIgnored) {
+    VornJsonDbApi& api = Open({{"ab", "int"}, {"abc", "int"}});
+    EXPECT_EQ("abc", Written(api, R"({"a":1,"abc":2})"));
+    EXPECT_EQ("ab,", Written(api, R"({"ab":1,"abcd":2})"));
+}
+
 TEST_F(Names, PresentNullCountsAsPresent) {
     EXPECT_EQ("a,b", Written(Open({{"a", "int"}, {"b", "int"}}), R"({"a":null,"b":null})"));
 }

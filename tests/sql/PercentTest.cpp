@@ -170,6 +170,14 @@ TEST_F(Percent, ConversionBegunAtTheEndOfTheTextIsRefused) {
     }
 }
 
+TEST_F(Percent, TextBeforeTheValuesEndsAtItsFirstNul) {
+    VornJsonDbApi& api = OpenThree();
+    // The formatter reads a C string, so the value's own place is cut off, too.
+    EXPECT_EQ("() ", Rendered(api, R"({"c":1})", std::string("(\0%s", 4)));
+    EXPECT_EQ("(%) ", Rendered(api, R"({"c":1})", std::string("(%\0s", 4)));
+    ExpectRefused(api, ParseJson(R"({"c":1})"), std::string("(%s\0", 4));
+}
+
 TEST_F(Percent, WithoutAPresentMemberNothingIsFormatted) {
     EXPECT_EQ("%s %% %", Rendered(OpenThree(), "{}", "%s %% %"));
 }

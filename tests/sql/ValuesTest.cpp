@@ -216,6 +216,18 @@ TEST_F(Values, RealBeyondTheIntegersCannotBeRenderedAsOne) {
                   {Located(R"(type failed, strKey=m, jRecParam={"m":-1.5})")});
 }
 
+TEST_F(Values, FirstRealBeyondARangeIsRefusedInsteadOfChangingItsSign) {
+    VornJsonDbApi& api = Open({{"s", "long long"}, {"u", "unsigned long long"}});
+    Json::Value jRec;
+    jRec["s"] = 9223372036854775808.0;
+    ExpectRefused(api, jRec, {Located("type failed, strKey=s, jRecParam=" + Compact(jRec))});
+    jRec["s"] = -9223372036854775808.0;
+    jRec["u"] = 9223372036854775808.0;
+    EXPECT_EQ("(-9223372036854775808,9223372036854775808) ", Rendered(api, jRec));
+    jRec["u"] = 18446744073709551616.0;
+    ExpectRefused(api, jRec, {Located("type failed, strKey=u, jRecParam=" + Compact(jRec))});
+}
+
 TEST_F(Values, FailureAfterEarlierMembersLeavesTheTextUnchanged) {
     VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}, {"c", "time_t"}});
     ExpectRefused(api, ParseJson(R"({"a":1,"b":"x","c":3})"),

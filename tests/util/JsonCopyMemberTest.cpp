@@ -128,3 +128,15 @@ TEST_F(JsonCopyMemberTest, NamesOfAnyKindAreCopied) {
     EXPECT_EQ(Copy("{\"\":1,\"a b\":2,\"\xC3\xBC\":3}", true), 0);
     EXPECT_EQ(Compact(m_jIn), "{\"\":1,\"a b\":2,\"\xC3\xBC\":3}");
 }
+
+TEST_F(JsonCopyMemberTest, SourceInsideTheDestinationIsCopiedAsItWas) {
+    m_jIn = ParseJson(R"({"a":{"a":1,"b":2},"z":0})");
+    EXPECT_EQ(VORN_JSON_DB::jsonCopyMember(m_jIn, m_jIn["a"], true), 0);
+    EXPECT_EQ(Compact(m_jIn), R"({"a":1,"b":2,"z":0})");
+}
+
+TEST_F(JsonCopyMemberTest, DestinationInsideTheSourceReceivesTheSourceAsItWas) {
+    m_jIn = ParseJson(R"({"a":{"x":1},"b":2})");
+    EXPECT_EQ(VORN_JSON_DB::jsonCopyMember(m_jIn["a"], m_jIn, true), 0);
+    EXPECT_EQ(Compact(m_jIn), R"({"a":{"a":{"x":1},"b":2,"x":1},"b":2})");
+}

@@ -2,6 +2,8 @@
 //
 // A failure logs the whole cache, so the tests of failures each run in a process whose cache is
 // new.
+#include <unistd.h>
+
 #include "../support/TestHost.h"
 
 using namespace testhost;
@@ -268,5 +270,41 @@ TEST_F(RecTypeTest, RefusalShowsTheCacheOfAllTables) {
                             Refusal("jTableDef.empty()", "t", "{}",
                                     "{\"lost\":null,\"s\":{\"a\":{\"cppDefaultValue\":\"\xC3\xBC\","
                                     "\"cpptype\":\"string\"}}}"));
+              }));
+}
+
+TEST_F(RecTypeTest, EntryMadeByReadingAnUnknownMemberIsAnUnknownType) {
+    EXPECT_EQ(0, InFreshProcess([] {
+                  std::string strTable = "t";
+                  Json::Value jDefinition = Definition(strTable, {{"a", "int"}});
+                  // The reference is not const, so this makes a null entry.
+                  EXPECT_TRUE(VORN_JSON_DB::recType(jDefinition, strTable)["nosuch"].isNull());
+                  std::string strCreate = "CREATE TABLE t (a)";
+                  VornJsonDbApi Handle(nullptr, strTable, jDefinition, strCreate);
+                  TakeLog();
+                  Json::Value jRecord = ParseJson(R"({"a":1,"nosuch":2})");
+                  EXPECT_EQ(Handle.checkJsonType(jRecord), -1);
+                  EXPECT_EQ(TakeLog(),
+                            (std::vector<std::string>{Located("type not found!!, key=nosuch")}));
+              }));
+}
+
+// A host's static that outlives the library's own and still calls it. Its destructor runs when the
+// fresh process exits; a crash there is what the parent would see.
+TEST_F(RecTypeTest, CallsFromTheDestructorOfAStaticStillWork) {
+    EXPECT_EQ(0, InFreshProcess([] {
+                  struct Late {
+                      ~Late() {
+                          std::string strTable = "t";
+                          Json::Value jNone;
+                          if (!VORN_JSON_DB::recType(jNone, strTable).isMember("a")) {
+                              _exit(77);
+                          }
+                      }
+                  };
+                  static Late s_Late;
+                  std::string strTable = "t";
+                  Json::Value jDefinition = Definition(strTable, {{"a", "int"}});
+                  EXPECT_TRUE(VORN_JSON_DB::recType(jDefinition, strTable).isMember("a"));
               }));
 }

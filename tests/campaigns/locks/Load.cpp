@@ -7,6 +7,7 @@
 
 #include <chrono>
 #include <map>
+#include <thread>
 
 namespace campaign {
 
@@ -140,9 +141,13 @@ class Worker {
     // A call that gave up may have stored its row all the same.
     void Resync(int nKey, const std::string& strText) {
         std::string strNow = "error";
-        for (int i = 0; i < 1000 && strNow.compare(0, 5, "error") == 0; ++i) {
+        for (int i = 0; i < 10000 && strNow.compare(0, 5, "error") == 0; ++i) {
+            // The others hold the file most of the time, and their writes may take long.
+            std::this_thread::sleep_for(std::chrono::milliseconds(1));
             strNow = Stored(nKey);
         }
+        Expect(strNow.compare(0, 5, "error") != 0,
+               [&] { return "the row could not be looked at: " + strNow; });
         if (strNow == "'" + strText + "'\n") {
             m_rows[nKey] = strText;
         }

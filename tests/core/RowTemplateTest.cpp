@@ -1,0 +1,93 @@
+// Rows of statements that share their columns, and those that stop being alike.
+
+#include "../support/TableFixture.h"
+
+using namespace testhost;
+
+namespace {
+
+using Lines = std::vector<std::string>;
+
+class RowTemplateTest : public TableTest {
+  protected:
+    // What the handle lists, as compact JSON.
+    static std::string Listed(VornJsonDbApi& Handle, int nExpected = 0) {
+        Json::Value jNoQuery;
+        Json::Value jRows(Json::arrayValue);
+        EXPECT_EQ(Handle.recList(jNoQuery, jRows), nExpected);
+        return Compact(jRows);
+    }
+};
+
+TEST_F(RowTemplateTest, FirstRowWithTooDeepJsonIsRefused) {
+    const std::string strTable = UniqueTable();
+    const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, {{"j", "Json::Value"}}),
+                                   "CREATE TABLE " + strTable + " (j)");
+    const std::string strDeep = std::string(5000, '[') + std::string(5000, ']');
+    Sql("INSERT INTO " + strTable + " VALUES ('" + strDeep + "')");
+    EXPECT_EQ(Listed(*pHandle, -1), "[]");
+    Sql("UPDATE " + strTable + " SET j = '[[]]'");
+    EXPECT_EQ(Listed(*pHandle), R"([{"j":[[]]}])");
+}
+
+TEST_F(RowTemplateTest, NullsOfOneRowDoNotReachTheNext) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, NULL), (3, 'c')");
+    EXPECT_EQ(Listed(*m_pHandle), R"([{"id":1,"name":"a"},{"id":2},{"id":3,"name":"c"}])");
+}
+
+TEST_F(RowTemplateTest, ColumnWithoutANameIsRefusedAfterGoodRowsToo) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    EXPECT_EQ(Listed(*m_pHandle), R"([{"id":1,"name":"a"}])");
+    const RowCallback fnCallback = LastRowCallback();
+    char szId[] = "id";
+    char szText[] = "7";
+    char* aszNames[] = {szId, nullptr};
+    char* aszValues[] = {szText, szText};
+    TakeLog();
+    Json::Value jRows(Json::arrayValue);
+    EXPECT_EQ(fnCallback(&jRows, 2, aszValues, aszNames), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Plain("column_name[1]=(null)"),
+                                Plain("column_value[1]=7"),
+                                Check("0 > DbCallBackFillRec(&jTmp, n_column, column_value, "
+                                      "column_name)")}));
+}
+
+TEST_F(RowTemplateTest, ColumnsInAnotherOrderFillTheSameMembers) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    EXPECT_EQ(Listed(*m_pHandle), R"([{"id":1,"name":"a"}])");
+    const RowCallback fnCallback = LastRowCallback();
+    Json::Value jRows;
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT name, id FROM " + m_strTable, fnCallback, &jRows), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT id, name FROM " + m_strTable, fnCallback, &jRows), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT id FROM " + m_strTable, fnCallback, &jRows), 0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":1,"name":"a"},{"id":1,"name":"a"},{"id":1}])");
+}
+
+TEST_F(RowTemplateTest, MoreTablesThanTemplatesAreReadAlike) {
+    for (int i = 0; i < 300; ++i) {
+        const std::string strTable = UniqueTable();
+        const auto pHandle =
+            NewHandle(m_pDb, strTable, Definition(strTable, {{"n", "int"}, {"t", "string"}}),
+                      "CREATE TABLE " + strTable + " (n INT, t TEXT)");
+        Sql("INSERT INTO " + strTable + " VALUES (" + std::to_string(i) + ", 'x')");
+        EXPECT_EQ(Listed(*pHandle), "[{\"n\":" + std::to_string(i) + ",\"t\":\"x\"}]");
+    }
+}
+
+TEST_F(RowTemplateTest, RecordsLiveOnWhenTheirHandleIsGone) {
+    Json::Value jRows;
+    const std::string strTable = UniqueTable();
+    {
+        const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, {{"n", "int"}}),
+                                       "CREATE TABLE " + strTable + " (n INT)");
+        Sql("INSERT INTO " + strTable + " VALUES (7)");
+        Json::Value jNoQuery;
+        EXPECT_EQ(pHandle->recList(jNoQuery, jRows), 0);
+    }
+    Json::Value jCopy = jRows[0];
+    jCopy["m"] = 1;
+    EXPECT_EQ(Compact(jRows), R"([{"n":7}])");
+    EXPECT_EQ(Compact(jCopy), R"({"m":1,"n":7})");
+}
+
+}  // namespace

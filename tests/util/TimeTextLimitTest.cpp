@@ -1,0 +1,52 @@
+// A strftime that can be made to write nothing: no real date is longer than the library's buffer.
+
+#include <VornJsonDbApi.h>
+
+#include <dlfcn.h>
+
+#include <ctime>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "../support/TestHost.h"
+
+namespace {
+
+bool g_blWritesNothing = false;
+
+}  // namespace
+
+extern "C" size_t strftime(char* szText, size_t nMax, const char* szFormat,
+                           const struct tm* pTime) {
+    using Strftime = size_t (*)(char*, size_t, const char*, const struct tm*);
+    static const auto fnReal = reinterpret_cast<Strftime>(dlsym(RTLD_NEXT, "strftime"));
+    return g_blWritesNothing ? 0 : fnReal(szText, nMax, szFormat, pTime);
+}
+
+namespace {
+
+std::vector<std::string> LogOfARefusedText(int nType) {
+    testhost::TakeLog();
+    std::string strOut = "as it was";
+    g_blWritesNothing = true;
+    EXPECT_EQ(VORN_JSON_DB::convert2ReadableTime(0, strOut, nType), -1);
+    g_blWritesNothing = false;
+    EXPECT_EQ(strOut, "as it was");
+    return testhost::TakeLog();
+}
+
+TEST(TimeTextLimit, DateLayoutThatWritesNothingIsRefused) {
+    EXPECT_EQ(LogOfARefusedText(3),
+              std::vector<std::string>{testhost::UtilCheck(
+                  "0 == strftime(szTime, sizeof(szTime), \"%a, %d %b %Y %T GMT\", &sTime)")});
+}
+
+TEST(TimeTextLimit, NumericLayoutThatWritesNothingIsRefused) {
+    EXPECT_EQ(LogOfARefusedText(5),
+              std::vector<std::string>{testhost::UtilCheck(
+                  "0 == strftime(szTime, sizeof(szTime), \"%Y-%m-%d %H:%M:%S\", &sTime)")});
+}
+
+}  // namespace
