@@ -1,0 +1,100 @@
+#!/usr/bin/env bash
+# Looks for faults without running inputs: clang's static analyzer and cppcheck over the sources, and
+# the tests against the checked forms of the standard library.
+# Fails on any finding; what is left out, and why, stands in docs/reliability.md.
+#
+#    scripts/static-analysis.sh [clang|cppcheck|assertions|debug]...
+set -euo pipefail
+cd "$(dirname "$0")/.."
+source scripts/install-packages.sh
+source scripts/build.sh
+source scripts/armhf-sysroot.sh
+
+steps=("$@")
+if ((${#steps[@]} == 0)); then
+    steps=(clang cppcheck assertions debug)
+fi
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" \
+    clang-14:clang++-14 cppcheck:cppcheck
+
+mkdir -p build/analysis
+mapfile -t sources < <(find src -name '*.cpp' | LC_ALL=C sort)
+flags=(-std=c++17 -Iinclude -I/usr/include/jsoncpp)
+
+# each COMMAND... runs the command with every source, side by side, and keeps all messages.
+each() {
+    printf '%s\0' "${sources[@]}" | xargs -0 -n 1 -P "$jobs" "$@"
+}
+
+run_clang() {
+    each clang++-14 --analyze --analyzer-output text "${flags[@]}" -Werror \
+        -Xclang -analyzer-config -Xclang aggressive-binary-operation-simplification=true \
+        -Xclang -analyzer-checker=core,cplusplus,deadcode,nullability,security,unix,optin.cplusplus,optin.portability
+}
+
+run_cppcheck() {
+    # The documented signature takes the statement by value; the second takes an argument of the log
+    # line for a statement.
+    cppcheck --quiet --std=c++17 --language=c++ --enable=warning,performance,portability \
+        --inline-suppr --suppress=missingIncludeSystem \
+        --suppress=passedByValue:src/core/VornJsonDbApiRunner.cpp \
+        --suppress=constStatement:src/core/VornJsonDbApiRows.cpp -D__GNUC__=12 --error-exitcode=1 \
+        -Iinclude -j "$jobs" src include
+}
+
+# run_suite NAME FLAGS [CMAKE-OPTION...]
+run_suite() {
+    local name=analysis-$1 flags=$2
+    shift 2
+    configure "$name" -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
+        -DCMAKE_CXX_FLAGS="$flags" "$@"
+    build_quietly "$name" vornjsondb_tests
+    "build/$name/tests/vornjsondb_tests" --gtest_brief=1
+}
+
+# The checked containers have another layout, so that JsonCpp and GoogleTest must be built with them,
+# too: JsonCpp from Debian's source package, whose signature apt checks.
+make_checked_libraries() {
+    local prefix=$PWD/build/analysis-prefix work=$PWD/build/analysis-source flags=$1
+    if [[ -e $prefix/complete ]]; then
+        return 0
+    fi
+    need_packages dpkg-dev:dpkg-source googletest
+    rm -rf "$work" "$prefix"
+    mkdir -p "$work/lists/partial" "$work/cache/archives/partial" "$prefix/lib"
+    armhf_source_line | sed 's/^deb \[arch=armhf /deb-src [/' >"$work/source.list"
+    (
+        cd "$work"
+        printf '%s\n' 'APT::Sandbox::User "root";' "Dir::State::lists \"$work/lists\";" \
+            "Dir::Cache \"$work/cache\";" "Dir::Etc::sourcelist \"$work/source.list\";" \
+            'Dir::Etc::sourceparts "-";' >apt.conf
+        export APT_CONFIG=$work/apt.conf
+        apt-get -qq update
+        apt-get -qq source libjsoncpp >apt.log 2>&1
+        cd libjsoncpp-*/
+        g++ -std=c++17 -g -fPIC "$flags" -Iinclude -shared -Wl,-soname,libjsoncpp.so \
+            -o "$prefix/lib/libjsoncpp.so" src/lib_json/json_{reader,value,writer}.cpp
+    )
+    cmake -S /usr/src/googletest -B "$work/googletest" -DCMAKE_CXX_FLAGS="$flags" \
+        -DCMAKE_INSTALL_PREFIX="$prefix" >/dev/null
+    cmake --build "$work/googletest" --parallel "$jobs" --target install >/dev/null
+    touch "$prefix/complete"
+}
+
+run_debug() {
+    local prefix=$PWD/build/analysis-prefix flags=-D_GLIBCXX_DEBUG
+    make_checked_libraries "$flags"
+    run_suite debug "$flags" -DCMAKE_PREFIX_PATH="$prefix" \
+        -DVORNJSONDB_JSONCPP_LIBRARY="$prefix/lib/libjsoncpp.so"
+}
+
+for step in "${steps[@]}"; do
+    echo "== $step"
+    case $step in
+        clang) run_clang ;;
+        cppcheck) run_cppcheck ;;
+        assertions) run_suite assertions -D_GLIBCXX_ASSERTIONS ;;
+        debug) run_debug ;;
+        *) echo "unknown step $step" >&2 && exit 2 ;;
+    esac
+done

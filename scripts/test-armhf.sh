@@ -1,0 +1,23 @@
+#!/usr/bin/env bash
+# Cross-builds the library and its tests for 32-bit ARM and runs the tests in the emulator.
+#
+#    scripts/test-armhf.sh [CTEST-OPTION...]
+#
+# What is given goes to ctest: scripts/test-armhf.sh -R Runner
+set -euo pipefail
+cd "$(dirname "$0")/.."
+source scripts/install-packages.sh
+source scripts/build.sh
+source scripts/armhf-sysroot.sh
+
+need_packages g++-arm-linux-gnueabihf qemu-user:qemu-arm cmake:cmake \
+    pkg-config:pkg-config iso-codes
+make_armhf_sysroot
+export PKG_CONFIG_LIBDIR=$armhf_sysroot/usr/lib/arm-linux-gnueabihf/pkgconfig
+configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON -DVORNJSONDB_WERROR=ON \
+    -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchain-armhf.cmake" \
+    -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot" -DVORNJSONDB_CAMPAIGN_SCALE=20
+build armhf
+
+cd build/armhf
+ctest --output-on-failure --parallel "$jobs" "$@"
