@@ -1,0 +1,62 @@
+"""report.py RESULTS DOCS: writes tables into DOCS/performance.md and plots beside it.
+
+A table stands between two comment lines, "<!-- NAME -->" and "<!-- /NAME -->"; what stands outside
+of them is written by hand and left alone.
+"""
+
+import json
+import os
+import re
+import sys
+
+import machine
+import plots
+import tables
+from results import medians
+
+
+def replace(text, name, content):
+    pattern = re.compile(f"(<!-- {name} -->\n).*?(<!-- /{name} -->)", re.DOTALL)
+    if not pattern.search(text):
+        sys.exit(f"the report has no place for {name}")
+    return pattern.sub(lambda found: found.group(1) + content + "\n" + found.group(2), text)
+
+
+def main(results, docs):
+    with open(os.path.join(results, "ratios.json")) as file:
+        ratios = json.load(file)
+    scale = medians(os.path.join(results, "scale.json"))
+    peers = medians(os.path.join(results, "peers.json"))
+    contents = {
+        "machine": machine.describe(results),
+        "ratios": tables.ratios(ratios),
+        "sizes": tables.sizes(os.path.join(results, "sizes.txt")),
+        "peers": tables.peers(peers),
+        "rows": tables.scale_rows(scale) + "\n\n" + tables.flatness(scale),
+        "columns": tables.scale_columns(scale),
+        "texts": tables.scale_texts(scale),
+        "tables": tables.scale_tables(scale),
+        "contention": tables.contention(scale),
+        "instructions": tables.instructions(os.path.join(results, "instructions.txt")),
+    }
+    report = os.path.join(docs, "performance.md")
+    with open(report) as file:
+        text = file.read()
+    for name, content in contents.items():
+        text = replace(text, name, content)
+    with open(report, "w") as file:
+        file.write(text)
+
+    folder = os.path.join(docs, "performance")
+    os.makedirs(folder, exist_ok=True)
+    plots.columns(scale, os.path.join(folder, "columns.svg"))
+    plots.rows(scale, os.path.join(folder, "rows.svg"))
+    plots.texts(scale, os.path.join(folder, "texts.svg"))
+    plots.peers(peers, os.path.join(folder, "peers.svg"))
+    print(f"wrote {report}")
+
+
+if __name__ == "__main__":
+    if len(sys.argv) != 3:
+        sys.exit(__doc__)
+    main(sys.argv[1], sys.argv[2])

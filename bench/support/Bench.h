@@ -1,0 +1,46 @@
+// What every measurement needs: a database, a clock, a median, and a way to stop when a result is
+// not the expected one. A benchmark of wrong results measures nothing, so checks are never left
+// out.
+
+#ifndef VORN_BENCH_SUPPORT_BENCH_H
+#define VORN_BENCH_SUPPORT_BENCH_H
+
+#include <string>
+#include <vector>
+
+#include <sqlite3.h>
+
+namespace bench {
+
+// Ends the program with szWhat on standard error when blTrue is false.
+void Require(bool blTrue, const char* szWhat);
+
+// An in-memory database unless a file is named.
+class Database {
+  public:
+    explicit Database(const char* szFile = ":memory:");
+    ~Database();
+    Database(const Database&) = delete;
+    Database& operator=(const Database&) = delete;
+
+    sqlite3* Get() const { return m_pDb; }
+    // Runs statements that must succeed; rows are passed to a callback that does nothing.
+    void Exec(const std::string& strSql) const;
+
+  private:
+    sqlite3* m_pDb = nullptr;
+};
+
+// Has freed memory stay with the process. Otherwise a long list is built in pages that the system
+// has just taken back, and whoever goes first pays for getting them again.
+void KeepHeap();
+
+// Nanoseconds that this thread has computed. Others on the machine stretch the time of day, not
+// this.
+double CpuNow();
+
+double Median(std::vector<double> vecValues);
+
+}  // namespace bench
+
+#endif  // VORN_BENCH_SUPPORT_BENCH_H
