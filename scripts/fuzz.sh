@@ -24,7 +24,7 @@ while (($# > 0)); do
     shift
 done
 if ((${#targets[@]} == 0)); then
-    targets=(definition record query rows percent time)
+    targets=(definition record query rows percent plain time)
 fi
 
 need_packages clang-14:clang++-14 libclang-rt-14-dev binutils:objcopy "${library_packages[@]}"

@@ -5,9 +5,15 @@
 
 #include <json/json.h>
 
-// Ends a public function whose body is a try block and copies texts into JSON values: JsonCpp
-// reports that malloc gave nothing by an exception of its own, and callers are promised
-// std::bad_alloc.
+// Ends a public function whose body is a try block:
+//
+//    int F(Json::Value& jOut) try {
+//        ...
+//    }
+//    VORN_JSON_MEMORY_TO_BAD_ALLOC
+//
+// for functions that copy texts into JSON values. JsonCpp reports that malloc gave nothing by a
+// Json::RuntimeError, the only one that such a copy throws; callers are promised std::bad_alloc.
 #define VORN_JSON_MEMORY_TO_BAD_ALLOC   \
     catch (const Json::RuntimeError&) { \
         throw std::bad_alloc();         \
