@@ -6,7 +6,8 @@
 # Prints instructions per create, fetch, update, delete and listed cell on the table of eight
 # members, split by the library in which they were executed. Unlike a time, a count is the same in
 # every run. The status is 1 when a total or our own part is more than 2% above
-# bench/instruction-budget.txt; --update writes a new budget, whose first line is the reason.
+# bench/instruction-budget.txt, which holds for the versions of compiler and libraries that it
+# names; --update writes a new budget, whose first line is the reason.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -76,11 +77,14 @@ if [[ -n $reason ]]; then
     exit
 fi
 
+enforced=1
 if ! grep -qxF "# $versions" "$budget"; then
+    enforced=0
     echo "the budget was counted with: $(sed -n '3s/^# //p' "$budget")"
     echo "this count was made with:    $versions"
+    echo "so the comparison is shown and not enforced"
 fi
-awk '
+awk -v enforced="$enforced" '
     FNR == NR { if ($1 != "#") { total[$1] = $2; ours[$1] = $3 } next }
     function check(what, now, allowed) {
         if (now > allowed * 1.02) {
@@ -90,5 +94,5 @@ awk '
     }
     !($1 in total) { printf "%s is not in the budget\n", $1; failed = 1; next }
     { check("the total", $2, total[$1]); check("our part", $3, ours[$1]) }
-    END { if (!failed) { print "within the budget" } exit failed }
+    END { if (!failed) { print "within the budget" } exit failed && enforced }
 ' "$budget" "$results"
