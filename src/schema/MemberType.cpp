@@ -117,6 +117,15 @@ constexpr MemberType kUnknownType =
     {"",                   nullptr,    nullptr,                  nullptr, nullptr,        kBare};
 // clang-format on
 
+// The "cpptype" text of a member's entry; empty when there is none.
+MemberName TypeText(const Json::Value& jDefinition) {
+    MemberName Name = NameOf("");
+    if (const Json::Value* pjName = FindMember(jDefinition, "cpptype")) {
+        pjName->getString(&Name.pBegin, &Name.pEnd);
+    }
+    return Name;
+}
+
 }  // namespace
 
 const MemberType& FindMemberType(const char* pBegin, const char* pEnd) {
@@ -130,17 +139,12 @@ const MemberType& FindMemberType(const char* pBegin, const char* pEnd) {
 }
 
 const MemberType& TypeOfMember(const Json::Value& jDefinition) {
-    const char* pBegin = "";
-    const char* pEnd = pBegin;
-    if (const Json::Value* pjName = FindMember(jDefinition, "cpptype")) {
-        pjName->getString(&pBegin, &pEnd);  // what is no text leaves the name empty
-    }
-    return FindMemberType(pBegin, pEnd);
+    const MemberName Name = TypeText(jDefinition);
+    return FindMemberType(Name.pBegin, Name.pEnd);
 }
 
 const char* TypeName(const Json::Value& jDefinition) {
-    const Json::Value* pjName = FindMember(jDefinition, "cpptype");
-    return pjName != nullptr && pjName->isString() ? pjName->asCString() : "";
+    return TypeText(jDefinition).pBegin;
 }
 
 bool ReadColumn(const MemberType& Type, const char* szText, Json::Value& jOut) {

@@ -27,8 +27,9 @@ int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string&
         VORN_FAIL_IF(!szSql);
         strSqlOut += szSql.get();
         if (const Json::Value* pjDirection = FindMember(jFilter, "sort_direction")) {
-            const bool blDescending = pjDirection->isString() && pjDirection->asString() == "desc";
-            strSqlOut.append(blDescending ? " DESC" : " ASC");
+            vornjsondb::MemberName Direction = {};
+            const bool blText = pjDirection->getString(&Direction.pBegin, &Direction.pEnd);
+            strSqlOut.append(blText && Direction.Is("desc") ? " DESC" : " ASC");
         }
     }
     const Json::Value* pjLimit = FindMember(jFilter, "limit");
