@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <iterator>
+#include <utility>
 
 #include "TestHost.h"
 
@@ -82,10 +83,15 @@ std::string ReadAll(int nFd) {
     return strText;
 }
 
-int StartAndWait(int nCall) {
+struct Ended {
+    int nStatus;
+    std::string strOutput;
+};
+
+Ended StartAndWait(int nCall) {
     int aFds[2];
     if (::pipe(aFds) != 0) {
-        return -1;
+        return {-1, "no pipe"};
     }
     std::fflush(stdout);
     const pid_t nParent = ::getpid();
@@ -103,13 +109,12 @@ int StartAndWait(int nCall) {
     ::close(aFds[0]);
     int nStatus = 0;
     if (nChild < 0 || ::waitpid(nChild, &nStatus, 0) != nChild) {
-        return -1;
+        return {-1, strOutput};
     }
     if (WIFEXITED(nStatus) && WEXITSTATUS(nStatus) == kFreshSuccess) {
-        return 0;
+        return {0, strOutput};
     }
-    std::fprintf(stderr, "output of the fresh process:\n%s\n", strOutput.c_str());
-    return nStatus == 0 ? -1 : nStatus;
+    return {nStatus == 0 ? -1 : nStatus, strOutput};
 }
 
 // Counts the calls within one run of one test; a repeated test begins anew.
@@ -133,19 +138,33 @@ class CallCounter : public ::testing::EmptyTestEventListener {
     int m_nCalls = 0;
 };
 
-}  // namespace
-
-int InFreshProcess(const std::function<void()>& fn) {
+Ended RunFresh(const std::function<void()>& fn) {
     const int nCall = CallCounter::Count();
     const char* szFresh = std::getenv(kFreshVariable);
     if (szFresh == nullptr) {
         return StartAndWait(nCall);
     }
     if (szFresh != std::to_string(nCall)) {
-        return 0;
+        return {0, ""};
     }
     fn();
     std::exit(::testing::Test::HasFailure() ? EXIT_FAILURE : kFreshSuccess);
+}
+
+}  // namespace
+
+int InFreshProcess(const std::function<void()>& fn) {
+    const Ended ended = RunFresh(fn);
+    if (ended.nStatus != 0) {
+        std::fprintf(stderr, "output of the fresh process:\n%s\n", ended.strOutput.c_str());
+    }
+    return ended.nStatus;
+}
+
+int InFreshProcess(const std::function<void()>& fn, std::string& strOutput) {
+    Ended ended = RunFresh(fn);
+    strOutput = std::move(ended.strOutput);
+    return ended.nStatus;
 }
 
 }  // namespace testhost

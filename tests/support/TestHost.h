@@ -119,6 +119,9 @@ std::string UniqueTable();
 // ran and no assertion failed. Statements of the test before the call run in the new process too.
 int InFreshProcess(const std::function<void()>& fn);
 
+// The same, but what the process printed goes to strOutput and nowhere else.
+int InFreshProcess(const std::function<void()>& fn, std::string& strOutput);
+
 // Path of a fresh file in a directory that is removed at exit.
 std::string TempFile(const char* szStem);
 

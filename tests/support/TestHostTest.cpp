@@ -126,11 +126,14 @@ TEST_F(TestHostTest, StatementsOfSqliteItselfAreNotRecorded) {
 }
 
 TEST_F(TestHostTest, FreshProcessReportsAFailureWithinIt) {
-    EXPECT_NE(0, InFreshProcess([] { ADD_FAILURE() << "expected by the test of the test host"; }));
+    std::string strOutput;
+    EXPECT_NE(0, InFreshProcess([] { ADD_FAILURE() << "told by the process"; }, strOutput));
+    EXPECT_NE(strOutput.find("told by the process"), std::string::npos) << strOutput;
 }
 
 TEST_F(TestHostTest, FreshProcessThatEndsInsideItsFunctionIsAFailure) {
-    EXPECT_NE(0, InFreshProcess([] { ::_exit(0); }));
+    std::string strOutput;
+    EXPECT_NE(0, InFreshProcess([] { ::_exit(0); }, strOutput));
 }
 
 TEST_F(TestHostTest, FreshProcessesRunEachTheirOwnFunction) {
