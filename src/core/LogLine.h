@@ -80,7 +80,8 @@ __attribute__((noinline, cold)) void WriteLine(const char* szMessage, const char
         std::printf(Format.Text(), static_cast<unsigned>(getpid()), szFile, nLine, args...);
         return;
     }
-    const LineFormat Format(errno != 0 ? "%s:%d (%u)(%m)" : "%s:%d (%u)", szMessage, "");
+    const char* szBefore = errno != 0 ? "%s:%d (%u)(%m)" : "%s:%d (%u)";
+    const LineFormat Format(szBefore, szMessage, "");
     syslog(LOG_ERR, Format.Text(), szFile, nLine, static_cast<unsigned>(getpid()), args...);
 }
 

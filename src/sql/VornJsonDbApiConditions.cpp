@@ -28,8 +28,10 @@ SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
     if (eForm == ConditionForm::kQuotedJson) {
         return SqlText(sqlite3_mprintf("%q", vornjsondb::ToString(jValue).c_str()));
     }
-    return SqlText(jValue.isString() ? sqlite3_mprintf("%q", jValue.asCString())
-                                     : sqlite3_mprintf("%q", jValue.asString().c_str()));
+    if (jValue.isString()) {
+        return SqlText(sqlite3_mprintf("%q", jValue.asCString()));
+    }
+    return SqlText(sqlite3_mprintf("%q", jValue.asString().c_str()));
 } catch (const Json::Exception&) {
     return nullptr;
 }

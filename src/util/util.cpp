@@ -53,7 +53,8 @@ int AddToCache(Json::Value& jType, Json::Value& jTableDef, std::string& strJsonN
     if (0 > nResult) {
         return -1;
     }
-    VORN_FAIL_IF(jType == Json::nullValue || !jType.isMember(strJsonName));
+    VORN_FAIL_IF_TEXT(FindMember(jType, strJsonName) == nullptr,
+                      "jType == Json::nullValue || !jType.isMember(strJsonName)");
     return 0;
 }
 

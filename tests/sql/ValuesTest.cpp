@@ -264,6 +264,15 @@ TEST_F(Values, TextEndsAtAnEmbeddedNul) {
     EXPECT_EQ("('ab',1) ", Rendered(Open({{"a", "string"}, {"b", "int"}}), jRec));
 }
 
+TEST_F(Values, NulInTheCallersTextCutsItThereBeforeEachMember) {
+    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+    Json::Value jRec = ParseJson(R"({"a":7,"b":"x"})");
+    std::string strSql("VALUES\0 (", 9);
+    EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
+    EXPECT_EQ("VALUES,'x') ", strSql);
+    EXPECT_EQ(Lines{}, TakeLog());
+}
+
 TEST_F(Values, EmbeddedNulInsideJsonTextIsEscapedAndKept) {
     Json::Value jRec(Json::objectValue);
     jRec["a"]["k"] = Json::Value(std::string("ab\0cd", 5));
