@@ -105,19 +105,20 @@ TEST_F(RowTemplateTest, ColumnsInAnotherOrderFillTheSameMembers) {
 
 TEST_F(RowTemplateTest, MoreTablesThanTemplatesAreReadAlike) {
     EXPECT_EQ(0, InFreshProcess([this] {
-        for (int i = 1; i <= 300; ++i) {
-            const std::string strTable = UniqueTable();
-            const auto pHandle =
-                NewHandle(m_pDb, strTable, Definition(strTable, {{"n", "int"}, {"t", "string"}}),
+                  for (int i = 1; i <= 300; ++i) {
+                      const std::string strTable = UniqueTable();
+                      const auto pHandle = NewHandle(
+                          m_pDb, strTable, Definition(strTable, {{"n", "int"}, {"t", "string"}}),
                           "CREATE TABLE " + strTable + " (n INT, t TEXT)");
-            Sql("INSERT INTO " + strTable + " VALUES (" + std::to_string(i) + ", 'x'), (0, '')");
-            const Json::Value jRows = AllOf(*pHandle);
-            EXPECT_EQ(Compact(jRows),
-                      "[{\"n\":" + std::to_string(i) + ",\"t\":\"x\"},{\"n\":0,\"t\":\"\"}]");
-            // Memory for names that are never freed ends with the 256th statement.
-            EXPECT_EQ(NamesKeptAt(jRows[0]) == NamesKeptAt(jRows[1]), i <= 256) << i;
-        }
-    }));
+                      Sql("INSERT INTO " + strTable + " VALUES (" + std::to_string(i) +
+                          ", 'x'), (0, '')");
+                      const Json::Value jRows = AllOf(*pHandle);
+                      EXPECT_EQ(Compact(jRows), "[{\"n\":" + std::to_string(i) +
+                                                    ",\"t\":\"x\"},{\"n\":0,\"t\":\"\"}]");
+                      // Memory for names that are never freed ends with the 256th statement.
+                      EXPECT_EQ(NamesKeptAt(jRows[0]) == NamesKeptAt(jRows[1]), i <= 256) << i;
+                  }
+              }));
 }
 
 TEST_F(RowTemplateTest, RecordsLiveOnWhenTheirHandleIsGone) {
