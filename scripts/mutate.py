@@ -99,6 +99,8 @@ def mutants_of(path):
         if inside(match.start()) or source.startswith("#define", line_start):
             continue
         for replacement in ("true", "false", f"!({source[match.end():end]})"):
+            if replacement == source[match.end() : end]:
+                continue
             yield Mutant(path, source, match.end(), end, replacement)
     for match in STATEMENT.finditer(source):
         if not inside(match.end() - 1):

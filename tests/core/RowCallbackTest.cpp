@@ -101,7 +101,9 @@ TEST_F(RowCallbackTest, RowWithoutColumnsIsAnEmptyRecord) {
     Json::Value jRows;
     EXPECT_EQ(m_fnCallback(&jRows, 0, m_aszValues, m_aszNames), 0);
     EXPECT_EQ(m_fnCallback(&jRows, -1, m_aszValues, m_aszNames), 0);
-    EXPECT_EQ(Compact(jRows), "[{},{}]");
+    m_aszNames[0] = nullptr;
+    EXPECT_EQ(m_fnCallback(&jRows, 0, m_aszValues, m_aszNames), 0);
+    EXPECT_EQ(Compact(jRows), "[{},{},{}]");
     EXPECT_EQ(TakeLog(), Lines());
 }
 
@@ -111,6 +113,17 @@ TEST_F(RowCallbackTest, FirstColumnWithoutANameLogsOnlyTheConditions) {
     EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
     EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRecCheck)}));
     EXPECT_EQ(Compact(jRows), "[]");
+}
+
+TEST_F(RowCallbackTest, FirstColumnWithoutANameIsRefusedBeforeTheTypesAreLookedUp) {
+    const std::string strTable = UniqueTable();
+    const auto pHandle = NewHandle(m_pDb, strTable, Json::Value(), "SELECT 1");
+    EXPECT_EQ(pHandle->runSqlEx("SELECT 1"), 0);
+    TakeLog();
+    Json::Value jRows;
+    m_aszNames[0] = nullptr;
+    EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRecCheck)}));
 }
 
 TEST_F(RowCallbackTest, LaterColumnWithoutANameAlsoLogsItsValue) {

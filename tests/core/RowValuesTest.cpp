@@ -94,6 +94,9 @@ TEST_F(RowsTest, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
         ExpectRead(szType, "-1", Json::Value(Json::Int64(-1)));
         ExpectRead(szType, "  -8 9", Json::Value(Json::Int64(-8)));
         ExpectRead(szType, "7e3", Json::Value(Json::Int64(7)));
+        ExpectRead(szType, "7a", Json::Value(Json::Int64(7)));
+        ExpectRead(szType, "0x10", Json::Value(Json::Int64(0)));
+        ExpectRead(szType, "010", Json::Value(Json::Int64(10)));
         ExpectRead(szType, "abc", Json::Value(Json::Int64(0)));
         ExpectRead(szType, "", Json::Value(Json::Int64(0)));
         ExpectRead(szType, "4294967296", Json::Value(Json::Int64(4294967296)));
@@ -106,10 +109,11 @@ TEST_F(RowsTest, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
 }
 
 TEST_F(RowsTest, BoolIsTrueForTheNumberOneOnly) {
-    for (const char* szTrue : {"1", " 1", "+1", "01", "1.9", "1x"}) {
+    for (const char* szTrue : {"1", " 1", "+1", "01", "1.9", "1x", "1a"}) {
         ExpectRead("bool", szTrue, Json::Value(true));
     }
-    for (const char* szFalse : {"0", "2", "-1", "11", "true", "TRUE", "", "x1", "4294967297"}) {
+    for (const char* szFalse :
+         {"0", "2", "-1", "11", "true", "TRUE", "", "x1", "0x1", "4294967297"}) {
         ExpectRead("bool", szFalse, Json::Value(false));
     }
 }

@@ -100,6 +100,12 @@ TEST_F(Create, WronglyTypedValueRunsNoSql) {
     EXPECT_EQ("", api.getErrMsg());
 }
 
+TEST_F(Create, RecordWithoutAnyMemberOfTheTableIsMadeOfDefaults) {
+    VornJsonDbApi& api =
+        OpenMembers(ParseJson(R"({"a":{"cpptype":"int","cppDefaultValue":7}})"), "a");
+    EXPECT_EQ(R"({"a":7})", Compact(Created(api, ParseJson(R"({"unknown":1})"))));
+}
+
 TEST_F(Create, DefaultOfAWrongTypeIsRefusedLikeAnyValue) {
     VornJsonDbApi& api = OpenMembers(
         ParseJson(R"({"a":{"cpptype":"int"},"b":{"cpptype":"int","cppDefaultValue":"7"}})"), "a,b");

@@ -90,6 +90,12 @@ TEST_F(Names, RecordOfAWrongKindHasNoMembers) {
     }
 }
 
+TEST_F(Names, ElementOfAListIsNoMemberWithoutAName) {
+    VornJsonDbApi& api = Open({{"", "int"}, {"b", "int"}}, "b");
+    EXPECT_EQ("", Written(api, "[7]"));
+    EXPECT_EQ(",", Written(api, R"({"":7})"));
+}
+
 TEST_F(Names, SingleMemberNeedsNoComma) {
     VornJsonDbApi& api = Open({{"only", "int"}});
     EXPECT_EQ("only", Written(api));

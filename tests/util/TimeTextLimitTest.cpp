@@ -15,6 +15,7 @@
 namespace {
 
 bool g_blWritesNothing = false;
+size_t g_nMax = 0;
 
 }  // namespace
 
@@ -22,6 +23,7 @@ extern "C" size_t strftime(char* szText, size_t nMax, const char* szFormat,
                            const struct tm* pTime) {
     using Strftime = size_t (*)(char*, size_t, const char*, const struct tm*);
     static const auto fnReal = reinterpret_cast<Strftime>(dlsym(RTLD_NEXT, "strftime"));
+    g_nMax = nMax;
     return g_blWritesNothing ? 0 : fnReal(szText, nMax, szFormat, pTime);
 }
 
@@ -47,6 +49,15 @@ TEST(TimeTextLimit, NumericLayoutThatWritesNothingIsRefused) {
     EXPECT_EQ(LogOfARefusedText(5),
               std::vector<std::string>{testhost::UtilCheck(
                   "0 == strftime(szTime, sizeof(szTime), \"%Y-%m-%d %H:%M:%S\", &sTime)")});
+}
+
+TEST(TimeTextLimit, TextMayHave1023Characters) {
+    std::string strOut;
+    EXPECT_EQ(VORN_JSON_DB::convert2ReadableTime(0, strOut, 3), 0);
+    EXPECT_EQ(g_nMax, 1024U);
+    g_nMax = 0;
+    EXPECT_EQ(VORN_JSON_DB::convert2ReadableTime(0, strOut, 5), 0);
+    EXPECT_EQ(g_nMax, 1024U);
 }
 
 }  // namespace
