@@ -27,6 +27,8 @@ CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TE
 STATEMENT = re.compile(r"^ +(?=\S)(?!return|const |static |using |struct |else|case|default)[^\n{}#]*;$", re.M)
 
 
+# In one process a test may hide behind what an earlier one left.
+ORDERS = ([], ["--gtest_shuffle", "--gtest_random_seed=7"])
 PLAIN_JSON = pathlib.Path("src/util/PlainJson.cpp")
 
 
@@ -188,12 +190,8 @@ def try_mutant(library, folder, workers, mutant, options):
                 return "not compiled"
             replaced[source] = output
         library.link(worker, replaced)
-        if not run_tests(folder, worker, ["--gtest_fail_fast", *options], 60):
-            return "killed"
-        # In one process a test may hide behind what an earlier one left.
-        if not run_tests(folder, worker, ["--gtest_shuffle", "--gtest_random_seed=7", *options], 60):
-            return "killed"
-        return "survived"
+        passed = all(run_tests(folder, worker, ["--gtest_fail_fast", *order, *options], 60) for order in ORDERS)
+        return "survived" if passed else "killed"
     finally:
         shutil.copy(mutant.path, worker / mutant.path)
         workers.put(worker)
@@ -222,9 +220,12 @@ def arguments():
 
 def known_failures(folder, worker):
     """Names of the tests that fail without any change: they can tell nothing."""
-    if run_tests(folder, worker, [], 300):
-        return []
-    return sorted(set(re.findall(r"\[  FAILED  \] (\w+\.\w+)", (worker / "tests.log").read_text(errors="replace"))))
+    names = set()
+    for order in ORDERS:
+        if not run_tests(folder, worker, order, 300):
+            log = (worker / "tests.log").read_text(errors="replace")
+            names.update(re.findall(r"\[  FAILED  \] (\w+\.\w+)", log))
+    return sorted(names)
 
 
 def main():

@@ -36,27 +36,36 @@ class RowTemplateTest : public TableTest {
     }
 };
 
+// In fresh processes: the statements whose names are shared are counted for the whole process.
 TEST_F(RowTemplateTest, RecordsOfOneStatementKeepTheirNamesOnce) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b'), (3, NULL)");
-    const Json::Value jRows = AllOf(*m_pHandle);
-    const std::vector<const char*> vecNames = NamesKeptAt(jRows[0]);
-    EXPECT_EQ(vecNames.size(), 2U);
-    EXPECT_EQ(NamesKeptAt(jRows[1]), vecNames);
-    EXPECT_EQ(NamesKeptAt(jRows[2]), std::vector<const char*>{vecNames[0]});
-    EXPECT_EQ(NamesKeptAt(AllOf(*m_pHandle)[1]), vecNames);
+    EXPECT_EQ(0, InFreshProcess([this] {
+                  Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b'), (3, NULL)");
+                  const Json::Value jRows = AllOf(*m_pHandle);
+                  const Json::Value jLater = AllOf(*m_pHandle);
+                  const std::vector<const char*> vecNames = NamesKeptAt(jRows[0]);
+                  EXPECT_EQ(vecNames.size(), 2U);
+                  EXPECT_EQ(NamesKeptAt(jRows[1]), vecNames);
+                  EXPECT_EQ(NamesKeptAt(jRows[2]), std::vector<const char*>{vecNames[0]});
+                  EXPECT_EQ(NamesKeptAt(jLater[1]), vecNames);
+              }));
 }
 
 TEST_F(RowTemplateTest, StatementsInTurnsKeepTheirNamesEach) {
-    const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "int"}}),
-                                  "CREATE TABLE " + strOther + " (id)");
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
-    Sql("INSERT INTO " + strOther + " VALUES (1)");
-    const std::vector<const char*> vecNames = NamesKeptAt(AllOf(*m_pHandle)[0]);
-    const std::vector<const char*> vecOther = NamesKeptAt(AllOf(*pOther)[0]);
-    EXPECT_NE(vecOther[0], vecNames[0]);
-    EXPECT_EQ(NamesKeptAt(AllOf(*m_pHandle)[0]), vecNames);
-    EXPECT_EQ(NamesKeptAt(AllOf(*pOther)[0]), vecOther);
+    EXPECT_EQ(0, InFreshProcess([this] {
+                  const std::string strOther = UniqueTable();
+                  const auto pOther =
+                      NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "int"}}),
+                                "CREATE TABLE " + strOther + " (id)");
+                  Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+                  Sql("INSERT INTO " + strOther + " VALUES (1)");
+                  const Json::Value jRows = AllOf(*m_pHandle);
+                  const Json::Value jOther = AllOf(*pOther);
+                  const Json::Value jRowsAgain = AllOf(*m_pHandle);
+                  const Json::Value jOtherAgain = AllOf(*pOther);
+                  EXPECT_NE(NamesKeptAt(jOther[0])[0], NamesKeptAt(jRows[0])[0]);
+                  EXPECT_EQ(NamesKeptAt(jRowsAgain[0]), NamesKeptAt(jRows[0]));
+                  EXPECT_EQ(NamesKeptAt(jOtherAgain[0]), NamesKeptAt(jOther[0]));
+              }));
 }
 
 TEST_F(RowTemplateTest, FirstRowWithTooDeepJsonIsRefused) {
