@@ -125,34 +125,40 @@ TEST_F(JsonMemoryTest, DeleteByNameThrowsBadAllocOnly) {
     EXPECT_GT(ThrowsOutOf([&] { Handle.recDeleteByName(strValue, "name"); }), 0);
 }
 
+// In a fresh process: a statement past those whose names are shared is read another way, in which
+// JsonCpp's own report of missing memory passes for a text that cannot be read.
 TEST_F(JsonMemoryTest, RowWithoutMemoryIsRefusedWithOneLine) {
-    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
-    Json::Value jNoQuery;
-    Json::Value jRows(Json::arrayValue);
-    ASSERT_EQ(Handle.recList(jNoQuery, jRows), 0);
-    const testhost::RowCallback fnCallback = testhost::LastRowCallback();
-    char szName[] = "name";
-    char* aszNames[] = {szName};
-    std::string strLong = m_strLong;
-    char* aszTexts[] = {strLong.data()};
-    int nRefused = 0;
-    int nResult = -1;
-    for (int nAt = 1; nResult != 0 && nAt < 1000; ++nAt) {
-        testhost::TakeLog();
-        g_nFailAt = nAt;
-        nResult = fnCallback(&jRows, 1, aszTexts, aszNames);
-        g_nFailAt = 0;
-        if (nResult != 0) {
-            ++nRefused;
-            EXPECT_EQ(nResult, -1);
-            EXPECT_EQ(jRows.size(), 0U);
-            EXPECT_EQ(testhost::TakeLog(),
-                      std::vector<std::string>{testhost::Check(
-                          "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)")});
-        }
-    }
-    EXPECT_GT(nRefused, 0);
-    EXPECT_EQ(jRows[0]["name"].asString(), m_strLong);
+    EXPECT_EQ(
+        0, testhost::InFreshProcess([this] {
+            VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+            Json::Value jNoQuery;
+            Json::Value jRows(Json::arrayValue);
+            ASSERT_EQ(Handle.recList(jNoQuery, jRows), 0);
+            const testhost::RowCallback fnCallback = testhost::LastRowCallback();
+            char szName[] = "name";
+            char* aszNames[] = {szName};
+            std::string strLong = m_strLong;
+            char* aszTexts[] = {strLong.data()};
+            int nRefused = 0;
+            int nResult = -1;
+            for (int nAt = 1; nResult != 0 && nAt < 1000; ++nAt) {
+                testhost::TakeLog();
+                g_nFailAt = nAt;
+                nResult = fnCallback(&jRows, 1, aszTexts, aszNames);
+                g_nFailAt = 0;
+                if (nResult != 0) {
+                    ++nRefused;
+                    EXPECT_EQ(nResult, -1);
+                    EXPECT_EQ(jRows.size(), 0U);
+                    EXPECT_EQ(
+                        testhost::TakeLog(),
+                        std::vector<std::string>{testhost::Check(
+                            "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)")});
+                }
+            }
+            EXPECT_GT(nRefused, 0);
+            EXPECT_EQ(jRows[0]["name"].asString(), m_strLong);
+        }));
 }
 
 TEST_F(JsonMemoryTest, SortedListAndGetThrowBadAllocOnly) {
