@@ -51,7 +51,6 @@ int vornjsondb::RunSql(const TableParts& Table, const std::string& strSql,
     while (i < kMaxAttempts) {
         if (szError) {
             Table.strSqlError = szError.get();
-            szError.reset();
         }
         errno = 0;
         g_strCurTable = Table.strName;

@@ -112,6 +112,26 @@ TEST_F(RowTemplateTest, ColumnsInAnotherOrderFillTheSameMembers) {
     EXPECT_EQ(Compact(jRows), R"([{"id":1,"name":"a"},{"id":1,"name":"a"},{"id":1}])");
 }
 
+TEST_F(RowTemplateTest, StatementsThatDifferInTheFirstNameAloneAreToldApart) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    EXPECT_EQ(Listed(*m_pHandle), R"([{"id":1,"name":"a"}])");
+    const RowCallback fnCallback = LastRowCallback();
+    Json::Value jRows;
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT id FROM " + m_strTable, fnCallback, &jRows), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT name FROM " + m_strTable, fnCallback, &jRows), 0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":1},{"name":"a"}])");
+}
+
+TEST_F(RowTemplateTest, LaterNullDoesNotTakeBackAColumnOfTheSameName) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    EXPECT_EQ(Listed(*m_pHandle), R"([{"id":1,"name":"a"}])");
+    Json::Value jRows;
+    EXPECT_EQ(
+        m_pHandle->runSqlEx("SELECT id, NULL AS id FROM " + m_strTable, LastRowCallback(), &jRows),
+        0);
+    EXPECT_EQ(Compact(jRows), R"([{"id":1}])");
+}
+
 TEST_F(RowTemplateTest, MoreTablesThanTemplatesAreReadAlike) {
     EXPECT_EQ(0, InFreshProcess([this] {
                   for (int i = 1; i <= 300; ++i) {

@@ -64,6 +64,7 @@ const char* const kPlainTexts[] = {
     "{\"b\":1,\"a\":2}",
     "{\"a\":[1],\"a\":{\"b\":2}}",
     "[[[[[[[[1]]]]]]]]",
+    "{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":1}}}}}}}}",
 };
 
 TEST(PlainJson, PlainTextsReadAsJsonCppReadsThem) {
@@ -138,6 +139,7 @@ TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
         "1000000000000000000",
         "-1000000000000000000",
         "[[[[[[[[[1]]]]]]]]]",
+        "{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":1}}}}}}}}}",
         "{\"a\\\"\":1}",
     };
     for (const char* szText : szOthers) {
