@@ -86,6 +86,20 @@ TEST_F(RowCallbackTest, RowidColumnFailsTheStatementBecauseTheDefinitionLacksIt)
     EXPECT_TRUE(jRows.isNull());
 }
 
+TEST_F(RowCallbackTest, PlaceOfALateColumnIsADecimalNumber) {
+    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    Json::Value jRows;
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT id, id, id, id, id, id, id, id, id, id, rowid AS rowid "
+                                  "FROM " +
+                                      m_strTable,
+                                  m_fnCallback, &jRows),
+              -1);
+    const Lines vecLog = TakeLog();
+    ASSERT_EQ(vecLog.size(), 6U);
+    EXPECT_EQ(vecLog[2], Plain("column_name[10]=rowid"));
+    EXPECT_EQ(vecLog[3], Plain("column_value[10]=1"));
+}
+
 TEST_F(RowCallbackTest, RowWithoutNamesOrValuesIsRefused) {
     Json::Value jRows(Json::arrayValue);
     EXPECT_EQ(m_fnCallback(&jRows, 2, nullptr, m_aszNames), -1);
