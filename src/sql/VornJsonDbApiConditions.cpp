@@ -100,6 +100,20 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
     return 0;
 }
 
+// A member's condition: by its value or by a list of values.
+int AppendMember(VornJsonDbApi& Handle, const TypedMember& Member, Json::Value& jValue,
+                 std::string& strSqlOut) {
+    if (jValue.isArray()) {
+        // Through the public call, which ends the name at a NUL.
+        VORN_FAIL_IF_TEXT(0 > Handle.SqlMakeByListField(Member.Name.pBegin, jValue, strSqlOut),
+                          "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)");
+        return 0;
+    }
+    VORN_FAIL_IF_TEXT(0 > AppendMatch(Member, jValue, strSqlOut),
+                      "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)");
+    return 0;
+}
+
 struct JoinMode {
     const char* szJoiner;
     bool blWrapped;
@@ -152,18 +166,11 @@ int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strS
         // joiner, and SQLite refuses the statement instead of running it without the condition.
         // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
         strSqlWhereOut += blWritten ? Mode.szJoiner : (Mode.blWrapped ? " (" : "");
-        Json::Value& jTmp = *it;
         if (blFilter) {
-            VORN_FAIL_IF_TEXT(!jTmp.isString(), "!jRecParam[jmFieldName[i]].isString()");
-            strSqlWhereOut.append(" ").append(jTmp.asString()).append(" ");
-        } else if (jTmp.isArray()) {
-            // Through the public call, which ends the name at a NUL.
-            VORN_FAIL_IF_TEXT(
-                0 > SqlMakeByListField(Name.pBegin, jTmp, strSqlWhereOut),
-                "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)");
-        } else {
-            VORN_FAIL_IF_TEXT(0 > AppendMatch(*pMember, jTmp, strSqlWhereOut),
-                              "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)");
+            VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
+            strSqlWhereOut.append(" ").append(it->asString()).append(" ");
+        } else if (0 > AppendMember(*this, *pMember, *it, strSqlWhereOut)) {
+            return -1;
         }
         blWritten = true;
     }
