@@ -154,8 +154,8 @@ class VORN_JSON_DB_EXPORT VornJsonDbApi {
     // 6.1  Handle
 
     // Copies the name, the definition and the CREATE statement, keeps pDb, and runs the statement
-    // at once. pDb stays the caller's: it must be open for as long as the handle lives, and it is
-    // never closed here. The arguments are not changed.
+    // at once. pDb stays the caller's: it must be open for every call on the handle but the
+    // destructor, and it is never closed here. The arguments are not changed.
     // Nothing is reported but by the log: a handle whose table could not be created is complete,
     // and its calls fail in their own right. To have a second handle on an existing table, write
     // "CREATE TABLE IF NOT EXISTS".
