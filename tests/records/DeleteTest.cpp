@@ -183,10 +183,10 @@ TEST_F(Delete, EarlierErrorTextShowsWithAnEmptyStatementAtTheExit) {
 }
 
 TEST_F(Delete, SuccessIsLoggedOnlyWithDebugOutput) {
-    VornJsonDbApi& api = OpenItem(4);
-    Deletes(api, R"({"name":"a"})", false, 2);
+    VornJsonDbApi& api = OpenItem(24);
+    Deletes(api, R"({"name":"a"})", false, 12);
     blDebugOutput = true;
-    Deletes(api, R"({"name":"b"})", false, 2, {Plain("delete rec number=2")});
+    Deletes(api, R"({"name":"b"})", false, 12, {Plain("delete rec number=12")});
     Deletes(api, R"({"name":"b"})", false, 0, {Plain("delete rec number=0")});
     EXPECT_EQ(0, api.recDeleteAll());
     EXPECT_EQ(Lines{Plain("delete rec number=0")}, TakeLog());
