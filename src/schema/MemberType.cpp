@@ -24,19 +24,33 @@ void ReadText(const char* szText, Json::Value& jOut) {
     Set(jOut, Json::Value(szText));
 }
 
+constexpr int kUsualDigits = 9;  // fit 32 bits without a check
+
+// What strtol or strtoll gives; it is asked only where the text is more than a few digits.
+template <typename Number>
+Number ReadNumber(const char* szText, Number (*pfnGeneral)(const char*, char**, int)) {
+    Number nValue = 0;
+    const char* p = szText;
+    while (*p >= '0' && *p <= '9' && p - szText < kUsualDigits) {
+        nValue = nValue * 10 + (*p - '0');
+        ++p;
+    }
+    return *p == '\0' ? nValue : pfnGeneral(szText, nullptr, 10);
+}
+
 // By way of long, also for the unsigned types: out of range it is clamped where long has 32 bits
 // and cut where it has 64. Stored data is read so everywhere.
 // Pinned by RowsTest.UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion.
 void ReadInt(const char* szText, Json::Value& jOut) {
-    Set(jOut, static_cast<Json::Int>(std::strtol(szText, nullptr, 10)));
+    Set(jOut, static_cast<Json::Int>(ReadNumber(szText, std::strtol)));
 }
 
 void ReadInt64(const char* szText, Json::Value& jOut) {
-    Set(jOut, static_cast<Json::Int64>(std::strtoll(szText, nullptr, 10)));
+    Set(jOut, static_cast<Json::Int64>(ReadNumber(szText, std::strtoll)));
 }
 
 void ReadBool(const char* szText, Json::Value& jOut) {
-    Set(jOut, std::strtol(szText, nullptr, 10) == 1);
+    Set(jOut, ReadNumber(szText, std::strtol) == 1);
 }
 
 // ---- value into a value list ----
