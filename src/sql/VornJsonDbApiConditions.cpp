@@ -36,10 +36,8 @@ SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
     return nullptr;
 }
 
-const char* Quote(ConditionForm eForm) {
-    const bool blQuoted =
-        eForm == ConditionForm::kQuotedText || eForm == ConditionForm::kQuotedJson;
-    return blQuoted ? "'" : "";
+bool IsQuoted(ConditionForm eForm) {
+    return eForm == ConditionForm::kQuotedText || eForm == ConditionForm::kQuotedJson;
 }
 
 void LogNoText(ConditionForm eForm) {
@@ -65,11 +63,15 @@ int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::strin
         LogNoText(eForm);
         return -1;
     }
+    const bool blQuoted = IsQuoted(eForm);
     const size_t nValue = std::strlen(szSql.get());
     // Room for all of it first: memory that runs out in between must not leave half a condition.
     strSqlOut.reserve(strSqlOut.length() + Member.Name.Length() + nValue + 3);
-    strSqlOut.append(Member.Name.pBegin, Member.Name.pEnd).append("=");
-    strSqlOut.append(Quote(eForm)).append(szSql.get(), nValue).append(Quote(eForm));
+    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()).append(blQuoted ? "='" : "=");
+    strSqlOut.append(szSql.get(), nValue);
+    if (blQuoted) {
+        strSqlOut += '\'';
+    }
     return 0;
 }
 
@@ -92,7 +94,8 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
         if (strList.empty()) {
             strList.append(Member.Name.pBegin, Member.Name.pEnd).append(" in (");
         }
-        strList.append(Quote(eElement)).append(szSql.get()).append(Quote(eElement));
+        const char* szQuote = IsQuoted(eElement) ? "'" : "";
+        strList.append(szQuote).append(szSql.get()).append(szQuote);
     }
     if (!strList.empty()) {
         strSqlOut.append(strList.append(" )"));

@@ -64,15 +64,28 @@ int CheckCached(const Json::Value& jEntry) {
     return 0;
 }
 
+// Each operation asks several times for the same table.
+struct LastFound {
+    std::string strName;
+    Json::Value* pjEntry = nullptr;
+};
+
 }  // namespace
 
 Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) try {
     // Never freed: a host's own statics may use the library when this one's would be gone.
     static Json::Value& jType = *new Json::Value;
+    static LastFound& Last = *new LastFound;
+    if (Last.pjEntry != nullptr && Last.strName == strJsonName && Last.pjEntry->isObject()) {
+        return *Last.pjEntry;
+    }
     if (const Json::Value* pjEntry = FindMember(jType, strJsonName)) {
         if (0 <= CheckCached(*pjEntry)) {
-            // Found in a value that is not const: asked for every row, so not searched again.
-            return const_cast<Json::Value&>(*pjEntry);
+            // Found in a value that is not const.
+            Last.pjEntry = nullptr;
+            Last.strName = strJsonName;
+            Last.pjEntry = const_cast<Json::Value*>(pjEntry);
+            return *Last.pjEntry;
         }
     } else if (0 <= AddToCache(jType, jTableDef, strJsonName)) {
         return jType[strJsonName];
