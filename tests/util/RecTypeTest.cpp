@@ -160,6 +160,34 @@ TEST_F(RecTypeTest, MembersThatAreNoObjectAreRefused) {
     }
 }
 
+TEST_F(RecTypeTest, NamesAreFoundInTurns) {
+    const std::string strFirst = UniqueTable();
+    const std::string strSecond = UniqueTable();
+    Json::Value& jFirst =
+        Look("{\"" + strFirst + R"(":{"member":{"a":{"cpptype":"int"}}}})", strFirst);
+    Json::Value& jSecond =
+        Look("{\"" + strSecond + R"(":{"member":{"b":{"cpptype":"int"}}}})", strSecond);
+    for (int i = 0; i < 3; ++i) {
+        EXPECT_EQ(&Look("null", strFirst), &jFirst);
+        EXPECT_EQ(&Look("null", strSecond), &jSecond);
+        EXPECT_EQ(&Look("null", strSecond), &jSecond);
+    }
+    EXPECT_EQ(TakeLog(), Lines());
+    EXPECT_TRUE(Look("null", "").isNull());
+    EXPECT_EQ(TakeLog().size(), 4U);
+}
+
+TEST_F(RecTypeTest, EntryThatTheHostChangedIsRefusedAtOnce) {
+    EXPECT_EQ(0, InFreshProcess([] {
+                  Json::Value& jEntry = Look(R"({"t":{"member":{"a":{"cpptype":"int"}}}})", "t");
+                  EXPECT_EQ(&Look("null", "t"), &jEntry);
+                  EXPECT_EQ(&Look("null", "t"), &jEntry);
+                  jEntry = 7;
+                  EXPECT_EQ(&Look("null", "t"), &jEntry);
+                  EXPECT_EQ(TakeLog(), Refusal(kCachedCheck, "t", "null", R"({"t":7})"));
+              }));
+}
+
 TEST_F(RecTypeTest, EmptyNameIsRefusedOnlyAfterItsEntryWasFound) {
     EXPECT_EQ(0, InFreshProcess([] {
                   ExpectFirstLookupRefused("strJsonName.empty()", "",
