@@ -52,76 +52,85 @@ std::vector<std::string> Texts(const Store& Source, int nCount, Work&& fnWork) {
     return vecTexts;
 }
 
-// Calls fnWork on one store in turns with the bare texts on another one that holds the same; the
-// texts are those of the same calls on a third. Only the calls are measured: query objects are made
-// before and results destroyed after.
-template <class Work>
-Figure AgainstExec(const Rounds& How, int nRows, Work&& fnWork) {
+// Calls fnWork(handle, input, result) on one store in turns with the bare texts on another one that
+// holds the same; the texts are those of the same calls on a third. Only the calls are measured: a
+// turn's inputs and texts are made right before it, as a caller makes a record and stores it, and
+// results are destroyed after it.
+template <class Make, class Work>
+Figure AgainstExec(const Rounds& How, int nRows, Make&& fnMakeInput, Work&& fnWork) {
+    const size_t nCalls = static_cast<size_t>(How.nCalls);
     std::vector<std::string> vecTexts;
     {
         const Store Source(nRows);
         Json::Value jResult;
         vecTexts = Texts(Source, CallsOf(How), [&](int i) {
+            Json::Value jInput = fnMakeInput(i);
             jResult = Json::Value();
-            fnWork(*Source.pHandle, static_cast<size_t>(i), jResult);
+            fnWork(*Source.pHandle, jInput, jResult);
         });
     }
     const Store Ours(nRows);
     const Store Other(nRows);
-    std::vector<Json::Value> vecResults(static_cast<size_t>(How.nCalls));
+    std::vector<Json::Value> vecInputs(nCalls);
+    std::vector<Json::Value> vecResults(nCalls);
+    std::vector<std::string> vecTextsOfTurn(nCalls);
     return FromTiming(Interleave(
         How,
         [&](int i) {
-            fnWork(*Ours.pHandle, static_cast<size_t>(i),
-                   vecResults[static_cast<size_t>(i % How.nCalls)]);
+            const size_t nPlace = static_cast<size_t>(i) % nCalls;
+            fnWork(*Ours.pHandle, vecInputs[nPlace], vecResults[nPlace]);
         },
-        [&](int i) { Other.Db.Exec(vecTexts[static_cast<size_t>(i)]); },
-        [&] { vecResults.assign(vecResults.size(), Json::Value()); }));
+        [&](int i) { Other.Db.Exec(vecTextsOfTurn[static_cast<size_t>(i) % nCalls]); },
+        [&](int nFirst) {
+            vecResults.assign(nCalls, Json::Value());
+            for (size_t i = 0; i < nCalls; ++i) {
+                vecInputs[i] = fnMakeInput(nFirst + static_cast<int>(i));
+                vecTextsOfTurn[i] = vecTexts[static_cast<size_t>(nFirst) + i];
+            }
+        }));
 }
 
-std::vector<Json::Value> QueriesByKey() {
-    std::vector<Json::Value> vecQueries;
-    for (const int nId : Shuffled(kRows)) {
-        vecQueries.push_back(ById(nId));
-    }
-    return vecQueries;
+// Every call has a key of its own.
+constexpr int kRounds = 100;
+constexpr int kCalls = 190;
+static_assert((kRounds + kWarmUpRounds) * kCalls <= kRows, "more calls than keys");
+
+// A query object for each running number.
+auto ByKeys() {
+    return [vecIds = Shuffled(kRows)](int i) { return ById(vecIds[static_cast<size_t>(i)]); };
 }
 
 }  // namespace
 
 Figure CreateRatio(const Settings& Now) {
-    const Rounds How = HowOften(Now, 30, 300);
-    std::vector<Json::Value> vecRecords = EightMemberRecords(CallsOf(How));
-    return AgainstExec(How, 0, [&](VornJsonDbApi& Handle, size_t i, Json::Value& jStored) {
-        Require(Handle.recCreate(vecRecords[i], jStored) == 0, "recCreate");
-    });
+    return AgainstExec(HowOften(Now, kRounds, kCalls), 0, EightMemberRecord,
+                       [](VornJsonDbApi& Handle, Json::Value& jRecord, Json::Value& jStored) {
+                           Require(Handle.recCreate(jRecord, jStored) == 0, "recCreate");
+                       });
 }
 
 Figure GetRatio(const Settings& Now) {
-    std::vector<Json::Value> vecQueries = QueriesByKey();
-    return AgainstExec(HowOften(Now, 30, 300), kRows,
-                       [&](VornJsonDbApi& Handle, size_t i, Json::Value& jFound) {
-                           Require(Handle.recGetOne(vecQueries[i], jFound) == 1, "recGetOne");
+    return AgainstExec(HowOften(Now, kRounds, kCalls), kRows, ByKeys(),
+                       [](VornJsonDbApi& Handle, Json::Value& jQuery, Json::Value& jFound) {
+                           Require(Handle.recGetOne(jQuery, jFound) == 1, "recGetOne");
                        });
 }
 
 Figure UpdateRatio(const Settings& Now) {
-    std::vector<Json::Value> vecQueries = QueriesByKey();
     Json::Value jChange;
     jChange["city"] = "Depot 100";
     jChange["level"] = 12;
     jChange["note"] = "moved to the yard";
-    return AgainstExec(HowOften(Now, 30, 300), kRows,
-                       [&](VornJsonDbApi& Handle, size_t i, Json::Value&) {
-                           Require(Handle.recUpdateByFilter(vecQueries[i], jChange) == 0, "update");
+    return AgainstExec(HowOften(Now, kRounds, kCalls), kRows, ByKeys(),
+                       [&](VornJsonDbApi& Handle, Json::Value& jQuery, Json::Value&) {
+                           Require(Handle.recUpdateByFilter(jQuery, jChange) == 0, "update");
                        });
 }
 
 Figure DeleteRatio(const Settings& Now) {
-    std::vector<Json::Value> vecQueries = QueriesByKey();
-    return AgainstExec(HowOften(Now, 30, 300), kRows,
-                       [&](VornJsonDbApi& Handle, size_t i, Json::Value&) {
-                           Require(Handle.recDelete(vecQueries[i]) == 1, "recDelete");
+    return AgainstExec(HowOften(Now, kRounds, kCalls), kRows, ByKeys(),
+                       [](VornJsonDbApi& Handle, Json::Value& jQuery, Json::Value&) {
+                           Require(Handle.recDelete(jQuery) == 1, "recDelete");
                        });
 }
 
@@ -144,7 +153,7 @@ Figure ListRatio(const Settings& Now) {
         HowOften(Now, 14, 1),
         [&](int) { Require(Source.pHandle->recList(jAll, jOurs) == 0, "recList"); },
         [&](int) { jOther = Reader.Read(Source.Db.Get(), strSql); },
-        [&] {
+        [&](int) {
             jOurs = Json::Value();
             jOther = Json::Value();
         });

@@ -74,7 +74,7 @@ Figure LongTexts(const Settings& Now, const Json::Value& jRecord) {
     }
     const Timing Found = Interleave(
         {Now.blShort ? 10 : 16, 6}, Create, [&](int) { Other.Exec(strSql); },
-        [&] {
+        [&](int) {
             // Not a rollback: the freed pages are to be used again, on both sides.
             for (const Database* pDb : {&Ours, &Other}) {
                 pDb->Exec("DELETE FROM texts");

@@ -33,8 +33,8 @@ double TimeCalls(Work&& fnWork, int nFirst, int nCalls) {
 }
 
 // Both works are called with running numbers, the same ones. Round by round the other goes first.
-// fnBetween runs before each work's turn, unmeasured: what the one has left must not lie in the
-// other's way. The first two rounds only warm up.
+// fnBetween runs before each work's turn, unmeasured, with the turn's first number: what the one
+// has left must not lie in the other's way. The first two rounds only warm up.
 template <class Ours, class Other, class Between>
 Timing Interleave(const Rounds& How, Ours&& fnOurs, Other&& fnOther, Between&& fnBetween) {
     std::vector<double> vecOurs;
@@ -44,7 +44,7 @@ Timing Interleave(const Rounds& How, Ours&& fnOurs, Other&& fnOther, Between&& f
         double dOurs = 0;
         double dOther = 0;
         for (const bool blOurs : {n % 2 == 0, n % 2 != 0}) {
-            fnBetween();
+            fnBetween(n * How.nCalls);
             if (blOurs) {
                 dOurs = TimeCalls(fnOurs, n * How.nCalls, How.nCalls);
             } else {
@@ -62,7 +62,7 @@ Timing Interleave(const Rounds& How, Ours&& fnOurs, Other&& fnOther, Between&& f
 
 template <class Ours, class Other>
 Timing Interleave(const Rounds& How, Ours&& fnOurs, Other&& fnOther) {
-    return Interleave(How, fnOurs, fnOther, [] {});
+    return Interleave(How, fnOurs, fnOther, [](int) {});
 }
 
 // Highest running number that such a measurement asks for, plus one.

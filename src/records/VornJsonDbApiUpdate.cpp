@@ -4,13 +4,12 @@
 
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
-#include "../util/JsonMember.h"
-#include "../util/JsonMemory.h"
+#include "../sql/MemberList.h"
 #include "../util/JsonText.h"
 #include "../util/SqlText.h"
 #include "UniqueFailure.h"
 
-int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) try {
+int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {
     std::string strSql;
     const auto Update = [&]() -> int {
         // An empty condition would change the whole table.
@@ -18,16 +17,12 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
         VORN_FAIL_IF(jRecIn.empty());
         strSql.reserve(vornjsondb::kUsualStatement);
         strSql.append("UPDATE ").append(m_strName).append(" SET ");
-        // Raw condition text in a record must not become an assignment.
-        Json::Value jWithoutFilter;
-        const bool blFilter = vornjsondb::FindMember(jRecIn, "vornSqlWhereFilter") != nullptr;
-        if (blFilter) {
-            jWithoutFilter = jRecIn;
-            jWithoutFilter.removeMember("vornSqlWhereFilter");
-        }
-        Json::Value& jColumnList = blFilter ? jWithoutFilter : jRecIn;
+        const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
         const size_t nHead = strSql.length();
-        if (0 > SqlExpandMemberList(jColumnList, strSql, VORN_SQL_WHERE_TYPE_COMMA)) {
+        // Raw condition text in a record must not become an assignment.
+        if (0 > vornjsondb::ExpandMemberList(*this, jType, jRecIn, strSql,
+                                             VORN_SQL_WHERE_TYPE_COMMA,
+                                             vornjsondb::RawFilter::kLeftOut)) {
             strSql.resize(nHead);  // what is logged of a failed statement is the head alone
             VORN_LOG_CONDITION(
                 "0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA)");
@@ -55,7 +50,6 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
     }
     return -1;
 }
-VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 int VornJsonDbApi::recUpdateByFilter(Json::Value& jFilterIn, Json::Value& jParamIn) {
     const auto Update = [&]() -> int {

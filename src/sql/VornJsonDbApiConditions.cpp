@@ -8,6 +8,7 @@
 #include "../schema/TableTypes.h"
 #include "../util/JsonText.h"
 #include "../util/SqlText.h"
+#include "MemberList.h"
 
 namespace {
 
@@ -146,9 +147,9 @@ int VornJsonDbApi::SqlMakeByListField(const char* szField, Json::Value& jList,
     return AppendList(*pMember, jList, strSqlOut);
 }
 
-int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strSqlWhereOut,
-                                       int andType) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+int vornjsondb::ExpandMemberList(VornJsonDbApi& Handle, const Json::Value& jType,
+                                 Json::Value& jRecParam, std::string& strSqlOut, int andType,
+                                 RawFilter eFilter) {
     VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
     if (andType < 0 || andType >= kJoinModeCount) {
         VORN_LOG_LOCATED("error andType=%d", andType);
@@ -162,17 +163,17 @@ int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strS
         const MemberName Name = vornjsondb::NameOf(it);
         const bool blFilter = Name.Is(kFilterKey);
         const TypedMember* pMember = Types.Find(Name);
-        if (!blFilter && pMember == nullptr) {
+        if (blFilter ? eFilter == RawFilter::kLeftOut : pMember == nullptr) {
             continue;
         }
         // Written before the member's own text: an empty list, which writes nothing, leaves its
         // joiner, and SQLite refuses the statement instead of running it without the condition.
         // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
-        strSqlWhereOut += blWritten ? Mode.szJoiner : (Mode.blWrapped ? " (" : "");
+        strSqlOut += blWritten ? Mode.szJoiner : (Mode.blWrapped ? " (" : "");
         if (blFilter) {
             VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
-            strSqlWhereOut.append(" ").append(it->asString()).append(" ");
-        } else if (0 > AppendMember(*this, *pMember, *it, strSqlWhereOut)) {
+            strSqlOut.append(" ").append(it->asString()).append(" ");
+        } else if (0 > AppendMember(Handle, *pMember, *it, strSqlOut)) {
             return -1;
         }
         blWritten = true;
@@ -181,7 +182,14 @@ int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strS
         return 1;
     }
     if (Mode.blWrapped) {
-        strSqlWhereOut += " )";
+        strSqlOut += " )";
     }
     return 0;
+}
+
+int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strSqlWhereOut,
+                                       int andType) {
+    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    return vornjsondb::ExpandMemberList(*this, jType, jRecParam, strSqlWhereOut, andType,
+                                        vornjsondb::RawFilter::kWritten);
 }

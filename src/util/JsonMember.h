@@ -39,6 +39,12 @@ MemberName NameOf(const Iterator& It) {
 
 // The order of JSON objects: by bytes, a name before its continuations. Negative, 0 or positive.
 inline int Compare(const MemberName& Left, const MemberName& Right) {
+    // Most names differ here, which needs no call. Behind an empty name there is a NUL, too.
+    const auto nLeft = static_cast<unsigned char>(*Left.pBegin);
+    const auto nRight = static_cast<unsigned char>(*Right.pBegin);
+    if (nLeft != nRight) {
+        return nLeft < nRight ? -1 : 1;
+    }
     const size_t nCommon = Left.Length() < Right.Length() ? Left.Length() : Right.Length();
     const int nOrder = std::memcmp(Left.pBegin, Right.pBegin, nCommon);
     if (nOrder != 0 || Left.Length() == Right.Length()) {
