@@ -13,7 +13,6 @@
 namespace {
 
 using vornjsondb::ConditionForm;
-using vornjsondb::MemberName;
 using vornjsondb::SqlText;
 using vornjsondb::TableTypes;
 using vornjsondb::TypedMember;
