@@ -5,6 +5,7 @@
 #include <VornJsonDbApi.h>
 
 #include <cstddef>
+#include <cstdlib>
 #include <functional>
 #include <new>
 #include <string>
@@ -27,6 +28,20 @@ extern "C" void* malloc(size_t nBytes) {
         return nullptr;
     }
     return __libc_malloc(nBytes);
+}
+
+// By way of malloc also where the system's own does something else, as under valgrind.
+void* operator new(size_t nBytes) {
+    if (void* pMemory = malloc(nBytes)) {
+        return pMemory;
+    }
+    throw std::bad_alloc();
+}
+void operator delete(void* pMemory) noexcept {
+    free(pMemory);
+}
+void operator delete(void* pMemory, size_t) noexcept {
+    free(pMemory);
 }
 
 namespace {
