@@ -2,8 +2,8 @@
 // What the scanner accepts is compared with sqlite3_mprintf itself, given arguments that nobody may
 // take.
 
+#include "../src/base/SqlText.h"
 #include "../src/sql/AccumulatedFormat.h"
-#include "../src/util/SqlText.h"
 #include "FuzzHost.h"
 
 using namespace fuzzhost;

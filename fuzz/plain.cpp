@@ -1,6 +1,6 @@
 // The input is a JSON text. Where the fast reader or writer takes it, JsonCpp's own must agree.
 
-#include "../src/util/PlainJson.h"
+#include "../src/base/PlainJson.h"
 #include "FuzzHost.h"
 
 using namespace fuzzhost;

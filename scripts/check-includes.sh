@@ -7,11 +7,12 @@ src=$(realpath "${1:-"$(dirname "$0")/../src"}")
 
 # What each layer may include beside itself, the log line and the public header.
 declare -A allowed=(
-    [util]=""
-    [schema]="util"
-    [sql]="schema util"
-    [core]="schema util"
-    [records]="sql core schema util"
+    [base]=""
+    [schema]="base"
+    [util]="schema base"
+    [sql]="schema base"
+    [core]="schema base"
+    [records]="sql core schema base"
 )
 open_to_all=core/LogLine.h
 

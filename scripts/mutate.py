@@ -29,7 +29,7 @@ STATEMENT = re.compile(r"^ +(?=\S)(?!return|const |static |using |struct |else|c
 
 # In one process a test may hide behind what an earlier one left.
 ORDERS = ([], ["--gtest_shuffle", "--gtest_random_seed=7"])
-PLAIN_JSON = pathlib.Path("src/util/PlainJson.cpp")
+PLAIN_JSON = pathlib.Path("src/base/PlainJson.cpp")
 
 
 class Mutant:

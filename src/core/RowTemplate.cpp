@@ -5,7 +5,7 @@
 #include <memory>
 #include <utility>
 
-#include "../util/JsonMember.h"
+#include "../base/JsonMember.h"
 
 namespace vornjsondb {
 

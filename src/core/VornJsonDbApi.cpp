@@ -4,7 +4,7 @@
 
 #include <utility>
 
-#include "../util/JsonMemory.h"
+#include "../base/JsonMemory.h"
 #include "LogLine.h"
 
 // The only short condition checks: a constructor cannot return -1 and goes on in any case.

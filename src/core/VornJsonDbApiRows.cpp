@@ -7,8 +7,8 @@
 #include <exception>
 #include <utility>
 
+#include "../base/JsonMember.h"
 #include "../schema/MemberType.h"
-#include "../util/JsonMember.h"
 #include "CurrentTable.h"
 #include "LogLine.h"
 #include "RowTemplate.h"

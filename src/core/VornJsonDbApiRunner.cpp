@@ -8,7 +8,7 @@
 #include <cerrno>
 #include <cstring>
 
-#include "../util/SqlText.h"
+#include "../base/SqlText.h"
 #include "CurrentTable.h"
 #include "LogLine.h"
 #include "TableParts.h"

@@ -2,10 +2,10 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonMemory.h"
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
 #include "../schema/Defaults.h"
-#include "../util/JsonMemory.h"
-#include "../util/JsonText.h"
 #include "SaveRecord.h"
 #include "UniqueFailure.h"
 

@@ -4,11 +4,11 @@
 
 #include <cstring>
 
+#include "../base/JsonMember.h"
+#include "../base/JsonMemory.h"
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
 #include "../schema/MemberType.h"
-#include "../util/JsonMember.h"
-#include "../util/JsonMemory.h"
 
 namespace {
 

@@ -2,10 +2,10 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
 #include "../core/VornJsonDbApiRows.h"
-#include "../util/JsonText.h"
 
 int VornJsonDbApi::recList(Json::Value& jRecParam, Json::Value& jRecArrayOut) {
     std::string strSqlRun;

@@ -2,10 +2,10 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonText.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRows.h"
-#include "../util/JsonText.h"
-#include "../util/SqlText.h"
 #include "SaveRecord.h"
 
 // Beside the class, so that a create can store the caller's record without changing or copying it.

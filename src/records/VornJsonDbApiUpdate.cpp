@@ -2,11 +2,11 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonText.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../core/TableParts.h"
 #include "../sql/MemberList.h"
-#include "../util/JsonText.h"
-#include "../util/SqlText.h"
 #include "UniqueFailure.h"
 
 int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {

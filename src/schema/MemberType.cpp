@@ -5,8 +5,8 @@
 
 #include <sqlite3.h>
 
-#include "../util/JsonMember.h"
-#include "../util/JsonText.h"
+#include "../base/JsonMember.h"
+#include "../base/JsonText.h"
 
 namespace vornjsondb {
 

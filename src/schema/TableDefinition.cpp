@@ -1,6 +1,6 @@
 #include "TableDefinition.h"
 
-#include "../util/JsonMember.h"
+#include "../base/JsonMember.h"
 
 namespace vornjsondb {
 

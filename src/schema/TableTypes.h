@@ -5,7 +5,7 @@
 
 #include <json/json.h>
 
-#include "../util/JsonMember.h"
+#include "../base/JsonMember.h"
 #include "MemberType.h"
 
 namespace vornjsondb {

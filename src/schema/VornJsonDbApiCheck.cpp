@@ -2,8 +2,8 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "../util/JsonText.h"
 #include "TableTypes.h"
 
 int VornJsonDbApi::checkJsonType(Json::Value& jParam) {

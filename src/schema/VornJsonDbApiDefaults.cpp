@@ -2,9 +2,9 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonMemory.h"
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "../util/JsonMemory.h"
-#include "../util/JsonText.h"
 #include "Defaults.h"
 
 namespace vornjsondb {

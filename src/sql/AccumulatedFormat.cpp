@@ -3,7 +3,7 @@
 #include <cstring>
 #include <stdexcept>
 
-#include "../util/SqlText.h"
+#include "../base/SqlText.h"
 
 namespace vornjsondb {
 

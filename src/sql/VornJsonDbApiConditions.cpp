@@ -4,10 +4,10 @@
 
 #include <cstring>
 
+#include "../base/JsonText.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../schema/TableTypes.h"
-#include "../util/JsonText.h"
-#include "../util/SqlText.h"
 #include "MemberList.h"
 
 namespace {

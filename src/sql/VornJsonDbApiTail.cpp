@@ -4,10 +4,10 @@
 
 #include <string>
 
+#include "../base/JsonMember.h"
+#include "../base/JsonText.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
-#include "../util/JsonMember.h"
-#include "../util/JsonText.h"
-#include "../util/SqlText.h"
 
 namespace {
 

@@ -2,10 +2,10 @@
 
 #include <VornJsonDbApi.h>
 
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
 #include "../schema/TableDefinition.h"
 #include "../schema/TableTypes.h"
-#include "../util/JsonText.h"
 #include "AccumulatedFormat.h"
 
 namespace {

@@ -5,10 +5,10 @@
 #include <ctime>
 #include <utility>
 
+#include "../base/JsonMember.h"
+#include "../base/JsonMemory.h"
+#include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "JsonMember.h"
-#include "JsonMemory.h"
-#include "JsonText.h"
 
 namespace {
 

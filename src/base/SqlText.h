@@ -1,5 +1,5 @@
-#ifndef VORN_UTIL_SQL_TEXT_H
-#define VORN_UTIL_SQL_TEXT_H
+#ifndef VORN_BASE_SQL_TEXT_H
+#define VORN_BASE_SQL_TEXT_H
 
 #include <cstddef>
 #include <memory>
@@ -20,4 +20,4 @@ constexpr size_t kUsualStatement = 256;
 
 }  // namespace vornjsondb
 
-#endif  // VORN_UTIL_SQL_TEXT_H
+#endif  // VORN_BASE_SQL_TEXT_H

@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 #include <json/json.h>
 
-#include "../../src/util/PlainJson.h"
+#include "../../src/base/PlainJson.h"
 
 namespace {
 

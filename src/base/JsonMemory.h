@@ -1,5 +1,5 @@
-#ifndef VORN_UTIL_JSON_MEMORY_H
-#define VORN_UTIL_JSON_MEMORY_H
+#ifndef VORN_BASE_JSON_MEMORY_H
+#define VORN_BASE_JSON_MEMORY_H
 
 #include <new>
 
@@ -19,4 +19,4 @@
         throw std::bad_alloc();         \
     }
 
-#endif  // VORN_UTIL_JSON_MEMORY_H
+#endif  // VORN_BASE_JSON_MEMORY_H

@@ -1,7 +1,7 @@
 // JSON values as text and back.
 
-#ifndef VORN_UTIL_JSON_TEXT_H
-#define VORN_UTIL_JSON_TEXT_H
+#ifndef VORN_BASE_JSON_TEXT_H
+#define VORN_BASE_JSON_TEXT_H
 
 #include <string>
 
@@ -18,4 +18,4 @@ void FromString(const char* szText, Json::Value& jOut);
 
 }  // namespace vornjsondb
 
-#endif  // VORN_UTIL_JSON_TEXT_H
+#endif  // VORN_BASE_JSON_TEXT_H

@@ -2,8 +2,8 @@
 // at most 18 digits, few levels. For such values and texts these two are several times as fast as
 // JsonCpp's reader and writer and give the same result; all others are left to those.
 
-#ifndef VORN_UTIL_PLAIN_JSON_H
-#define VORN_UTIL_PLAIN_JSON_H
+#ifndef VORN_BASE_PLAIN_JSON_H
+#define VORN_BASE_PLAIN_JSON_H
 
 #include <string>
 
@@ -21,4 +21,4 @@ bool WritePlainJson(const Json::Value& jValue, std::string& strOut);
 
 }  // namespace vornjsondb
 
-#endif  // VORN_UTIL_PLAIN_JSON_H
+#endif  // VORN_BASE_PLAIN_JSON_H

@@ -1,7 +1,7 @@
 // Member access that no JSON kind makes throw.
 
-#ifndef VORN_UTIL_JSON_MEMBER_H
-#define VORN_UTIL_JSON_MEMBER_H
+#ifndef VORN_BASE_JSON_MEMBER_H
+#define VORN_BASE_JSON_MEMBER_H
 
 #include <cstring>
 #include <string>
@@ -82,4 +82,4 @@ class MemberCursor {
 
 }  // namespace vornjsondb
 
-#endif  // VORN_UTIL_JSON_MEMBER_H
+#endif  // VORN_BASE_JSON_MEMBER_H
