@@ -26,7 +26,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     Json::Value jExpected;
     const bool blParsed = Parse(strText, jExpected);
     Json::Value jRead;
-    if (vornjsondb::ReadPlainJson(strText.c_str(), jRead)) {
+    if (vornjsondb::ReadPlainJson(strText.c_str(), strText.length(), jRead)) {
         Require(blParsed, "what is read is JSON");
         Require(jRead == jExpected && KindsOf(jRead) == KindsOf(jExpected), "the values are equal");
     }

@@ -36,8 +36,9 @@
 // its users. The same holds for a number member that is given as text in a query object.
 // A percent sign in a text value can halve ("%%" becomes "%") or get the record refused, when
 // members that follow it in key order are written too.
-// Exceptions: std::bad_alloc, and std::logic_error from SqlExpandMemberSymbol, recSave and
-// recCreate when SQLite's formatter runs out of memory. Nothing else is thrown.
+// Exceptions: std::bad_alloc, and std::logic_error from SqlExpandMemberSymbol and recSave when
+// SQLite's formatter, which writes numbers with a fraction, runs out of memory. Nothing else is
+// thrown.
 //
 // 2  Words
 //
@@ -117,8 +118,9 @@ namespace VORN_JSON_DB {
 // Returns the member types of the table strJsonName: an object with one entry per member, each
 // holding "cpptype" and, where defined, "cppDefaultValue". The first call for a name takes them
 // from jTableDef and keeps them; later calls answer from the cache, whatever they pass (an empty
-// jTableDef is fine then). The reference is shared and lives as long as the process. Do not
-// change what it refers to: the library keeps pointers into it.
+// jTableDef is fine then). The reference is shared and lives as long as the process. Read it, and
+// do not change it: the library works on a copy, which a change may or may not reach. Reading a
+// member that is missing by [] adds it, with null, and makes it a member of an unknown type.
 // On failure (no entry, no "member" object, an entry without a "cpptype" text) the definition
 // and the whole cache are logged, and a value that is no object is returned. Note: a name whose
 // first lookup failed stays unusable until the process ends; if some members came before the

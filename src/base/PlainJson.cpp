@@ -16,7 +16,9 @@ class PlainJson {
   public:
     explicit PlainJson(const char* szText) : m_pNext(szText) {}
 
-    bool ReadWhole(Json::Value& jOut) { return ReadValue(jOut, 0) && *m_pNext == '\0'; }
+    bool ReadWhole(const char* pEnd, Json::Value& jOut) {
+        return ReadValue(jOut, 0) && m_pNext == pEnd;
+    }
 
   private:
     bool Skip(char c) {
@@ -150,28 +152,41 @@ bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
 
 bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut);
 
-bool WriteMembers(const Json::Value& jValue, int nLevel, std::string& strOut) {
-    const bool blObject = jValue.isObject();
-    char cBefore = blObject ? '{' : '[';
-    const Json::Value::const_iterator itEnd = jValue.end();
-    for (Json::Value::const_iterator it = jValue.begin(); it != itEnd; ++it) {
-        strOut += cBefore;
-        cBefore = ',';
-        if (blObject) {
-            const MemberName Name = NameOf(it);
-            if (!WriteText(Name.pBegin, Name.pEnd, strOut)) {
-                return false;
-            }
-            strOut += ':';
+bool WriteArray(const Json::Value& jArray, int nLevel, std::string& strOut) {
+    strOut += '[';
+    Json::ArrayIndex nNext = 0;
+    const Json::Value::const_iterator itEnd = jArray.end();
+    for (Json::Value::const_iterator it = jArray.begin(); it != itEnd; ++it) {
+        if (it.index() != nNext) {
+            return false;
         }
-        if (!WriteValue(*it, nLevel + 1, strOut)) {
+        if (nNext++ > 0) {
+            strOut += ',';
+        }
+        if (!WriteValue(*it, nLevel, strOut)) {
             return false;
         }
     }
-    if (cBefore != ',') {
+    strOut += ']';
+    return true;
+}
+
+bool WriteObject(const Json::Value& jObject, int nLevel, std::string& strOut) {
+    char cBefore = '{';
+    const Json::Value::const_iterator itEnd = jObject.end();
+    for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
         strOut += cBefore;
+        cBefore = ',';
+        const MemberName Name = NameOf(it);
+        if (!WriteText(Name.pBegin, Name.pEnd, strOut)) {
+            return false;
+        }
+        strOut += ':';
+        if (!WriteValue(*it, nLevel, strOut)) {
+            return false;
+        }
     }
-    strOut += blObject ? '}' : ']';
+    strOut += jObject.empty() ? "{}" : "}";
     return true;
 }
 
@@ -193,8 +208,9 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
             return WriteText(pBegin, pEnd, strOut);
         }
         case Json::arrayValue:
+            return nLevel < kMaxLevels && WriteArray(jValue, nLevel + 1, strOut);
         case Json::objectValue:
-            return nLevel < kMaxLevels && WriteMembers(jValue, nLevel, strOut);
+            return nLevel < kMaxLevels && WriteObject(jValue, nLevel + 1, strOut);
         default:
             return false;
     }
@@ -202,8 +218,8 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
 
 }  // namespace
 
-bool ReadPlainJson(const char* szText, Json::Value& jOut) {
-    return PlainJson(szText).ReadWhole(jOut);
+bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut) {
+    return PlainJson(szText).ReadWhole(szText + nLength, jOut);
 }
 
 bool WritePlainJson(const Json::Value& jValue, std::string& strOut) {

@@ -5,18 +5,19 @@
 #ifndef VORN_BASE_PLAIN_JSON_H
 #define VORN_BASE_PLAIN_JSON_H
 
+#include <cstddef>
 #include <string>
 
 #include <json/json.h>
 
 namespace vornjsondb {
 
-// Reads the text into jOut. Returns false, with jOut in any state, for a text that is not plain,
-// well-formed or not.
-bool ReadPlainJson(const char* szText, Json::Value& jOut);
+// Reads the text, which a NUL follows, into jOut. Returns false, with jOut in any state, for a text
+// that is not plain, well-formed or not.
+bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut);
 
-// Appends the value's text. Returns false, with strOut in any state, for a value that is not
-// plain.
+// Appends the value's text. Returns false, with strOut in any state, for a value that is not plain.
+// A list that does not store all of its elements is none: what is missing is a null.
 bool WritePlainJson(const Json::Value& jValue, std::string& strOut);
 
 }  // namespace vornjsondb

@@ -7,50 +7,41 @@
 #include <exception>
 #include <utility>
 
-#include "../base/JsonMember.h"
-#include "../schema/MemberType.h"
-#include "CurrentTable.h"
+#include "../schema/KnownTables.h"
 #include "LogLine.h"
-#include "RowTemplate.h"
+#include "VornJsonDbApiRunner.h"
 
 namespace {
 
-using vornjsondb::FindMember;
-using vornjsondb::MemberType;
 using vornjsondb::RowTemplate;
+using vornjsondb::TableTypes;
+using vornjsondb::TypedMember;
 
 // One column into the member of the same name. A NULL column leaves the member out.
-int DbCallBackFillField(Json::Value& jRec, const Json::Value& jType, const char* szName,
+int DbCallBackFillField(Json::Value& jRec, const TableTypes& Types, const char* szName,
                         const char* szText) {
-    const Json::Value* pjDefinition = FindMember(jType, szName);
-    VORN_FAIL_IF_TEXT(pjDefinition == nullptr, "!jType.isMember(strName)");
+    const TypedMember* pMember = Types.Find(vornjsondb::NameOf(szName));
+    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strName)");
     if (szText == nullptr) {
         return 0;
     }
-    const MemberType& Type = vornjsondb::TypeOfMember(*pjDefinition);
-    if (!vornjsondb::ReadColumn(Type, szText, jRec[szName])) {
-        VORN_LOG_LOCATED("type error, strType=%s", vornjsondb::TypeName(*pjDefinition));
+    if (pMember->pType->pfnRead == nullptr) {
+        VORN_LOG_LOCATED("type error, strType=%s", pMember->szTypeName);
         return -1;
     }
+    pMember->pType->pfnRead(szText, jRec[szName]);
     return 0;
 }
 
-// The member types come from the cache alone: the operation that runs the statement has looked
-// them up with the table's definition before.
-const Json::Value& CurrentMemberTypes() {
-    static Json::Value& jNoDefinition = *new Json::Value;
-    return VORN_JSON_DB::recType(jNoDefinition, g_strCurTable);
-}
-
 // Goes through the row column by column, so that a failure is reported where it lies.
-int FillColumns(Json::Value& jRec, const Json::Value& jType, int n_column, char** column_value,
+int FillColumns(Json::Value& jRec, const TableTypes& Types, int n_column, char** column_value,
                 char** column_name) {
     for (int i = 0; i < n_column; ++i) {
         int iTmp = -1;
         if (NULL == column_name[i]) {
             VORN_LOG_CONDITION("NULL == column_name[i]");
         } else {
-            iTmp = DbCallBackFillField(jRec, jType, column_name[i], column_value[i]);
+            iTmp = DbCallBackFillField(jRec, Types, column_name[i], column_value[i]);
             if (0 > iTmp) {
                 VORN_LOG_CONDITION(
                     "0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))");
@@ -77,16 +68,17 @@ int DbCallBackFillRec(Json::Value* pjRec, int n_column, char** column_value, cha
         return 0;
     }
     VORN_FAIL_IF_TEXT(NULL == column_name[0], "NULL == column_name[i]");
-    const RowTemplate* pTemplate = RowTemplate::Find(g_strCurTable, n_column, column_name);
-    const Json::Value& jType = pTemplate != nullptr ? pTemplate->Types() : CurrentMemberTypes();
-    if (pTemplate == nullptr) {
-        pTemplate = RowTemplate::Make(g_strCurTable, jType, n_column, column_name);
-    }
-    if (pTemplate != nullptr && pTemplate->Fill(column_value, *pjRec)) {
+    // Known without a definition: the operation that runs the statement has looked the table up
+    // with its own before.
+    Json::Value jNoDefinition;
+    vornjsondb::KnownTable& Table = vornjsondb::LookUpTable(jNoDefinition, g_strCurTable);
+    const RowTemplate* pTemplate = Table.TemplateFor(n_column, column_name);
+    if (pTemplate != nullptr) {
+        pTemplate->Fill(column_value, *pjRec);
         return 0;
     }
     *pjRec = Json::Value(Json::objectValue);
-    return FillColumns(*pjRec, jType, n_column, column_value, column_name);
+    return FillColumns(*pjRec, Table.Types(), n_column, column_value, column_name);
 }
 
 }  // namespace

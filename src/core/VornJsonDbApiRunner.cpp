@@ -1,6 +1,8 @@
 // Running SQL: the only caller of sqlite3_exec, and the retry while another connection holds the
 // database.
 
+#include "VornJsonDbApiRunner.h"
+
 #include <VornJsonDbApi.h>
 
 #include <unistd.h>
@@ -9,9 +11,7 @@
 #include <cstring>
 
 #include "../base/SqlText.h"
-#include "CurrentTable.h"
 #include "LogLine.h"
-#include "TableParts.h"
 
 std::string g_strCurTable;
 
@@ -20,25 +20,26 @@ namespace {
 constexpr int kMaxAttempts = 500;
 constexpr useconds_t kRetryPauseUs = 10000;
 constexpr char kLockText[] = "database is locked";
-// Spelled so since ever; hosts compare with it. Pinned by
+// The spelling is part of the text: hosts compare with it. Pinned by
 // RunnerTest.FailureWithoutATextIsAnUnknownError.
 constexpr char kNoErrorText[] = "Unknow Error!!";
 
-// SQLite reports a lock by its text; some file systems only by errno.
+// SQLite reports a lock by its text; with some file systems only errno tells. A failure without a
+// text is never a lock: it comes from a call that did not get as far as a file.
 bool IsLocked(const char* szError, int nErrno) {
-    return (szError != nullptr && std::strstr(szError, kLockText) != nullptr) || nErrno == EAGAIN;
+    return szError != nullptr && (std::strstr(szError, kLockText) != nullptr || nErrno == EAGAIN);
 }
 
 }  // namespace
 
-int vornjsondb::RunSql(const TableParts& Table, const std::string& strSql,
+int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
                        int (*callback)(void*, int, char**, char**), void* pArg) {
     SqlText szError;
     int i = 0;
     const auto Failed = [&](int nResult) {
-        Table.strSqlError = szError ? szError.get() : kNoErrorText;
+        Handle.strSqlError = szError ? szError.get() : kNoErrorText;
         VORN_LOG_PLAIN("i=%d,errno=%d, run sql failed, error=%s, sql=%s", i, errno,
-                       Table.strSqlError.c_str(), strSql.c_str());
+                       Handle.strSqlError.c_str(), strSql.c_str());
         VORN_LOG_DEBUG("run sql fail, err=%s", szError.get());
         return nResult;
     };
@@ -47,22 +48,24 @@ int vornjsondb::RunSql(const TableParts& Table, const std::string& strSql,
         VORN_LOG_CONDITION("0 >= strSql.length()");
         return Failed(-1);
     }
-    Table.strSqlError.clear();
+    Handle.strSqlError.clear();
     while (i < kMaxAttempts) {
         if (szError) {
-            Table.strSqlError = szError.get();
+            Handle.strSqlError = szError.get();
+            szError.reset();
         }
+        // Only now, so that nothing but the statement can leave an errno that decides.
         errno = 0;
-        g_strCurTable = Table.strName;
+        g_strCurTable = Handle.strName;
         char* szText = nullptr;
-        const int nStatus = sqlite3_exec(Table.pDb, strSql.c_str(), callback, pArg, &szText);
+        const int nStatus = sqlite3_exec(Handle.pDb, strSql.c_str(), callback, pArg, &szText);
         szError.reset(szText);
         if (nStatus == SQLITE_OK) {
-            const int nChanged = callback == nullptr ? sqlite3_changes(Table.pDb) : 0;
+            const int nChanged = callback == nullptr ? sqlite3_changes(Handle.pDb) : 0;
             if (nChanged < 0) {
                 return Failed(nChanged);
             }
-            Table.strSqlError.clear();
+            Handle.strSqlError.clear();
             return nChanged;
         }
         if (!IsLocked(szText, errno)) {
@@ -79,5 +82,6 @@ int vornjsondb::RunSql(const TableParts& Table, const std::string& strSql,
 // NOLINTNEXTLINE(performance-unnecessary-value-param): by value in the ABI.
 int VornJsonDbApi::runSqlEx(std::string strSql, int (*callback)(void*, int, char**, char**),
                             void* pArg) {
-    return vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSql, callback, pArg);
+    return vornjsondb::RunSql({m_pDb, m_strName, m_jTableDef, m_strSqlError}, strSql, callback,
+                              pArg);
 }

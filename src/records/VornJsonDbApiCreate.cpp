@@ -5,9 +5,9 @@
 #include "../base/JsonMemory.h"
 #include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "../schema/Defaults.h"
-#include "SaveRecord.h"
+#include "../schema/VornJsonDbApiDefaults.h"
 #include "UniqueFailure.h"
+#include "VornJsonDbApiSave.h"
 
 int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) try {
     Json::Value jCompleted;
@@ -16,8 +16,8 @@ int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) try 
     const auto Create = [&]() -> int {
         // Log readers know the record by the name jRecIn.
         VORN_FAIL_IF_TEXT(jParamIn.empty(), "jRecIn.empty()");
-        const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-        const vornjsondb::TableTypes& Types = vornjsondb::TableTypes::Of(jType);
+        const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
+        const vornjsondb::TableTypes& Types = Handle.LookUp().Types();
         // The caller's record is copied only where there is something to fill in. A value that is
         // no object is left for the type check to refuse.
         if (jParamIn.isObject() && vornjsondb::LacksDefaults(Types, jParamIn)) {
@@ -26,10 +26,7 @@ int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) try 
             pjParam = &jCompleted;
         }
         VORN_FAIL_IF_TEXT(0 > checkJsonType(*pjParam), "0 > checkJsonType(jParam)");
-        // Looked up anew, as each step does: a name that was refused is reported at each.
-        const Json::Value& jTypeOfSave = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-        VORN_FAIL_IF_TEXT(0 > vornjsondb::SaveRecord(*this, {m_pDb, m_strName, m_strSqlError},
-                                                     jTypeOfSave, *pjParam, jStored, true),
+        VORN_FAIL_IF_TEXT(0 > vornjsondb::SaveRecord(Handle, *pjParam, jStored, true),
                           "0 > recSave(jParam, true)");
         return 0;
     };

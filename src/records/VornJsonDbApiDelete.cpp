@@ -2,15 +2,13 @@
 
 #include <VornJsonDbApi.h>
 
-#include <cstring>
-
-#include "../base/JsonMember.h"
 #include "../base/JsonMemory.h"
 #include "../core/LogLine.h"
-#include "../core/TableParts.h"
-#include "../schema/MemberType.h"
+#include "../core/VornJsonDbApiRunner.h"
 
 namespace {
+
+using vornjsondb::TableTypes;
 
 // "a,b,c" for the failure line.
 std::string Joined(const std::vector<std::string>& strVector) {
@@ -27,6 +25,7 @@ std::string Joined(const std::vector<std::string>& strVector) {
 }  // namespace
 
 int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
+    const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
     std::string strSqlRun;
     const auto Delete = [&]() -> int {
         std::string strSql;
@@ -40,8 +39,7 @@ int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
             strSqlRun.append(" WHERE ").append(strSql);
         }
         strSqlRun.append(";");
-        VORN_FAIL_IF_TEXT(0 > (err = vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError},
-                                                        strSqlRun, nullptr, nullptr)),
+        VORN_FAIL_IF_TEXT(0 > (err = vornjsondb::RunSql(Handle, strSqlRun, nullptr, nullptr)),
                           "0 > (err = runSqlEx(strSqlRun))");
         // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!m_strSqlError.empty()) {
@@ -65,17 +63,16 @@ int VornJsonDbApi::recDeleteAll() {
 }
 
 int VornJsonDbApi::recDeleteByArray(std::vector<std::string>& strVector, const char* szKey) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     const auto Delete = [&]() -> int {
         Json::Value jParam(Json::objectValue);
         int err = -1;
         VORN_FAIL_IF(0 >= strVector.size());
         VORN_FAIL_IF(!szKey || !szKey[0]);
-        const Json::Value* pjDefinition = vornjsondb::FindMember(jType, szKey);
-        VORN_FAIL_IF_TEXT(pjDefinition == nullptr, "!jType.isMember(szKey)");
-        VORN_FAIL_IF_TEXT(
-            std::strcmp(vornjsondb::TypeOfMember(*pjDefinition).szName, "string") != 0,
-            "jType[szKey][\"cpptype\"].asString() != \"string\"");
+        const vornjsondb::TypedMember* pMember = Types.Find(vornjsondb::NameOf(szKey));
+        VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(szKey)");
+        VORN_FAIL_IF_TEXT(!pMember->pType->blDeleteByList,
+                          "jType[szKey][\"cpptype\"].asString() != \"string\"");
         VORN_FAIL_IF(0 > VectorParamToJson(strVector, szKey, jParam));  // GCOVR_EXCL_BR_LINE
         VORN_FAIL_IF(0 > (err = recDelete(jParam)));
         return err;
@@ -89,12 +86,12 @@ int VornJsonDbApi::recDeleteByArray(std::vector<std::string>& strVector, const c
 }
 
 int VornJsonDbApi::recDeleteByName(std::string& strValue, const char* szKey) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     const auto Delete = [&]() -> int {
         int err = -1;
         VORN_FAIL_IF(strValue.empty());
         VORN_FAIL_IF(!szKey || !szKey[0]);
-        VORN_FAIL_IF_TEXT(vornjsondb::FindMember(jType, szKey) == nullptr,
+        VORN_FAIL_IF_TEXT(Types.Find(vornjsondb::NameOf(szKey)) == nullptr,
                           "!jType.isMember(szKey)");
         std::vector<std::string> strVector{strValue};
         VORN_FAIL_IF(0 > (err = recDeleteByArray(strVector, szKey)));

@@ -4,10 +4,11 @@
 
 #include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "../core/TableParts.h"
 #include "../core/VornJsonDbApiRows.h"
+#include "../core/VornJsonDbApiRunner.h"
 
 int VornJsonDbApi::recList(Json::Value& jRecParam, Json::Value& jRecArrayOut) {
+    const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
     std::string strSqlRun;
     const auto List = [&]() -> int {
         std::string strSql;
@@ -26,9 +27,9 @@ int VornJsonDbApi::recList(Json::Value& jRecParam, Json::Value& jRecArrayOut) {
             strSqlRun.append(" WHERE ").append(strSql);
         }
         strSqlRun.append(strSqlLimit).append(";");
-        VORN_FAIL_IF_TEXT(0 > vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSqlRun,
-                                                 DbCallBackFillList, &jRecArrayOut),
-                          "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)");
+        VORN_FAIL_IF_TEXT(
+            0 > vornjsondb::RunSql(Handle, strSqlRun, DbCallBackFillList, &jRecArrayOut),
+            "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)");
         return 0;
     };
     if (0 <= List()) {

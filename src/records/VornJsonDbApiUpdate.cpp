@@ -5,11 +5,12 @@
 #include "../base/JsonText.h"
 #include "../base/SqlText.h"
 #include "../core/LogLine.h"
-#include "../core/TableParts.h"
-#include "../sql/MemberList.h"
+#include "../core/VornJsonDbApiRunner.h"
+#include "../sql/VornJsonDbApiConditions.h"
 #include "UniqueFailure.h"
 
 int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWhere) {
+    const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
     std::string strSql;
     const auto Update = [&]() -> int {
         // An empty condition would change the whole table.
@@ -17,10 +18,9 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
         VORN_FAIL_IF(jRecIn.empty());
         strSql.reserve(vornjsondb::kUsualStatement);
         strSql.append("UPDATE ").append(m_strName).append(" SET ");
-        const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
         const size_t nHead = strSql.length();
         // Raw condition text in a record must not become an assignment.
-        if (0 > vornjsondb::ExpandMemberList(*this, jType, jRecIn, strSql,
+        if (0 > vornjsondb::AppendMemberList(Handle.LookUp().Types(), jRecIn, strSql,
                                              VORN_SQL_WHERE_TYPE_COMMA,
                                              vornjsondb::RawFilter::kLeftOut)) {
             strSql.resize(nHead);  // what is logged of a failed statement is the head alone
@@ -30,9 +30,8 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
         }
         strSql.append(" WHERE ").append(strSqlWhere).append(";");
         VORN_FAIL_IF(strSql.empty());  // GCOVR_EXCL_BR_LINE: never is; kept as a guard
-        VORN_FAIL_IF_TEXT(
-            0 > vornjsondb::RunSql({m_pDb, m_strName, m_strSqlError}, strSql, nullptr, nullptr),
-            "0 > runSqlEx(strSql, NULL, NULL)");
+        VORN_FAIL_IF_TEXT(0 > vornjsondb::RunSql(Handle, strSql, nullptr, nullptr),
+                          "0 > runSqlEx(strSql, NULL, NULL)");
         // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!m_strSqlError.empty()) {
             VORN_LOG_LOCATED("sql error msg=%s, sql=%s", m_strSqlError.c_str(), strSql.c_str());

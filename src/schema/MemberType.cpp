@@ -1,12 +1,16 @@
 #include "MemberType.h"
 
+#include <charconv>
 #include <cstdlib>
 #include <cstring>
+#include <iterator>
+#include <stdexcept>
 
 #include <sqlite3.h>
 
 #include "../base/JsonMember.h"
 #include "../base/JsonText.h"
+#include "../base/SqlText.h"
 
 namespace vornjsondb {
 
@@ -55,19 +59,26 @@ void ReadBool(const char* szText, Json::Value& jOut) {
 
 // ---- value into a value list ----
 
-char* FormatText(const char* szFormat, const Json::Value& jValue) {
-    if (!jValue.isString()) {
-        return sqlite3_mprintf(szFormat, jValue.asString().c_str());
+// In single quotes, each quote in it doubled, as "%Q" writes it.
+void AppendQuoted(const char* szText, std::string& strOut) {
+    strOut += '\'';
+    while (const char* pQuote = std::strchr(szText, '\'')) {
+        strOut.append(szText, pQuote + 1) += '\'';
+        szText = pQuote + 1;
     }
-    // Handed over in place: it may be long. "%Q" goes through a text byte by byte to double its
-    // quotes; without any, "'%s'" gives the same at a fraction of the cost.
-    const char* szText = jValue.asCString();
-    const bool blPlain = std::strcmp(szFormat, "%Q") == 0 && std::strchr(szText, '\'') == nullptr;
-    return sqlite3_mprintf(blPlain ? "'%s'" : szFormat, szText);
+    strOut.append(szText) += '\'';
 }
 
-char* FormatJson(const char* szFormat, const Json::Value& jValue) {
-    return sqlite3_mprintf(szFormat, ToString(jValue).c_str());
+void AppendText(const Json::Value& jValue, std::string& strOut) {
+    if (jValue.isString()) {
+        AppendQuoted(jValue.asCString(), strOut);  // in place: it may be long
+    } else {
+        AppendQuoted(jValue.asString().c_str(), strOut);
+    }
+}
+
+void AppendJson(const Json::Value& jValue, std::string& strOut) {
+    AppendQuoted(ToString(jValue).c_str(), strOut);
 }
 
 // JsonCpp takes the first number beyond a range for the last one in it, which would change sign.
@@ -77,22 +88,36 @@ void RefuseFrom(double dFirstBeyond, const Json::Value& jValue) {
     }
 }
 
-char* FormatSigned(const char* szFormat, const Json::Value& jValue) {
+template <typename Number>
+void AppendDigits(Number nValue, std::string& strOut) {
+    char szDigits[24];
+    strOut.append(szDigits, std::to_chars(szDigits, std::end(szDigits), nValue).ptr);
+}
+
+void AppendSigned(const Json::Value& jValue, std::string& strOut) {
     RefuseFrom(9223372036854775808.0, jValue);
-    return sqlite3_mprintf(szFormat, static_cast<sqlite3_int64>(jValue.asInt64()));
+    AppendDigits(jValue.asInt64(), strOut);
 }
 
-char* FormatUnsigned(const char* szFormat, const Json::Value& jValue) {
+void AppendUnsigned(const Json::Value& jValue, std::string& strOut) {
     RefuseFrom(18446744073709551616.0, jValue);
-    return sqlite3_mprintf(szFormat, static_cast<sqlite3_uint64>(jValue.asUInt64()));
+    AppendDigits(jValue.asUInt64(), strOut);
 }
 
-char* FormatFloat(const char* szFormat, const Json::Value& jValue) {
-    return sqlite3_mprintf(szFormat, static_cast<double>(jValue.asFloat()));
+void AppendReal(double dValue, std::string& strOut) {
+    const SqlText szText(sqlite3_mprintf("%f", dValue));
+    if (!szText) {
+        throw std::logic_error("vornjsondb: the SQL formatter gave no text");
+    }
+    strOut += szText.get();
 }
 
-char* FormatDouble(const char* szFormat, const Json::Value& jValue) {
-    return sqlite3_mprintf(szFormat, jValue.asDouble());
+void AppendFloat(const Json::Value& jValue, std::string& strOut) {
+    AppendReal(static_cast<double>(jValue.asFloat()), strOut);
+}
+
+void AppendDouble(const Json::Value& jValue, std::string& strOut) {
+    AppendReal(jValue.asDouble(), strOut);
 }
 
 // ---- whether a value fits ----
@@ -110,25 +135,25 @@ constexpr ConditionForm kBare = ConditionForm::kBareText;
 
 // clang-format off
 constexpr MemberType kMemberTypes[] = {
-    {"string",             ReadText,   Fits<&Value::isString>,   "%Q",    FormatText,     kText},
-    {"int",                ReadInt,    Fits<&Value::isIntegral>, "%lld",  FormatSigned,   kBare},
-    {"long long",          ReadInt64,  Fits<&Value::isIntegral>, "%lld",  FormatSigned,   kBare},
-    {"bool",               ReadBool,   Fits<&Value::isBool>,     "%lld",  FormatSigned,   kFlag},
-    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   "%Q",    FormatJson,     kJson},
-    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    "%Q",    FormatJson,     kJson},
-    {"Json::Value",        FromString, nullptr,                  nullptr, nullptr,        kJson},
-    {"unsigned int",       ReadInt,    nullptr,                  "%llu",  FormatUnsigned, kBare},
-    {"unsigned long long", ReadInt64,  nullptr,                  "%llu",  FormatUnsigned, kBare},
-    {"long",               nullptr,    nullptr,                  "%lld",  FormatSigned,   kBare},
-    {"unsigned long",      nullptr,    nullptr,                  "%llu",  FormatUnsigned, kBare},
-    {"unsigned",           nullptr,    nullptr,                  "%llu",  FormatUnsigned, kBare},
-    {"double",             nullptr,    nullptr,                  "%lf",   FormatDouble,   kBare},
-    {"float",              nullptr,    nullptr,                  "%f",    FormatFloat,    kBare},
-    {"uid_t",              nullptr,    Fits<&Value::isIntegral>, nullptr, nullptr,        kBare},
-    {"time_t",             nullptr,    Fits<&Value::isIntegral>, nullptr, nullptr,        kBare},
+    {"string",             ReadText,   Fits<&Value::isString>,   AppendText,     "%Q",    kText, true},
+    {"int",                ReadInt,    Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false},
+    {"long long",          ReadInt64,  Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false},
+    {"bool",               ReadBool,   Fits<&Value::isBool>,     AppendSigned,   "%lld",  kFlag, false},
+    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   AppendJson,     "%Q",    kJson, false},
+    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    AppendJson,     "%Q",    kJson, false},
+    {"Json::Value",        FromString, nullptr,                  nullptr,        nullptr, kJson, false},
+    {"unsigned int",       ReadInt,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
+    {"unsigned long long", ReadInt64,  nullptr,                  AppendUnsigned, "%llu",  kBare, false},
+    {"long",               nullptr,    nullptr,                  AppendSigned,   "%lld",  kBare, false},
+    {"unsigned long",      nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
+    {"unsigned",           nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
+    {"double",             nullptr,    nullptr,                  AppendDouble,   "%lf",   kBare, false},
+    {"float",              nullptr,    nullptr,                  AppendFloat,    "%f",    kBare, false},
+    {"uid_t",              nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false},
+    {"time_t",             nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false},
 };
 constexpr MemberType kUnknownType =
-    {"",                   nullptr,    nullptr,                  nullptr, nullptr,        kBare};
+    {"",                   nullptr,    nullptr,                  nullptr,        nullptr, kBare, false};
 // clang-format on
 
 // The "cpptype" text of a member's entry; empty when there is none.
@@ -159,18 +184,6 @@ const MemberType& TypeOfMember(const Json::Value& jDefinition) {
 
 const char* TypeName(const Json::Value& jDefinition) {
     return TypeText(jDefinition).pBegin;
-}
-
-bool ReadColumn(const MemberType& Type, const char* szText, Json::Value& jOut) {
-    if (Type.pfnRead == nullptr) {
-        return false;
-    }
-    try {
-        Type.pfnRead(szText, jOut);
-    } catch (const Json::Exception&) {
-        return false;
-    }
-    return true;
 }
 
 }  // namespace vornjsondb

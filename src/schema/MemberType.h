@@ -3,6 +3,8 @@
 #ifndef VORN_SCHEMA_MEMBER_TYPE_H
 #define VORN_SCHEMA_MEMBER_TYPE_H
 
+#include <string>
+
 #include <json/json.h>
 
 namespace vornjsondb {
@@ -26,14 +28,16 @@ struct MemberType {
     // Whether a record's value fits; nullptr: the record check refuses every value.
     bool (*pfnFits)(const Json::Value& jValue);
 
-    // Formatting for a value list; nullptr: cannot be stored. pfnFormat hands szFormat, which
-    // holds szSpecifier as its one conversion that takes an argument, and the value to
-    // sqlite3_mprintf and returns its result, which the caller frees. Throws Json::Exception for
-    // a value that cannot be converted.
+    // Appends a value to a value list, as SQLite's formatter writes it for szSpecifier; nullptr:
+    // cannot be stored. Throws Json::Exception for a value that cannot be converted, and
+    // std::logic_error when the formatter itself, which writes fractions, gives no text.
+    void (*pfnAppend)(const Json::Value& jValue, std::string& strOut);
     const char* szSpecifier;
-    char* (*pfnFormat)(const char* szFormat, const Json::Value& jValue);
 
     ConditionForm eCondition;
+
+    // Whether records may be deleted by a list of values of such a member.
+    bool blDeleteByList;
 };
 
 // The row of that name; for an unknown name a row that refuses all but bare conditions.
@@ -44,10 +48,6 @@ const MemberType& TypeOfMember(const Json::Value& jDefinition);
 
 // The "cpptype" text of a member's entry, for messages.
 const char* TypeName(const Json::Value& jDefinition);
-
-// Reads a column text as Type says; false when the type cannot be read or the text is nested
-// deeper than the JSON reader goes.
-bool ReadColumn(const MemberType& Type, const char* szText, Json::Value& jOut);
 
 }  // namespace vornjsondb
 

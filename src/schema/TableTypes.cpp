@@ -1,29 +1,18 @@
 #include "TableTypes.h"
 
 #include <algorithm>
-#include <map>
-#include <utility>
 
 namespace vornjsondb {
 
-const TableTypes& TableTypes::Of(const Json::Value& jType) {
-    static const TableTypes& s_None = *new TableTypes;
-    static std::map<const Json::Value*, TableTypes>& s_mapTypes =
-        *new std::map<const Json::Value*, TableTypes>;
-    const auto itKnown = s_mapTypes.find(&jType);
-    if (itKnown != s_mapTypes.end()) {
-        return itKnown->second;
+TableTypes::TableTypes(const Json::Value& jTypes) : m_jTypes(jTypes) {
+    if (!m_jTypes.isObject()) {
+        return;
     }
-    if (!jType.isObject()) {
-        return s_None;
+    m_vecMembers.reserve(m_jTypes.size());
+    for (Json::Value::const_iterator it = m_jTypes.begin(); it != m_jTypes.end(); ++it) {
+        m_vecMembers.push_back(TypedMember{NameOf(it), &TypeOfMember(*it), TypeName(*it),
+                                           FindMember(*it, "cppDefaultValue")});
     }
-    TableTypes Types;
-    Types.m_vecMembers.reserve(jType.size());
-    for (Json::Value::const_iterator it = jType.begin(); it != jType.end(); ++it) {
-        Types.m_vecMembers.push_back(TypedMember{NameOf(it), &TypeOfMember(*it), TypeName(*it),
-                                                 FindMember(*it, "cppDefaultValue")});
-    }
-    return s_mapTypes.emplace(&jType, std::move(Types)).first->second;
 }
 
 const TypedMember* TableTypes::Find(const MemberName& Name) const {

@@ -21,15 +21,17 @@ struct TypedMember {
 // A table's members in key order.
 class TableTypes {
   public:
-    // Of what recType returned, kept for the calls to come: an entry that is an object never
-    // changes again. Empty for anything else.
-    static const TableTypes& Of(const Json::Value& jType);
+    // Of what recType returned; works on a copy. None for a value that is no object.
+    explicit TableTypes(const Json::Value& jTypes);
+    TableTypes(const TableTypes&) = delete;
+    TableTypes& operator=(const TableTypes&) = delete;
 
     const std::vector<TypedMember>& Members() const { return m_vecMembers; }
 
     const TypedMember* Find(const MemberName& Name) const;
 
   private:
+    const Json::Value m_jTypes;  // the members point into it
     std::vector<TypedMember> m_vecMembers;
 };
 

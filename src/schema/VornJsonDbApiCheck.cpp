@@ -4,12 +4,11 @@
 
 #include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "TableTypes.h"
+#include "KnownTables.h"
 
 int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
+    vornjsondb::TypeCursor Types(vornjsondb::LookUpTable(m_jTableDef, m_strName).Types());
     VORN_FAIL_IF_TEXT(!jParam.isObject(), "!jRecParam.isObject()");
-    vornjsondb::TypeCursor Types(vornjsondb::TableTypes::Of(jType));
     const Json::Value::const_iterator itEnd = jParam.end();
     for (Json::Value::const_iterator it = jParam.begin(); it != itEnd; ++it) {
         const vornjsondb::MemberName Key = vornjsondb::NameOf(it);

@@ -1,11 +1,13 @@
 // Members that a record lacks.
 
+#include "VornJsonDbApiDefaults.h"
+
 #include <VornJsonDbApi.h>
 
 #include "../base/JsonMemory.h"
 #include "../base/JsonText.h"
 #include "../core/LogLine.h"
-#include "Defaults.h"
+#include "KnownTables.h"
 
 namespace vornjsondb {
 
@@ -31,8 +33,7 @@ void FillDefaults(const TableTypes& Types, Json::Value& jRec) {
 }  // namespace vornjsondb
 
 int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-    const vornjsondb::TableTypes& Types = vornjsondb::TableTypes::Of(jType);
+    const vornjsondb::TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     if (!blStrict) {
         // A value of another kind is left for the type check to refuse.
         if (jParam.isObject() || jParam.isNull()) {

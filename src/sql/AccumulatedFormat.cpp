@@ -1,23 +1,10 @@
 #include "AccumulatedFormat.h"
 
 #include <cstring>
-#include <stdexcept>
 
 #include "../base/SqlText.h"
 
 namespace vornjsondb {
-
-namespace {
-
-SqlText FormatOrThrow(const MemberType& Type, const char* szFormat, const Json::Value& jValue) {
-    SqlText szText(Type.pfnFormat(szFormat, jValue));
-    if (!szText) {
-        throw std::logic_error("vornjsondb: the SQL formatter gave no text");
-    }
-    return szText;
-}
-
-}  // namespace
 
 AccumulatedFormat::AccumulatedFormat(const std::string& strText)
     : m_blLiteral(strText.find('%') == std::string::npos &&
@@ -47,15 +34,31 @@ void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue
         FormatAgain(Type, jValue);
         return;
     }
-    const SqlText szText = FormatOrThrow(Type, Type.szSpecifier, jValue);
-    const size_t nLength = std::strlen(szText.get());
-    m_strText.append(szText.get(), nLength);
-    m_blLiteral = std::memchr(szText.get(), '%', nLength) == nullptr;
+    const size_t nBefore = m_strText.length();
+    Type.pfnAppend(jValue, m_strText);
+    m_blLiteral = m_strText.find('%', nBefore) == std::string::npos;
 }
 
+// What the formatter makes of the text and the specifier behind it: the text ends at a NUL, "%%" is
+// a percent sign, and the first other conversion is the value's own. There may be none left: the
+// value is then lost, as it is there.
 void AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& jValue) {
+    std::string strValue;
+    Type.pfnAppend(jValue, strValue);
     const std::string strFormat = m_strText + Type.szSpecifier;
-    m_strText = FormatOrThrow(Type, strFormat.c_str(), jValue).get();
+    const char* pNext = strFormat.c_str();
+    m_strText.clear();
+    while (const char* pSign = std::strchr(pNext, '%')) {
+        m_strText.append(pNext, pSign);
+        if (pSign[1] != '%' && pSign[1] != '\0') {
+            m_strText += strValue;
+            pNext = "";
+            break;
+        }
+        m_strText += '%';
+        pNext = pSign + (pSign[1] == '%' ? 2 : 1);
+    }
+    m_strText += pNext;
     m_blLiteral = m_strText.find('%') == std::string::npos;
 }
 

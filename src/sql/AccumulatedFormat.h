@@ -5,8 +5,8 @@
 // value. Any other conversion in that text would take an argument that nobody passed, or make the
 // formatter stop and cut the statement, so that the next value would stand outside its quotes; it
 // is refused before it is formatted.
-// Text without a percent sign does not change by being formatted: then the new value alone is
-// formatted and appended, which keeps the work linear.
+// Text without a percent sign does not change by being formatted: then the new value is only
+// appended, which keeps the work linear.
 
 #ifndef VORN_SQL_ACCUMULATED_FORMAT_H
 #define VORN_SQL_ACCUMULATED_FORMAT_H
@@ -28,8 +28,7 @@ class AccumulatedFormat {
     bool HoldsConversion() const;
 
     // Formats the text so far, which holds no conversion, together with one value of a type that
-    // can be stored. Throws Json::Exception for a value that cannot be converted,
-    // std::logic_error when the formatter gives no text; the text is then as it was.
+    // can be stored. Throws what the type's pfnAppend throws; the text is of no use then.
     void Format(const MemberType& Type, const Json::Value& jValue);
 
     // Appends text that later values format too; it holds no percent sign.

@@ -1,5 +1,7 @@
 // Conditions and assignments: one member, and whole query objects.
 
+#include "VornJsonDbApiConditions.h"
+
 #include <VornJsonDbApi.h>
 
 #include <cstring>
@@ -7,8 +9,7 @@
 #include "../base/JsonText.h"
 #include "../base/SqlText.h"
 #include "../core/LogLine.h"
-#include "../schema/TableTypes.h"
-#include "MemberList.h"
+#include "../schema/KnownTables.h"
 
 namespace {
 
@@ -85,13 +86,14 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
     const ConditionForm eElement =
         eForm == ConditionForm::kBoolean ? ConditionForm::kBareText : eForm;
     std::string strList;
-    for (const Json::Value& jElement : jList) {
-        const SqlText szSql = EscapedValue(eElement, jElement);
+    // By index: an array need not store all of its elements, and a missing one is a null.
+    for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
+        const SqlText szSql = EscapedValue(eElement, jList[i]);
         VORN_FAIL_IF_TEXT(!szSql && eElement == ConditionForm::kQuotedJson,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].toString().c_str()))");
         VORN_FAIL_IF_TEXT(!szSql,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
-        if (strList.empty()) {
+        if (i == 0) {
             strList.append(Member.Name.pBegin, Member.Name.pEnd).append(" in (");
         }
         const char* szQuote = IsQuoted(eElement) ? "'" : "";
@@ -103,12 +105,22 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
     return 0;
 }
 
+// The same of the member szField, for any value.
+int AppendListOf(const TableTypes& Types, const char* szField, const Json::Value& jList,
+                 std::string& strSqlOut) {
+    VORN_FAIL_IF(!szField || !szField[0]);
+    const TypedMember* pMember = Types.Find(vornjsondb::NameOf(szField));
+    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(szField)");
+    VORN_FAIL_IF(jList.type() != Json::arrayValue);
+    return AppendList(*pMember, jList, strSqlOut);
+}
+
 // A member's condition: by its value or by a list of values.
-int AppendMember(VornJsonDbApi& Handle, const TypedMember& Member, Json::Value& jValue,
+int AppendMember(const TableTypes& Types, const TypedMember& Member, const Json::Value& jValue,
                  std::string& strSqlOut) {
     if (jValue.isArray()) {
-        // Through the public call, which ends the name at a NUL.
-        VORN_FAIL_IF_TEXT(0 > Handle.SqlMakeByListField(Member.Name.pBegin, jValue, strSqlOut),
+        // By name: for a list the name ends at its first NUL.
+        VORN_FAIL_IF_TEXT(0 > AppendListOf(Types, Member.Name.pBegin, jValue, strSqlOut),
                           "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)");
         return 0;
     }
@@ -128,27 +140,8 @@ constexpr int kJoinModeCount = sizeof(kJoinModes) / sizeof(kJoinModes[0]);
 
 }  // namespace
 
-int VornJsonDbApi::SqlMakeByMatchField(std::string& strField, Json::Value& jParam,
-                                       std::string& strSqlOut) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-    const TypedMember* pMember = TableTypes::Of(jType).Find(vornjsondb::NameOf(strField));
-    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strField)");
-    return AppendMatch(*pMember, jParam, strSqlOut);
-}
-
-int VornJsonDbApi::SqlMakeByListField(const char* szField, Json::Value& jList,
-                                      std::string& strSqlOut) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-    VORN_FAIL_IF(!szField || !szField[0]);
-    const TypedMember* pMember = TableTypes::Of(jType).Find(vornjsondb::NameOf(szField));
-    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(szField)");
-    VORN_FAIL_IF(jList.type() != Json::arrayValue);
-    return AppendList(*pMember, jList, strSqlOut);
-}
-
-int vornjsondb::ExpandMemberList(VornJsonDbApi& Handle, const Json::Value& jType,
-                                 Json::Value& jRecParam, std::string& strSqlOut, int andType,
-                                 RawFilter eFilter) {
+int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam,
+                                 std::string& strSqlOut, int andType, RawFilter eFilter) {
     VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
     if (andType < 0 || andType >= kJoinModeCount) {
         VORN_LOG_LOCATED("error andType=%d", andType);
@@ -156,12 +149,12 @@ int vornjsondb::ExpandMemberList(VornJsonDbApi& Handle, const Json::Value& jType
     }
     const JoinMode& Mode = kJoinModes[andType];
     bool blWritten = false;
-    vornjsondb::TypeCursor Types(TableTypes::Of(jType));
-    const Json::Value::iterator itEnd = jRecParam.end();
-    for (Json::Value::iterator it = jRecParam.begin(); it != itEnd; ++it) {
-        const MemberName Name = vornjsondb::NameOf(it);
+    TypeCursor NextType(Types);
+    const Json::Value::const_iterator itEnd = jRecParam.end();
+    for (Json::Value::const_iterator it = jRecParam.begin(); it != itEnd; ++it) {
+        const MemberName Name = NameOf(it);
         const bool blFilter = Name.Is(kFilterKey);
-        const TypedMember* pMember = Types.Find(Name);
+        const TypedMember* pMember = NextType.Find(Name);
         if (blFilter ? eFilter == RawFilter::kLeftOut : pMember == nullptr) {
             continue;
         }
@@ -172,7 +165,7 @@ int vornjsondb::ExpandMemberList(VornJsonDbApi& Handle, const Json::Value& jType
         if (blFilter) {
             VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
             strSqlOut.append(" ").append(it->asString()).append(" ");
-        } else if (0 > AppendMember(Handle, *pMember, *it, strSqlOut)) {
+        } else if (0 > AppendMember(Types, *pMember, *it, strSqlOut)) {
             return -1;
         }
         blWritten = true;
@@ -186,9 +179,23 @@ int vornjsondb::ExpandMemberList(VornJsonDbApi& Handle, const Json::Value& jType
     return 0;
 }
 
+int VornJsonDbApi::SqlMakeByMatchField(std::string& strField, Json::Value& jParam,
+                                       std::string& strSqlOut) {
+    const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
+    const TypedMember* pMember = Types.Find(vornjsondb::NameOf(strField));
+    VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strField)");
+    return AppendMatch(*pMember, jParam, strSqlOut);
+}
+
+int VornJsonDbApi::SqlMakeByListField(const char* szField, Json::Value& jList,
+                                      std::string& strSqlOut) {
+    const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
+    return AppendListOf(Types, szField, jList, strSqlOut);
+}
+
 int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strSqlWhereOut,
                                        int andType) {
-    const Json::Value& jType = VORN_JSON_DB::recType(m_jTableDef, m_strName);
-    return vornjsondb::ExpandMemberList(*this, jType, jRecParam, strSqlWhereOut, andType,
+    const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
+    return vornjsondb::AppendMemberList(Types, jRecParam, strSqlWhereOut, andType,
                                         vornjsondb::RawFilter::kWritten);
 }

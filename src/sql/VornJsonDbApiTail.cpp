@@ -9,15 +9,9 @@
 #include "../base/SqlText.h"
 #include "../core/LogLine.h"
 
-namespace {
-
-using vornjsondb::FindMember;
-
-}  // namespace
-
 int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string& strSqlOut) {
     VORN_FAIL_IF(jFilter.type() != Json::objectValue && jFilter.type() != Json::nullValue);
-    if (const Json::Value* pjSortBy = FindMember(jFilter, "sort_by")) {
+    if (const Json::Value* pjSortBy = vornjsondb::FindMember(jFilter, "sort_by")) {
         // In single quotes SQLite sorts by a constant. The order that hosts see is that of the
         // table, and it stays so. Pinned by
         // List.SortTermIsAConstantSoTheDirectionDoesNotOrderTheRows.
@@ -26,18 +20,18 @@ int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string&
                                  : nullptr);
         VORN_FAIL_IF(!szSql);
         strSqlOut += szSql.get();
-        if (const Json::Value* pjDirection = FindMember(jFilter, "sort_direction")) {
+        if (const Json::Value* pjDirection = vornjsondb::FindMember(jFilter, "sort_direction")) {
             vornjsondb::MemberName Direction = {};
             const bool blText = pjDirection->getString(&Direction.pBegin, &Direction.pEnd);
             strSqlOut.append(blText && Direction.Is("desc") ? " DESC" : " ASC");
         }
     }
-    const Json::Value* pjLimit = FindMember(jFilter, "limit");
+    const Json::Value* pjLimit = vornjsondb::FindMember(jFilter, "limit");
     if (pjLimit == nullptr) {
         return 0;
     }
     strSqlOut.append(" LIMIT ").append(vornjsondb::ToString(*pjLimit));
-    if (const Json::Value* pjOffset = FindMember(jFilter, "offset")) {
+    if (const Json::Value* pjOffset = vornjsondb::FindMember(jFilter, "offset")) {
         strSqlOut.append(" OFFSET ").append(vornjsondb::ToString(*pjOffset));
     }
     return 0;

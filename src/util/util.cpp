@@ -1,4 +1,4 @@
-// The free functions: member types with their cache, member copy, time text.
+// The free functions: member types of a table, member copy, time text.
 
 #include <VornJsonDbApi.h>
 
@@ -9,10 +9,13 @@
 #include "../base/JsonMemory.h"
 #include "../base/JsonText.h"
 #include "../core/LogLine.h"
+#include "../schema/KnownTables.h"
 
 namespace {
 
 using vornjsondb::FindMember;
+using vornjsondb::KnownTable;
+using vornjsondb::KnownTables;
 
 // Copies what the lookup keeps of each member definition into jEntry. On failure jEntry holds the
 // members before the faulty one.
@@ -32,10 +35,11 @@ int CopyMemberTypes(const Json::Value& jMember, Json::Value& jEntry) {
     return 0;
 }
 
-// Adds the table's entry to the cache jType. Built aside and moved in: running out of memory half
-// way must not leave a part of the members for good. A faulty definition does leave that part;
-// hosts run on it. Pinned by RecTypeTest.FaultyMemberLeavesTheEarlierOnesAsTheWholeEntry.
-int AddToCache(Json::Value& jType, Json::Value& jTableDef, std::string& strJsonName) {
+// Makes the table known with the types of its definition. Built aside and moved in: running out of
+// memory half way must not leave a part of the members for good. A faulty definition does leave
+// that part; hosts run on it.
+// Pinned by RecTypeTest.FaultyMemberLeavesTheEarlierOnesAsTheWholeEntry.
+int Learn(KnownTables& Tables, Json::Value& jTableDef, std::string& strJsonName) {
     VORN_FAIL_IF(jTableDef.empty());
     const Json::Value* pjTable = FindMember(jTableDef, strJsonName);
     VORN_FAIL_IF_TEXT(pjTable == nullptr, "!jTableDef.isMember(strJsonName)");
@@ -48,55 +52,36 @@ int AddToCache(Json::Value& jType, Json::Value& jTableDef, std::string& strJsonN
     Json::Value jEntry;
     const int nResult = CopyMemberTypes(*pjMember, jEntry);
     if (!jEntry.isNull()) {
-        jType[strJsonName] = std::move(jEntry);
+        Tables.FindOrAdd(strJsonName).jTypes = std::move(jEntry);
     }
     if (0 > nResult) {
         return -1;
     }
-    VORN_FAIL_IF_TEXT(FindMember(jType, strJsonName) == nullptr,
+    VORN_FAIL_IF_TEXT(Tables.Find(strJsonName) == nullptr,
                       "jType == Json::nullValue || !jType.isMember(strJsonName)");
     return 0;
 }
 
-int CheckCached(const Json::Value& jEntry) {
-    VORN_FAIL_IF_TEXT(jEntry.type() != Json::objectValue,
+int CheckKnown(const KnownTable& Known) {
+    VORN_FAIL_IF_TEXT(Known.jTypes.type() != Json::objectValue,
                       "jType[strJsonName].type() != Json::objectValue");
     return 0;
 }
 
-// Each operation asks several times for the same table.
-struct LastFound {
-    std::string strName;
-    Json::Value* pjEntry = nullptr;
-};
-
 }  // namespace
 
 Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) try {
-    // Never freed: a host's own statics may use the library when this one's would be gone.
-    static Json::Value& jType = *new Json::Value;
-    static LastFound& Last = *new LastFound;
-    if (Last.pjEntry != nullptr && Last.strName == strJsonName && Last.pjEntry->isObject()) {
-        return *Last.pjEntry;
+    KnownTables& Tables = KnownTables::OfProcess();
+    const KnownTable* pKnown = Tables.Find(strJsonName);
+    if (0 > (pKnown != nullptr ? CheckKnown(*pKnown) : Learn(Tables, jTableDef, strJsonName))) {
+        VORN_LOG_PLAIN("strJsonName=%s", strJsonName.c_str());
+        VORN_LOG_PLAIN("jTableDef=%s", vornjsondb::ToString(jTableDef).c_str());
+        VORN_LOG_PLAIN("jType=%s", vornjsondb::ToString(Tables.AllTypes()).c_str());
     }
-    if (const Json::Value* pjEntry = FindMember(jType, strJsonName)) {
-        if (0 <= CheckCached(*pjEntry)) {
-            // Found in a value that is not const.
-            Last.pjEntry = nullptr;
-            Last.strName = strJsonName;
-            Last.pjEntry = const_cast<Json::Value*>(pjEntry);
-            return *Last.pjEntry;
-        }
-    } else if (0 <= AddToCache(jType, jTableDef, strJsonName)) {
-        return jType[strJsonName];
-    }
-    VORN_LOG_PLAIN("strJsonName=%s", strJsonName.c_str());
-    VORN_LOG_PLAIN("jTableDef=%s", vornjsondb::ToString(jTableDef).c_str());
-    VORN_LOG_PLAIN("jType=%s", vornjsondb::ToString(jType).c_str());
-    // Makes a null entry where there is none, so that the name stays refused: a host that got its
+    // A refused name becomes known without types, so that it stays refused: a host that got its
     // first definition wrong sees the same failure for as long as it runs.
     // Pinned by RecTypeTest.EmptyDefinitionIsRefused.
-    return jType[strJsonName];
+    return Tables.FindOrAdd(strJsonName).jTypes;
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 

@@ -70,7 +70,7 @@ const char* const kPlainTexts[] = {
 TEST(PlainJson, PlainTextsReadAsJsonCppReadsThem) {
     for (const char* szText : kPlainTexts) {
         Json::Value jRead;
-        ASSERT_TRUE(vornjsondb::ReadPlainJson(szText, jRead)) << szText;
+        ASSERT_TRUE(vornjsondb::ReadPlainJson(szText, std::strlen(szText), jRead)) << szText;
         const Json::Value jExpected = ParsedByJsonCpp(szText);
         EXPECT_EQ(jRead, jExpected) << szText;
         EXPECT_EQ(KindsOf(jRead), KindsOf(jExpected)) << szText;
@@ -144,7 +144,7 @@ TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
     };
     for (const char* szText : szOthers) {
         Json::Value jRead;
-        EXPECT_FALSE(vornjsondb::ReadPlainJson(szText, jRead)) << szText;
+        EXPECT_FALSE(vornjsondb::ReadPlainJson(szText, std::strlen(szText), jRead)) << szText;
     }
 }
 

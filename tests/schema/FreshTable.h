@@ -82,7 +82,9 @@ class FreshTableTest : public DbTest {
 // While it lives, SQLite finds no memory for a text of more than about 64 KiB.
 class ScarceMemory {
   public:
-    ScarceMemory() { sqlite3_hard_heap_limit64(sqlite3_memory_used() + 64 * 1024); }
+    explicit ScarceMemory(int nLeft = 64 * 1024) {
+        sqlite3_hard_heap_limit64(sqlite3_memory_used() + nLeft);
+    }
     ~ScarceMemory() {
         sqlite3_hard_heap_limit64(0);
         sqlite3_soft_heap_limit64(0);

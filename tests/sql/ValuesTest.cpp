@@ -317,13 +317,13 @@ TEST_F(Values, FiveHundredAndTwelveMembers) {
 }
 
 TEST_F(Values, FormatterWithoutMemoryRaisesLogicErrorAndKeepsTheText) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+    VornJsonDbApi& api = Open({{"a", "string"}, {"b", "double"}});
     Json::Value jRec(Json::objectValue);
-    jRec["a"] = 1;
-    jRec["b"] = LongText();
+    jRec["a"] = LongText();
+    jRec["b"] = 1e300;
     std::string strSql = "(";
     {
-        ScarceMemory scarce;
+        ScarceMemory scarce(1);
         try {
             api.SqlExpandMemberSymbol(strSql, jRec);
             ADD_FAILURE() << "no exception";
@@ -333,7 +333,7 @@ TEST_F(Values, FormatterWithoutMemoryRaisesLogicErrorAndKeepsTheText) {
     }
     EXPECT_EQ("(", strSql);
     EXPECT_EQ(Lines{}, TakeLog());
-    EXPECT_EQ("(1,'x') ", Rendered(api, ParseJson(R"({"a":1,"b":"x"})")));
+    EXPECT_EQ("('x',1.500000) ", Rendered(api, ParseJson(R"({"a":"x","b":1.5})")));
 }
 
 }  // namespace testhost

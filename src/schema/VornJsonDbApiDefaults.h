@@ -1,5 +1,5 @@
-#ifndef VORN_SCHEMA_DEFAULTS_H
-#define VORN_SCHEMA_DEFAULTS_H
+#ifndef VORN_SCHEMA_VORN_JSON_DB_API_DEFAULTS_H
+#define VORN_SCHEMA_VORN_JSON_DB_API_DEFAULTS_H
 
 #include <json/json.h>
 
@@ -15,4 +15,4 @@ void FillDefaults(const TableTypes& Types, Json::Value& jRec);
 
 }  // namespace vornjsondb
 
-#endif  // VORN_SCHEMA_DEFAULTS_H
+#endif  // VORN_SCHEMA_VORN_JSON_DB_API_DEFAULTS_H
