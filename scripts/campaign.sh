@@ -1,23 +1,63 @@
-# Sourced by scripts/campaign-*.sh.
-# shellcheck shell=bash
-
+#!/usr/bin/env bash
+# Runs one campaign: a program that makes one kind of thing go wrong again and again.
+#
+#    scripts/campaign.sh memory|io|crash|locks|model [--long] [--record] [--seed N] [OPTION...]
+#
+# memory  each allocation of each operation fails in turn, under AddressSanitizer and LeakSanitizer;
+#         --long also without them, every allocation. --scale N takes fewer.
+# io      calls of the file system fail, are cut short or interrupted. --scale N takes fewer.
+# crash   a writing process is killed. --count KILLS
+# locks   locks at a known attempt, signals, a caller's busy handler, eight processes on one file.
+#         --count SECONDS
+# model   random sequences of all operations beside a model of the library. --count SEQUENCES;
+#         "sequence S" in the output runs alone with --seed S --count 1.
+#
+# --record puts the figures into docs/reliability.md.
+set -euo pipefail
+cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
 
-# run_campaign NAME [--asan] [OPTION...] builds one campaign and runs it with these options. The
-# folders are those of scripts/test.sh.
-run_campaign() {
-    local name=$1 folder="test"
-    local -a options=(-DCMAKE_BUILD_TYPE=Release)
+name=${1:-}
+if [[ ! -e tests/campaigns/${name^}Campaign.cpp ]]; then
+    sed -n '2,/^set/{/^#/p}' "$0" >&2
+    exit 2
+fi
+shift
+options=()
+long=""
+record=""
+for option; do
+    case $option in
+        --record) record=yes ;;
+        --long) long=yes && options+=(--long) ;;
+        *) options+=("$option") ;;
+    esac
+done
+
+# run FOLDER CMAKE-OPTION... builds the campaign in one of the folders of scripts/test.sh, and runs it.
+run() {
+    local folder=$1
     shift
-    if [[ ${1:-} == --asan ]]; then
-        shift
-        folder=asan
-        options=(-DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON)
-    fi
-    need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
-    configure "$folder" "${options[@]}" -DBUILD_TESTING=ON -DVORNJSONDB_WERROR=ON
-    build "$folder" "vornjsondb_campaign_$name" >"build/$folder/campaign.log" 2>&1 ||
-        { cat "build/$folder/campaign.log" >&2 && return 1; }
-    UBSAN_OPTIONS=print_stacktrace=1 "build/$folder/tests/campaigns/vornjsondb_campaign_$name" "$@"
+    configure "$folder" "$@" -DBUILD_TESTING=ON
+    build_quietly "$folder" "vornjsondb_campaign_$name"
+    UBSAN_OPTIONS=print_stacktrace=1 \
+        "build/$folder/tests/campaigns/vornjsondb_campaign_$name" "${options[@]}" | tee build/campaign.txt
 }
+
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
+if [[ $name == memory ]]; then
+    run asan -DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON
+fi
+if [[ $name != memory || -n $long ]]; then
+    run "test" -DCMAKE_BUILD_TYPE=Release
+fi
+
+if [[ -n $record ]]; then
+    need_packages python3:python3
+    {
+        printf '```\n%s: %s\n' "$(date +%F)" "scripts/campaign.sh $name ${options[*]}"
+        grep '^  ' build/campaign.txt
+        printf '```\n'
+    } | scripts/figures.py docs/reliability.md "campaign-$name"
+fi

@@ -1,25 +1,20 @@
 """report.py RESULTS DOCS: writes tables into DOCS/performance.md and plots beside it.
 
-A table stands between two comment lines, "<!-- NAME -->" and "<!-- /NAME -->"; what stands outside
-of them is written by hand and left alone.
+Each table stands in a block of the page: see scripts/figures.py.
 """
 
 import json
 import os
-import re
+import pathlib
 import sys
 
+sys.path.insert(0, str(pathlib.Path(__file__).parents[2] / "scripts"))
+
+import figures
 import machine
 import plots
 import tables
 from results import medians
-
-
-def replace(text, name, content):
-    pattern = re.compile(f"(<!-- {name} -->\n).*?(<!-- /{name} -->)", re.DOTALL)
-    if not pattern.search(text):
-        sys.exit(f"the report has no place for {name}")
-    return pattern.sub(lambda found: found.group(1) + content + "\n" + found.group(2), text)
 
 
 def main(results, docs):
@@ -40,12 +35,7 @@ def main(results, docs):
         "instructions": tables.instructions(os.path.join(results, "instructions.txt")),
     }
     report = os.path.join(docs, "performance.md")
-    with open(report) as file:
-        text = file.read()
-    for name, content in contents.items():
-        text = replace(text, name, content)
-    with open(report, "w") as file:
-        file.write(text)
+    figures.write(report, contents)
 
     folder = os.path.join(docs, "performance")
     os.makedirs(folder, exist_ok=True)
