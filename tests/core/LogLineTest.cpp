@@ -1,4 +1,6 @@
 // The one logging rule, with whole lines as they reach the system log and standard output.
+#include <sys/stat.h>
+#include <syslog.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -25,6 +27,8 @@ std::string LineNumberIn(const std::string& strText) {
     const size_t nBegin = nAt + 5;
     return strText.substr(nBegin, strText.find_first_not_of("0123456789", nBegin) - nBegin);
 }
+
+int g_nLogOpenedOrClosed = 0;
 
 class LogLineTest : public TableTest {
   protected:
@@ -62,6 +66,16 @@ const char* const kLongText =
     "Failed [jIn.type() != Json::nullValue && jIn.type() != Json::objectValue], err=";
 
 }  // namespace
+
+extern "C" void openlog(const char*, int, int) {
+    ++g_nLogOpenedOrClosed;
+}
+extern "C" void closelog() {
+    ++g_nLogOpenedOrClosed;
+}
+extern "C" int setlogmask(int) noexcept {
+    return ++g_nLogOpenedOrClosed;
+}
 
 TEST_F(LogLineTest, FlagsAreOneByteEachAndFalseAtFirst) {
     EXPECT_EQ(sizeof(blLogToStdout), 1U);
@@ -216,6 +230,67 @@ TEST_F(LogLineTest, StdoutFlagSetWithinOneOperationMovesItsRemainingLines) {
                Plain("i=0,errno=0, run sql failed, error=Unknow Error!!, sql=" + strSql),
                Located("create table failed, sql=" + strSql),
                Plain("sql error, err=Unknow Error!!, sql=" + strSql), Check("0 > tableCreate()")}));
+}
+
+TEST_F(LogLineTest, BothFlagsAreReadAgainForEachLineOfOneFailure) {
+    const std::string strSql = "nonsense";
+    const std::string strError = "near \"nonsense\": syntax error";
+    OnNextLine([] { blDebugOutput = blLogToStdout = true; });
+    StdoutCapture capture;
+    EXPECT_EQ(m_pHandle->runSqlEx(strSql), -1);
+    EXPECT_EQ(TakeSyslogCalls().size(), 1U);
+    EXPECT_EQ(TakeLog(),
+              (Lines{Plain("i=0,errno=0, run sql failed, error=" + strError + ", sql=" + strSql),
+                     Plain("run sql fail, err=" + strError)}));
+    blLogToStdout = false;
+    OnNextLine([] { blDebugOutput = false; });
+    EXPECT_EQ(m_pHandle->runSqlEx(strSql), -1);
+    EXPECT_EQ(TakeSyslogCalls().size(), 1U);
+}
+
+TEST_F(LogLineTest, BothFlagsAreReadAgainForEachAttempt) {
+    FailNextExec({{SQLITE_BUSY, "database is locked", 0},
+                  {SQLITE_BUSY, "database is locked", 0},
+                  {SQLITE_BUSY, "database is locked", 0}});
+    // The first attempt says nothing, the second prints its line, the third writes it to the log.
+    OnPause([](int nPause) {
+        blDebugOutput = true;
+        blLogToStdout = nPause == 0;
+    });
+    StdoutCapture capture;
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), 0);
+    const std::string strRest = ", errno=0, run sql failed, error=database is locked, sql=SELECT 1";
+    EXPECT_EQ(TakeLog(), (Lines{Plain("retry, i=1" + strRest), Plain("retry, i=2" + strRest)}));
+    EXPECT_EQ(TakeSyslogCalls().size(), 1U);
+}
+
+TEST_F(LogLineTest, DebugLineAfterAnErrorReadsItsFlagBehindIt) {
+    Json::Value jEmpty(Json::objectValue);
+    OnNextLine([] { blDebugOutput = true; });
+    EXPECT_EQ(m_pHandle->fillDefaultValue(jEmpty, true), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Located("lost data member=id"), Plain("jParam={}")}));
+}
+
+TEST_F(LogLineTest, PrintedLineStaysInTheBufferOfTheHost) {
+    // In a process whose standard output is a pipe: there nothing but a flush empties the buffer.
+    EXPECT_EQ(0, InFreshProcess([] {
+                  StdoutCapture capture;
+                  blLogToStdout = true;
+                  LongCheck();
+                  struct stat status = {};
+                  EXPECT_EQ(::fstat(STDOUT_FILENO, &status), 0);
+                  EXPECT_EQ(status.st_size, 0);
+                  EXPECT_NE(capture.Take(), "");
+              }));
+}
+
+TEST_F(LogLineTest, SystemLogIsNeitherOpenedNorClosed) {
+    g_nLogOpenedOrClosed = 0;
+    LongCheck();
+    NewHandle(nullptr, "", Json::Value(), "");
+    blDebugOutput = true;
+    EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
+    EXPECT_EQ(g_nLogOpenedOrClosed, 0);
 }
 
 TEST_F(LogLineTest, DebugLineIsNotWrittenWhileItsFlagIsClearWhateverTheSink) {

@@ -50,6 +50,14 @@ TEST_F(RunnerTest, EmptyStatementReplacesAnEarlierErrorText) {
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
 }
 
+TEST_F(RunnerTest, EmptyStatementKeepsAnEarlierErrorTextUntilItFails) {
+    EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
+    std::string strAtTheCheck = "no line";
+    OnNextLine([&] { strAtTheCheck = SqlErrorOf(*m_pHandle); });
+    EXPECT_EQ(m_pHandle->runSqlEx(""), -1);
+    EXPECT_EQ(strAtTheCheck, "near \"nonsense\": syntax error");
+}
+
 TEST_F(RunnerTest, EmptyStatementShowsErrnoAsItStands) {
     errno = ENOENT;
     EXPECT_EQ(m_pHandle->runSqlEx(""), -1);

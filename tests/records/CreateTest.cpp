@@ -164,6 +164,47 @@ TEST_F(Create, LaterFailureWithoutSqlReportsTheStaleDuplicateAgain) {
                   {Check("!jRecParam.isObject()"), Check("0 > checkJsonType(jParam)"),
                    Plain("call create rec, rec=[7]")});
     EXPECT_EQ(kDuplicate, api.getErrMsg());
+    api.setErrMsg("");
+    Json::Value jWrong = ParseJson(R"({"id":"3"})");
+    EXPECT_EQ(-1, api.recCreate(jWrong, jWrong));
+    EXPECT_EQ(kDuplicate, api.getErrMsg());
+    EXPECT_EQ(Lines{}, TakeSql());
+}
+
+TEST_F(Create, RefusalByTheValuesReportsTheStaleDuplicateAgain) {
+    VornJsonDbApi& api = Open({{"id", "int"}, {"name", "string"}, {"t", "time_t"}},
+                              "id integer primary key,name text,t");
+    for (const char* szRecord : {R"({"id":1,"name":"a","t":2})", R"({"id":1,"name":"%s","t":2})"}) {
+        SCOPED_TRACE(szRecord);
+        MakeStaleDuplicate(api);
+        api.setErrMsg("");
+        Json::Value jRec = ParseJson(szRecord);
+        EXPECT_EQ(-1, api.recCreate(jRec, jRec));
+        EXPECT_EQ(kDuplicate, api.getErrMsg());
+    }
+    EXPECT_EQ(Lines{}, TakeSql());
+}
+
+TEST_F(Create, DuplicateIsReportedBehindTheLastLine) {
+    VornJsonDbApi& api = OpenItem();
+    MakeStaleDuplicate(api);
+    std::string strAtTheTail = "no line";
+    OnNextLine([&] { OnNextLine([&] { strAtTheTail = api.getErrMsg(); }); });
+    ExpectFailure(api, ParseJson("{}"),
+                  {Check("jRecIn.empty()"), Plain("call create rec, rec={}")});
+    EXPECT_EQ("", strAtTheTail);
+    EXPECT_EQ(kDuplicate, api.getErrMsg());
+}
+
+TEST_F(Create, WholeRealPassesForAnIntegerAndIsStoredAsOne) {
+    VornJsonDbApi& api = OpenItem();
+    EXPECT_EQ(R"({"id":3,"name":"new","size":-4})",
+              Compact(Created(api, ParseJson(R"({"id":3.0,"size":-4.0})"))));
+    EXPECT_EQ(Lines{Insert("id,name,size", "3,'new',-4")}, TakeSql());
+    const std::string strCopy = R"({"id":3.5,"name":"new","size":0})";
+    ExpectFailure(api, ParseJson(R"({"id":3.5})"),
+                  {Located("type failed, strKey=id, jRecParam=" + strCopy),
+                   Check("0 > checkJsonType(jParam)"), Plain("call create rec, rec=" + strCopy)});
 }
 
 TEST_F(Create, StatementThatSucceededEndsTheStaleDuplicate) {

@@ -92,8 +92,10 @@ TEST_F(DeleteByList, EmptyTextIsAValueLikeAnyOther) {
 
 TEST_F(DeleteByList, EmptyVectorIsRefusedWithAnEmptyRendering) {
     VornJsonDbApi& api = OpenItem();
-    ByArray(api, {}, "name", -1, {Check("0 >= strVector.size()"), ArrayTail("name", "")});
     ByArray(api, {}, nullptr, -1, {Check("0 >= strVector.size()"), ArrayTail("(null)", "")});
+    for (const char* szKey : {"name", "", "nobody", "id"}) {
+        ByArray(api, {}, szKey, -1, {Check("0 >= strVector.size()"), ArrayTail(szKey, "")});
+    }
     EXPECT_EQ(Lines{}, TakeSql());
     EXPECT_EQ("1,2,3,4", Ids());
 }
@@ -148,22 +150,6 @@ TEST_F(DeleteByList, RenderingHasNoQuotesNoBlanksAndNoTrailingSeparator) {
             {Check(kMember), ArrayTail("nobody", "it's,, x ,a,b,50%s")});
 }
 
-TEST_F(DeleteByList, LookupComesBeforeEveryCheck) {
-    VornJsonDbApi& api = OpenAs(UniqueTable(), ParseJson(R"({"other":1})"), "name");
-    Lines vecNone;
-    EXPECT_EQ(-1, api.recDeleteByArray(vecNone, "name"));
-    Lines vecLines = TakeLog();
-    ASSERT_EQ(6U, vecLines.size());
-    EXPECT_EQ(UtilCheck("!jTableDef.isMember(strJsonName)"), vecLines[0]);
-    EXPECT_EQ(Check("0 >= strVector.size()"), vecLines[4]);
-    std::string strEmpty;
-    EXPECT_EQ(-1, api.recDeleteByName(strEmpty, "name"));
-    vecLines = TakeLog();
-    ASSERT_EQ(6U, vecLines.size());
-    EXPECT_EQ(UtilCheck("jType[strJsonName].type() != Json::objectValue"), vecLines[0]);
-    EXPECT_EQ(Check("strValue.empty()"), vecLines[4]);
-}
-
 // ---- by name -----------------------------------------------------------------------------------
 
 TEST_F(DeleteByList, NameDeletesItsRows) {
@@ -178,8 +164,10 @@ TEST_F(DeleteByList, NameDeletesItsRows) {
 
 TEST_F(DeleteByList, EmptyNameIsRefusedBeforeTheKey) {
     VornJsonDbApi& api = OpenItem();
-    ByName(api, "", "name", -1, {Check("strValue.empty()"), NameTail("name", "")});
     ByName(api, "", nullptr, -1, {Check("strValue.empty()"), NameTail("(null)", "")});
+    for (const char* szKey : {"name", "", "nobody", "id"}) {
+        ByName(api, "", szKey, -1, {Check("strValue.empty()"), NameTail(szKey, "")});
+    }
     EXPECT_EQ(Lines{}, TakeSql());
 }
 

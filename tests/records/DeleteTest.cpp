@@ -192,4 +192,11 @@ TEST_F(Delete, SuccessIsLoggedOnlyWithDebugOutput) {
     EXPECT_EQ(Lines{Plain("delete rec number=0")}, TakeLog());
 }
 
+TEST_F(Delete, DebugFlagIsReadWhenTheRowsAreGone) {
+    VornJsonDbApi& api = OpenItem(2);
+    OnExec([](int) { blDebugOutput = !blDebugOutput; });
+    Deletes(api, R"({"id":1})", false, 1, {Plain("delete rec number=1")});
+    Deletes(api, R"({"id":2})", false, 1);
+}
+
 }  // namespace testhost

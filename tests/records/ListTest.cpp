@@ -226,6 +226,20 @@ TEST_F(List, KindOfTheQueryIsCheckedBeforeTheOutput) {
     EXPECT_EQ((Lines{Check(kQueryKind), Plain("jRecParam=[1]")}), TakeLog());
 }
 
+TEST_F(List, KindOfTheOutputIsCheckedBeforeTheCondition) {
+    VornJsonDbApi& api = OpenItem();
+    Json::Value jQuery = ParseJson(R"({"vornSqlWhereFilter":5})");
+    Json::Value jOut = ParseJson("{}");
+    EXPECT_EQ(-1, api.recList(jQuery, jOut));
+    EXPECT_EQ((Lines{Check(kOutKind), Plain(R"(jRecParam={"vornSqlWhereFilter":5})")}), TakeLog());
+}
+
+TEST_F(List, ConditionIsBuiltBeforeTheSortTerm) {
+    VornJsonDbApi& api = OpenItem();
+    ExpectRefused(api, R"({"sort_by":7,"vornSqlWhereFilter":5})",
+                  {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kExpand)});
+}
+
 TEST_F(List, RefusedConditionRunsNothing) {
     VornJsonDbApi& api = OpenItem();
     ExpectRefused(api, R"({"vornSqlWhereFilter":5})",

@@ -116,6 +116,14 @@ TEST_F(Save, ReadBackWithoutARowFailsAndTheRowStays) {
     EXPECT_EQ("5|own", Rows("select * from " + m_strTable + ";"));
 }
 
+TEST_F(Save, FirstOfSeveralRowsReadBackIsTaken) {
+    // A column of that name hides SQLite's own, so that the read-back finds all three rows.
+    VornJsonDbApi& api = Open({{"n", "int"}, {"rowid", "int"}});
+    Sql("insert into " + m_strTable + " values (10,3),(11,3);");
+    EXPECT_EQ(R"({"n":10,"rowid":3})", Compact(Saved(api, ParseJson(R"({"n":12,"rowid":3})"))));
+    EXPECT_EQ("3", Count());
+}
+
 TEST_F(Save, MissingLastMemberMakesAStatementThatSqliteRejects) {
     VornJsonDbApi& api = OpenTask();
     ExpectSqlFailure(api, ParseJson(R"({"id":1})"), true, "near \")\": syntax error",

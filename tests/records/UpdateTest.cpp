@@ -219,6 +219,14 @@ TEST_F(Update, NewValuesOfAWrongKindAreRefused) {
     EXPECT_EQ(Lines{}, TakeSql());
 }
 
+TEST_F(Update, FirstOfSeveralRefusalsIsReported) {
+    VornJsonDbApi& api = OpenItem();
+    ByFilter(api, ParseJson("null"), ParseJson("[2]"), -1,
+             {Check("jFilterIn.empty()"), FilterTail("[2]")});
+    ByFilter(api, ParseJson(R"({"vornSqlWhereFilter":1})"), ParseJson("[2]"), -1,
+             {Check("jParamIn.type() != Json::objectValue"), FilterTail("[2]")});
+}
+
 TEST_F(Update, RefusedFilterRunsNothing) {
     VornJsonDbApi& api = OpenItem();
     ByFilter(api, ParseJson(R"({"vornSqlWhereFilter":1})"), ParseJson(R"({"size":"bad"})"), -1,
@@ -282,9 +290,42 @@ TEST_F(Update, LaterFailureWithoutSqlReportsTheStaleDuplicateAgain) {
     VornJsonDbApi& api = OpenItem();
     MakeStaleDuplicate(api);
     EXPECT_EQ("", api.getErrMsg());
+    const std::pair<const char*, const char*> aRefused[] = {
+        {"{}", "{}"},
+        {"[1]", "{}"},
+        {R"({"id":1})", "[]"},
+        {R"({"vornSqlWhereFilter":1})", "{}"},
+        {R"({"limit":1})", "{}"},
+        {R"({"id":1})", R"({"size":"7"})"},
+        {R"({"id":1})", "{}"},
+    };
+    for (const auto& [szFilter, szRecord] : aRefused) {
+        SCOPED_TRACE(std::string(szFilter) + " " + szRecord);
+        api.setErrMsg("");
+        Json::Value jFilter = ParseJson(szFilter);
+        Json::Value jRec = ParseJson(szRecord);
+        EXPECT_EQ(-1, api.recUpdateByFilter(jFilter, jRec));
+        EXPECT_EQ(kDuplicate, api.getErrMsg());
+    }
+    EXPECT_EQ(Lines{}, TakeSql());
+}
+
+TEST_F(Update, DuplicateIsReportedBehindTheLastLine) {
+    VornJsonDbApi& api = OpenItem();
+    MakeStaleDuplicate(api);
+    std::string strAtTheTail = "no line";
+    OnNextLine([&] { OnNextLine([&] { strAtTheTail = api.getErrMsg(); }); });
     ByFilter(api, ParseJson("{}"), ParseJson("{}"), -1,
              {Check("jFilterIn.empty()"), FilterTail("{}")});
+    EXPECT_EQ("", strAtTheTail);
     EXPECT_EQ(kDuplicate, api.getErrMsg());
+}
+
+TEST_F(Update, WholeRealPassesForAnInteger) {
+    VornJsonDbApi& api = OpenItem();
+    ByFilter(api, ParseJson(R"({"id":1.0})"), ParseJson(R"({"size":3.0})"), 0);
+    EXPECT_EQ(Lines{Statement("size=3.0", " (id=1.0 )")}, TakeSql());
+    EXPECT_EQ("1|a|3\n2|b|20\n3|c|30", All());
 }
 
 TEST_F(Update, OtherRefusalAndSuccessLeaveTheErrorMessage) {

@@ -314,22 +314,4 @@ TEST_F(MemberCondition, HandleWorksOnAfterEveryRefusal) {
     EXPECT_EQ("m in ('x' )", List(api, "m", ListOf("x")));
 }
 
-TEST_F(MemberCondition, TableWithoutTypesKnowsNoMember) {
-    VornJsonDbApi& api = OpenAs(UniqueTable(), ParseJson(R"({"other":1})"), "m");
-    std::string strField = "m";
-    std::string strSql;
-    Json::Value jValue = 1;
-    EXPECT_EQ(-1, api.SqlMakeByMatchField(strField, jValue, strSql));
-    Lines vecLines = TakeLog();
-    ASSERT_EQ(5U, vecLines.size());
-    EXPECT_EQ(UtilCheck("!jTableDef.isMember(strJsonName)"), vecLines[0]);
-    EXPECT_EQ(Check("!jType.isMember(strField)"), vecLines[4]);
-    Json::Value jList = ListOf(1);
-    EXPECT_EQ(-1, api.SqlMakeByListField(nullptr, jList, strSql));
-    vecLines = TakeLog();
-    ASSERT_EQ(5U, vecLines.size());
-    EXPECT_EQ(UtilCheck("jType[strJsonName].type() != Json::objectValue"), vecLines[0]);
-    EXPECT_EQ(Check("!szField || !szField[0]"), vecLines[4]);
-}
-
 }  // namespace testhost

@@ -238,6 +238,17 @@ TEST_F(Percent, RefusedRecordRunsNothingAndTheHandleWorksOn) {
     EXPECT_EQ("fine|y|1", Rows("select * from " + m_strTable + ";"));
 }
 
+TEST_F(Percent, EarlierErrorTextShowsBehindTheRefusal) {
+    VornJsonDbApi& api = OpenThree();
+    MakeStaleError(api);
+    Json::Value jRec = ParseJson(R"({"a":"%n","b":"y","c":1})");
+    EXPECT_EQ(-1, api.recSave(jRec, false));
+    const Lines vecLines = WithFirstCheckNamed(TakeLog());
+    ASSERT_EQ(5U, vecLines.size());
+    EXPECT_EQ(SqlError("no such column: stale", "REPLACE INTO " + m_strTable + " (a,b,c) VALUES ("),
+              vecLines[4]);
+}
+
 TEST_F(Percent, CreateReportsTheRefusalThroughItsOwnTail) {
     VornJsonDbApi& api = OpenThree();
     Json::Value jIn = ParseJson(R"({"a":"100%","b":"y","c":1})");

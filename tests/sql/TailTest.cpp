@@ -140,13 +140,4 @@ TEST_F(Tail, FormatterWithoutMemoryIsReported) {
     ExpectRefused(jFilter, "!szSql");
 }
 
-TEST_F(Tail, TypesOfTheTableAreNotAsked) {
-    VornJsonDbApi& api = OpenAs(UniqueTable(), ParseJson(R"({"other":1})"), "name");
-    std::string strSql;
-    Json::Value jFilter = ParseJson(R"({"sort_by":"name","limit":2})");
-    EXPECT_EQ(0, api.SqlFilterConditionFromJson(jFilter, strSql));
-    EXPECT_EQ(" order by 'name' LIMIT 2", strSql);
-    EXPECT_EQ(Lines{}, TakeLog());
-}
-
 }  // namespace testhost

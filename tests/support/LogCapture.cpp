@@ -14,6 +14,7 @@ namespace {
 
 std::vector<std::string> g_vecLog;
 std::vector<SyslogCall> g_vecSyslog;
+std::function<void()> g_fnOnNextLine;
 
 // State of the one StdoutCapture; nFd is the copy of the real standard output.
 struct Capture {
@@ -93,11 +94,19 @@ void RecordSyslog(int nPriority, const char* szFormat, va_list args) {
     ParsePrinted();
     g_vecSyslog.push_back({nPriority, nErrno, szFormat, Render(szFormat, args)});
     g_vecLog.push_back(CanonicalSyslog(g_vecSyslog.back()));
+    if (const std::function<void()> fn = std::exchange(g_fnOnNextLine, nullptr)) {
+        fn();
+    }
     errno = nErrno;
+}
+
+void OnNextLine(std::function<void()> fn) {
+    g_fnOnNextLine = std::move(fn);
 }
 
 void ResetLog() {
     ParsePrinted();
+    OnNextLine(nullptr);
     g_vecLog.clear();
     g_vecSyslog.clear();
 }

@@ -43,6 +43,10 @@ struct SyslogCall {
 };
 std::vector<SyslogCall> TakeSyslogCalls();
 
+// Called once, behind the next line in the system log: what comes between two lines of one
+// operation.
+void OnNextLine(std::function<void()> fn);
+
 // Redirects file descriptor 1 into a file while it lives; one at a time. A test that has failed
 // gets the captured text shown when the capture ends, because it holds the test's own messages too.
 class StdoutCapture {
