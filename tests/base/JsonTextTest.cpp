@@ -34,17 +34,25 @@ class JsonTextTest : public DbTest {
     }
 
     // The text that stands in the column after a value was saved.
-    std::string Stored(const Json::Value& jValue) {
+    std::string StoredAs(const Json::Value& jValue) {
         Json::Value jRecord(Json::objectValue);
         jRecord["j"] = jValue;
         EXPECT_EQ(m_pHandle->recSave(jRecord, true), 0);
-        EXPECT_EQ(jRecord["j"], jValue);
+        m_jBack = jRecord["j"];
         EXPECT_EQ(TakeLog(), Lines());
         return Rows("SELECT j FROM " + m_strTable + " ORDER BY rowid DESC LIMIT 1");
     }
 
+    // The same for a value that comes back as it was.
+    std::string Stored(const Json::Value& jValue) {
+        const std::string strText = StoredAs(jValue);
+        EXPECT_EQ(m_jBack, jValue);
+        return strText;
+    }
+
     std::string m_strTable;
     std::unique_ptr<VornJsonDbApi> m_pHandle;
+    Json::Value m_jBack;
 };
 
 }  // namespace
@@ -68,6 +76,36 @@ TEST_F(JsonTextTest, TextIsWrittenAsUtf8AndNotEscaped) {
 TEST_F(JsonTextTest, QuotesBackslashesAndControlCharactersAreEscaped) {
     const std::string strText = R"({"a":"\"\\\n\t\r\b\f\u0001'/"})";
     EXPECT_EQ(Stored(ParseJson(strText)), strText);
+}
+
+// An array need not store all of its elements; one that it does not is a null.
+TEST_F(JsonTextTest, ElementsThatAnArrayDoesNotStoreAreNulls) {
+    Json::Value jArray(Json::arrayValue);
+    jArray[2] = "x";
+    EXPECT_EQ(StoredAs(jArray), R"([null,null,"x"])");
+    jArray.resize(5);
+    EXPECT_EQ(StoredAs(jArray), R"([null,null,"x",null,null])");
+    EXPECT_TRUE(jArray[6].isNull());
+    EXPECT_EQ(StoredAs(jArray), R"([null,null,"x",null,null,null,null])");
+    Json::Value jNone(Json::arrayValue);
+    jNone.resize(2);
+    EXPECT_EQ(StoredAs(jNone), "[null,null]");
+    Json::Value jNested(Json::objectValue);
+    jNested["k"][1]["l"][1] = 7;
+    EXPECT_EQ(StoredAs(jNested), R"({"k":[null,{"l":[null,7]}]})");
+}
+
+TEST_F(JsonTextTest, ElementsThatAnArrayDoesNotStoreAreNullsInLogLinesToo) {
+    Json::Value jArray(Json::arrayValue);
+    jArray[2] = "x";
+    Json::Value jRows;
+    EXPECT_EQ(m_pHandle->recList(jArray, jRows), -1);
+    EXPECT_EQ(TakeLog().at(1), Plain(R"(jRecParam=[null,null,"x"])"));
+    Json::Value jFilter(Json::objectValue);
+    jFilter["limit"][1] = 7;
+    std::string strSql;
+    EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), 0);
+    EXPECT_EQ(strSql, " LIMIT [null,7]");
 }
 
 TEST_F(JsonTextTest, MembersAreWrittenInKeyOrder) {

@@ -1,7 +1,9 @@
 // The fast reader and writer against JsonCpp's own: whatever they accept must come out the same.
 
+#include <limits>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 #include <json/json.h>
@@ -83,6 +85,71 @@ TEST(PlainJson, ValuesAreWrittenAsJsonCppWritesThem) {
         std::string strWritten;
         ASSERT_TRUE(vornjsondb::WritePlainJson(jValue, strWritten)) << szText;
         EXPECT_EQ(strWritten, ByJsonCpp(jValue)) << szText;
+    }
+}
+
+// Values that no parser makes: reals that are whole, texts that are no UTF-8, arrays that do not
+// store all of their elements.
+std::vector<Json::Value> ValuesThatNoParserMakes() {
+    using Real = std::numeric_limits<double>;
+    std::vector<Json::Value> vecValues;
+    for (const double dReal :
+         {0.0, -0.0, 3.0, -7.0, 1e15, 1e16, 1e17, -1e300, 5e-324, 9223372036854775808.0,
+          Real::infinity(), -Real::infinity(), Real::quiet_NaN()}) {
+        vecValues.emplace_back(dReal);
+    }
+    vecValues.emplace_back(std::numeric_limits<Json::Int64>::min());
+    vecValues.emplace_back(std::numeric_limits<Json::UInt64>::max());
+    vecValues.emplace_back(Json::UInt64(7));
+    vecValues.emplace_back(Json::StaticString("not copied"));
+    const std::string aTexts[] = {"",
+                                  std::string("a\0b", 3),
+                                  std::string(1, '\0'),
+                                  "\x01",
+                                  "\x1f",
+                                  "\x7f",
+                                  "\x80",
+                                  "\xc3",
+                                  "\xff\xfe",
+                                  "\xc0\xaf",
+                                  "\xed\xa0\x80",
+                                  "\xf4\x90\x80\x80",
+                                  "a\xe2\x82",
+                                  "\"\\/"};
+    for (const std::string& strText : aTexts) {
+        vecValues.emplace_back(strText);
+        vecValues.emplace_back(Json::objectValue);
+        vecValues.back()[strText] = 1;
+    }
+    for (const Json::ArrayIndex nIndex : {0U, 1U, 5U}) {
+        vecValues.emplace_back(Json::arrayValue);
+        vecValues.back()[nIndex]["o"][nIndex] = 7;
+        vecValues.emplace_back(Json::arrayValue);
+        vecValues.back().resize(nIndex);
+    }
+    return vecValues;
+}
+
+Json::Value WithComments(Json::Value jValue) {
+    jValue.setComment(std::string("// before"), Json::commentBefore);
+    jValue.setComment(std::string("// behind"), Json::commentAfterOnSameLine);
+    jValue.setComment(std::string("/* after */"), Json::commentAfter);
+    jValue.setOffsetStart(3);
+    return jValue;
+}
+
+// The fast writer may leave such a value to JsonCpp, but not write it otherwise.
+TEST(PlainJson, ValuesThatNoParserMakesAreWrittenAsJsonCppWritesThem) {
+    for (const Json::Value& jOne : ValuesThatNoParserMakes()) {
+        Json::Value jList(Json::arrayValue);
+        jList.append(WithComments(jOne));
+        jList.append(jOne);
+        for (const Json::Value& jValue : {jOne, WithComments(jOne), jList}) {
+            std::string strWritten;
+            if (vornjsondb::WritePlainJson(jValue, strWritten)) {
+                EXPECT_EQ(strWritten, ByJsonCpp(jValue));
+            }
+        }
     }
 }
 

@@ -15,6 +15,16 @@ std::string Repeated(const std::string& str, size_t nTimes) {
     return strAll;
 }
 
+// What JsonCpp's reader has made of a text when it gives up at too many levels.
+Json::Value ReadUntilTooDeep(const std::string& strText) {
+    const Json::CharReaderBuilder builder;
+    const std::unique_ptr<Json::CharReader> pReader(builder.newCharReader());
+    Json::Value jValue;
+    EXPECT_THROW(pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, nullptr),
+                 Json::RuntimeError);
+    return jValue;
+}
+
 // The smallest and largest long, as the 32-bit integer that a conversion keeps of them.
 const Json::Int kOfLongMax = sizeof(long) == 8 ? -1 : std::numeric_limits<Json::Int>::max();
 const Json::Int kOfLongMin = sizeof(long) == 8 ? 0 : std::numeric_limits<Json::Int>::min();
@@ -146,15 +156,45 @@ TEST_F(RowsTest, TextThatIsNoJsonIsNoFailure) {
 
 // The reader gives up half way and leaves what it has read so far.
 TEST_F(RowsTest, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoesOn) {
-    Open({{"a", "Json::arrayValue"}});
-    Insert("('[1]'), ('" + Repeated("[", 5000) + Repeated("]", 5000) + "'), ('[2]')");
-    Json::Value jRows;
-    EXPECT_EQ(List(jRows), 0);
-    EXPECT_EQ(TakeLog(), std::vector<std::string>());
-    ASSERT_EQ(jRows.size(), 3U);
-    EXPECT_EQ(Compact(jRows[0]), R"({"a":[1]})");
-    EXPECT_EQ(Compact(jRows[1]["a"]).substr(0, 100), Repeated("[", 100));
-    EXPECT_EQ(Compact(jRows[2]), R"({"a":[2]})");
+    const std::string aTexts[] = {
+        Repeated("[", 1100) + Repeated("]", 1100),
+        Repeated("[", 1100),
+        R"({"a":1,"b":)" + Repeated("[", 1100),
+        Repeated("{\"k\":", 1100) + "1" + Repeated("}", 1100),
+        R"(["\"[",)" + Repeated("[", 1100),
+    };
+    Open({{"a", "int"}, {"b", "Json::arrayValue"}, {"c", "int"}});
+    for (const std::string& strText : aTexts) {
+        SCOPED_TRACE(strText.substr(0, 30));
+        char* szSql = sqlite3_mprintf("(1, '[1]', 3), (4, %Q, 6), (7, '[2]', 9)", strText.c_str());
+        Insert(szSql);
+        sqlite3_free(szSql);
+        Json::Value jRows = Listed();
+        ASSERT_EQ(jRows.size(), 3U);
+        EXPECT_EQ(Compact(jRows[0]), R"({"a":1,"b":[1],"c":3})");
+        EXPECT_TRUE(jRows[1]["b"] == ReadUntilTooDeep(strText));
+        EXPECT_EQ(jRows[1]["c"], Json::Value(6));
+        EXPECT_EQ(Compact(jRows[2]), R"({"a":7,"b":[2],"c":9})");
+        Sql("DELETE FROM " + m_strTable);
+    }
+}
+
+TEST_F(RowsTest, RecordNestedTooDeepToBeReadIsCreated) {
+    Open({{"a", "Json::arrayValue"}, {"b", "int"}});
+    Json::Value jRecord(Json::objectValue);
+    jRecord["a"] = Json::Value(Json::arrayValue);
+    jRecord["b"] = 7;
+    for (int i = 0; i < 1100; ++i) {
+        Json::Value jOuter(Json::arrayValue);
+        jOuter.append(std::move(jRecord["a"]));
+        jRecord["a"] = std::move(jOuter);
+    }
+    Json::Value jStored;
+    EXPECT_EQ(m_pHandle->recCreate(jRecord, jStored), 0);
+    EXPECT_EQ(TakeLog().size(), 0U);
+    EXPECT_EQ(jStored["b"], Json::Value(7));
+    EXPECT_TRUE(jStored["a"] == ReadUntilTooDeep(Repeated("[", 1101) + Repeated("]", 1101)));
+    EXPECT_EQ(Rows("SELECT length(a) FROM " + m_strTable), "2202");
 }
 
 TEST_F(RowsTest, NumberOutOfRangeInStoredJsonIsNoFailure) {

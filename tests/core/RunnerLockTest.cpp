@@ -194,6 +194,29 @@ TEST_F(RunnerLockTest, EagainOfOneAttemptIsClearedBeforeTheNext) {
     EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
 }
 
+TEST_F(RunnerLockTest, ErrnoThatAFreeLeavesDoesNotDecideOnTheRetry) {
+    OnFree([] { errno = EAGAIN; });
+    FailNextExec({{SQLITE_BUSY, kLockText, 0}, {SQLITE_IOERR, "disk I/O error", ENOSPC}});
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
+    EXPECT_EQ(TakePauses(), Pauses(1));
+    EXPECT_EQ(TakeLog(), (Lines{FailureLine("disk I/O error", "SELECT 1", ENOSPC, 1)}));
+}
+
+TEST_F(RunnerLockTest, FailureWithoutATextIsNoLockWhateverErrnoHolds) {
+    FailNextExec({{SQLITE_BUSY, nullptr, EAGAIN}});
+    blDebugOutput = true;
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
+    EXPECT_EQ(TakeSql(), Lines{"SELECT 1"});
+    EXPECT_EQ(TakePauses(), Pauses(0));
+    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", EAGAIN, 0),
+                                Plain("run sql fail, err=(null)")}));
+    EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
+    blDebugOutput = false;
+    FailNextExec({{SQLITE_BUSY, kLockText, EAGAIN}, {SQLITE_BUSY, nullptr, EAGAIN}});
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
+    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", EAGAIN, 1)}));
+}
+
 TEST_F(RunnerLockTest, CallbackThatStopsWithEagainIsRunAgain) {
     int nCalls = 0;
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1", StopWithEagain, &nCalls), -1);

@@ -130,6 +130,16 @@ TEST_F(Delete, RawFilterAndListsSelectRows) {
     EXPECT_EQ("1,2,3,5", Rows("select group_concat(id) from " + m_strTable + ";"));
 }
 
+TEST_F(Delete, ListThatDoesNotStoreItsFirstElementsSparesTheRowOfTheLast) {
+    VornJsonDbApi& api = OpenItem(0);
+    Sql("insert into " + m_strTable + " values (1,'x'),(2,'''''x');");
+    Json::Value jQuery(Json::objectValue);
+    jQuery["name"][2] = "x";
+    EXPECT_EQ(1, api.recDelete(jQuery));
+    EXPECT_EQ(Lines{Statement(" WHERE  (name in ('''''x' ) )")}, TakeSql());
+    EXPECT_EQ("1|x", Rows("select * from " + m_strTable + ";"));
+}
+
 TEST_F(Delete, EmptyListIsRejectedBySqliteAndDeletesNothing) {
     VornJsonDbApi& api = OpenItem(3);
     std::string strSql = Statement(" WHERE  ( )");

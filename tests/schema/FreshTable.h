@@ -71,6 +71,8 @@ class FreshTableTest : public DbTest {
         TakeSql();
     }
 
+    void CloseAll() { m_vecHandles.clear(); }
+
     std::string Count() { return Rows("select count(*) from " + m_strTable + ";"); }
 
     std::string m_strTable;

@@ -271,6 +271,48 @@ TEST_F(MemberCondition, ElementsFollowEachOtherWithoutSeparator) {
               List(Open({{"name", "Json::Value"}}), "name", ParseJson("[{},[],1]")));
 }
 
+// An array need not store all of its elements; one that it does not is a null.
+TEST_F(MemberCondition, ElementThatTheListDoesNotStoreIsANull) {
+    const std::pair<const char*, const char*> aTexts[] = {
+        {"string", "m in ('''''7' )"},
+        {"Json::Value", "m in ('null''null''7' )"},
+        {"Json::objectValue", "m in ('null''null''7' )"},
+        {"Json::arrayValue", "m in ('null''null''7' )"},
+        {"int", "m in (7 )"},
+        {"bool", "m in (7 )"},
+        {"nonsense", "m in (7 )"},
+    };
+    for (const auto& [szType, szText] : aTexts) {
+        Json::Value jList(Json::arrayValue);
+        jList[2] = 7;
+        EXPECT_EQ(szText, List(Open({{"m", szType}}), "m", jList)) << szType;
+    }
+}
+
+TEST_F(MemberCondition, ElementsMissingAtTheEndAreNulls) {
+    Json::Value jList = ListOf("x");
+    jList.resize(3);
+    EXPECT_EQ("m in ('x''''' )", List(Open({{"m", "string"}}), "m", jList));
+    EXPECT_EQ(R"(m in ('"x"''null''null' ))", List(Open({{"m", "Json::Value"}}), "m", jList));
+    Json::Value jNone(Json::arrayValue);
+    jNone.resize(2);
+    EXPECT_EQ("m in ('''' )", List(Open({{"m", "string"}}), "m", jNone));
+    EXPECT_EQ("m in ( )", List(Open({{"m", "int"}}), "m", jNone));
+}
+
+TEST_F(MemberCondition, ReadingPastTheEndMakesElements) {
+    Json::Value jList = ListOf("x");
+    EXPECT_TRUE(jList[3].isNull());
+    EXPECT_EQ("m in ('x''''''' )", List(Open({{"m", "string"}}), "m", jList));
+}
+
+TEST_F(MemberCondition, ElementMissingInsideAnElementIsWrittenAsNull) {
+    Json::Value jList(Json::arrayValue);
+    jList[1][1] = "x";
+    EXPECT_EQ(R"(m in ('null''[null,"x"]' ))", List(Open({{"m", "Json::Value"}}), "m", jList));
+    ExpectListRefused(Open({{"m", "string"}}), "m", jList, kListText);
+}
+
 TEST_F(MemberCondition, LaterElementOfAWrongKindDropsTheWholeList) {
     ExpectListRefused(Open({{"m", "string"}}), "m", ParseJson(R"(["a","b",[]])"), kListText);
     ExpectListRefused(Open({{"m", "int"}}), "m", ParseJson("[1,{}]"), kListText);

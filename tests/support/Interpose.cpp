@@ -22,11 +22,13 @@ using ExecFunction = int (*)(sqlite3*, const char*, int (*)(void*, int, char**, 
                              char**);
 using SleepFunction = int (*)(unsigned);
 using ChangesFunction = int (*)(sqlite3*);
+using FreeFunction = void (*)(void*);
 
 std::vector<std::string> g_vecSql;
 std::deque<ExecFault> g_queFaults;
 std::function<void(int)> g_fnOnExec;
 RowCallback g_fnRowCallback = nullptr;
+std::function<void()> g_fnOnFree;
 std::deque<int> g_queChanges;
 std::vector<unsigned> g_vecPauses;
 std::function<void(int)> g_fnOnPause;
@@ -113,6 +115,10 @@ RowCallback LastRowCallback() {
     return g_fnRowCallback;
 }
 
+void OnFree(std::function<void()> fn) {
+    g_fnOnFree = std::move(fn);
+}
+
 void FakeNextChanges(int nChanges) {
     g_queChanges.push_back(nChanges);
 }
@@ -131,6 +137,7 @@ void ResetHost() {
     FailNextExec({});
     OnExec(nullptr);
     OnPause(nullptr);
+    OnFree(nullptr);
     g_queChanges.clear();
     TakeSql();
     TakePauses();
@@ -157,6 +164,14 @@ VORN_TEST_INTERPOSED int sqlite3_changes(sqlite3* pDb) {
     const int nChanges = testhost::g_queChanges.front();
     testhost::g_queChanges.pop_front();
     return nChanges;
+}
+
+VORN_TEST_INTERPOSED void sqlite3_free(void* pMemory) {
+    static const auto fnReal = testhost::RealFunction<testhost::FreeFunction>("sqlite3_free");
+    fnReal(pMemory);
+    if (testhost::g_fnOnFree && !testhost::IsInsideSqlite(__builtin_return_address(0))) {
+        testhost::g_fnOnFree();
+    }
 }
 
 VORN_TEST_INTERPOSED int usleep(unsigned nMicroseconds) {

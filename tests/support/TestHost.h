@@ -79,6 +79,9 @@ void OnExec(std::function<void(int nCall)> fn);
 using RowCallback = int (*)(void*, int, char**, char**);
 RowCallback LastRowCallback();
 
+// Called behind each sqlite3_free of the library.
+void OnFree(std::function<void()> fn);
+
 // The next sqlite3_changes answers with this.
 void FakeNextChanges(int nChanges);
 
