@@ -1,6 +1,5 @@
 #include "JsonText.h"
 
-#include <algorithm>
 #include <cstring>
 #include <new>
 #include <sstream>
@@ -19,23 +18,9 @@ std::unique_ptr<Json::StreamWriter> MakeWriter() {
     return std::unique_ptr<Json::StreamWriter>(Builder.newStreamWriter());
 }
 
-// How many brackets are open at once; what looks like one inside a quoted text is left out.
-size_t DeepestLevel(const char* pText, const char* pEnd) {
-    size_t nOpen = 0;
-    size_t nDeepest = 0;
-    bool blQuoted = false;
-    for (; pText != pEnd; ++pText) {
-        if (blQuoted && *pText == '\\' && pText + 1 != pEnd) {
-            ++pText;
-        } else if (*pText == '"') {
-            blQuoted = !blQuoted;
-        } else if (!blQuoted && (*pText == '[' || *pText == '{')) {
-            nDeepest = std::max(nDeepest, ++nOpen);
-        } else if (!blQuoted && (*pText == ']' || *pText == '}') && nOpen > 0) {
-            --nOpen;
-        }
-    }
-    return nDeepest;
+// JsonCpp reports by one exception that there are too many levels and that a malloc gave nothing.
+bool IsTooDeep(const Json::RuntimeError& Error) {
+    return std::strstr(Error.what(), "stackLimit") != nullptr;
 }
 
 // Never freed: a host's own statics may use the library when this one's would be gone.
@@ -70,15 +55,12 @@ bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
     if (!m_pReader) {
         Json::CharReaderBuilder Builder;
         Builder["collectComments"] = false;
-        m_nMaxLevels = Builder["stackLimit"].asUInt();
         m_pReader.reset(Builder.newCharReader());
     }
-    const char* pEnd = szText + nLength;
     try {
-        return m_pReader->parse(szText, pEnd, &jOut, nullptr);
-    } catch (const Json::RuntimeError&) {
-        // The same exception tells of too many levels and of a malloc that gave nothing.
-        if (DeepestLevel(szText, pEnd) < m_nMaxLevels) {
+        return m_pReader->parse(szText, szText + nLength, &jOut, nullptr);
+    } catch (const Json::RuntimeError& Error) {
+        if (!IsTooDeep(Error)) {
             throw std::bad_alloc();
         }
         return false;

@@ -26,7 +26,6 @@ class JsonCodec {
   private:
     std::unique_ptr<Json::StreamWriter> m_pWriter;
     std::unique_ptr<Json::CharReader> m_pReader;
-    size_t m_nMaxLevels = 0;  // the reader's limit
 };
 
 // The same by a codec of the process, which is used by one thread at a time as all of it is.

@@ -162,6 +162,8 @@ TEST_F(RowsTest, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoes
         R"({"a":1,"b":)" + Repeated("[", 1100),
         Repeated("{\"k\":", 1100) + "1" + Repeated("}", 1100),
         R"(["\"[",)" + Repeated("[", 1100),
+        "/* it's \" open */ " + Repeated("[", 1100) + Repeated("]", 1100),
+        "// \"\n" + Repeated("[", 1100),
     };
     Open({{"a", "int"}, {"b", "Json::arrayValue"}, {"c", "int"}});
     for (const std::string& strText : aTexts) {
