@@ -1,4 +1,4 @@
-// How the making of SQL texts grows, with the columns and with the length of the values.
+// How the time for SQL texts grows with the columns and with the length of the values.
 
 #include <memory>
 #include <string>

@@ -39,7 +39,7 @@ if [[ $measure == yes ]]; then
         libc6 >"$results/packages.txt"
     "${CXX:-g++}" --version | sed -n 1p >"$results/compiler.txt"
 
-    # A missed goal is told by the report and does not stop it.
+    # The report shows a missed goal; the measurement goes on.
     "$results/bench/vornjsondb_ratios" --json "$results/ratios.json" || true
     median=(--benchmark_report_aggregates_only=true --benchmark_out_format=json)
     "$results/bench/vornjsondb_peers" "${median[@]}" --benchmark_repetitions=15 \

@@ -50,7 +50,7 @@ struct JsonCppPeer {
 
 // One peer with the rows 0 to kPeerRows - 1, for all its measurements of reading. Every record is
 // compared on its way in and on its way out. The peer is never destroyed: at the end of the program
-// its library may be gone before it.
+// its library may already be unloaded.
 template <class Peer>
 Peer& FilledPeer() {
     static Peer* s_pPeer = nullptr;

@@ -110,7 +110,7 @@ void CreateText(benchmark::State& State) {
         Json::Value jStored;
         Require(pHandle->recCreate(jRecord, jStored) == 0, "recCreate");
         if (++nStored % 16 == 0) {
-            // The table must not grow for as long as the measurement likes to last.
+            // However long the measurement takes, the table must not grow.
             State.PauseTiming();
             Db.Exec("DELETE FROM texts");
             State.ResumeTiming();

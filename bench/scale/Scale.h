@@ -22,7 +22,7 @@ struct Filled {
     std::unique_ptr<VornJsonDbApi> pHandle;
 };
 
-// The one of this size. The one before is given up: a large one is dear to make and to keep.
+// The table of this size. The one before it is closed first: large ones take time and memory.
 Filled& FilledOnce(int nRows);
 
 // Time for one of nUnits parts of each iteration, shown beside the time of the whole.

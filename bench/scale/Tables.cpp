@@ -1,4 +1,4 @@
-// Cost against the number of tables that one process works on in turns.
+// Cost against the number of tables that one process uses in turn.
 
 #include <memory>
 #include <string>

@@ -31,12 +31,12 @@ class Database {
     sqlite3* m_pDb = nullptr;
 };
 
-// Has freed memory stay with the process. Otherwise a long list is built in pages that the system
-// has just taken back, and whoever goes first pays for getting them again.
+// Keeps freed memory in the process. Otherwise the system takes pages back, and whoever runs first
+// pays for getting them again.
 void KeepHeap();
 
-// Nanoseconds that this thread has computed. Others on the machine stretch the time of day, not
-// this.
+// Nanoseconds that this thread has computed. Other programs on the machine do not add to
+// it.
 double CpuNow();
 
 double Median(std::vector<double> vecValues);

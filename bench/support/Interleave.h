@@ -1,4 +1,4 @@
-// Two works measured in turns, so that whatever slows the machine down meets both.
+// Two pieces of work measured in turns, so that both are slowed down alike when the machine is.
 
 #ifndef VORN_BENCH_SUPPORT_INTERLEAVE_H
 #define VORN_BENCH_SUPPORT_INTERLEAVE_H
@@ -18,7 +18,7 @@ struct Timing {
 constexpr int kWarmUpRounds = 2;
 
 struct Rounds {
-    int nRounds;  // at least 7 make a median that stands
+    int nRounds;  // 7 or more for a steady median
     int nCalls;   // calls of each work in a round
 };
 
@@ -33,8 +33,8 @@ double TimeCalls(Work&& fnWork, int nFirst, int nCalls) {
 }
 
 // Both works are called with running numbers, the same ones. Round by round the other goes first.
-// fnBetween runs before each work's turn, unmeasured, with the turn's first number: what the one
-// has left must not lie in the other's way. The first two rounds only warm up.
+// fnBetween runs before each turn, unmeasured, with the turn's first number, to remove what the
+// other one has left. The first two rounds only warm up.
 template <class Ours, class Other, class Between>
 Timing Interleave(const Rounds& How, Ours&& fnOurs, Other&& fnOther, Between&& fnBetween) {
     std::vector<double> vecOurs;

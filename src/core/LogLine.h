@@ -16,7 +16,7 @@
 #include <cstdio>
 #include <cstring>
 
-// The base name, so that a line reads the same whatever directory the library was built in.
+// The base name, so that a line is the same in whichever directory the library was built.
 #ifdef __FILE_NAME__
 #define VORN_LOG_FILE __FILE_NAME__
 #else

@@ -7,7 +7,7 @@
 #include "../base/JsonMemory.h"
 #include "LogLine.h"
 
-// The only short condition checks: a constructor cannot return -1 and goes on in any case.
+// The only short condition checks: a constructor cannot return -1, so it continues.
 #define VORN_WARN_IF(condition)                        \
     do {                                               \
         if (condition) {                               \

@@ -50,8 +50,8 @@ int FillColumns(Json::Value& jRec, const TableTypes& Types, int n_column, char**
         if (0 <= iTmp) {
             continue;
         }
-        // The first column fails without these two lines: what reads the log tells by their
-        // absence. Pinned by RowsTest.TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions.
+        // The first column fails without these two lines, and log readers go by that.
+        // Pinned by RowsTest.TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions.
         if (i > 0) {
             VORN_LOG_PLAIN("column_name[%d]=%s", i, column_name[i]);
             VORN_LOG_PLAIN("column_value[%d]=%s", i, column_value[i]);
