@@ -200,6 +200,10 @@ TEST_F(RunnerLockTest, ErrnoThatAFreeLeavesDoesNotDecideOnTheRetry) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakePauses(), Pauses(1));
     EXPECT_EQ(TakeLog(), (Lines{FailureLine("disk I/O error", "SELECT 1", ENOSPC, 1)}));
+    // A statement that leaves errno as it finds it.
+    LockNextExec(1);
+    EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
+    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
 }
 
 TEST_F(RunnerLockTest, FailureWithoutATextIsNoLockWhateverErrnoHolds) {
