@@ -4,6 +4,7 @@
 #include <numeric>
 #include <random>
 
+#include "../../tests/support/JsonHelpers.h"
 #include "Bench.h"
 
 namespace bench {
@@ -19,12 +20,13 @@ struct Column {
 Table MakeTable(const std::string& strName, const std::vector<Column>& vecColumns) {
     Table One;
     One.strName = strName;
-    Json::Value& jMember = One.jDefinition[strName]["member"];
+    std::string strMembers;
     std::string strColumns;
     for (const Column& Each : vecColumns) {
-        jMember[Each.strName]["cpptype"] = Each.szType;
+        strMembers += Each.strName + ":" + Each.szType + ",";
         strColumns += (strColumns.empty() ? "" : ", ") + Each.strName + " " + Each.szSql;
     }
+    One.jDefinition = jsonhelpers::Definition(strName, strMembers);
     One.strSqlCreate = "CREATE TABLE IF NOT EXISTS " + strName + " (" + strColumns + ")";
     return One;
 }
@@ -54,10 +56,7 @@ constexpr int kKindCount = 8;
 }  // namespace
 
 std::unique_ptr<VornJsonDbApi> Table::Open(sqlite3* pDb) const {
-    std::string strNameCopy = strName;
-    std::string strCreateCopy = strSqlCreate;
-    Json::Value jDefinitionCopy = jDefinition;
-    return std::make_unique<VornJsonDbApi>(pDb, strNameCopy, jDefinitionCopy, strCreateCopy);
+    return jsonhelpers::NewHandle(pDb, strName, jDefinition, strSqlCreate);
 }
 
 Table EightMembers() {

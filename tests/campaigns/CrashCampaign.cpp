@@ -108,13 +108,9 @@ class Stream {
 };
 
 std::unique_ptr<VornJsonDbApi> Handle(const Database& db) {
-    std::string strName = kTable;
-    std::string strCreate =
-        "CREATE TABLE IF NOT EXISTS crash (id INTEGER PRIMARY KEY, name TEXT UNIQUE, text TEXT)";
-    Json::Value jDefinition = FromText(
-        R"({"crash":{"member":{"id":{"cpptype":"int"},"name":{"cpptype":"string"},
-            "text":{"cpptype":"string"}}}})");
-    return std::make_unique<VornJsonDbApi>(db.Get(), strName, jDefinition, strCreate);
+    return NewHandle(
+        db.Get(), kTable, Definition(kTable, "id:int,name:string,text:string"),
+        "CREATE TABLE IF NOT EXISTS crash (id INTEGER PRIMARY KEY, name TEXT UNIQUE, text TEXT)");
 }
 
 bool Run(VornJsonDbApi& handle, const Step& step) {

@@ -73,10 +73,7 @@ class Case {
         db.Run(std::string("PRAGMA journal_mode=") + m_szMode);
         // The log is written back within the operation.
         db.Run("PRAGMA wal_autocheckpoint=1");
-        std::string strName = m_table.strName;
-        std::string strCreate = m_table.strCreate;
-        Json::Value jDefinition = m_table.jDefinition;
-        return std::make_unique<VornJsonDbApi>(db.Get(), strName, jDefinition, strCreate);
+        return NewHandle(db.Get(), m_table.strName, m_table.jDefinition, m_table.strCreate);
     }
 
     void RunOnFile() {

@@ -82,12 +82,11 @@ class Case {
     std::unique_ptr<VornJsonDbApi> Prepare(const Database& db, const Table& table) const {
         table.Fill(db);
         std::string strName = table.strName;
-        std::string strCreate = table.strCreate;
         Json::Value jDefinition = table.jDefinition;
         if (!m_operation.blFirstUse) {
             VORN_JSON_DB::recType(jDefinition, strName);
         }
-        return std::make_unique<VornJsonDbApi>(db.Get(), strName, jDefinition, strCreate);
+        return NewHandle(db.Get(), strName, jDefinition, table.strCreate);
     }
 
     long Kept(bool& blFailed) {

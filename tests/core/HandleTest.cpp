@@ -32,8 +32,7 @@ Lines Joined(Lines vecFirst, const Lines& vecSecond) {
 TEST_F(HandleTest, ConstructionRunsTheCreateStatementUnchangedAndOnce) {
     const std::string strTable = UniqueTable();
     const std::string strCreate = "create  table " + strTable + "(x) ; -- as it stands";
-    const auto pHandle =
-        NewHandle(m_pDb, strTable, Definition(strTable, {{"x", "int"}}), strCreate);
+    const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, "x:int"), strCreate);
     EXPECT_EQ(TakeSql(), (Lines{strCreate}));
     EXPECT_EQ(TakeLog(), Lines());
     EXPECT_EQ(Rows("SELECT name FROM sqlite_master WHERE name = '" + strTable + "'"), strTable);
@@ -105,7 +104,7 @@ TEST_F(HandleTest, SecondHandleIsSilentWhenTheStatementToleratesTheTable) {
 TEST_F(HandleTest, HandleKeepsCopiesOfItsArguments) {
     std::string strName = UniqueTable();
     const std::string strTable = strName;
-    Json::Value jDefinition = Definition(strTable, {{"id", "int"}});
+    Json::Value jDefinition = Definition(strTable, "id:int");
     std::string strCreate = "CREATE TABLE " + strTable + " (id)";
     VornJsonDbApi handle(m_pDb, strName, jDefinition, strCreate);
     Sql("INSERT INTO " + strTable + " VALUES (5)");
@@ -125,7 +124,7 @@ TEST_F(HandleTest, HandleKeepsCopiesOfItsArguments) {
 TEST_F(HandleTest, ConstructionLeavesItsArgumentsAlone) {
     std::string strName = UniqueTable();
     const std::string strTable = strName;
-    Json::Value jDefinition = Definition(strTable, {{"id", "int"}});
+    Json::Value jDefinition = Definition(strTable, "id:int");
     const Json::Value jBefore = jDefinition;
     std::string strCreate = "CREATE TABLE " + strTable + " (id)";
     const VornJsonDbApi handle(m_pDb, strName, jDefinition, strCreate);

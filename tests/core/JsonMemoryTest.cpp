@@ -84,7 +84,7 @@ class JsonMemoryTest : public DbTest {
     std::string m_strTable = UniqueTable();
     std::string m_strCreate =
         "CREATE TABLE IF NOT EXISTS " + m_strTable + " (id INTEGER PRIMARY KEY, name TEXT)";
-    Json::Value m_jDefinition = Definition(m_strTable, {{"id", "int"}, {"name", "string"}});
+    Json::Value m_jDefinition = Definition(m_strTable, "id:int,name:string");
     const std::string m_strLong = std::string(100, 'x');
 };
 

@@ -160,7 +160,7 @@ TEST_F(RowCallbackTest, SecondColumnOfTheSameNameWins) {
 
 TEST_F(RowCallbackTest, TypesAreThoseOfTheTableWhoseStatementRanLast) {
     const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "string"}}),
+    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
                                   "CREATE TABLE " + strOther + " (id)");
     Json::Value jNoQuery;
     Json::Value jRows;
@@ -173,7 +173,7 @@ TEST_F(RowCallbackTest, TypesAreThoseOfTheTableWhoseStatementRanLast) {
 
 TEST_F(RowCallbackTest, LookupByTheCallbackAloneSpoilsTheTableNameForGood) {
     const std::string strTable = UniqueTable();
-    const Json::Value jDefinition = Definition(strTable, {{"id", "int"}});
+    const Json::Value jDefinition = Definition(strTable, "id:int");
     const auto pHandle =
         NewHandle(m_pDb, strTable, jDefinition, "CREATE TABLE " + strTable + " (id)");
     Sql("INSERT INTO " + strTable + " VALUES (1)");

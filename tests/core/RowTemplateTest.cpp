@@ -53,9 +53,8 @@ TEST_F(RowTemplateTest, RecordsOfOneStatementKeepTheirNamesOnce) {
 TEST_F(RowTemplateTest, TablesInTurnsShareANameThatBothHave) {
     EXPECT_EQ(0, InFreshProcess([this] {
                   const std::string strOther = UniqueTable();
-                  const auto pOther =
-                      NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "int"}}),
-                                "CREATE TABLE " + strOther + " (id)");
+                  const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:int"),
+                                                "CREATE TABLE " + strOther + " (id)");
                   Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
                   Sql("INSERT INTO " + strOther + " VALUES (1)");
                   const Json::Value jRows = AllOf(*m_pHandle);
@@ -146,7 +145,7 @@ TEST_F(RowTemplateTest, RecordsLiveOnWhenTheirHandleIsGone) {
     Json::Value jRows;
     const std::string strTable = UniqueTable();
     {
-        const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, {{"n", "int"}}),
+        const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, "n:int"),
                                        "CREATE TABLE " + strTable + " (n INT)");
         Sql("INSERT INTO " + strTable + " VALUES (7)");
         Json::Value jNoQuery;

@@ -2,6 +2,8 @@
 #ifndef VORNJSONDB_TESTS_CORE_ROWSFIXTURE_H
 #define VORNJSONDB_TESTS_CORE_ROWSFIXTURE_H
 
+#include <sstream>
+
 #include "../support/TableFixture.h"
 
 namespace testhost {
@@ -15,15 +17,15 @@ class RowsTest : public DbTest {
 
     // A handle on a fresh table whose columns have no type, so that SQLite keeps every text as it
     // is.
-    void Open(std::initializer_list<std::pair<const char*, const char*>> members,
-              const std::string& strMoreColumns = "") {
+    void Open(const std::string& strMembers, const std::string& strMoreColumns = "") {
         m_strTable = UniqueTable();
         std::string strColumns;
-        for (const auto& member : members) {
-            strColumns += (strColumns.empty() ? "" : ", ") + std::string(member.first);
+        std::istringstream stream(strMembers);
+        for (std::string strOne; std::getline(stream, strOne, ',');) {
+            strColumns += (strColumns.empty() ? "" : ",") + strOne.substr(0, strOne.find(':'));
         }
         m_pHandle =
-            NewHandle(m_pDb, m_strTable, Definition(m_strTable, members),
+            NewHandle(m_pDb, m_strTable, Definition(m_strTable, strMembers),
                       "CREATE TABLE " + m_strTable + " (" + strColumns + strMoreColumns + ")");
         ASSERT_EQ(TakeLog(), std::vector<std::string>());
         TakeSql();
@@ -48,7 +50,7 @@ class RowsTest : public DbTest {
 
     // What a member of the given type reads from a stored text.
     Json::Value Read(const char* szType, const std::string& strText) {
-        Open({{"a", szType}});
+        Open(std::string("a:") + szType);
         char* szSql = sqlite3_mprintf("(%Q)", strText.c_str());
         Insert(szSql);
         sqlite3_free(szSql);

@@ -16,7 +16,7 @@ const char* const kRecCheck = "0 > DbCallBackFillRec(&jTmp, n_column, column_val
 TEST_F(RowsTest, TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions) {
     for (const char* szType : {"long", "unsigned long", "unsigned", "double", "float", "uid_t",
                                "time_t", "String", "int ", "", "BOOL", "%s"}) {
-        Open({{"a", szType}, {"b", "int"}});
+        Open(std::string("a:") + szType + ",b:int");
         Insert("(1, 2)");
         Json::Value jRows;
         EXPECT_EQ(List(jRows), -1) << szType;
@@ -28,7 +28,7 @@ TEST_F(RowsTest, TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions) {
 }
 
 TEST_F(RowsTest, TypeWithoutAConversionAtALaterColumnAlsoLogsItsNameAndValue) {
-    Open({{"a", "int"}, {"b", "string"}, {"c", "double"}});
+    Open("a:int,b:string,c:double");
     Insert("(1, 'x', 2.5)");
     Json::Value jRows;
     EXPECT_EQ(List(jRows), -1);
@@ -44,7 +44,7 @@ TEST_F(RowsTest, TypeNameThatGoesOnBehindANulIsAnotherName) {
         for (const std::string& strMore :
              {std::string(1, '\0'), std::string("\0x", 2), std::string(40, '\0')}) {
             m_strTable = UniqueTable();
-            Json::Value jDefinition = Definition(m_strTable, {{"a", "int"}});
+            Json::Value jDefinition = Definition(m_strTable, "a:int");
             jDefinition[m_strTable]["member"]["a"]["cpptype"] = strName + strMore;
             m_pHandle =
                 NewHandle(m_pDb, m_strTable, jDefinition, "CREATE TABLE " + m_strTable + " (a)");
@@ -59,7 +59,7 @@ TEST_F(RowsTest, TypeNameThatGoesOnBehindANulIsAnotherName) {
 }
 
 TEST_F(RowsTest, BadRowStopsTheStatementAndEarlierRecordsStay) {
-    Open({{"a", "int"}, {"b", "double"}});
+    Open("a:int,b:double");
     Insert("(1, NULL), (2, NULL), (3, 'x'), (4, NULL)");
     Json::Value jRows = ParseJson("[\"old\"]");
     EXPECT_EQ(List(jRows), -1);
@@ -70,7 +70,7 @@ TEST_F(RowsTest, BadRowStopsTheStatementAndEarlierRecordsStay) {
 }
 
 TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRow) {
-    Open({{"id", "int"}, {"name", "string"}}, ", more DEFAULT 'm'");
+    Open("id:int,name:string", ", more DEFAULT 'm'");
     Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
     EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
     EXPECT_EQ(TakeLog(), StoppedSave({Check("!jType.isMember(strName)"), Check(kFieldCheck),
@@ -81,7 +81,7 @@ TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRow) {
 }
 
 TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRowEvenWhenItIsNull) {
-    Open({{"id", "int"}, {"name", "string"}}, ", more");
+    Open("id:int,name:string", ", more");
     Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
     EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
     EXPECT_EQ(TakeLog(), StoppedSave({Check("!jType.isMember(strName)"), Check(kFieldCheck),
@@ -92,9 +92,8 @@ TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRowEvenWhenItIsNull) {
 
 TEST_F(RowsTest, FirstColumnMissingFromTheDefinitionLogsNoNameAndValue) {
     m_strTable = UniqueTable();
-    m_pHandle =
-        NewHandle(m_pDb, m_strTable, Definition(m_strTable, {{"id", "int"}, {"name", "string"}}),
-                  "CREATE TABLE " + m_strTable + " (more DEFAULT 'm', id, name)");
+    m_pHandle = NewHandle(m_pDb, m_strTable, Definition(m_strTable, "id:int,name:string"),
+                          "CREATE TABLE " + m_strTable + " (more DEFAULT 'm', id, name)");
     Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
     EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
     EXPECT_EQ(TakeLog(),
@@ -104,7 +103,7 @@ TEST_F(RowsTest, FirstColumnMissingFromTheDefinitionLogsNoNameAndValue) {
 }
 
 TEST_F(RowsTest, NullArrayBecomesAnArrayWithTheFirstRowOnly) {
-    Open({{"a", "int"}});
+    Open("a:int");
     Json::Value jRows;
     EXPECT_EQ(List(jRows), 0);
     EXPECT_TRUE(jRows.isNull());
@@ -114,7 +113,7 @@ TEST_F(RowsTest, NullArrayBecomesAnArrayWithTheFirstRowOnly) {
 }
 
 TEST_F(RowsTest, ColumnsMayComeInAnyOrderAndNullAtAnyPlace) {
-    Open({{"z", "int"}, {"a", "string"}, {"\xC3\xBC", "bool"}, {"a1", "long long"}, {"B", "int"}});
+    Open("z:int,a:string,\xC3\xBC:bool,a1:long long,B:int");
     Insert(
         "(1, 'x', 1, 2, 3), (NULL, 'x', 1, 2, 3), (1, NULL, 1, 2, 3), (1, 'x', NULL, 2, 3), "
         "(1, 'x', 1, NULL, 3), (1, 'x', 1, 2, NULL), (NULL, NULL, NULL, NULL, NULL)");
@@ -147,7 +146,7 @@ TEST_F(RowsTest, ManyTablesEachKeepTheirOwnTypes) {
         {"string", "\"1\""}, {"int", "1"}, {"bool", "true"}};
     std::vector<Table> vecTables;
     for (size_t i = 0; i < 300; ++i) {
-        Open({{"a", aTypes[i % 3].first}, {"b", "int"}});
+        Open(std::string("a:") + aTypes[i % 3].first + ",b:int");
         Insert("(1, " + std::to_string(i) + ")");
         vecTables.push_back({m_strTable, std::move(m_pHandle),
                              "[{\"a\":" + std::string(aTypes[i % 3].second) +
@@ -165,7 +164,7 @@ TEST_F(RowsTest, ManyTablesEachKeepTheirOwnTypes) {
 }
 
 TEST_F(RowsTest, RecordsAreTheCallersToChangeAndToKeep) {
-    Open({{"a", "int"}, {"b", "Json::Value"}});
+    Open("a:int,b:Json::Value");
     Insert("(1, '{\"x\":[1]}'), (2, '{\"x\":[1]}')");
     Json::Value jRows = Listed();
     jRows[0]["b"]["x"][0] = 9;
@@ -180,7 +179,7 @@ TEST_F(RowsTest, RecordsAreTheCallersToChangeAndToKeep) {
 }
 
 TEST_F(RowsTest, LargeNumberOfRowsKeepsItsOrder) {
-    Open({{"a", "int"}});
+    Open("a:int");
     Sql("WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 2000) INSERT "
         "INTO " +
         m_strTable + " SELECT i FROM n");

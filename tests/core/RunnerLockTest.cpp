@@ -242,7 +242,7 @@ TEST_F(RunnerLockTest, TextOfThePreviousAttemptIsKeptDuringTheRetry) {
 
 TEST_F(RunnerLockTest, EveryAttemptNamesItsTableAgain) {
     const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "string"}}),
+    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
                                   "CREATE TABLE " + strOther + " (id)");
     Sql("INSERT INTO " + m_strTable + " VALUES (7, 'a')");
     LockNextExec(1);

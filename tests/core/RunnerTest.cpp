@@ -252,7 +252,7 @@ TEST_F(RunnerTest, TransactionsAreTheCallersOwn) {
 
 TEST_F(RunnerTest, RowsAreReadWithTheTypesOfTheHandleThatAsked) {
     const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, {{"id", "string"}}),
+    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
                                   "CREATE TABLE " + strOther + " (id)");
     Sql("INSERT INTO " + strOther + " VALUES (7)");
     Json::Value jNoQuery;

@@ -25,8 +25,9 @@ TEST_F(TypeName, BeginningOfAKnownNameIsUnknown) {
     for (const char* szName :
          {"", "in", "lon", "long lon", "Json::", "Json::Valu", "bo", "unsigned lon"}) {
         const std::string strTable = UniqueTable();
-        const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, {{"a", szName}}),
-                                       "CREATE TABLE " + strTable + " (a)");
+        const auto pHandle =
+            NewHandle(m_pDb, strTable, Definition(strTable, std::string("a:") + szName),
+                      "CREATE TABLE " + strTable + " (a)");
         Json::Value jRecord;
         jRecord["a"] = 1;
         EXPECT_EQ(pHandle->checkJsonType(jRecord), -1) << szName;

@@ -116,14 +116,14 @@ TEST_F(Create, DefaultOfAWrongTypeIsRefusedLikeAnyValue) {
 }
 
 TEST_F(Create, MemberOfATypeOutsideTheCheckIsRefused) {
-    VornJsonDbApi& api = Open({{"a", "unsigned int"}});
+    VornJsonDbApi& api = Open("a:unsigned int");
     ExpectFailure(api, ParseJson(R"({"a":1})"),
                   {Located("type not found!!, key=a"), Check("0 > checkJsonType(jParam)"),
                    Plain(R"(call create rec, rec={"a":1})")});
 }
 
 TEST_F(Create, TypeThatPassesTheCheckButCannotBeRenderedIsRefusedBySave) {
-    VornJsonDbApi& api = Open({{"t", "time_t"}});
+    VornJsonDbApi& api = Open("t:time_t");
     ExpectFailure(
         api, ParseJson(R"({"t":1})"),
         {Located("cannot support this type=time_t"),
@@ -172,8 +172,7 @@ TEST_F(Create, LaterFailureWithoutSqlReportsTheStaleDuplicateAgain) {
 }
 
 TEST_F(Create, RefusalByTheValuesReportsTheStaleDuplicateAgain) {
-    VornJsonDbApi& api = Open({{"id", "int"}, {"name", "string"}, {"t", "time_t"}},
-                              "id integer primary key,name text,t");
+    VornJsonDbApi& api = Open("id:int,name:string,t:time_t", "id integer primary key,name text,t");
     for (const char* szRecord : {R"({"id":1,"name":"a","t":2})", R"({"id":1,"name":"%s","t":2})"}) {
         SCOPED_TRACE(szRecord);
         MakeStaleDuplicate(api);
@@ -311,7 +310,7 @@ TEST_F(Create, LastMemberWithADefaultMakesAShortRecordComplete) {
 }
 
 TEST_F(Create, LastMemberWithoutADefaultLeavesAStatementThatSqliteRejects) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     Json::Value jIn = ParseJson(R"({"a":1})");
     Json::Value jOut;
     EXPECT_EQ(-1, api.recCreate(jIn, jOut));

@@ -15,8 +15,7 @@ class DeleteByList : public FreshTableTest {
   protected:
     // 1|a, 2|b, 3|a'b, 4|a
     VornJsonDbApi& OpenItem() {
-        VornJsonDbApi& api =
-            Open({{"id", "int"}, {"name", "string"}}, "id integer primary key,name text");
+        VornJsonDbApi& api = Open("id:int,name:string", "id integer primary key,name text");
         Sql("insert into " + m_strTable + " values (1,'a'),(2,'b'),(3,'a''b'),(4,'a');");
         return api;
     }
@@ -126,7 +125,7 @@ TEST_F(DeleteByList, OnlyTheTypeStringIsAccepted) {
           "Json::objectValue", "Json::arrayValue", "bool", "long", "unsigned long", "unsigned",
           "double", "float", "uid_t", "time_t", "String", "string ", ""}) {
         SCOPED_TRACE(szType);
-        VornJsonDbApi& api = Open({{"name", szType}});
+        VornJsonDbApi& api = Open(std::string("name:") + szType);
         ByArray(api, {"a"}, "name", -1, {Check(kType), ArrayTail("name", "a")});
     }
     EXPECT_EQ(Lines{}, TakeSql());

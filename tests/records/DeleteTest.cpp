@@ -11,8 +11,7 @@ class Delete : public FreshTableTest {
   protected:
     // Rows 1|a, 2|b, 3|a and so on up to nRows.
     VornJsonDbApi& OpenItem(int nRows) {
-        VornJsonDbApi& api =
-            Open({{"id", "int"}, {"name", "string"}}, "id integer primary key,name text");
+        VornJsonDbApi& api = Open("id:int,name:string", "id integer primary key,name text");
         for (int i = 1; i <= nRows; ++i) {
             Sql("insert into " + m_strTable + " values (" + std::to_string(i) + ",'" +
                 (i % 2 == 1 ? "a" : "b") + "');");

@@ -10,8 +10,7 @@ const char kFailed[] = "0 > recList(jRecParam, jRecArray)";
 class GetOne : public FreshTableTest {
   protected:
     VornJsonDbApi& OpenItem() {
-        VornJsonDbApi& api =
-            Open({{"id", "int"}, {"name", "string"}}, "id integer primary key,name text");
+        VornJsonDbApi& api = Open("id:int,name:string", "id integer primary key,name text");
         Sql("insert into " + m_strTable + " values (1,'a'),(2,'b'),(3,null);");
         return api;
     }
@@ -66,14 +65,14 @@ TEST_F(GetOne, NullColumnKeepsTheMemberThatTheRecordHad) {
 }
 
 TEST_F(GetOne, RowOfNullsIsFoundAndLeavesANullRecordNull) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+    VornJsonDbApi& api = Open("a:int,b:string");
     Sql("insert into " + m_strTable + " values (null,null);");
     EXPECT_EQ("null", Got(api, "{}", "null", 1));
     EXPECT_EQ(Lines{}, TakeLog());
 }
 
 TEST_F(GetOne, AddsNoLimitSoEveryRowIsConverted) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "float"}});
+    VornJsonDbApi& api = Open("a:int,b:float");
     Sql("insert into " + m_strTable + " values (1,null),(2,2.5);");
     EXPECT_EQ("{}", Got(api, "{}", "{}", -1));
     EXPECT_EQ(Lines{"SELECT a,b FROM " + m_strTable + " ;"}, TakeSql());

@@ -16,8 +16,7 @@ class List : public FreshTableTest {
   protected:
     // Three rows: 1|a, 2|b, 3|c.
     VornJsonDbApi& OpenItem() {
-        VornJsonDbApi& api =
-            Open({{"id", "int"}, {"name", "string"}}, "id integer primary key,name text");
+        VornJsonDbApi& api = Open("id:int,name:string", "id integer primary key,name text");
         Sql("insert into " + m_strTable + " values (1,'a'),(2,'b'),(3,'c');");
         return api;
     }
@@ -72,7 +71,7 @@ TEST_F(List, NullOrEmptyQueryListsTheWholeTable) {
 }
 
 TEST_F(List, ColumnsAreThoseOfTheDefinitionInNameOrder) {
-    VornJsonDbApi& api = Open({{"b", "int"}, {"a", "int"}}, "b,extra,a");
+    VornJsonDbApi& api = Open("b:int,a:int", "b,extra,a");
     Sql("insert into " + m_strTable + " values (1,'e',2);");
     EXPECT_EQ(R"([{"a":2,"b":1}])", Listed(api, "null"));
     EXPECT_EQ(Lines{"SELECT a,b FROM " + m_strTable + " ;"}, TakeSql());
@@ -276,7 +275,7 @@ TEST_F(List, StatementThatSqliteRejectsIsReportedWhole) {
 }
 
 TEST_F(List, RowsBeforeAFailingRowStay) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "double"}});
+    VornJsonDbApi& api = Open("a:int,b:double");
     Sql("insert into " + m_strTable + " values (1,null),(2,2.5),(3,null);");
     Json::Value jQuery(Json::objectValue);
     Json::Value jRows;
@@ -322,7 +321,7 @@ TEST_F(List, EveryTypeReadsItsColumnInItsOwnWay) {
     };
     for (const Case& oneCase : kCases) {
         SCOPED_TRACE(std::string(oneCase.szType) + " " + oneCase.szStored);
-        VornJsonDbApi& api = Open({{"m", oneCase.szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + oneCase.szType);
         Sql("insert into " + m_strTable + " values (" + oneCase.szStored + "),(null);");
         EXPECT_EQ("[" + std::string(oneCase.szRecord) + ",{}]", Listed(api, "null"));
     }
@@ -332,7 +331,7 @@ TEST_F(List, OtherTypesCannotBeReadBackUnlessTheColumnIsNull) {
     for (const char* szType : {"long", "unsigned long", "unsigned", "double", "float", "uid_t",
                                "time_t", "Int", "", "nonsense"}) {
         SCOPED_TRACE(szType);
-        VornJsonDbApi& api = Open({{"m", szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + szType);
         Sql("insert into " + m_strTable + " values (null);");
         EXPECT_EQ("[{}]", Listed(api, "null"));
         Sql("update " + m_strTable + " set m = 1;");
@@ -345,7 +344,7 @@ TEST_F(List, OtherTypesCannotBeReadBackUnlessTheColumnIsNull) {
 }
 
 TEST_F(List, MemberNamedLimitIsConditionAndPageAtOnce) {
-    VornJsonDbApi& api = Open({{"\"limit\"", "int"}, {"limit", "int"}}, "\"limit\"");
+    VornJsonDbApi& api = Open("\"limit\":int,limit:int", "\"limit\"");
     Json::Value jQuery = ParseJson(R"({"limit":1})");
     Json::Value jRows;
     EXPECT_EQ(-1, api.recList(jQuery, jRows));

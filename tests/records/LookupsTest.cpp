@@ -19,7 +19,7 @@ class Lookups : public FreshTableTest {
         Json::Value jNone;
         VORN_JSON_DB::recType(jNone, strTable);
         TakeLog();
-        m_jDefinition = Definition(strTable, {{"id", "int"}, {"name", "string"}});
+        m_jDefinition = Definition(strTable, "id:int,name:string");
         m_pApi = &OpenAs(strTable, m_jDefinition, "id integer primary key,name text");
         Sql("insert into " + strTable + " values (1,'a'),(2,'b');");
         m_strRows = "SELECT id,name FROM " + strTable + " ;";

@@ -12,7 +12,7 @@ class Save : public FreshTableTest {
   protected:
     VornJsonDbApi& OpenTask() {
         m_strTypes = R"({"id":{"cpptype":"int"},"name":{"cpptype":"string"}})";
-        return Open({{"id", "int"}, {"name", "string"}}, "id integer primary key,name text");
+        return Open("id:int,name:string", "id integer primary key,name text");
     }
 
     std::string Statement(const std::string& strVerb, const std::string& strNames,
@@ -108,7 +108,7 @@ TEST_F(Save, ExtraMembersAreNeitherWrittenNorReturned) {
 }
 
 TEST_F(Save, ReadBackWithoutARowFailsAndTheRowStays) {
-    VornJsonDbApi& api = Open({{"n", "int"}, {"rowid", "string"}}, "n integer,rowid text");
+    VornJsonDbApi& api = Open("n:int,rowid:string", "n integer,rowid text");
     m_strTypes = R"({"n":{"cpptype":"int"},"rowid":{"cpptype":"string"}})";
     ExpectFailure(api, ParseJson(R"({"n":5,"rowid":"own"})"), true,
                   {Check("0 == jArrayTmp.size()")});
@@ -118,7 +118,7 @@ TEST_F(Save, ReadBackWithoutARowFailsAndTheRowStays) {
 
 TEST_F(Save, FirstOfSeveralRowsReadBackIsTaken) {
     // A column of that name hides SQLite's own, so that the read-back finds all three rows.
-    VornJsonDbApi& api = Open({{"n", "int"}, {"rowid", "int"}});
+    VornJsonDbApi& api = Open("n:int,rowid:int");
     Sql("insert into " + m_strTable + " values (10,3),(11,3);");
     EXPECT_EQ(R"({"n":10,"rowid":3})", Compact(Saved(api, ParseJson(R"({"n":12,"rowid":3})"))));
     EXPECT_EQ("3", Count());
@@ -141,7 +141,7 @@ TEST_F(Save, RecordWithoutAnyMemberMakesAStatementThatSqliteRejects) {
 }
 
 TEST_F(Save, TypeThatCannotBeRenderedRunsNothing) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"t", "time_t"}});
+    VornJsonDbApi& api = Open("a:int,t:time_t");
     m_strTypes = R"({"a":{"cpptype":"int"},"t":{"cpptype":"time_t"}})";
     ExpectFailure(api, ParseJson(R"({"a":1,"t":2})"), true,
                   {Located("cannot support this type=time_t"), Check(kSymbol)});
@@ -187,7 +187,7 @@ TEST_F(Save, FailureWithoutATextIsAnUnknownError) {
 }
 
 TEST_F(Save, ColumnThatTheDefinitionLacksFailsTheReadBackAndTheRowStays) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}}, "a,extra default 'e',b");
+    VornJsonDbApi& api = Open("a:int,b:int", "a,extra default 'e',b");
     m_strTypes = R"({"a":{"cpptype":"int"},"b":{"cpptype":"int"}})";
     const std::string strSql = Statement("INSERT", "a,b", "1,2) ");
     ExpectFailure(api, ParseJson(R"({"a":1,"b":2})"), true,
@@ -201,7 +201,7 @@ TEST_F(Save, ColumnThatTheDefinitionLacksFailsTheReadBackAndTheRowStays) {
 }
 
 TEST_F(Save, DoubleIsStoredButCannotBeReadBack) {
-    VornJsonDbApi& api = Open({{"d", "double"}});
+    VornJsonDbApi& api = Open("d:double");
     m_strTypes = R"({"d":{"cpptype":"double"}})";
     const std::string strSql = Statement("INSERT", "d", "1.500000) ");
     ExpectFailure(api, ParseJson(R"({"d":1.5})"), true,
@@ -214,20 +214,15 @@ TEST_F(Save, DoubleIsStoredButCannotBeReadBack) {
 }
 
 TEST_F(Save, RowThatComesBackReplacesTheRecordWhole) {
-    VornJsonDbApi& api = Open({{"a", "string"}, {"b", "int"}, {"n", "string"}, {"z", "int"}},
-                              "a text default 'dflt',b integer,n text,z integer");
+    VornJsonDbApi& api =
+        Open("a:string,b:int,n:string,z:int", "a text default 'dflt',b integer,n text,z integer");
     EXPECT_EQ(R"({"a":"dflt","b":1,"z":0})",
               Compact(Saved(api, ParseJson(R"({"b":true,"other":{},"z":null})"))));
 }
 
 TEST_F(Save, ValuesComeBackAsTheirColumnTypes) {
-    VornJsonDbApi& api = Open({{"b", "bool"},
-                               {"i", "int"},
-                               {"l", "long long"},
-                               {"o", "Json::objectValue"},
-                               {"s", "string"},
-                               {"u", "unsigned int"},
-                               {"v", "Json::arrayValue"}});
+    VornJsonDbApi& api = Open(
+        "b:bool,i:int,l:long long,o:Json::objectValue,s:string,u:unsigned int,v:Json::arrayValue");
     EXPECT_EQ(
         R"({"b":true,"i":-3,"l":-9223372036854775808,"o":{"k":[1]},"s":"7","u":7,"v":[{},null]})",
         Compact(Saved(api, ParseJson(R"({"b":true,"i":-3,"l":-9223372036854775808,"o":{"k":[1]},
@@ -235,7 +230,7 @@ TEST_F(Save, ValuesComeBackAsTheirColumnTypes) {
 }
 
 TEST_F(Save, ApostrophesAndForeignLettersSurvive) {
-    VornJsonDbApi& api = Open({{"o", "Json::objectValue"}, {"s", "string"}});
+    VornJsonDbApi& api = Open("o:Json::objectValue,s:string");
     const Json::Value jRec =
         ParseJson(u8R"({"o":{"k'":"it's ☂"},"s":"O'Neil '' Grün 😀 ; -- \" \\"})");
     EXPECT_EQ(jRec, Saved(api, jRec));
@@ -275,7 +270,7 @@ TEST_F(Save, DoubledPercentInTheLastMemberSurvives) {
 }
 
 TEST_F(Save, DoubledPercentBeforeALaterMemberIsStoredSingle) {
-    VornJsonDbApi& api = Open({{"a", "string"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:string,b:int");
     EXPECT_EQ(R"({"a":"50%","b":1})", Compact(Saved(api, ParseJson(R"({"a":"50%%","b":1})"))));
 }
 

@@ -17,7 +17,7 @@ class Update : public FreshTableTest {
   protected:
     // Three rows: 1|a|10, 2|b|20, 3|c|30.
     VornJsonDbApi& OpenItem() {
-        VornJsonDbApi& api = Open({{"id", "int"}, {"name", "string"}, {"size", "int"}},
+        VornJsonDbApi& api = Open("id:int,name:string,size:int",
                                   "id integer primary key,name text unique,size integer");
         Sql("insert into " + m_strTable + " values (1,'a',10),(2,'b',20),(3,'c',30);");
         return api;

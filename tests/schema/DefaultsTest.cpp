@@ -87,7 +87,7 @@ TEST_F(Defaults, NullRecordBecomesAnObjectWithTheFirstDefault) {
 }
 
 TEST_F(Defaults, NullRecordStaysNullWithoutAnyDefault) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+    VornJsonDbApi& api = Open("a:int,b:string");
     Json::Value jRec;
     EXPECT_EQ(0, api.fillDefaultValue(jRec, false));
     EXPECT_TRUE(jRec.isNull());
@@ -159,7 +159,7 @@ TEST_F(Defaults, StrictNeverFillsEvenWhereADefaultExists) {
 }
 
 TEST_F(Defaults, StrictReportsOnlyTheFirstMissingInKeyOrder) {
-    VornJsonDbApi& api = Open({{"c", "int"}, {"b", "int"}, {"a", "int"}});
+    VornJsonDbApi& api = Open("c:int,b:int,a:int");
     Json::Value jRec = ParseJson(R"({"a":1})");
     EXPECT_EQ(-1, api.fillDefaultValue(jRec, true));
     EXPECT_EQ((Lines{Located("lost data member=b")}), TakeLog());

@@ -4,10 +4,9 @@
 
 #include <VornJsonDbApi.h>
 
-#include <initializer_list>
 #include <memory>
+#include <sstream>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -17,23 +16,23 @@
 namespace testhost {
 
 using Lines = std::vector<std::string>;
-using Members = std::initializer_list<std::pair<const char*, const char*>>;
 
 // A test that works through one handle (or several) on tables of the in-memory database.
 class FreshTableTest : public DbTest {
   protected:
     // One untyped column per member.
-    VornJsonDbApi& Open(Members members) {
+    VornJsonDbApi& Open(const std::string& strMembers) {
         std::string strColumns;
-        for (const auto& member : members) {
-            strColumns += (strColumns.empty() ? "" : ",") + std::string(member.first);
+        std::istringstream stream(strMembers);
+        for (std::string strOne; std::getline(stream, strOne, ',');) {
+            strColumns += (strColumns.empty() ? "" : ",") + strOne.substr(0, strOne.find(':'));
         }
-        return Open(members, strColumns);
+        return Open(strMembers, strColumns);
     }
 
-    VornJsonDbApi& Open(Members members, const std::string& strColumns) {
+    VornJsonDbApi& Open(const std::string& strMembers, const std::string& strColumns) {
         const std::string strTable = UniqueTable();
-        return OpenAs(strTable, Definition(strTable, members), strColumns);
+        return OpenAs(strTable, Definition(strTable, strMembers), strColumns);
     }
 
     // jMembers is the "member" object itself, for definitions with defaults.
@@ -44,11 +43,13 @@ class FreshTableTest : public DbTest {
         return OpenAs(strTable, jDef, strColumns);
     }
 
-    VornJsonDbApi& OpenAs(std::string strTable, Json::Value jDef, const std::string& strColumns) {
+    VornJsonDbApi& OpenAs(const std::string& strTable, const Json::Value& jDef,
+                          const std::string& strColumns) {
         m_strTable = strTable;
         TakeSql();
-        std::string strCreate = "create table if not exists " + strTable + " (" + strColumns + ");";
-        m_vecHandles.push_back(std::make_unique<VornJsonDbApi>(m_pDb, strTable, jDef, strCreate));
+        const std::string strCreate =
+            "create table if not exists " + strTable + " (" + strColumns + ");";
+        m_vecHandles.push_back(NewHandle(m_pDb, strTable, jDef, strCreate));
         EXPECT_EQ(Lines{}, TakeLog());
         EXPECT_EQ(Lines{strCreate}, TakeSql());
         return *m_vecHandles.back();

@@ -65,7 +65,7 @@ Json::Value RecordOf(const char* szJson) {
 
 TEST_F(RecordCheck, EveryKnownTypeTakesExactlyItsOwnKinds) {
     for (const Treatment& treatment : kKnown) {
-        VornJsonDbApi& api = Open({{"m", treatment.szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + treatment.szType);
         for (const char* szValue : kValues) {
             SCOPED_TRACE(std::string(treatment.szType) + " " + szValue);
             Json::Value jRec = RecordOf(szValue);
@@ -85,7 +85,7 @@ TEST_F(RecordCheck, EveryKnownTypeTakesExactlyItsOwnKinds) {
 
 TEST_F(RecordCheck, TypeNameOutsideItsTableIsNotFoundWhateverTheValue) {
     for (const char* szType : kNotFound) {
-        VornJsonDbApi& api = Open({{"m", szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + szType);
         for (const char* szValue : kValues) {
             SCOPED_TRACE(std::string(szType) + " " + szValue);
             Json::Value jRec = RecordOf(szValue);
@@ -96,14 +96,14 @@ TEST_F(RecordCheck, TypeNameOutsideItsTableIsNotFoundWhateverTheValue) {
 }
 
 TEST_F(RecordCheck, EmptyObjectPasses) {
-    VornJsonDbApi& api = Open({{"id", "int"}});
+    VornJsonDbApi& api = Open("id:int");
     Json::Value jRec(Json::objectValue);
     EXPECT_EQ(0, api.checkJsonType(jRec));
     EXPECT_EQ(Lines{}, TakeLog());
 }
 
 TEST_F(RecordCheck, ArgumentThatIsNoObjectIsRefused) {
-    VornJsonDbApi& api = Open({{"id", "int"}});
+    VornJsonDbApi& api = Open("id:int");
     for (const char* szValue : {"null", "[]", "[{\"id\":1}]", "\"id\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szValue);
         Json::Value jRec = ParseJson(szValue);
@@ -115,14 +115,14 @@ TEST_F(RecordCheck, ArgumentThatIsNoObjectIsRefused) {
 }
 
 TEST_F(RecordCheck, MembersUnknownToTheTablePassSilently) {
-    VornJsonDbApi& api = Open({{"id", "int"}});
+    VornJsonDbApi& api = Open("id:int");
     Json::Value jRec = ParseJson(R"({"a":null,"vornSqlWhereFilter":1,"zz":{"id":"x"}})");
     EXPECT_EQ(0, api.checkJsonType(jRec));
     EXPECT_EQ(Lines{}, TakeLog());
 }
 
 TEST_F(RecordCheck, IntTakesThreeButNeitherTextNorNull) {
-    VornJsonDbApi& api = Open({{"id", "int"}});
+    VornJsonDbApi& api = Open("id:int");
     Json::Value jGood = ParseJson(R"({"id":3})");
     Json::Value jText = ParseJson(R"({"id":"3"})");
     Json::Value jNull = ParseJson(R"({"id":null})");
@@ -135,28 +135,28 @@ TEST_F(RecordCheck, IntTakesThreeButNeitherTextNorNull) {
 }
 
 TEST_F(RecordCheck, NumberIsNoBoolean) {
-    VornJsonDbApi& api = Open({{"flag", "bool"}});
+    VornJsonDbApi& api = Open("flag:bool");
     Json::Value jRec = ParseJson(R"({"flag":1})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
     EXPECT_EQ((Lines{Located(R"(type failed, strKey=flag, jRecParam={"flag":1})")}), TakeLog());
 }
 
 TEST_F(RecordCheck, DoubleIsNotFound) {
-    VornJsonDbApi& api = Open({{"d", "double"}});
+    VornJsonDbApi& api = Open("d:double");
     Json::Value jRec = ParseJson(R"({"d":1.5})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
     EXPECT_EQ((Lines{Located("type not found!!, key=d")}), TakeLog());
 }
 
 TEST_F(RecordCheck, IntegersHaveNoRangeAndNoSign) {
-    VornJsonDbApi& api = Open({{"i", "int"}, {"t", "time_t"}, {"u", "uid_t"}});
+    VornJsonDbApi& api = Open("i:int,t:time_t,u:uid_t");
     Json::Value jRec = ParseJson(R"({"i":18446744073709551615,"t":-1,"u":-9223372036854775808})");
     EXPECT_EQ(0, api.checkJsonType(jRec));
     EXPECT_EQ(Lines{}, TakeLog());
 }
 
 TEST_F(RecordCheck, OnlyTheFirstMisfitInKeyOrderIsReported) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}, {"c", "bool"}});
+    VornJsonDbApi& api = Open("a:int,b:string,c:bool");
     Json::Value jRec = ParseJson(R"({"c":"no","b":2,"a":1})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
     EXPECT_EQ((Lines{Located(R"(type failed, strKey=b, jRecParam={"a":1,"b":2,"c":"no"})")}),
@@ -164,21 +164,21 @@ TEST_F(RecordCheck, OnlyTheFirstMisfitInKeyOrderIsReported) {
 }
 
 TEST_F(RecordCheck, UnknownTypeEndsTheWalkBeforeALaterMisfit) {
-    VornJsonDbApi& api = Open({{"a", "float"}, {"b", "string"}});
+    VornJsonDbApi& api = Open("a:float,b:string");
     Json::Value jRec = ParseJson(R"({"a":1.5,"b":2})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
     EXPECT_EQ((Lines{Located("type not found!!, key=a")}), TakeLog());
 }
 
 TEST_F(RecordCheck, MemberOfUnknownTypeThatTheRecordLacksDoesNotMatter) {
-    VornJsonDbApi& api = Open({{"a", "float"}, {"b", "string"}});
+    VornJsonDbApi& api = Open("a:float,b:string");
     Json::Value jRec = ParseJson(R"({"b":"x"})");
     EXPECT_EQ(0, api.checkJsonType(jRec));
     EXPECT_EQ(Lines{}, TakeLog());
 }
 
 TEST_F(RecordCheck, FailureLeavesTheErrorMessageAlone) {
-    VornJsonDbApi& api = Open({{"id", "int"}});
+    VornJsonDbApi& api = Open("id:int");
     api.setErrMsg("kept");
     Json::Value jRec = ParseJson(R"({"id":"3"})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
@@ -187,7 +187,7 @@ TEST_F(RecordCheck, FailureLeavesTheErrorMessageAlone) {
 }
 
 TEST_F(RecordCheck, TextsAreLoggedAsTheyStand) {
-    VornJsonDbApi& api = Open({{"n", "int"}});
+    VornJsonDbApi& api = Open("n:int");
     Json::Value jRec = ParseJson(u8R"({"n":"100% %s Grün ☂ 'q'"})");
     EXPECT_EQ(-1, api.checkJsonType(jRec));
     EXPECT_EQ((Lines{Located(u8R"(type failed, strKey=n, jRecParam={"n":"100% %s Grün ☂ 'q'"})")}),

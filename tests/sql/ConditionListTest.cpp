@@ -7,7 +7,7 @@ namespace {
 
 class ConditionList : public FreshTableTest {
   protected:
-    VornJsonDbApi& OpenNameAndSize() { return Open({{"name", "string"}, {"size", "int"}}); }
+    VornJsonDbApi& OpenNameAndSize() { return Open("name:string,size:int"); }
 
     std::string Expanded(VornJsonDbApi& api, const char* szQuery, int nMode, int nResult = 0) {
         std::string strSql;
@@ -59,8 +59,7 @@ TEST_F(ConditionList, AndModeWrapsTheJoinedConditions) {
 }
 
 TEST_F(ConditionList, OrModeWrapsTheJoinedConditions) {
-    EXPECT_EQ(" (a='x' or b=2 )",
-              Expanded(Open({{"a", "string"}, {"b", "int"}}), R"({"a":"x","b":2})", kOr));
+    EXPECT_EQ(" (a='x' or b=2 )", Expanded(Open("a:string,b:int"), R"({"a":"x","b":2})", kOr));
 }
 
 TEST_F(ConditionList, CommaModeJoinsWithoutWrapping) {
@@ -106,7 +105,7 @@ TEST_F(ConditionList, UnknownMembersAreSkippedSilently) {
 
 TEST_F(ConditionList, MemberNamedLimitInTheTableIsACondition) {
     EXPECT_EQ(" (limit=5 and sort_by='x' )",
-              Expanded(Open({{"limit", "int"}, {"sort_by", "string"}}, "a"),
+              Expanded(Open("limit:int,sort_by:string", "a"),
                        R"({"limit":5,"offset":1,"sort_by":"x"})", kAnd));
 }
 
@@ -117,13 +116,12 @@ TEST_F(ConditionList, ArrayValueIsAMembershipCondition) {
 }
 
 TEST_F(ConditionList, ArrayOfAJsonTypedMemberIsAMembershipToo) {
-    EXPECT_EQ(" (j in ('1''{}' ) )",
-              Expanded(Open({{"j", "Json::arrayValue"}}), R"({"j":[1,{}]})", kAnd));
+    EXPECT_EQ(" (j in ('1''{}' ) )", Expanded(Open("j:Json::arrayValue"), R"({"j":[1,{}]})", kAnd));
 }
 
 TEST_F(ConditionList, ObjectValueIsAnEquality) {
     EXPECT_EQ(R"( (j='{"k":[1]}' ))",
-              Expanded(Open({{"j", "Json::objectValue"}}), R"({"j":{"k":[1]}})", kAnd));
+              Expanded(Open("j:Json::objectValue"), R"({"j":{"k":[1]}})", kAnd));
 }
 
 TEST_F(ConditionList, NullValueIsAnEqualityWithItsStringForm) {
@@ -154,9 +152,9 @@ TEST_F(ConditionList, RawFilterLandsInASetList) {
 }
 
 TEST_F(ConditionList, RawFilterIsRawEvenWhenTheTableDefinesTheName) {
-    EXPECT_EQ(" ( a=1  )", Expanded(Open({{"vornSqlWhereFilter", "string"}}),
-                                    R"({"vornSqlWhereFilter":"a=1"})", kAnd));
-    EXPECT_EQ(" (", Left(Open({{"vornSqlWhereFilter", "int"}}), R"({"vornSqlWhereFilter":1})", kAnd,
+    EXPECT_EQ(" ( a=1  )",
+              Expanded(Open("vornSqlWhereFilter:string"), R"({"vornSqlWhereFilter":"a=1"})", kAnd));
+    EXPECT_EQ(" (", Left(Open("vornSqlWhereFilter:int"), R"({"vornSqlWhereFilter":1})", kAnd,
                          {Check("!jRecParam[jmFieldName[i]].isString()")}));
 }
 
@@ -174,7 +172,7 @@ TEST_F(ConditionList, RawFilterThatIsNoStringIsRefusedWithTheLeadInWritten) {
 }
 
 TEST_F(ConditionList, EmptyListLeavesItsJoinerBehind) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     EXPECT_EQ(" ( and b=1 )", Expanded(api, R"({"a":[],"b":1})", kAnd));
     EXPECT_EQ(" (a=1 and  )", Expanded(api, R"({"a":1,"b":[]})", kAnd));
     EXPECT_EQ(" ( or b=1 )", Expanded(api, R"({"a":[],"b":1})", kOr));
@@ -183,7 +181,7 @@ TEST_F(ConditionList, EmptyListLeavesItsJoinerBehind) {
 }
 
 TEST_F(ConditionList, EmptyListAloneCountsAsWritten) {
-    VornJsonDbApi& api = Open({{"a", "int"}});
+    VornJsonDbApi& api = Open("a:int");
     EXPECT_EQ(" ( )", Expanded(api, R"({"a":[]})", kAnd, 0));
     EXPECT_EQ("", Expanded(api, R"({"a":[]})", kComma, 0));
 }
@@ -225,7 +223,7 @@ TEST_F(ConditionList, FailingMembershipIsReportedTwiceAndLeavesWhatStands) {
 }
 
 TEST_F(ConditionList, WrongKindForABoolMemberNamesTheBoolCall) {
-    EXPECT_EQ(" (", Left(Open({{"flag", "bool"}}), R"({"flag":"yes"})", kAnd,
+    EXPECT_EQ(" (", Left(Open("flag:bool"), R"({"flag":"yes"})", kAnd,
                          {Check(R"(NULL == (szSql = sqlite3_mprintf("%d", jParam.asInt())))"),
                           Check(kMatchFailed)}));
 }
@@ -238,7 +236,7 @@ TEST_F(ConditionList, HandleWorksOnAfterAFailure) {
 
 TEST_F(ConditionList, ConditionsStandInNameOrder) {
     EXPECT_EQ(" (B=1 and a=2 and  raw  and z=3 )",
-              Expanded(Open({{"z", "int"}, {"a", "int"}, {"B", "int"}}),
+              Expanded(Open("z:int,a:int,B:int"),
                        R"({"z":3,"vornSqlWhereFilter":"raw","a":2,"B":1})", kAnd));
 }
 

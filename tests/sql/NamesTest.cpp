@@ -27,11 +27,11 @@ class Names : public FreshTableTest {
 }  // namespace
 
 TEST_F(Names, WithoutARecordEveryMemberIsListedInNameOrder) {
-    EXPECT_EQ("a,b,c", Written(Open({{"c", "int"}, {"a", "int"}, {"b", "string"}})));
+    EXPECT_EQ("a,b,c", Written(Open("c:int,a:int,b:string")));
 }
 
 TEST_F(Names, AppendsToTheTextItIsGiven) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     std::string strSql = "SELECT ";
     EXPECT_EQ(0, api.SqlExpandMemberName(strSql, nullptr));
     EXPECT_EQ("SELECT a,b", strSql);
@@ -46,44 +46,43 @@ TEST_F(Names, OrderIsThatOfTheBytes) {
 }
 
 TEST_F(Names, CompleteRecordGivesTheWholeList) {
-    EXPECT_EQ("a,b", Written(Open({{"a", "int"}, {"b", "int"}}), R"({"a":1,"b":2})"));
+    EXPECT_EQ("a,b", Written(Open("a:int,b:int"), R"({"a":1,"b":2})"));
 }
 
 TEST_F(Names, MissingMiddleMemberLeavesNoGap) {
-    EXPECT_EQ("a,c", Written(Open({{"a", "int"}, {"b", "int"}, {"c", "int"}}), R"({"a":1,"c":3})"));
+    EXPECT_EQ("a,c", Written(Open("a:int,b:int,c:int"), R"({"a":1,"c":3})"));
 }
 
 TEST_F(Names, MissingFirstMemberLeavesNoGap) {
-    EXPECT_EQ("b,c", Written(Open({{"a", "int"}, {"b", "int"}, {"c", "int"}}), R"({"b":1,"c":3})"));
+    EXPECT_EQ("b,c", Written(Open("a:int,b:int,c:int"), R"({"b":1,"c":3})"));
 }
 
 TEST_F(Names, MissingLastMemberLeavesATrailingComma) {
-    EXPECT_EQ("a,b,",
-              Written(Open({{"a", "int"}, {"b", "int"}, {"c", "int"}}), R"({"a":1,"b":3})"));
+    EXPECT_EQ("a,b,", Written(Open("a:int,b:int,c:int"), R"({"a":1,"b":3})"));
 }
 
 TEST_F(Names, RecordWithoutAnyMemberOfTheTableWritesNothing) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     EXPECT_EQ("", Written(api, "{}"));
     EXPECT_EQ("", Written(api, R"({"x":1,"A":2})"));
 }
 
 TEST_F(Names, UnknownMembersOfTheRecordAreIgnored) {
-    EXPECT_EQ("a,b", Written(Open({{"a", "int"}, {"b", "int"}}), R"({"a":1,"ab":0,"b":2,"z":3})"));
+    EXPECT_EQ("a,b", Written(Open("a:int,b:int"), R"({"a":1,"ab":0,"b":2,"z":3})"));
 }
 
 TEST_F(Names, UnknownMemberThatBeginsADeclaredNameIsIgnored) {
-    VornJsonDbApi& api = Open({{"ab", "int"}, {"abc", "int"}});
+    VornJsonDbApi& api = Open("ab:int,abc:int");
     EXPECT_EQ("abc", Written(api, R"({"a":1,"abc":2})"));
     EXPECT_EQ("ab,", Written(api, R"({"ab":1,"abcd":2})"));
 }
 
 TEST_F(Names, PresentNullCountsAsPresent) {
-    EXPECT_EQ("a,b", Written(Open({{"a", "int"}, {"b", "int"}}), R"({"a":null,"b":null})"));
+    EXPECT_EQ("a,b", Written(Open("a:int,b:int"), R"({"a":null,"b":null})"));
 }
 
 TEST_F(Names, RecordOfAWrongKindHasNoMembers) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     for (const char* szRecord : {"null", "[]", "[\"a\",\"b\"]", "\"a\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szRecord);
         EXPECT_EQ("", Written(api, szRecord));
@@ -91,13 +90,13 @@ TEST_F(Names, RecordOfAWrongKindHasNoMembers) {
 }
 
 TEST_F(Names, ElementOfAListIsNoMemberWithoutAName) {
-    VornJsonDbApi& api = Open({{"", "int"}, {"b", "int"}}, "b");
+    VornJsonDbApi& api = Open(":int,b:int", "b");
     EXPECT_EQ("", Written(api, "[7]"));
     EXPECT_EQ(",", Written(api, R"({"":7})"));
 }
 
 TEST_F(Names, SingleMemberNeedsNoComma) {
-    VornJsonDbApi& api = Open({{"only", "int"}});
+    VornJsonDbApi& api = Open("only:int");
     EXPECT_EQ("only", Written(api));
     EXPECT_EQ("only", Written(api, R"({"only":1})"));
 }
@@ -111,16 +110,15 @@ TEST_F(Names, NamesAreWrittenAsTheyStand) {
 }
 
 TEST_F(Names, EveryTypeNameIsListedEvenOneThatCannotBeRendered) {
-    EXPECT_EQ("a,b,c", Written(Open({{"a", "time_t"}, {"b", "Json::Value"}, {"c", "nonsense"}}),
-                               R"({"a":1,"b":2,"c":3})"));
+    EXPECT_EQ("a,b,c",
+              Written(Open("a:time_t,b:Json::Value,c:nonsense"), R"({"a":1,"b":2,"c":3})"));
 }
 
 TEST_F(Names, ListIsThatOfTheHandlesOwnDefinitionNotOfTheCache) {
-    VornJsonDbApi& first = Open({{"a", "int"}});
+    VornJsonDbApi& first = Open("a:int");
     Json::Value jRec = ParseJson(R"({"a":1})");
     EXPECT_EQ(0, first.checkJsonType(jRec));
-    VornJsonDbApi& second =
-        OpenAs(m_strTable, Definition(m_strTable, {{"a", "int"}, {"b", "int"}}), "a");
+    VornJsonDbApi& second = OpenAs(m_strTable, Definition(m_strTable, "a:int,b:int"), "a");
     EXPECT_EQ("a,b", Written(second));
 }
 

@@ -8,7 +8,7 @@ namespace {
 class Percent : public FreshTableTest {
   protected:
     // Three members in name order: two texts and a number.
-    VornJsonDbApi& OpenThree() { return Open({{"a", "string"}, {"b", "string"}, {"c", "int"}}); }
+    VornJsonDbApi& OpenThree() { return Open("a:string,b:string,c:int"); }
 
     std::string Rendered(VornJsonDbApi& api, const char* szRecord, std::string strSql = "(") {
         Json::Value jRec = ParseJson(szRecord);
@@ -53,14 +53,13 @@ TEST_F(Percent, DoubledSignStaysDoubledWithoutALaterPresentMember) {
 }
 
 TEST_F(Percent, DoubledSignInTheLastMemberStaysDoubled) {
-    EXPECT_EQ("('x','50%%') ",
-              Rendered(Open({{"a", "string"}, {"b", "string"}}), R"({"a":"x","b":"50%%"})"));
+    EXPECT_EQ("('x','50%%') ", Rendered(Open("a:string,b:string"), R"({"a":"x","b":"50%%"})"));
 }
 
 TEST_F(Percent, LastMemberIsStoredAsGivenWhateverItHolds) {
     for (const char* szText : kConversions) {
         SCOPED_TRACE(szText);
-        VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+        VornJsonDbApi& api = Open("a:int,b:string");
         Json::Value jRec(Json::objectValue);
         jRec["a"] = 1;
         jRec["b"] = szText;
@@ -113,7 +112,7 @@ TEST_F(Percent, SignBeforeAForeignLetterIsRefused) {
 }
 
 TEST_F(Percent, JsonTypedValueIsFormattedAgainToo) {
-    VornJsonDbApi& api = Open({{"a", "Json::objectValue"}, {"c", "int"}});
+    VornJsonDbApi& api = Open("a:Json::objectValue,c:int");
     EXPECT_EQ("('{\"k\":\"%\"}',1) ", Rendered(api, R"({"a":{"k":"%%"},"c":1})"));
     std::string strSql = "(";
     Json::Value jRec = ParseJson(R"({"a":{"k":"%s"},"c":1})");
@@ -126,19 +125,19 @@ TEST_F(Percent, MemberOfEveryRenderedTypeMakesAPass) {
     for (const char* szType : {"string", "long long", "int", "long", "bool", "unsigned long long",
                                "unsigned int", "unsigned long", "unsigned"}) {
         SCOPED_TRACE(szType);
-        VornJsonDbApi& api = Open({{"a", "string"}, {"z", szType}});
+        VornJsonDbApi& api = Open(std::string("a:string,z:") + szType);
         const std::string strOne = std::string(szType) == "string" ? "'1'" : "1";
         EXPECT_EQ("('%'," + strOne + ") ", Rendered(api, R"({"a":"%%","z":1})"));
     }
     for (const char* szType : {"float", "double"}) {
         SCOPED_TRACE(szType);
         EXPECT_EQ("('%',1.000000) ",
-                  Rendered(Open({{"a", "string"}, {"z", szType}}), R"({"a":"%%","z":1})"));
+                  Rendered(Open(std::string("a:string,z:") + szType), R"({"a":"%%","z":1})"));
     }
     for (const char* szType : {"Json::objectValue", "Json::arrayValue"}) {
         SCOPED_TRACE(szType);
         EXPECT_EQ("('%','1') ",
-                  Rendered(Open({{"a", "string"}, {"z", szType}}), R"({"a":"%%","z":1})"));
+                  Rendered(Open(std::string("a:string,z:") + szType), R"({"a":"%%","z":1})"));
     }
 }
 
@@ -183,7 +182,7 @@ TEST_F(Percent, WithoutAPresentMemberNothingIsFormatted) {
 }
 
 TEST_F(Percent, UnknownTypeIsReportedAfterTheMembersBeforeIt) {
-    VornJsonDbApi& api = Open({{"a", "string"}, {"b", "time_t"}});
+    VornJsonDbApi& api = Open("a:string,b:time_t");
     Json::Value jRec = ParseJson(R"({"a":"%s","b":1})");
     std::string strSql = "(";
     EXPECT_EQ(-1, api.SqlExpandMemberSymbol(strSql, jRec));
@@ -267,8 +266,7 @@ TEST_F(Percent, CreateReportsTheRefusalThroughItsOwnTail) {
 
 TEST_F(Percent, SignInTableAndColumnNames) {
     const std::string strTable = "\"" + UniqueTable() + "%%\"";
-    VornJsonDbApi& api =
-        OpenAs(strTable, Definition(strTable, {{"\"c%%\"", "int"}, {"d", "int"}}), "x");
+    VornJsonDbApi& api = OpenAs(strTable, Definition(strTable, "\"c%%\":int,d:int"), "x");
     Json::Value jRec = ParseJson(R"({"d":1})");
     EXPECT_EQ(-1, api.recSave(jRec, true));
     std::string strSingle = strTable;

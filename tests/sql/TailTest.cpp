@@ -8,7 +8,7 @@ namespace {
 class Tail : public FreshTableTest {
   protected:
     std::string Written(const Json::Value& jGiven) {
-        VornJsonDbApi& api = Open({{"name", "string"}});
+        VornJsonDbApi& api = Open("name:string");
         std::string strSql;
         Json::Value jFilter = jGiven;
         EXPECT_EQ(0, api.SqlFilterConditionFromJson(jFilter, strSql));
@@ -21,7 +21,7 @@ class Tail : public FreshTableTest {
     std::string Written(const char* szFilter) { return Written(ParseJson(szFilter)); }
 
     void ExpectRefused(const Json::Value& jGiven, const std::string& strCondition) {
-        VornJsonDbApi& api = Open({{"name", "string"}});
+        VornJsonDbApi& api = Open("name:string");
         std::string strSql = "x";
         Json::Value jFilter = jGiven;
         EXPECT_EQ(-1, api.SqlFilterConditionFromJson(jFilter, strSql));
@@ -53,7 +53,7 @@ TEST_F(Tail, AllFourPiecesFollowEachOtherDirectly) {
 }
 
 TEST_F(Tail, AppendsToTheTextItIsGiven) {
-    VornJsonDbApi& api = Open({{"name", "string"}});
+    VornJsonDbApi& api = Open("name:string");
     std::string strSql = "x";
     Json::Value jFilter = ParseJson(R"({"limit":1})");
     EXPECT_EQ(0, api.SqlFilterConditionFromJson(jFilter, strSql));

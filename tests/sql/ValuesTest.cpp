@@ -130,7 +130,7 @@ Json::Value RecordOf(const char* szValue) {
 
 TEST_F(Values, EveryTypeRendersEveryKindOrNamesTheMember) {
     for (const Rendering& rendering : kRenderings) {
-        VornJsonDbApi& api = Open({{"m", rendering.szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + rendering.szType);
         for (std::size_t i = 0; i < 11; ++i) {
             SCOPED_TRACE(std::string(rendering.szType) + " " + kValues[i]);
             const Json::Value jRec = RecordOf(kValues[i]);
@@ -149,7 +149,7 @@ TEST_F(Values, EveryTypeRendersEveryKindOrNamesTheMember) {
 
 TEST_F(Values, OtherTypeNamesAreRefusedWhateverTheValue) {
     for (const char* szType : kRefusedTypes) {
-        VornJsonDbApi& api = Open({{"m", szType}});
+        VornJsonDbApi& api = Open(std::string("m:") + szType);
         for (const char* szValue : kValues) {
             SCOPED_TRACE(std::string(szType) + " " + szValue);
             ExpectRefused(api, RecordOf(szValue),
@@ -159,11 +159,11 @@ TEST_F(Values, OtherTypeNamesAreRefusedWhateverTheValue) {
 }
 
 TEST_F(Values, RefusedTypeDoesNotMatterWhileTheRecordLacksTheMember) {
-    EXPECT_EQ("(1) ", Rendered(Open({{"a", "time_t"}, {"b", "int"}}), ParseJson(R"({"b":1})")));
+    EXPECT_EQ("(1) ", Rendered(Open("a:time_t,b:int"), ParseJson(R"({"b":1})")));
 }
 
 TEST_F(Values, StatementOfTheTextbook) {
-    VornJsonDbApi& api = Open({{"id", "int"}, {"name", "string"}});
+    VornJsonDbApi& api = Open("id:int,name:string");
     std::string strSql = "INSERT INTO t (id,name) VALUES (";
     Json::Value jRec = ParseJson(R"({"id":7,"name":"O'Neil"})");
     EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
@@ -171,23 +171,21 @@ TEST_F(Values, StatementOfTheTextbook) {
 }
 
 TEST_F(Values, MissingMiddleMemberLeavesNoGap) {
-    EXPECT_EQ("(1,3) ", Rendered(Open({{"a", "int"}, {"b", "int"}, {"c", "int"}}),
-                                 ParseJson(R"({"a":1,"c":3})")));
+    EXPECT_EQ("(1,3) ", Rendered(Open("a:int,b:int,c:int"), ParseJson(R"({"a":1,"c":3})")));
 }
 
 TEST_F(Values, MissingLastMemberLeavesTheListOpen) {
-    EXPECT_EQ("(1,2,", Rendered(Open({{"a", "int"}, {"b", "int"}, {"c", "int"}}),
-                                ParseJson(R"({"a":1,"b":2})")));
+    EXPECT_EQ("(1,2,", Rendered(Open("a:int,b:int,c:int"), ParseJson(R"({"a":1,"b":2})")));
 }
 
 TEST_F(Values, RecordWithoutAnyMemberOfTheTableWritesNothing) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     EXPECT_EQ("(", Rendered(api, ParseJson("{}")));
     EXPECT_EQ("(", Rendered(api, ParseJson(R"({"x":[],"y":{}})")));
 }
 
 TEST_F(Values, RecordOfAWrongKindHasNoMembers) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "int"}});
+    VornJsonDbApi& api = Open("a:int,b:int");
     for (const char* szRecord : {"null", "[]", "[1,2]", "\"a\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szRecord);
         EXPECT_EQ("(", Rendered(api, ParseJson(szRecord)));
@@ -195,29 +193,28 @@ TEST_F(Values, RecordOfAWrongKindHasNoMembers) {
 }
 
 TEST_F(Values, UnknownMembersAreIgnoredSilently) {
-    EXPECT_EQ("(1) ", Rendered(Open({{"a", "int"}}), ParseJson(R"({"a":1,"b":[],"c":"x"})")));
+    EXPECT_EQ("(1) ", Rendered(Open("a:int"), ParseJson(R"({"a":1,"b":[],"c":"x"})")));
 }
 
 TEST_F(Values, TrueIsOneAndAFloatHasSixDecimals) {
     EXPECT_EQ("(1,1.500000) ",
-              Rendered(Open({{"b", "bool"}, {"f", "float"}}), ParseJson(R"({"b":true,"f":1.5})")));
+              Rendered(Open("b:bool,f:float"), ParseJson(R"({"b":true,"f":1.5})")));
 }
 
 TEST_F(Values, FloatGoesThroughSinglePrecisionAndDoubleDoesNot) {
     EXPECT_EQ("(16777217.000000,16777216.000000) ",
-              Rendered(Open({{"d", "double"}, {"f", "float"}}),
-                       ParseJson(R"({"d":16777217,"f":16777217})")));
+              Rendered(Open("d:double,f:float"), ParseJson(R"({"d":16777217,"f":16777217})")));
 }
 
 TEST_F(Values, RealBeyondTheIntegersCannotBeRenderedAsOne) {
-    ExpectRefused(Open({{"m", "int"}}), RecordOf("1e30"),
+    ExpectRefused(Open("m:int"), RecordOf("1e30"),
                   {Located("type failed, strKey=m, jRecParam=" + Compact(RecordOf("1e30")))});
-    ExpectRefused(Open({{"m", "unsigned"}}), RecordOf("-1.5"),
+    ExpectRefused(Open("m:unsigned"), RecordOf("-1.5"),
                   {Located(R"(type failed, strKey=m, jRecParam={"m":-1.5})")});
 }
 
 TEST_F(Values, FirstRealBeyondARangeIsRefusedInsteadOfChangingItsSign) {
-    VornJsonDbApi& api = Open({{"s", "long long"}, {"u", "unsigned long long"}});
+    VornJsonDbApi& api = Open("s:long long,u:unsigned long long");
     Json::Value jRec;
     jRec["s"] = 9223372036854775808.0;
     ExpectRefused(api, jRec, {Located("type failed, strKey=s, jRecParam=" + Compact(jRec))});
@@ -229,7 +226,7 @@ TEST_F(Values, FirstRealBeyondARangeIsRefusedInsteadOfChangingItsSign) {
 }
 
 TEST_F(Values, FailureAfterEarlierMembersLeavesTheTextUnchanged) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}, {"c", "time_t"}});
+    VornJsonDbApi& api = Open("a:int,b:string,c:time_t");
     ExpectRefused(api, ParseJson(R"({"a":1,"b":"x","c":3})"),
                   {Located("cannot support this type=time_t")});
     ExpectRefused(api, ParseJson(R"({"a":1,"b":[]})"),
@@ -238,10 +235,9 @@ TEST_F(Values, FailureAfterEarlierMembersLeavesTheTextUnchanged) {
 }
 
 TEST_F(Values, MemberThatTheCachedTypesLackIsRefusedEvenWhenTheRecordLacksIt) {
-    VornJsonDbApi& first = Open({{"a", "int"}});
+    VornJsonDbApi& first = Open("a:int");
     EXPECT_EQ("(1) ", Rendered(first, ParseJson(R"({"a":1})")));
-    VornJsonDbApi& second =
-        OpenAs(m_strTable, Definition(m_strTable, {{"a", "int"}, {"b", "int"}}), "a");
+    VornJsonDbApi& second = OpenAs(m_strTable, Definition(m_strTable, "a:int,b:int"), "a");
     ExpectRefused(second, ParseJson(R"({"a":1,"b":2})"), {Check("!jType.isMember(strKey)")});
     ExpectRefused(second, ParseJson(R"({"a":1})"), {Check("!jType.isMember(strKey)")});
 }
@@ -261,11 +257,11 @@ TEST_F(Values, TextEndsAtAnEmbeddedNul) {
     Json::Value jRec(Json::objectValue);
     jRec["a"] = Json::Value(std::string("ab\0cd", 5));
     jRec["b"] = 1;
-    EXPECT_EQ("('ab',1) ", Rendered(Open({{"a", "string"}, {"b", "int"}}), jRec));
+    EXPECT_EQ("('ab',1) ", Rendered(Open("a:string,b:int"), jRec));
 }
 
 TEST_F(Values, NulInTheCallersTextCutsItThereBeforeEachMember) {
-    VornJsonDbApi& api = Open({{"a", "int"}, {"b", "string"}});
+    VornJsonDbApi& api = Open("a:int,b:string");
     Json::Value jRec = ParseJson(R"({"a":7,"b":"x"})");
     std::string strSql("VALUES\0 (", 9);
     EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
@@ -276,18 +272,17 @@ TEST_F(Values, NulInTheCallersTextCutsItThereBeforeEachMember) {
 TEST_F(Values, EmbeddedNulInsideJsonTextIsEscapedAndKept) {
     Json::Value jRec(Json::objectValue);
     jRec["a"]["k"] = Json::Value(std::string("ab\0cd", 5));
-    EXPECT_EQ("('{\"k\":\"ab\\u0000cd\"}') ", Rendered(Open({{"a", "Json::objectValue"}}), jRec));
+    EXPECT_EQ("('{\"k\":\"ab\\u0000cd\"}') ", Rendered(Open("a:Json::objectValue"), jRec));
 }
 
 TEST_F(Values, ForeignLettersStayAsTheyAre) {
-    EXPECT_EQ(u8"('Grün ☂ 😀','[\"é\"]') ",
-              Rendered(Open({{"a", "string"}, {"b", "Json::arrayValue"}}),
-                       ParseJson(u8R"({"a":"Grün ☂ 😀","b":["é"]})")));
+    EXPECT_EQ(u8"('Grün ☂ 😀','[\"é\"]') ", Rendered(Open("a:string,b:Json::arrayValue"),
+                                                    ParseJson(u8R"({"a":"Grün ☂ 😀","b":["é"]})")));
 }
 
 TEST_F(Values, OnlySingleQuotesAreDoubled) {
     EXPECT_EQ("('''\"\\`;--\n''''') ",
-              Rendered(Open({{"a", "string"}}), ParseJson(R"({"a":"'\"\\`;--\n''"})")));
+              Rendered(Open("a:string"), ParseJson(R"({"a":"'\"\\`;--\n''"})")));
 }
 
 TEST_F(Values, TextOfAMillionBytesIsRenderedWhole) {
@@ -295,7 +290,7 @@ TEST_F(Values, TextOfAMillionBytesIsRenderedWhole) {
     jRec["a"] = LongText();
     jRec["b"] = LongText();
     const std::string strExpected = "('" + LongText() + "','" + LongText() + "') ";
-    EXPECT_TRUE(strExpected == Rendered(Open({{"a", "string"}, {"b", "string"}}), jRec));
+    EXPECT_TRUE(strExpected == Rendered(Open("a:string,b:string"), jRec));
 }
 
 TEST_F(Values, FiveHundredAndTwelveMembers) {
@@ -317,7 +312,7 @@ TEST_F(Values, FiveHundredAndTwelveMembers) {
 }
 
 TEST_F(Values, FormatterWithoutMemoryRaisesLogicErrorAndKeepsTheText) {
-    VornJsonDbApi& api = Open({{"a", "string"}, {"b", "double"}});
+    VornJsonDbApi& api = Open("a:string,b:double");
     Json::Value jRec(Json::objectValue);
     jRec["a"] = LongText();
     jRec["b"] = 1e300;

@@ -8,12 +8,6 @@
 
 namespace testhost {
 
-// The constructor takes its arguments by reference; this one takes them as they come.
-inline std::unique_ptr<VornJsonDbApi> NewHandle(sqlite3* pDb, std::string strName,
-                                                Json::Value jTableDef, std::string strSqlCreate) {
-    return std::make_unique<VornJsonDbApi>(pDb, strName, jTableDef, strSqlCreate);
-}
-
 // The handle's last SQL error. It has no accessor; a refused query shows it in its log lines, and
 // runs no statement.
 inline std::string SqlErrorOf(VornJsonDbApi& handle) {
@@ -38,7 +32,7 @@ class TableTest : public DbTest {
     void SetUp() override {
         DbTest::SetUp();
         m_strTable = UniqueTable();
-        m_jDefinition = Definition(m_strTable, {{"id", "int"}, {"name", "string"}});
+        m_jDefinition = Definition(m_strTable, "id:int,name:string");
         m_strCreate = "CREATE TABLE " + m_strTable + " (id INTEGER PRIMARY KEY, name TEXT)";
         m_pHandle = NewHandle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
         ASSERT_EQ(TakeLog(), std::vector<std::string>());

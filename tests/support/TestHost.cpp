@@ -94,33 +94,9 @@ std::string DbTest::Rows(const std::string& strSql) {
 }
 
 Json::Value ParseJson(const std::string& strText) {
-    Json::CharReaderBuilder builder;
-    Json::CharReaderBuilder::strictMode(&builder.settings_);
-    builder["strictRoot"] = false;
-    const std::unique_ptr<Json::CharReader> pReader(builder.newCharReader());
     Json::Value jValue;
-    std::string strError;
-    const bool blParsed =
-        pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, &strError);
-    EXPECT_TRUE(blParsed) << strText << "\n" << strError;
+    EXPECT_TRUE(jsonhelpers::Parse(strText, jValue)) << strText;
     return jValue;
-}
-
-std::string Compact(const Json::Value& jValue) {
-    Json::StreamWriterBuilder builder;
-    builder["indentation"] = "";
-    builder["emitUTF8"] = true;
-    return Json::writeString(builder, jValue);
-}
-
-Json::Value Definition(const std::string& strTable,
-                       std::initializer_list<std::pair<const char*, const char*>> listMembers) {
-    Json::Value jDefinition(Json::objectValue);
-    Json::Value& jMember = jDefinition[strTable]["member"] = Json::Value(Json::objectValue);
-    for (const auto& member : listMembers) {
-        jMember[member.first]["cpptype"] = member.second;
-    }
-    return jDefinition;
 }
 
 std::string UniqueTable() {

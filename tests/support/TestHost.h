@@ -8,7 +8,6 @@
 #include <VornJsonDbApi.h>
 
 #include <functional>
-#include <initializer_list>
 #include <string>
 #include <utility>
 #include <vector>
@@ -16,6 +15,8 @@
 #include <gtest/gtest.h>
 #include <json/json.h>
 #include <sqlite3.h>
+
+#include "JsonHelpers.h"
 
 namespace testhost {
 
@@ -110,12 +111,14 @@ class DbTest : public ::testing::Test {
 };
 
 // ---- JSON --------------------------------------------------------------------------------------
-Json::Value ParseJson(const std::string& strText);  // strict; a malformed text fails the test
-std::string Compact(const Json::Value& jValue);     // one line, UTF-8
+using jsonhelpers::Compact;
+using jsonhelpers::Definition;
+using jsonhelpers::KindsOf;
+using jsonhelpers::NewHandle;
+using jsonhelpers::ReadLeniently;
 
-// {"table":{"member":{"id":{"cpptype":"int"},...}}}
-Json::Value Definition(const std::string& strTable,
-                       std::initializer_list<std::pair<const char*, const char*>> listMembers);
+// Strict; a malformed text fails the test.
+Json::Value ParseJson(const std::string& strText);
 
 // A fresh table name per call, because the type cache is process-wide.
 std::string UniqueTable();

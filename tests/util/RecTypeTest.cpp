@@ -304,7 +304,7 @@ TEST_F(RecTypeTest, RefusalShowsTheCacheOfAllTables) {
 TEST_F(RecTypeTest, EntryMadeByReadingAnUnknownMemberIsAnUnknownType) {
     EXPECT_EQ(0, InFreshProcess([] {
                   std::string strTable = "t";
-                  Json::Value jDefinition = Definition(strTable, {{"a", "int"}});
+                  Json::Value jDefinition = Definition(strTable, "a:int");
                   // The reference is not const, so this makes a null entry.
                   EXPECT_TRUE(VORN_JSON_DB::recType(jDefinition, strTable)["nosuch"].isNull());
                   std::string strCreate = "CREATE TABLE t (a)";
@@ -332,7 +332,7 @@ TEST_F(RecTypeTest, CallsFromTheDestructorOfAStaticStillWork) {
                   };
                   static Late s_Late;
                   std::string strTable = "t";
-                  Json::Value jDefinition = Definition(strTable, {{"a", "int"}});
+                  Json::Value jDefinition = Definition(strTable, "a:int");
                   EXPECT_TRUE(VORN_JSON_DB::recType(jDefinition, strTable).isMember("a"));
               }));
 }

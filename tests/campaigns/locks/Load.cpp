@@ -19,14 +19,10 @@ constexpr int kProcesses = 8;
 }  // namespace
 
 std::unique_ptr<VornJsonDbApi> LoadHandle(const Database& db) {
-    std::string strName = kTable;
-    std::string strCreate =
+    return NewHandle(
+        db.Get(), kTable, Definition(kTable, "id:int,name:string,owner:int,text:string"),
         "CREATE TABLE IF NOT EXISTS load (id INTEGER PRIMARY KEY, name TEXT UNIQUE, owner INTEGER, "
-        "text TEXT)";
-    Json::Value jDefinition = FromText(
-        R"({"load":{"member":{"id":{"cpptype":"int"},"name":{"cpptype":"string"},
-            "owner":{"cpptype":"int"},"text":{"cpptype":"string"}}}})");
-    return std::make_unique<VornJsonDbApi>(db.Get(), strName, jDefinition, strCreate);
+        "text TEXT)");
 }
 
 Json::Value LoadRecord(int nKey, int nOwner, const std::string& strText) {

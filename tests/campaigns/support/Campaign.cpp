@@ -207,10 +207,7 @@ Json::Value FromText(const std::string& strText) {
 }
 
 std::string ToText(const Json::Value& jValue) {
-    Json::StreamWriterBuilder builder;
-    builder["indentation"] = "";
-    builder["emitUTF8"] = true;
-    return Json::writeString(builder, jValue);
+    return jsonhelpers::Compact(jValue);
 }
 
 }  // namespace campaign

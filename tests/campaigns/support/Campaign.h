@@ -12,6 +12,8 @@
 #include <json/json.h>
 #include <sqlite3.h>
 
+#include "../../support/JsonHelpers.h"
+
 namespace campaign {
 
 // ---- options ------------------------------------------------------------------------------------
@@ -73,6 +75,8 @@ bool InChild(const std::string& strWhat, const std::function<void()>& fn);
 Json::Value AskChild(const std::function<Json::Value()>& fn);
 
 // ---- JSON ---------------------------------------------------------------------------------------
+using jsonhelpers::Definition;
+using jsonhelpers::NewHandle;
 Json::Value FromText(const std::string& strText);
 std::string ToText(const Json::Value& jValue);
 
