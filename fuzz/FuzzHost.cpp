@@ -1,23 +1,79 @@
 #include "FuzzHost.h"
 
+#include <dlfcn.h>
+
+#include <cerrno>
 #include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <deque>
 #include <new>
-#include <sstream>
 #include <stdexcept>
 
-// scripts/fuzz.sh makes the function's static visible under this name.
-extern Json::Value* g_pjTypeCache __asm__("vornjsondb_fuzz_type_cache");
+#include "../src/schema/KnownTables.h"
 
-// The log would drown everything else and cost most of the time.
+namespace {
+
+using RowCallback = int (*)(void*, int, char**, char**);
+using ExecFunction = int (*)(sqlite3*, const char*, RowCallback, void*, char**);
+
+// The last statement that failed, and how often the library has paused since it first did.
+struct Failure {
+    std::string strSql;
+    std::string strError;
+    int nStatus = SQLITE_OK;
+    int nErrno = 0;
+    int nPauses = 0;
+};
+Failure g_Failure;
+
+// What the library does in one operation at most.
+constexpr int kMaxPauses = 500;
+// The first retry runs. Nobody else holds these databases, so the others would bring what it
+// brought, and the fuzzer is good at finding the text that stands for a lock.
+constexpr int kRunRetries = 1;
+
+}  // namespace
+
 extern "C" {
-void syslog(int, const char*, ...) {}
-void vsyslog(int, const char*, va_list) {}
-void __syslog_chk(int, int, const char*, ...) {}
+
+// The line is made, so that every argument is read, and goes nowhere.
+__attribute__((format(printf, 2, 3))) void syslog(int, const char* szFormat, ...) {
+    char szLine[256];
+    va_list args;
+    va_start(args, szFormat);
+    std::vsnprintf(szLine, sizeof(szLine), szFormat, args);
+    va_end(args);
 }
+
+int usleep(useconds_t) {
+    ++g_Failure.nPauses;
+    fuzzhost::Require(g_Failure.nPauses <= kMaxPauses, "a retry ends");
+    return 0;
+}
+
+int sqlite3_exec(sqlite3* pDb, const char* szSql, RowCallback callback, void* pArg,
+                 char** ppszError) {
+    static const auto s_pfnReal = reinterpret_cast<ExecFunction>(dlsym(RTLD_NEXT, "sqlite3_exec"));
+    if (g_Failure.nPauses > kRunRetries) {
+        fuzzhost::Require(g_Failure.strSql == szSql, "a retry runs the same statement");
+        if (!g_Failure.strError.empty()) {
+            *ppszError = sqlite3_mprintf("%s", g_Failure.strError.c_str());
+        }
+        errno = g_Failure.nErrno;
+        return g_Failure.nStatus;
+    }
+    const int nStatus = s_pfnReal(pDb, szSql, callback, pArg, ppszError);
+    if (nStatus == SQLITE_OK) {
+        g_Failure.nPauses = 0;
+    } else {
+        g_Failure = Failure{szSql, *ppszError == nullptr ? "" : *ppszError, nStatus, errno,
+                            g_Failure.nPauses};
+    }
+    return nStatus;
+}
+
+}  // extern "C"
 
 namespace fuzzhost {
 
@@ -28,26 +84,12 @@ void Require(bool blKept, const char* szPromise) {
     }
 }
 
-void ForgetTypes() {
-    // A first lookup constructs the static.
-    static const bool s_blMade = [] {
-        Json::Value jNone;
-        std::string strNone = "none";
-        VORN_JSON_DB::recType(jNone, strNone);
-        return true;
-    }();
-    Require(s_blMade, "the type cache exists");
-    // Kept, because the library relies on the entries' addresses for as long as the process runs.
-    static std::deque<Json::Value> s_vecOld;
-    s_vecOld.emplace_back();
-    s_vecOld.back().swap(*g_pjTypeCache);
-}
-
 Database::Database(const char* szCreate) {
     Require(sqlite3_open(":memory:", &m_pDb) == SQLITE_OK, "a database opens");
     sqlite3_limit(m_pDb, SQLITE_LIMIT_LENGTH, 1 << 20);
     sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, 1 << 18);
-    Require(sqlite3_exec(m_pDb, szCreate, nullptr, nullptr, nullptr) == SQLITE_OK, szCreate);
+    char* szError = nullptr;
+    Require(sqlite3_exec(m_pDb, szCreate, nullptr, nullptr, &szError) == SQLITE_OK, szCreate);
     sqlite3_set_authorizer(m_pDb, Authorize, this);
     sqlite3_progress_handler(m_pDb, 1000, Tick, this);
     m_blFenced = true;
@@ -99,8 +141,19 @@ int Database::Tick(void* pSelf) {
     return ++static_cast<Database*>(pSelf)->m_nTicks > 200 ? 1 : 0;
 }
 
+void ForgetTables() {
+    vornjsondb::KnownTables::OfProcess().Forget();
+}
+
+void Begin(Database& Db) {
+    ForgetTables();
+    sqlite3_set_last_insert_rowid(Db.Get(), 0);
+    errno = 0;
+}
+
 int Call(Database& Db, const std::function<int()>& fn) {
     Db.Rearm();
+    g_Failure.nPauses = 0;
     int nResult = -1;
     try {
         nResult = fn();
@@ -109,55 +162,10 @@ int Call(Database& Db, const std::function<int()>& fn) {
     } catch (const std::logic_error&) {
         nResult = -1;
     }
+    g_Failure.nPauses = 0;
     Require(sqlite3_next_stmt(Db.Get(), nullptr) == nullptr, "no statement stays open");
     Require(sqlite3_get_autocommit(Db.Get()) != 0, "no transaction stays open");
     return nResult;
-}
-
-bool Parse(const std::string& strText, Json::Value& jOut) {
-    Json::CharReaderBuilder Builder;
-    Json::CharReaderBuilder::strictMode(&Builder.settings_);
-    Builder["strictRoot"] = false;
-    // Twin keys stop the reader in strict mode, and are worth a try here.
-    Builder["rejectDupKeys"] = false;
-    const std::unique_ptr<Json::CharReader> pReader(Builder.newCharReader());
-    try {
-        return pReader->parse(strText.data(), strText.data() + strText.size(), &jOut, nullptr);
-    } catch (const Json::Exception&) {
-        return false;
-    }
-}
-
-Json::Value ReadLeniently(const char* szText) {
-    Json::CharReaderBuilder Builder;
-    Builder["collectComments"] = false;
-    const std::unique_ptr<Json::CharReader> pReader(Builder.newCharReader());
-    Json::Value jResult;
-    try {
-        pReader->parse(szText, szText + std::strlen(szText), &jResult, nullptr);
-    } catch (const Json::Exception&) {
-        Require(false, "JSON that is nested too deep is refused");
-    }
-    return jResult;
-}
-
-std::string Compact(const Json::Value& jValue) {
-    Json::StreamWriterBuilder Builder;
-    Builder["indentation"] = "";
-    Builder["emitUTF8"] = true;
-    return Json::writeString(Builder, jValue);
-}
-
-Json::Value Definition(const std::string& strTable, const std::string& strMembers) {
-    Json::Value jDefinition;
-    std::istringstream Stream(strMembers);
-    for (std::string strOne; std::getline(Stream, strOne, ',');) {
-        // The type may hold colons, a name does not.
-        const size_t nColon = strOne.find(':');
-        jDefinition[strTable]["member"][strOne.substr(0, nColon)]["cpptype"] =
-            strOne.substr(nColon + 1);
-    }
-    return jDefinition;
 }
 
 std::unique_ptr<VornJsonDbApi> NewHandle(Database& Db, std::string strTable, Json::Value jTableDef,

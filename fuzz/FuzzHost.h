@@ -19,10 +19,6 @@ constexpr size_t kMaxInput = 4096;
 // Ends the process with a message that names the broken promise.
 void Require(bool blKept, const char* szPromise);
 
-// Empties the library's cache of member types, so that each input starts like a new process and a
-// finding repeats by its input alone.
-void ForgetTypes();
-
 // A database in memory that runs row statements on its own tables and refuses everything else:
 // raw filter text reaches SQLite as it stands, and an input must not write files or run for ever.
 class Database {
@@ -53,22 +49,16 @@ class Database {
     int m_nTicks = 0;
 };
 
+// Empties what the library knows of all tables.
+void ForgetTables();
+
+// Called before an input's first handle: it starts like a new process, so that a finding repeats by
+// its input alone.
+void Begin(Database& Db);
+
 // Runs a call of the library. Only std::bad_alloc and std::logic_error may leave it, and no
 // statement may stay open.
 int Call(Database& Db, const std::function<int()>& fn);
-
-// The strict JSON of an input; false when it is none.
-bool Parse(const std::string& strText, Json::Value& jOut);
-
-// What JsonCpp's reader makes of a text, in its usual mode. A text that is nested too deep breaks a
-// promise: the library refuses it.
-Json::Value ReadLeniently(const char* szText);
-
-// One line of JSON by a writer of its own.
-std::string Compact(const Json::Value& jValue);
-
-// {"<table>":{"member":{"<name>":{"cpptype":"<type>"},...}}} from "name:type,name:type".
-Json::Value Definition(const std::string& strTable, const std::string& strMembers);
 
 std::unique_ptr<VornJsonDbApi> NewHandle(Database& Db, std::string strTable, Json::Value jTableDef,
                                          std::string strCreate);

@@ -1,10 +1,11 @@
 // The input is a text that holds anything, then the values that follow it, each behind a byte 1.
 // What the scanner accepts is compared with sqlite3_mprintf itself, given arguments that nobody may
-// take.
+// take, and what it refuses holds a conversion.
 
 #include "../src/base/SqlText.h"
 #include "../src/sql/AccumulatedFormat.h"
 #include "FuzzHost.h"
+#include "JsonValues.h"
 
 using namespace fuzzhost;
 using vornjsondb::AccumulatedFormat;
@@ -19,6 +20,18 @@ std::string Formatted(const std::string& strFormat, const char* szValue) {
     Require(szOne && szTwo, "the formatter gives a text");
     Require(std::string(szOne.get()) == szTwo.get(), "no argument is taken that was not passed");
     return szOne.get();
+}
+
+// Percent signs in a row make pairs; an odd one takes what follows it.
+bool HoldsConversion(const std::string& strFormat) {
+    size_t nSigns = 0;
+    for (const char* p = strFormat.c_str(); *p != '\0'; ++p) {
+        if (*p != '%' && nSigns % 2 == 1) {
+            return true;
+        }
+        nSigns = *p == '%' ? nSigns + 1 : 0;
+    }
+    return false;
 }
 
 }  // namespace
@@ -39,6 +52,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
         nEnd = strInput.find('\1', nBegin);
         const std::string strValue =
             strInput.substr(nBegin, nEnd == std::string::npos ? std::string::npos : nEnd - nBegin);
+        Require(Text.HoldsConversion() == HoldsConversion(strModel), "a conversion is refused");
         if (Text.HoldsConversion()) {
             return 0;
         }

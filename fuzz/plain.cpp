@@ -1,38 +1,33 @@
-// The input is a JSON text. Where the fast reader or writer takes it, JsonCpp's own must agree.
+// The input is a JSON text or a hostile value. Where the fast reader or writer takes it, JsonCpp's
+// own must agree.
 
+#include "../src/base/JsonText.h"
 #include "../src/base/PlainJson.h"
 #include "FuzzHost.h"
+#include "JsonValues.h"
 
 using namespace fuzzhost;
 
-namespace {
-
-std::string KindsOf(const Json::Value& jValue) {
-    std::string strKinds = std::to_string(jValue.type());
-    for (const Json::Value& jChild : jValue) {
-        strKinds += '(' + KindsOf(jChild) + ')';
-    }
-    return strKinds;
-}
-
-}  // namespace
-
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
-    // A C string, as a column's text is.
-    const std::string strText(reinterpret_cast<const char*>(pData), nSize);
-    if (nSize > kMaxInput || strText.find('\0') != std::string::npos) {
+    Json::Value jExpected;
+    if (nSize > kMaxInput) {
         return 0;
     }
-    Json::Value jExpected;
-    const bool blParsed = Parse(strText, jExpected);
+    const bool blTaken = TakeValue(pData, nSize, jExpected);
+    const std::string strText(reinterpret_cast<const char*>(pData), nSize);
     Json::Value jRead;
     if (vornjsondb::ReadPlainJson(strText.c_str(), strText.length(), jRead)) {
-        Require(blParsed, "what is read is JSON");
-        Require(jRead == jExpected && KindsOf(jRead) == KindsOf(jExpected), "the values are equal");
+        Require(blTaken, "what is read is JSON");
+        Require(Same(jRead, jExpected), "the values are equal");
     }
+    if (!blTaken) {
+        return 0;
+    }
+    const std::string strExpected = Compact(jExpected);
     std::string strWritten;
-    if (blParsed && vornjsondb::WritePlainJson(jExpected, strWritten)) {
-        Require(strWritten == Compact(jExpected), "the texts are equal");
+    if (vornjsondb::WritePlainJson(jExpected, strWritten)) {
+        Require(strWritten == strExpected, "the texts are equal");
     }
+    Require(vornjsondb::ToString(jExpected) == strExpected, "what is not plain is written, too");
     return 0;
 }

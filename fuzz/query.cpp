@@ -1,7 +1,8 @@
-// The first byte selects the operation, the rest is its query object; an update finds its values
-// under "set".
+// The first byte selects the operation, the rest is its query object, as JSON text or as a hostile
+// value; an update finds its values under "set".
 
 #include "FuzzHost.h"
+#include "JsonValues.h"
 
 using namespace fuzzhost;
 
@@ -38,17 +39,35 @@ int Operate(VornJsonDbApi& Handle, unsigned nOperation, Json::Value& jQuery) {
     }
 }
 
+// A hole in an array is a null, wherever it stands.
+void CheckHoles(Database& Db, VornJsonDbApi& Handle, const Json::Value& jQuery, int nJoin) {
+    Json::Value jGiven = jQuery;
+    Json::Value jFilled = WithoutHoles(jQuery);
+    std::string strGiven;
+    std::string strFilled;
+    const int nGiven =
+        Call(Db, [&] { return Handle.SqlExpandMemberList(jGiven, strGiven, nJoin); });
+    const int nFilled =
+        Call(Db, [&] { return Handle.SqlExpandMemberList(jFilled, strFilled, nJoin); });
+    Require(nGiven == nFilled && strGiven == strFilled, "a hole in a condition is a null");
+    Require(Same(jGiven, jQuery), "a condition leaves the query alone");
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     Json::Value jQuery;
-    if (nSize < 2 || nSize > kMaxInput ||
-        !Parse(std::string(reinterpret_cast<const char*>(pData) + 1, nSize - 1), jQuery)) {
+    if (nSize < 2 || nSize > kMaxInput || !TakeValue(pData + 1, nSize - 1, jQuery)) {
         return 0;
     }
     static Database s_Db("CREATE TABLE t(a, b, c, d, e, f, \"limit\")");
+    static const Json::Value s_jDefinition = Definition("t", kMembers);
     s_Db.Run(kRows);
-    const auto pHandle = NewHandle(s_Db, "t", Definition("t", kMembers), "SELECT 1");
+    Begin(s_Db);
+    const auto pHandle = NewHandle(s_Db, "t", s_jDefinition, "SELECT 1");
+    if (IsHostile(pData + 1, nSize - 1)) {
+        CheckHoles(s_Db, *pHandle, jQuery, pData[0] % 3);
+    }
     const int nResult = Call(s_Db, [&] { return Operate(*pHandle, pData[0], jQuery); });
     Require(nResult >= -1, "no answer below -1");
     Require(pHandle->runSqlEx("DELETE FROM t") >= 0, "the handle works on");

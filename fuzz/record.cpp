@@ -1,7 +1,8 @@
-// The first byte selects the table and the operation, the rest is the record: created, inserted or
-// replaced.
+// The first byte selects the table and the operation, the rest is the record, as JSON text or as a
+// hostile value: created, inserted or replaced.
 
 #include "FuzzHost.h"
+#include "JsonValues.h"
 
 using namespace fuzzhost;
 
@@ -14,11 +15,21 @@ constexpr const char* kMembers[] = {
     "a:long,b:unsigned long,c:unsigned,d:double,e:float,f:uid_t,z:nonsense",
 };
 
-// The stored text is what was given, up to the first NUL: told apart from the percent sign's rules.
-void CheckStored(Database& Db, const std::string& strTable, const Json::Value& jGiven) {
-    if (Compact(jGiven).find('%') == std::string::npos && jGiven["z"].isString()) {
-        const std::string strGiven = jGiven["z"].asCString();
-        Require(Db.Run("SELECT z FROM " + strTable) == strGiven, "the given text is stored");
+// The stored text is what was given, up to the first NUL; told apart from the percent sign's rules.
+void CheckStored(Database& Db, unsigned nTable, const Json::Value& jGiven) {
+    if (Compact(jGiven).find('%') != std::string::npos) {
+        return;
+    }
+    const std::string strFrom = std::string(" FROM ") + kTables[nTable];
+    if (jGiven["z"].isString()) {
+        Require(Db.Run("SELECT z" + strFrom) == jGiven["z"].asCString(), "a text is stored");
+    }
+    for (const char* szName : {"e", "f"}) {
+        const Json::Value& jPart = jGiven[szName];
+        if (nTable == 0 && (jPart.isArray() || jPart.isObject())) {
+            Require(Db.Run(std::string("SELECT ") + szName + strFrom) == Compact(jPart),
+                    "JSON is stored whole");
+        }
     }
 }
 
@@ -26,8 +37,7 @@ void CheckStored(Database& Db, const std::string& strTable, const Json::Value& j
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     Json::Value jRecord;
-    if (nSize < 2 || nSize > kMaxInput ||
-        !Parse(std::string(reinterpret_cast<const char*>(pData) + 1, nSize - 1), jRecord)) {
+    if (nSize < 2 || nSize > kMaxInput || !TakeValue(pData + 1, nSize - 1, jRecord)) {
         return 0;
     }
     static Database s_Db(
@@ -36,6 +46,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     const unsigned nTable = pData[0] % 3U;
     const unsigned nOperation = pData[0] / 3U % 3U;
     const std::string strTable = kTables[nTable];
+    Begin(s_Db);
     const auto pHandle =
         NewHandle(s_Db, strTable, Definition(strTable, kMembers[nTable]), "SELECT 1");
 
@@ -49,11 +60,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     Require(!s_Db.Refused(), "a value never becomes a statement");
     if (nResult == 0) {
         Require(s_Db.Run("SELECT count(*) FROM " + strTable) == "1", "one record makes one row");
-        CheckStored(s_Db, strTable, jRecord);
+        CheckStored(s_Db, nTable, jRecord);
     } else {
         Require(jOut == "before", "a failure leaves the output");
     }
-    Require((nResult == 0 && nOperation != 0) || jInOut == jRecord, "the input is left alone");
+    Require((nResult == 0 && nOperation != 0) || Same(jInOut, jRecord), "the input is left alone");
     Require(pHandle->runSqlEx("DELETE FROM " + strTable) <= 1, "no second row was written");
     return 0;
 }

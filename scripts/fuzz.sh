@@ -3,34 +3,48 @@
 # replay of the corpora in fuzz/corpus, and prints what was tried.
 #
 #    scripts/fuzz.sh [--seconds N | --long | --replay] [TARGET...]
+#    scripts/fuzz.sh --record [--seconds N | --long]
 #
 # Each target runs 20 seconds, N seconds, with --long 10 minutes, or not at all beyond the replay.
 # What a run finds new lies in build/fuzz/corpus/TARGET, an input that breaks a promise in
-# build/fuzz/findings.
+# build/fuzz/findings. --record runs all targets and puts their figures into docs/reliability.md.
+# shellcheck disable=SC2317  # each calls the functions by their names
 set -euo pipefail
+export LC_ALL=C # [a-z] are the small letters alone
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
 
 seconds=20
+record=""
 targets=()
+given=$*
 while (($# > 0)); do
     case $1 in
         --seconds) seconds=$2 && shift ;;
         --long) seconds=600 ;;
         --replay) seconds=0 ;;
+        --record) record=yes ;;
         *) targets+=("$1") ;;
     esac
     shift
 done
+# A target's file begins with a small letter, what the targets share with a capital one.
+mapfile -t all_targets < <(cd fuzz && printf '%s\n' [a-z]*.cpp | sed 's/\.cpp$//')
 if ((${#targets[@]} == 0)); then
-    targets=(definition record query rows percent plain time)
+    targets=("${all_targets[@]}")
 fi
+for target in "${targets[@]}"; do
+    if [[ ! " ${all_targets[*]} " == *" $target "* || -n $record && ${#targets[@]} != "${#all_targets[@]}" ]]; then
+        sed -n '2,/^# shellcheck/{/^# shellcheck/!p}' "$0" >&2
+        exit 2
+    fi
+done
 
-need_packages clang-14:clang++-14 libclang-rt-14-dev binutils:objcopy "${library_packages[@]}"
+need_packages clang-14:clang++-14 libclang-rt-14-dev "${library_packages[@]}"
 
 folder=build/fuzz
-mkdir -p "$folder/objects" "$folder/findings"
+mkdir -p "$folder/objects" "$folder/findings" "$folder/figures"
 compiler=(clang++-14)
 if command -v ccache >/dev/null; then
     compiler=(ccache clang++-14)
@@ -38,93 +52,113 @@ fi
 flags=(-std=c++17 -O1 -g -fno-omit-frame-pointer -fno-sanitize-recover=all -Iinclude -I/usr/include/jsoncpp)
 sanitizers=address,undefined
 
+# each FUNCTION ARGUMENT... calls the function once for each argument, as many at a time as there are
+# processors, and fails when one of the calls did. Every child is waited for by its number: asking
+# for "the next one that ends" misses one that has already ended.
+each() {
+    local function=$1 argument status=0
+    local -a running=()
+    shift
+    for argument; do
+        if ((${#running[@]} == jobs)); then
+            wait "${running[0]}" || status=1
+            running=("${running[@]:1}")
+        fi
+        "$function" "$argument" &
+        running+=($!)
+    done
+    for argument in "${running[@]}"; do
+        wait "$argument" || status=1
+    done
+    return "$status"
+}
+
 object_of() {
     local name=${1//\//_}
     printf '%s/objects/%s.o' "$folder" "${name%.cpp}"
 }
 
 compile() {
-    local -a more=()
-    if [[ $1 == src/util/util.cpp ]]; then
-        # Red zones would take the static below its name.
-        more=(-mllvm -asan-globals=0)
-    fi
-    "${compiler[@]}" "${flags[@]}" "-fsanitize=fuzzer-no-link,$sanitizers" "${more[@]}" \
-        -c "$1" -o "$(object_of "$1")"
+    "${compiler[@]}" "${flags[@]}" "-fsanitize=fuzzer-no-link,$sanitizers" -c "$1" -o "$(object_of "$1")"
 }
 
-build_targets() {
-    local -a sources=() objects=()
-    local source cache target
-    mapfile -t sources < <(find src -name '*.cpp' | LC_ALL=C sort)
-    for source in "${sources[@]}" fuzz/FuzzHost.cpp "${targets[@]/%/.cpp}"; do
-        [[ $source == */* ]] || source=fuzz/$source
-        compile "$source" &
-        while (($(jobs -rp | wc -l) >= jobs)); do
-            wait -n
-        done
-    done
-    # Until the last has ended, each with its own status.
-    while (($(jobs -rp | wc -l) > 0)); do
-        wait -n
-    done
-
-    # The cache of member types is a static of its function; the fuzz host empties it.
-    cache=$(nm "$(object_of src/util/util.cpp)" | awk '$3 ~ /^_ZZN12VORN_JSON_DB7recType.*E5jType$/ { print $3 }')
-    objcopy "--redefine-sym=$cache=vornjsondb_fuzz_type_cache" --globalize-symbol=vornjsondb_fuzz_type_cache \
-        "$(object_of src/util/util.cpp)"
-
-    for source in "${sources[@]}" fuzz/FuzzHost.cpp; do
+link_target() {
+    local -a objects=()
+    local source
+    for source in "fuzz/$1.cpp" "${shared_sources[@]}"; do
         objects+=("$(object_of "$source")")
     done
-    for target in "${targets[@]}"; do
-        clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$target" \
-            "$(object_of "fuzz/$target.cpp")" "${objects[@]}" -ljsoncpp -lsqlite3
-    done
+    clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$1" "${objects[@]}" -ljsoncpp -lsqlite3
 }
 
-# run_target TARGET prints one line of figures; the log of the last run is kept.
+# run_target TARGET runs one target and prints a line of figures, or what went wrong.
 run_target() {
-    local target=$1 log=$folder/$1.log grown=$folder/corpus/$1 left=$seconds runs=0 coverage
-    local -a slice
-    local -a options=("-max_len=4096" "-timeout=20" "-rss_limit_mb=2048" "-print_final_stats=1"
-        "-artifact_prefix=$folder/findings/$1-")
+    local target=$1 log=$folder/$1.log grown=$folder/corpus/$1 found=0 TIMEFORMAT='%R %U %S'
+    # Long inputs are replayed, but not grown. What takes longer is mutated less often.
+    local -a options=("-timeout=20" "-rss_limit_mb=2048" "-artifact_prefix=$folder/findings/$1-")
+    local -a growth=("-max_len=1024" "-entropic_scale_per_exec_time=1" "-max_total_time=$seconds")
     if [[ -e fuzz/dictionary/$target.dict ]]; then
         options+=("-dict=fuzz/dictionary/$target.dict")
     fi
     mkdir -p "$grown"
-    slice=("-runs=0" "fuzz/corpus/$target")
-    while true; do
-        if ! "$folder/$target" "${options[@]}" "${slice[@]}" >"$log" 2>&1; then
-            grep -aE 'broken promise|ERROR|runtime error|^    #[0-9] ' "$log" | head -n 30
-            printf '%-12s FAILED, see %s\n' "$target" "$log"
-            return 1
-        fi
-        runs=$((runs + $(awk '/stat::number_of_executed_units/ { print $2 }' "$log")))
-        if ((left <= 0)); then
-            break
-        fi
-        # What the library keeps for the life of the process would grow without end.
-        slice=("-max_total_time=$((left < 60 ? left : 60))" "$grown" "fuzz/corpus/$target")
-        left=$((left - 60))
-    done
-    coverage=$(awk '/ cov: / { for (i = 1; i < NF; ++i) if ($i == "cov:") c = $(i + 1) } END { print c }' "$log")
-    printf '%-12s %5d s  %9d runs  %5d edges  %4d checked-in inputs replayed\n' "$target" "$seconds" \
-        "$runs" "$coverage" "$(find "fuzz/corpus/$target" -type f | wc -l)"
+    "$folder/$target" "${options[@]}" -max_len=4096 -runs=0 "fuzz/corpus/$target" >"$log" 2>&1 || found=1
+    : >"$log.time"
+    if ((found == 0 && seconds > 0)); then
+        {
+            time "$folder/$target" "${options[@]}" "${growth[@]}" "$grown" "fuzz/corpus/$target" \
+                >"$log" 2>&1 || found=1
+        } 2>"$log.time"
+    fi
+    figures "$target" "$found" "$log" >"$folder/figures/$target"
+    if ((found > 0)); then
+        grep -aE 'broken promise|ERROR|runtime error|^    #[0-9] ' "$log" | head -n 30 || true
+        printf '%-12s FAILED, see %s\n' "$target" "$log"
+        return 1
+    fi
+    awk '
+        $2 == 0 { printf "%-12s %9d runs  %5d edges\n", $1, $3, $6 }
+        $2 != 0 { printf "%-12s %9d runs  %5d edges  %4d s, %d a second, %d a second of processor time\n",
+            $1, $3, $6, $2, $4, $5 }' "$folder/figures/$target"
 }
 
-build_targets
+# figures TARGET FINDINGS LOG prints: target, seconds, runs, runs a second, runs a second of processor
+# time, edges, findings.
+figures() {
+    awk -v target="$1" -v findings="$2" '
+        FILENAME ~ /time$/ { seconds = $1; busy = $2 + $3; next }
+        /^#[0-9]+\t/ { runs = substr($1, 2) }
+        / cov: / { for (i = 1; i < NF; ++i) if ($i == "cov:") edges = $(i + 1) }
+        function rate(time) { return time > 0 ? runs / time : 0 }
+        END { printf "%s %d %d %d %d %d %d\n", target, seconds, runs, rate(seconds), rate(busy), edges, findings }
+    ' "$3.time" "$3"
+}
+
+# A table of all figures, for the documentation.
+report() {
+    printf '%s: scripts/fuzz.sh %s, %d targets at a time\n\n' "$(date +%F)" "$given" "$jobs"
+    printf '| target | seconds | runs | a second | a second of processor time | edges | findings |\n'
+    printf '|---|--:|--:|--:|--:|--:|--:|\n'
+    (cd "$folder/figures" && cat "${targets[@]}") |
+        awk '{ printf "| %s | %d | %d | %d | %d | %d | %d |\n", $1, $2, $3, $4, $5, $6, $7 }'
+}
+
+mapfile -t shared_sources < <(find src fuzz -name '*.cpp' ! -path 'fuzz/[a-z]*' | sort)
+sources=("${targets[@]/#/fuzz/}")
+each compile "${shared_sources[@]}" "${sources[@]/%/.cpp}"
+each link_target "${targets[@]}"
+
 export ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1
-pids=()
-for target in "${targets[@]}"; do
-    run_target "$target" &
-    pids+=($!)
-    while (($(jobs -rp | wc -l) >= jobs)); do
-        sleep 0.2
-    done
-done
-status=0
-for pid in "${pids[@]}"; do
-    wait "$pid" || status=1
-done
+rm -f "$folder"/figures/*
+# Not as a condition: inside one, a command that fails would go unnoticed.
+set +e
+(
+    set -e
+    each run_target "${targets[@]}"
+)
+status=$?
+set -e
+if [[ -n $record ]]; then
+    need_packages python3:python3
+    report | scripts/figures.py docs/reliability.md fuzzing
+fi
 exit "$status"
