@@ -10,10 +10,15 @@ MemberCursor::MemberCursor(const Json::Value& jValue) {
 }
 
 const Json::Value* MemberCursor::Find(const MemberName& Name) {
-    for (; m_it != m_itEnd; ++m_it) {
+    while (m_it != m_itEnd) {
         const int nOrder = Compare(NameOf(m_it), Name);
-        if (nOrder >= 0) {
-            return nOrder == 0 ? &*m_it : nullptr;
+        if (nOrder > 0) {
+            return nullptr;
+        }
+        const Json::Value& jMember = *m_it;
+        ++m_it;
+        if (nOrder == 0) {
+            return &jMember;
         }
     }
     return nullptr;

@@ -66,13 +66,19 @@ inline const Json::Value* FindMember(const Json::Value& jValue, const std::strin
     return FindMember(jValue, NameOf(strName));
 }
 
-// Finds members of one value by names that are asked for in ascending order, which is the order
-// in which JSON objects keep theirs: one step a member instead of a search for each.
+// The member of that name of an object, or of a null value, which becomes one; made where there is
+// none.
+inline Json::Value& MakeMember(Json::Value& jObject, const MemberName& Name) {
+    return *jObject.demand(Name.pBegin, Name.pEnd);
+}
+
+// Finds members of one value by names that are asked for in ascending order, each once, which is
+// how JSON objects keep theirs: one step a member instead of a search for each.
 class MemberCursor {
   public:
     explicit MemberCursor(const Json::Value& jValue);
 
-    // As FindMember. Names must not be asked for in descending order.
+    // As FindMember, for a name behind all that were asked for before.
     const Json::Value* Find(const MemberName& Name);
 
   private:

@@ -1,9 +1,13 @@
 #ifndef VORN_BASE_JSON_MEMORY_H
 #define VORN_BASE_JSON_MEMORY_H
 
-#include <new>
-
 #include <json/json.h>
+
+namespace vornjsondb {
+
+[[noreturn]] void ThrowBadAlloc();
+
+}  // namespace vornjsondb
 
 // Ends a public function whose body is a try block:
 //
@@ -16,7 +20,7 @@
 // Json::RuntimeError, the only one that such a copy throws; callers are promised std::bad_alloc.
 #define VORN_JSON_MEMORY_TO_BAD_ALLOC   \
     catch (const Json::RuntimeError&) { \
-        throw std::bad_alloc();         \
+        vornjsondb::ThrowBadAlloc();    \
     }
 
 #endif  // VORN_BASE_JSON_MEMORY_H

@@ -1,20 +1,23 @@
 #include "JsonText.h"
 
 #include <cstring>
-#include <new>
 #include <sstream>
 
+#include "JsonMemory.h"
 #include "PlainJson.h"
 
 namespace vornjsondb {
 
 namespace {
 
+// Room for most texts: spares one that grows piece by piece its first allocations.
+constexpr size_t kUsualText = 64;
+
 std::unique_ptr<Json::StreamWriter> MakeWriter() {
     Json::StreamWriterBuilder Builder;
-    Builder["indentation"] = "";
-    Builder["commentStyle"] = "None";
-    Builder["emitUTF8"] = true;
+    Builder.settings_["indentation"] = "";
+    Builder.settings_["commentStyle"] = "None";
+    Builder.settings_["emitUTF8"] = true;
     return std::unique_ptr<Json::StreamWriter>(Builder.newStreamWriter());
 }
 
@@ -33,6 +36,7 @@ JsonCodec& ProcessCodec() {
 
 std::string JsonCodec::Write(const Json::Value& jValue) {
     std::string strText;
+    strText.reserve(kUsualText);
     if (WritePlainJson(jValue, strText)) {
         return strText;
     }
@@ -47,21 +51,19 @@ std::string JsonCodec::Write(const Json::Value& jValue) {
 }
 
 bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
-    Json::Value jRead;
-    if (ReadPlainJson(szText, nLength, jRead)) {
-        jOut.swapPayload(jRead);
+    if (ReadPlainJson(szText, nLength, jOut)) {
         return true;
     }
     if (!m_pReader) {
         Json::CharReaderBuilder Builder;
-        Builder["collectComments"] = false;
+        Builder.settings_["collectComments"] = false;
         m_pReader.reset(Builder.newCharReader());
     }
     try {
         return m_pReader->parse(szText, szText + nLength, &jOut, nullptr);
     } catch (const Json::RuntimeError& Error) {
         if (!IsTooDeep(Error)) {
-            throw std::bad_alloc();
+            ThrowBadAlloc();
         }
         return false;
     }

@@ -1,8 +1,8 @@
 #include "PlainJson.h"
 
 #include <cstring>
-#include <utility>
 
+#include "Digits.h"
 #include "JsonMember.h"
 
 namespace vornjsondb {
@@ -12,13 +12,33 @@ namespace {
 constexpr int kMaxLevels = 8;
 constexpr int kMaxDigits = 18;  // fits 64 bits without a check
 
-class PlainJson {
+// Reads one text. Values are returned and not written through a reference: so each is made where it
+// stays. What is returned once the text has turned out not to be plain is of no use.
+class PlainReader {
   public:
-    explicit PlainJson(const char* szText) : m_pNext(szText) {}
+    explicit PlainReader(const char* szText) : m_pNext(szText) {}
 
-    bool ReadWhole(const char* pEnd, Json::Value& jOut) {
-        return ReadValue(jOut, 0) && m_pNext == pEnd;
+    Json::Value ReadValue(int nLevel) {
+        switch (*m_pNext) {
+            case '"':
+                return ReadText();
+            case '[':
+                return ReadArray(nLevel + 1);
+            case '{':
+                return ReadObject(nLevel + 1);
+            case 't':
+                return ReadWord("true", true);
+            case 'f':
+                return ReadWord("false", false);
+            case 'n':
+                return ReadWord("null", Json::Value());
+            default:
+                return ReadInteger();
+        }
     }
+
+    // Whether the text was plain as far as pEnd, which is where it ended.
+    bool IsPlainUpTo(const char* pEnd) const { return m_blPlain && m_pNext == pEnd; }
 
   private:
     bool Skip(char c) {
@@ -29,36 +49,24 @@ class PlainJson {
         return true;
     }
 
-    bool ReadValue(Json::Value& jOut, int nLevel) {
-        switch (*m_pNext) {
-            case '"':
-                return ReadText(jOut);
-            case '[':
-                return nLevel < kMaxLevels && ReadArray(jOut, nLevel + 1);
-            case '{':
-                return nLevel < kMaxLevels && ReadObject(jOut, nLevel + 1);
-            case 't':
-                return ReadWord("true", jOut, true);
-            case 'f':
-                return ReadWord("false", jOut, false);
-            case 'n':
-                return ReadWord("null", jOut, Json::Value());
-            default:
-                return ReadInteger(jOut);
-        }
+    // As Skip, for what must be there.
+    void Expect(char c) { m_blPlain = Skip(c) && m_blPlain; }
+
+    Json::Value NotPlain() {
+        m_blPlain = false;
+        return {};
     }
 
-    bool ReadWord(const char* szWord, Json::Value& jOut, Json::Value jMeaning) {
+    Json::Value ReadWord(const char* szWord, Json::Value jMeaning) {
         const size_t nLength = std::strlen(szWord);
         if (std::strncmp(m_pNext, szWord, nLength) != 0) {
-            return false;
+            return NotPlain();
         }
         m_pNext += nLength;
-        jOut.swapPayload(jMeaning);
-        return true;
+        return jMeaning;
     }
 
-    bool ReadInteger(Json::Value& jOut) {
+    Json::Value ReadInteger() {
         const bool blNegative = Skip('-');
         const char* pFirst = m_pNext;
         Json::Int64 nValue = 0;
@@ -68,13 +76,11 @@ class PlainJson {
         }
         const bool blLeadingZero = *pFirst == '0' && m_pNext - pFirst > 1;
         if (m_pNext == pFirst || blLeadingZero) {
-            return false;
+            return NotPlain();
         }
         // What may continue a number instead of ending it is refused by the caller, which expects
         // a separator.
-        Json::Value jNumber(blNegative ? -nValue : nValue);
-        jOut.swapPayload(jNumber);
-        return true;
+        return blNegative ? -nValue : nValue;
     }
 
     // Moves over a quoted text without escapes; pBegin is set to what stands between the quotes.
@@ -90,54 +96,56 @@ class PlainJson {
         return true;
     }
 
-    bool ReadText(Json::Value& jOut) {
+    Json::Value ReadText() {
         const char* pBegin = nullptr;
-        if (!SkipText(pBegin)) {
-            return false;
-        }
-        Json::Value jText(pBegin, m_pNext - 1);
-        jOut.swapPayload(jText);
-        return true;
+        return SkipText(pBegin) ? Json::Value(pBegin, m_pNext - 1) : NotPlain();
     }
 
-    bool ReadArray(Json::Value& jOut, int nLevel) {
+    Json::Value ReadArray(int nLevel) {
         Json::Value jArray(Json::arrayValue);
-        jOut.swapPayload(jArray);
         ++m_pNext;
+        m_blPlain = nLevel <= kMaxLevels;
         if (Skip(']')) {
-            return true;
+            return jArray;
         }
-        do {
-            Json::Value jElement;
-            if (!ReadValue(jElement, nLevel)) {
-                return false;
+        while (m_blPlain) {
+            jArray.append(ReadValue(nLevel));
+            if (!Skip(',')) {
+                Expect(']');
+                break;
             }
-            jOut.append(std::move(jElement));
-        } while (Skip(','));
-        return Skip(']');
+        }
+        return jArray;
     }
 
-    bool ReadObject(Json::Value& jOut, int nLevel) {
+    Json::Value ReadObject(int nLevel) {
         Json::Value jObject(Json::objectValue);
-        jOut.swapPayload(jObject);
         ++m_pNext;
+        m_blPlain = nLevel <= kMaxLevels;
         if (Skip('}')) {
-            return true;
+            return jObject;
         }
-        do {
+        while (m_blPlain) {
             const char* pName = nullptr;
             if (*m_pNext != '"' || !SkipText(pName)) {
-                return false;
+                m_blPlain = false;
+                break;
             }
-            Json::Value& jMember = *jOut.demand(pName, m_pNext - 1);
-            if (!Skip(':') || !ReadValue(jMember, nLevel)) {
-                return false;
+            Json::Value& jMember = MakeMember(jObject, MemberName{pName, m_pNext - 1});
+            Expect(':');
+            if (m_blPlain) {
+                jMember = ReadValue(nLevel);
             }
-        } while (Skip(','));
-        return Skip('}');
+            if (!Skip(',')) {
+                Expect('}');
+                break;
+            }
+        }
+        return jObject;
     }
 
     const char* m_pNext;
+    bool m_blPlain = true;
 };
 
 bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
@@ -146,7 +154,8 @@ bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
             return false;
         }
     }
-    strOut.append(1, '"').append(pBegin, pEnd).append(1, '"');
+    strOut += '"';
+    strOut.append(pBegin, static_cast<size_t>(pEnd - pBegin)) += '"';
     return true;
 }
 
@@ -199,7 +208,7 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
             strOut += jValue.asBool() ? "true" : "false";
             return true;
         case Json::intValue:
-            strOut += std::to_string(jValue.asInt64());
+            AppendDigits(jValue.asInt64(), strOut);
             return true;
         case Json::stringValue: {
             const char* pBegin = nullptr;
@@ -219,7 +228,13 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
 }  // namespace
 
 bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut) {
-    return PlainJson(szText).ReadWhole(szText + nLength, jOut);
+    PlainReader Reader(szText);
+    Json::Value jRead = Reader.ReadValue(0);
+    if (!Reader.IsPlainUpTo(szText + nLength)) {
+        return false;
+    }
+    jOut.swapPayload(jRead);
+    return true;
 }
 
 bool WritePlainJson(const Json::Value& jValue, std::string& strOut) {

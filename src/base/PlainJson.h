@@ -12,7 +12,7 @@
 
 namespace vornjsondb {
 
-// Reads the text, which a NUL follows, into jOut. Returns false, with jOut in any state, for a text
+// Reads the text, which a NUL follows, into jOut. Returns false, with jOut as it was, for a text
 // that is not plain, well-formed or not.
 bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut);
 

@@ -1,13 +1,12 @@
 #include "MemberType.h"
 
-#include <charconv>
 #include <cstdlib>
 #include <cstring>
-#include <iterator>
 #include <stdexcept>
 
 #include <sqlite3.h>
 
+#include "../base/Digits.h"
 #include "../base/JsonMember.h"
 #include "../base/JsonText.h"
 #include "../base/SqlText.h"
@@ -63,7 +62,7 @@ void ReadBool(const char* szText, Json::Value& jOut) {
 void AppendQuoted(const char* szText, std::string& strOut) {
     strOut += '\'';
     while (const char* pQuote = std::strchr(szText, '\'')) {
-        strOut.append(szText, pQuote + 1) += '\'';
+        strOut.append(szText, static_cast<size_t>(pQuote + 1 - szText)) += '\'';
         szText = pQuote + 1;
     }
     strOut.append(szText) += '\'';
@@ -86,12 +85,6 @@ void RefuseFrom(double dFirstBeyond, const Json::Value& jValue) {
     if (jValue.type() == Json::realValue && jValue.asDouble() >= dFirstBeyond) {
         Json::throwLogicError("vornjsondb: the number is out of range");
     }
-}
-
-template <typename Number>
-void AppendDigits(Number nValue, std::string& strOut) {
-    char szDigits[24];
-    strOut.append(szDigits, std::to_chars(szDigits, std::end(szDigits), nValue).ptr);
 }
 
 void AppendSigned(const Json::Value& jValue, std::string& strOut) {
