@@ -13,6 +13,7 @@
 
 namespace {
 
+using vornjsondb::MakeMember;
 using vornjsondb::RowTemplate;
 using vornjsondb::TableTypes;
 using vornjsondb::TypedMember;
@@ -20,7 +21,8 @@ using vornjsondb::TypedMember;
 // One column into the member of the same name. A NULL column leaves the member out.
 int DbCallBackFillField(Json::Value& jRec, const TableTypes& Types, const char* szName,
                         const char* szText) {
-    const TypedMember* pMember = Types.Find(vornjsondb::NameOf(szName));
+    const vornjsondb::MemberName Name = vornjsondb::NameOf(szName);
+    const TypedMember* pMember = Types.Find(Name);
     VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strName)");
     if (szText == nullptr) {
         return 0;
@@ -29,7 +31,7 @@ int DbCallBackFillField(Json::Value& jRec, const TableTypes& Types, const char* 
         VORN_LOG_LOCATED("type error, strType=%s", pMember->szTypeName);
         return -1;
     }
-    pMember->pType->pfnRead(szText, jRec[szName]);
+    pMember->pType->pfnRead(szText, MakeMember(jRec, Name));
     return 0;
 }
 
@@ -53,32 +55,40 @@ int FillColumns(Json::Value& jRec, const TableTypes& Types, int n_column, char**
         // The first column fails without these two lines, and log readers go by that.
         // Pinned by RowsTest.TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions.
         if (i > 0) {
-            VORN_LOG_PLAIN("column_name[%d]=%s", i, column_name[i]);
-            VORN_LOG_PLAIN("column_value[%d]=%s", i, column_value[i]);
+            const char* szName = column_name[i];
+            const char* szText = column_value[i];
+            VORN_LOG_PLAIN("column_name[%d]=%s", i, szName);
+            VORN_LOG_PLAIN("column_value[%d]=%s", i, szText);
         }
         return -1;
     }
     return 0;
 }
 
-int DbCallBackFillRec(Json::Value* pjRec, int n_column, char** column_value, char** column_name) {
+// One row into a record behind those of jRecArray, which stays as it is when the row fails.
+int DbCallBackFillRec(Json::Value& jRecArray, int n_column, char** column_value,
+                      char** column_name) {
     VORN_FAIL_IF(NULL == column_name || NULL == column_value);
     if (n_column < 1) {
-        *pjRec = Json::Value(Json::objectValue);
+        jRecArray.append(Json::Value(Json::objectValue));
         return 0;
     }
     VORN_FAIL_IF_TEXT(NULL == column_name[0], "NULL == column_name[i]");
     // Known without a definition: the operation that runs the statement has looked the table up
     // with its own before.
-    Json::Value jNoDefinition;
-    vornjsondb::KnownTable& Table = vornjsondb::LookUpTable(jNoDefinition, g_strCurTable);
+    vornjsondb::KnownTable& Table =
+        vornjsondb::LookUpTable(Json::Value::nullSingleton(), g_strCurTable);
     const RowTemplate* pTemplate = Table.TemplateFor(n_column, column_name);
     if (pTemplate != nullptr) {
-        pTemplate->Fill(column_value, *pjRec);
+        jRecArray.append(pTemplate->Record(column_value));
         return 0;
     }
-    *pjRec = Json::Value(Json::objectValue);
-    return FillColumns(*pjRec, Table.Types(), n_column, column_value, column_name);
+    Json::Value jRec(Json::objectValue);
+    if (0 > FillColumns(jRec, Table.Types(), n_column, column_value, column_name)) {
+        return -1;
+    }
+    jRecArray.append(std::move(jRec));
+    return 0;
 }
 
 }  // namespace
@@ -87,9 +97,8 @@ int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** col
     Json::Value* pjRecArray = static_cast<Json::Value*>(pArg);
     VORN_FAIL_IF(!pjRecArray);
     VORN_FAIL_IF(pjRecArray->type() != Json::arrayValue && pjRecArray->type() != Json::nullValue);
-    Json::Value jTmp;
-    VORN_FAIL_IF(0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name));
-    pjRecArray->append(std::move(jTmp));
+    VORN_FAIL_IF_TEXT(0 > DbCallBackFillRec(*pjRecArray, n_column, column_value, column_name),
+                      "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)");
     return 0;
 } catch (const std::exception&) {
     VORN_LOG_CONDITION("0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)");

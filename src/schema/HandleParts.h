@@ -7,6 +7,7 @@
 #include <sqlite3.h>
 
 #include "KnownTables.h"
+#include "TableDefinition.h"
 
 namespace vornjsondb {
 
@@ -18,6 +19,7 @@ struct HandleParts {
     std::string& strSqlError;
 
     KnownTable& LookUp() const { return LookUpTable(jTableDef, strName); }
+    const Json::Value& Declared() const { return DeclaredMembers(jTableDef, strName); }
 };
 
 }  // namespace vornjsondb

@@ -1,26 +1,14 @@
 #include "KnownTables.h"
 
-#include <VornJsonDbApi.h>
-
-#include <utility>
+#include <algorithm>
 
 namespace vornjsondb {
 
-namespace {
-
-// More shapes than the library's own statements give a table; columns without end are read one by
-// one.
-constexpr size_t kMaxTemplates = 16;
-
-}  // namespace
-
 const TableTypes& KnownTable::Types() {
-    static const TableTypes& s_None = *new TableTypes(Json::Value());
-    if (!jTypes.isObject()) {
-        return s_None;
-    }
-    if (!m_pTypes || m_pTypes->Members().size() != jTypes.size()) {
-        m_vecTemplates.clear();
+    if (!m_pTypes || m_pTypes->Members().size() != CountMembers(jTypes)) {
+        for (std::unique_ptr<const RowTemplate>& pTemplate : m_Templates) {
+            pTemplate.reset();
+        }
         m_pTypes = std::make_unique<const TableTypes>(jTypes);
     }
     return *m_pTypes;
@@ -28,18 +16,19 @@ const TableTypes& KnownTable::Types() {
 
 const RowTemplate* KnownTable::TemplateFor(int nColumns, char** szNames) {
     const TableTypes& AllTypes = Types();
-    for (std::unique_ptr<const RowTemplate>& pTemplate : m_vecTemplates) {
-        if (pTemplate->Matches(nColumns, szNames)) {
-            // To the front: the next row is of the same statement.
-            pTemplate.swap(m_vecTemplates.front());
-            return m_vecTemplates.front()->IsUsable() ? m_vecTemplates.front().get() : nullptr;
+    for (std::unique_ptr<const RowTemplate>& pTemplate : m_Templates) {
+        if (!pTemplate && RowTemplate::AreNamed(nColumns, szNames)) {
+            pTemplate = std::make_unique<const RowTemplate>(AllTypes, nColumns, szNames);
+        } else if (!pTemplate) {
+            return nullptr;
+        } else if (!pTemplate->Matches(nColumns, szNames)) {
+            continue;
         }
+        // To the front: the next row is of the same statement.
+        pTemplate.swap(m_Templates.front());
+        return m_Templates.front()->IsUsable() ? m_Templates.front().get() : nullptr;
     }
-    if (m_vecTemplates.size() == kMaxTemplates || !RowTemplate::AreNamed(nColumns, szNames)) {
-        return nullptr;
-    }
-    m_vecTemplates.push_back(std::make_unique<const RowTemplate>(AllTypes, nColumns, szNames));
-    return m_vecTemplates.back()->IsUsable() ? m_vecTemplates.back().get() : nullptr;
+    return nullptr;
 }
 
 // Never freed: a host's own statics may use the library when this one's would be gone.
@@ -48,38 +37,49 @@ KnownTables& KnownTables::OfProcess() {
     return s_Tables;
 }
 
+KnownTables::Place KnownTables::PlaceOf(const std::string& strName) {
+    return std::lower_bound(
+        m_vecTables.begin(), m_vecTables.end(), strName,
+        [](const std::unique_ptr<KnownTable>& pEach, const std::string& strWanted) {
+            return pEach->m_strName < strWanted;
+        });
+}
+
 KnownTable* KnownTables::Find(const std::string& strName) {
-    if (m_itLast == m_mapTables.end() || m_itLast->first != strName) {
-        m_itLast = m_mapTables.find(strName);
+    if (m_pLast == nullptr || m_pLast->m_strName != strName) {
+        const Place itFound = PlaceOf(strName);
+        const bool blKnown = itFound != m_vecTables.end() && (*itFound)->m_strName == strName;
+        m_pLast = blKnown ? itFound->get() : nullptr;
     }
-    return m_itLast == m_mapTables.end() ? nullptr : &m_itLast->second;
+    return m_pLast;
 }
 
 KnownTable& KnownTables::FindOrAdd(const std::string& strName) {
-    KnownTable* pKnown = Find(strName);
-    return pKnown != nullptr ? *pKnown : m_mapTables[strName];
+    if (KnownTable* pKnown = Find(strName)) {
+        return *pKnown;
+    }
+    return **m_vecTables.insert(PlaceOf(strName), std::make_unique<KnownTable>(strName));
 }
 
 Json::Value KnownTables::AllTypes() const {
     Json::Value jAll;
-    for (const auto& Each : m_mapTables) {
-        jAll[Each.first] = Each.second.jTypes;
+    for (const std::unique_ptr<KnownTable>& pEach : m_vecTables) {
+        MakeMember(jAll, NameOf(pEach->m_strName)) = pEach->jTypes;
     }
     return jAll;
 }
 
 void KnownTables::Forget() {
-    m_mapTables.clear();
-    m_itLast = m_mapTables.end();
+    m_vecTables.clear();
+    m_pLast = nullptr;
 }
 
 const char* KnownTables::KeptName(const char* szName) {
-    return m_setNames.emplace(szName).first->c_str();
-}
-
-KnownTable& LookUpTable(Json::Value& jTableDef, std::string& strName) {
-    static_cast<void>(VORN_JSON_DB::recType(jTableDef, strName));
-    return *KnownTables::OfProcess().Find(strName);
+    Json::Value& jKept = m_jNames[szName];
+    if (!jKept.isString()) {
+        jKept = szName;
+    }
+    return jKept.asCString();
 }
 
 }  // namespace vornjsondb

@@ -7,10 +7,10 @@
 #ifndef VORN_SCHEMA_KNOWN_TABLES_H
 #define VORN_SCHEMA_KNOWN_TABLES_H
 
-#include <map>
+#include <array>
 #include <memory>
-#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <json/json.h>
@@ -22,6 +22,8 @@ namespace vornjsondb {
 
 class KnownTable {
   public:
+    explicit KnownTable(std::string strName) : m_strName(std::move(strName)) {}
+
     // What recType hands out. A host may write into it, so nothing points into it.
     Json::Value jTypes;
 
@@ -36,8 +38,13 @@ class KnownTable {
   private:
     friend class KnownTables;
 
+    // More shapes than the library's own statements give a table; columns without end are read one
+    // by one.
+    static constexpr size_t kMaxTemplates = 16;
+
+    const std::string m_strName;
     std::unique_ptr<const TableTypes> m_pTypes;
-    std::vector<std::unique_ptr<const RowTemplate>> m_vecTemplates;
+    std::array<std::unique_ptr<const RowTemplate>, kMaxTemplates> m_Templates;
 };
 
 class KnownTables {
@@ -61,15 +68,19 @@ class KnownTables {
     const char* KeptName(const char* szName);
 
   private:
-    std::map<std::string, KnownTable> m_mapTables;
-    std::set<std::string> m_setNames;
-    // Each operation asks several times for the same table.
-    std::map<std::string, KnownTable>::iterator m_itLast = m_mapTables.end();
+    using Place = std::vector<std::unique_ptr<KnownTable>>::iterator;
+
+    // Where the table of that name is, or would be.
+    Place PlaceOf(const std::string& strName);
+
+    std::vector<std::unique_ptr<KnownTable>> m_vecTables;  // by name
+    KnownTable* m_pLast = nullptr;  // each operation asks several times for the same table
+    Json::Value m_jNames;           // each as the text of its own member
 };
 
-// The table as every operation looks it up: through recType, which learns the definition or logs
-// why it is refused.
-KnownTable& LookUpTable(Json::Value& jTableDef, std::string& strName);
+// The table as every operation looks it up: recType, which learns the definition or logs why it is
+// refused, with all that is known beside the types. Defined beside recType.
+KnownTable& LookUpTable(const Json::Value& jTableDef, const std::string& strJsonName);
 
 }  // namespace vornjsondb
 

@@ -12,26 +12,30 @@ bool RowTemplate::AreNamed(int nColumns, char** szNames) {
 }
 
 RowTemplate::RowTemplate(const TableTypes& Types, int nColumns, char** szNames)
-    : m_jEmpty(Json::objectValue) {
-    for (int i = 0; i < nColumns; ++i) {
-        m_vecNames.push_back(KnownTables::OfProcess().KeptName(szNames[i]));
+    : m_vecNames(szNames, szNames + nColumns),
+      m_vecColumns(m_vecNames.size()),
+      m_jEmpty(Json::objectValue) {
+    for (const char*& szName : m_vecNames) {
+        szName = KnownTables::OfProcess().KeptName(szName);
     }
     m_blUsable = Prepare(Types);
 }
 
 bool RowTemplate::Prepare(const TableTypes& Types) {
-    for (size_t i = 0; i < m_vecNames.size(); ++i) {
-        const TypedMember* pMember = Types.Find(NameOf(m_vecNames[i]));
+    int nIndex = 0;
+    for (const char* szName : m_vecNames) {
+        const TypedMember* pMember = Types.Find(NameOf(szName));
         if (pMember == nullptr || pMember->pType->pfnRead == nullptr ||
-            m_jEmpty.isMember(m_vecNames[i])) {
+            FindMember(m_jEmpty, szName) != nullptr) {
             return false;
         }
-        m_jEmpty[Json::StaticString(m_vecNames[i])] = static_cast<Json::UInt64>(i);
+        m_jEmpty[Json::StaticString(szName)] = nIndex++;
     }
-    for (Json::Value::iterator it = m_jEmpty.begin(); it != m_jEmpty.end(); ++it) {
-        const TypedMember* pMember = Types.Find(NameOf(it));
-        m_vecColumns.push_back(Column{pMember->pType, static_cast<size_t>((*it).asUInt64())});
+    Json::Value::iterator it = m_jEmpty.begin();
+    for (Column& Each : m_vecColumns) {
+        Each = Column{Types.Find(NameOf(it))->pType, (*it).asInt()};
         *it = Json::Value();
+        ++it;
     }
     return true;
 }
@@ -48,7 +52,7 @@ bool RowTemplate::Matches(int nColumns, char** szNames) const {
     return true;
 }
 
-void RowTemplate::Fill(char** szTexts, Json::Value& jRec) const {
+Json::Value RowTemplate::Record(char** szTexts) const {
     Json::Value jFilled = m_jEmpty;
     Json::Value::iterator itMember = jFilled.begin();
     bool blAllPresent = true;
@@ -68,7 +72,7 @@ void RowTemplate::Fill(char** szTexts, Json::Value& jRec) const {
             }
         }
     }
-    jRec.swapPayload(jFilled);
+    return jFilled;
 }
 
 }  // namespace vornjsondb

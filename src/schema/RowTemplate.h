@@ -28,13 +28,13 @@ class RowTemplate {
     // through column by column.
     bool IsUsable() const { return m_blUsable; }
 
-    // Makes the record of one row into jRec.
-    void Fill(char** szTexts, Json::Value& jRec) const;
+    // The record of one row.
+    Json::Value Record(char** szTexts) const;
 
   private:
     struct Column {
         const MemberType* pType;
-        size_t nIndex;
+        int nIndex;
     };
 
     bool Prepare(const TableTypes& Types);

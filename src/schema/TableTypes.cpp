@@ -4,14 +4,13 @@
 
 namespace vornjsondb {
 
-TableTypes::TableTypes(const Json::Value& jTypes) : m_jTypes(jTypes) {
-    if (!m_jTypes.isObject()) {
-        return;
-    }
-    m_vecMembers.reserve(m_jTypes.size());
-    for (Json::Value::const_iterator it = m_jTypes.begin(); it != m_jTypes.end(); ++it) {
-        m_vecMembers.push_back(TypedMember{NameOf(it), &TypeOfMember(*it), TypeName(*it),
-                                           FindMember(*it, "cppDefaultValue")});
+TableTypes::TableTypes(const Json::Value& jTypes)
+    : m_jTypes(jTypes), m_vecMembers(CountMembers(jTypes)) {
+    Json::Value::const_iterator it = m_jTypes.begin();
+    for (TypedMember& Member : m_vecMembers) {
+        Member = TypedMember{NameOf(it), &TypeOfMember(*it), TypeName(*it),
+                             FindMember(*it, "cppDefaultValue")};
+        ++it;
     }
 }
 
@@ -24,10 +23,14 @@ const TypedMember* TableTypes::Find(const MemberName& Name) const {
 }
 
 const TypedMember* TypeCursor::Find(const MemberName& Name) {
-    for (; m_pNext != m_pEnd; ++m_pNext) {
+    while (m_pNext != m_pEnd) {
         const int nOrder = Compare(m_pNext->Name, Name);
-        if (nOrder >= 0) {
-            return nOrder == 0 ? m_pNext : nullptr;
+        if (nOrder > 0) {
+            return nullptr;
+        }
+        const TypedMember* pMember = m_pNext++;
+        if (nOrder == 0) {
+            return pMember;
         }
     }
     return nullptr;

@@ -18,11 +18,17 @@ struct TypedMember {
     const Json::Value* pjDefault;  // nullptr: none
 };
 
+// How many members the value has: none when it is no object.
+inline size_t CountMembers(const Json::Value& jValue) {
+    return jValue.isObject() ? jValue.size() : 0;
+}
+
 // A table's members in key order.
 class TableTypes {
   public:
     // Of what recType returned; works on a copy. None for a value that is no object.
     explicit TableTypes(const Json::Value& jTypes);
+    ~TableTypes() = default;
     TableTypes(const TableTypes&) = delete;
     TableTypes& operator=(const TableTypes&) = delete;
 

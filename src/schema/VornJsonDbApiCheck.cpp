@@ -9,8 +9,9 @@
 int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
     vornjsondb::TypeCursor Types(vornjsondb::LookUpTable(m_jTableDef, m_strName).Types());
     VORN_FAIL_IF_TEXT(!jParam.isObject(), "!jRecParam.isObject()");
-    const Json::Value::const_iterator itEnd = jParam.end();
-    for (Json::Value::const_iterator it = jParam.begin(); it != itEnd; ++it) {
+    const Json::Value& jRec = jParam;
+    const Json::Value::const_iterator itEnd = jRec.end();
+    for (Json::Value::const_iterator it = jRec.begin(); it != itEnd; ++it) {
         const vornjsondb::MemberName Key = vornjsondb::NameOf(it);
         const vornjsondb::TypedMember* pMember = Types.Find(Key);
         if (pMember == nullptr) {

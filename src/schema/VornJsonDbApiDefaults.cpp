@@ -25,7 +25,7 @@ void FillDefaults(const TableTypes& Types, Json::Value& jRec) {
     MemberCursor Record(jRec);
     for (const TypedMember& Member : Types.Members()) {
         if (Member.pjDefault != nullptr && Record.Find(Member.Name) == nullptr) {
-            *jRec.demand(Member.Name.pBegin, Member.Name.pEnd) = *Member.pjDefault;
+            MakeMember(jRec, Member.Name) = *Member.pjDefault;
         }
     }
 }
@@ -36,7 +36,7 @@ int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
     const vornjsondb::TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     if (!blStrict) {
         // A value of another kind is left for the type check to refuse.
-        if (jParam.isObject() || jParam.isNull()) {
+        if (jParam.isObject() || jParam.type() == Json::nullValue) {
             vornjsondb::FillDefaults(Types, jParam);
         }
         return 0;

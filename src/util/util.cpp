@@ -16,19 +16,22 @@ namespace {
 using vornjsondb::FindMember;
 using vornjsondb::KnownTable;
 using vornjsondb::KnownTables;
+using vornjsondb::MakeMember;
+using vornjsondb::NameOf;
 
 // Copies what the lookup keeps of each member definition into jEntry. On failure jEntry holds the
 // members before the faulty one.
 int CopyMemberTypes(const Json::Value& jMember, Json::Value& jEntry) {
-    for (const std::string& strKey : jMember.getMemberNames()) {
-        const Json::Value* pjType = FindMember(jMember[strKey], "cpptype");
+    const Json::Value::const_iterator itEnd = jMember.end();
+    for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
+        const Json::Value* pjType = FindMember(*it, "cpptype");
         VORN_FAIL_IF_TEXT(pjType == nullptr,
                           "!jTableDef[strJsonName][\"member\"][strKey].isMember(\"cpptype\")");
         VORN_FAIL_IF_TEXT(!pjType->isString(),
                           "!jTableDef[strJsonName][\"member\"][strKey][\"cpptype\"].isString()");
-        Json::Value& jOne = jEntry[strKey] = Json::Value(Json::objectValue);
+        Json::Value& jOne = MakeMember(jEntry, NameOf(it)) = Json::Value(Json::objectValue);
         jOne["cpptype"] = *pjType;
-        if (const Json::Value* pjDefault = FindMember(jMember[strKey], "cppDefaultValue")) {
+        if (const Json::Value* pjDefault = FindMember(*it, "cppDefaultValue")) {
             jOne["cppDefaultValue"] = *pjDefault;
         }
     }
@@ -39,7 +42,7 @@ int CopyMemberTypes(const Json::Value& jMember, Json::Value& jEntry) {
 // memory half way must not leave a part of the members for good. A faulty definition does leave
 // that part; hosts run on it.
 // Pinned by RecTypeTest.FaultyMemberLeavesTheEarlierOnesAsTheWholeEntry.
-int Learn(KnownTables& Tables, Json::Value& jTableDef, std::string& strJsonName) {
+int Learn(KnownTables& Tables, const Json::Value& jTableDef, const std::string& strJsonName) {
     VORN_FAIL_IF(jTableDef.empty());
     const Json::Value* pjTable = FindMember(jTableDef, strJsonName);
     VORN_FAIL_IF_TEXT(pjTable == nullptr, "!jTableDef.isMember(strJsonName)");
@@ -51,7 +54,7 @@ int Learn(KnownTables& Tables, Json::Value& jTableDef, std::string& strJsonName)
 
     Json::Value jEntry;
     const int nResult = CopyMemberTypes(*pjMember, jEntry);
-    if (!jEntry.isNull()) {
+    if (!jEntry.empty()) {
         Tables.FindOrAdd(strJsonName).jTypes = std::move(jEntry);
     }
     if (0 > nResult) {
@@ -70,20 +73,26 @@ int CheckKnown(const KnownTable& Known) {
 
 }  // namespace
 
-Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) try {
+KnownTable& vornjsondb::LookUpTable(const Json::Value& jTableDef,
+                                    const std::string& strJsonName) try {
     KnownTables& Tables = KnownTables::OfProcess();
-    const KnownTable* pKnown = Tables.Find(strJsonName);
-    if (0 > (pKnown != nullptr ? CheckKnown(*pKnown) : Learn(Tables, jTableDef, strJsonName))) {
-        VORN_LOG_PLAIN("strJsonName=%s", strJsonName.c_str());
-        VORN_LOG_PLAIN("jTableDef=%s", vornjsondb::ToString(jTableDef).c_str());
-        VORN_LOG_PLAIN("jType=%s", vornjsondb::ToString(Tables.AllTypes()).c_str());
+    KnownTable* pKnown = Tables.Find(strJsonName);
+    if (0 <= (pKnown != nullptr ? CheckKnown(*pKnown) : Learn(Tables, jTableDef, strJsonName))) {
+        return pKnown != nullptr ? *pKnown : *Tables.Find(strJsonName);
     }
+    VORN_LOG_PLAIN("strJsonName=%s", strJsonName.c_str());
+    VORN_LOG_PLAIN("jTableDef=%s", vornjsondb::ToString(jTableDef).c_str());
+    VORN_LOG_PLAIN("jType=%s", vornjsondb::ToString(Tables.AllTypes()).c_str());
     // A refused name becomes known without types, so that it stays refused: a host that got its
     // first definition wrong sees the same failure for as long as it runs.
     // Pinned by RecTypeTest.EmptyDefinitionIsRefused.
-    return Tables.FindOrAdd(strJsonName).jTypes;
+    return Tables.FindOrAdd(strJsonName);
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
+
+Json::Value& VORN_JSON_DB::recType(Json::Value& jTableDef, std::string& strJsonName) {
+    return vornjsondb::LookUpTable(jTableDef, strJsonName).jTypes;
+}
 
 int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool blOverwrite) try {
     VORN_FAIL_IF(jIn.type() != Json::nullValue && jIn.type() != Json::objectValue);
@@ -91,9 +100,8 @@ int VORN_JSON_DB::jsonCopyMember(Json::Value& jIn, Json::Value& jSubSet, bool bl
     // Copied as a whole first: the source may lie inside the destination, or the other way round.
     Json::Value jSource = jSubSet;
     for (Json::Value::iterator it = jSource.begin(); it != jSource.end(); ++it) {
-        const std::string strName = it.name();
-        if (blOverwrite || !jIn.isMember(strName)) {
-            jIn[strName].swap(*it);
+        if (blOverwrite || FindMember(jIn, NameOf(it)) == nullptr) {
+            MakeMember(jIn, NameOf(it)).swap(*it);
         }
     }
     return 0;
