@@ -2,9 +2,13 @@
 
 namespace vornjsondb {
 
-LineFormat::LineFormat(const char* szBefore, const char* szMessage, const char* szAfter) {
-    static_cast<void>(
-        std::snprintf(m_szText, sizeof(m_szText), "%s%s%s", szBefore, szMessage, szAfter));
+LineFormat::LineFormat(const char* szMessage) : m_blStdout(blLogToStdout) {
+    const char* szBefore = "(%u) %s:%d ";
+    if (!m_blStdout) {
+        szBefore = errno != 0 ? "%s:%d (%u)(%m)" : "%s:%d (%u)";
+    }
+    static_cast<void>(std::snprintf(m_szText, sizeof(m_szText), "%s%s%s", szBefore, szMessage,
+                                    m_blStdout ? "\n" : ""));
 }
 
 void LogFailedCondition(const char* szFile, int nLine, const char* szCondition) {

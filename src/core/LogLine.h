@@ -59,12 +59,14 @@ namespace vornjsondb {
 // text is in the library once instead of once for each place where lines may go.
 class LineFormat {
   public:
-    LineFormat(const char* szBefore, const char* szMessage, const char* szAfter);
+    explicit LineFormat(const char* szMessage);
     const char* Text() const { return m_szText; }
+    bool IsForStdout() const { return m_blStdout; }
 
     static constexpr size_t kMaxMessage = 128;  // with its NUL
 
   private:
+    const bool m_blStdout;
     char m_szText[kMaxMessage + 32];
 };
 
@@ -75,14 +77,13 @@ class LineFormat {
 template <typename... Arguments>
 __attribute__((noinline, cold)) void WriteLine(const char* szMessage, const char* szFile, int nLine,
                                                Arguments... args) {
-    if (blLogToStdout) {
-        const LineFormat Format("(%u) %s:%d ", szMessage, "\n");
-        std::printf(Format.Text(), static_cast<unsigned>(getpid()), szFile, nLine, args...);
-        return;
+    const LineFormat Format(szMessage);
+    const auto nProcess = static_cast<unsigned>(getpid());
+    if (Format.IsForStdout()) {
+        std::printf(Format.Text(), nProcess, szFile, nLine, args...);
+    } else {
+        syslog(LOG_ERR, Format.Text(), szFile, nLine, nProcess, args...);
     }
-    const char* szBefore = errno != 0 ? "%s:%d (%u)(%m)" : "%s:%d (%u)";
-    const LineFormat Format(szBefore, szMessage, "");
-    syslog(LOG_ERR, Format.Text(), szFile, nLine, static_cast<unsigned>(getpid()), args...);
 }
 
 #pragma GCC diagnostic pop

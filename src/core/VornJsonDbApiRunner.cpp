@@ -40,7 +40,8 @@ int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
         Handle.strSqlError = szError ? szError.get() : kNoErrorText;
         VORN_LOG_PLAIN("i=%d,errno=%d, run sql failed, error=%s, sql=%s", i, errno,
                        Handle.strSqlError.c_str(), strSql.c_str());
-        VORN_LOG_DEBUG("run sql fail, err=%s", szError.get());
+        const char* szReason = szError.get();
+        VORN_LOG_DEBUG("run sql fail, err=%s", szReason);
         return nResult;
     };
 
@@ -68,11 +69,12 @@ int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
             Handle.strSqlError.clear();
             return nChanged;
         }
-        if (!IsLocked(szText, errno)) {
+        const char* szReason = szText;
+        if (!IsLocked(szReason, errno)) {
             return Failed(-1);
         }
-        VORN_LOG_DEBUG("retry, i=%d, errno=%d, run sql failed, error=%s, sql=%s", i, errno, szText,
-                       strSql.c_str());
+        VORN_LOG_DEBUG("retry, i=%d, errno=%d, run sql failed, error=%s, sql=%s", i, errno,
+                       szReason, strSql.c_str());
         ++i;
         usleep(kRetryPauseUs);
     }

@@ -3,6 +3,7 @@
 #include <VornJsonDbApi.h>
 
 #include "../base/JsonMemory.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRunner.h"
 
@@ -33,6 +34,7 @@ int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
         VORN_FAIL_IF(jRecParam.type() != Json::objectValue);
         VORN_FAIL_IF(0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND));
         VORN_FAIL_IF_TEXT(strSql.empty() && !blAllowAll, "strSql.empty()");
+        strSqlRun.reserve(vornjsondb::kUsualStatement);
         // Two blanks before WHERE, as in a list.
         strSqlRun.append("DELETE FROM ").append(m_strName).append(" ");
         if (!strSql.empty()) {
@@ -93,7 +95,8 @@ int VornJsonDbApi::recDeleteByName(std::string& strValue, const char* szKey) {
         VORN_FAIL_IF(!szKey || !szKey[0]);
         VORN_FAIL_IF_TEXT(Types.Find(vornjsondb::NameOf(szKey)) == nullptr,
                           "!jType.isMember(szKey)");
-        std::vector<std::string> strVector{strValue};
+        std::vector<std::string> strVector(1);
+        strVector.front() = strValue;
         VORN_FAIL_IF(0 > (err = recDeleteByArray(strVector, szKey)));
         return err;
     };

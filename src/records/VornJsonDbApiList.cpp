@@ -3,6 +3,7 @@
 #include <VornJsonDbApi.h>
 
 #include "../base/JsonText.h"
+#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRows.h"
 #include "../core/VornJsonDbApiRunner.h"
@@ -13,16 +14,19 @@ int VornJsonDbApi::recList(Json::Value& jRecParam, Json::Value& jRecArrayOut) {
     const auto List = [&]() -> int {
         std::string strSql;
         std::string strSqlLimit;
-        std::string strSqlPrefix = "SELECT ";
         VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
         VORN_FAIL_IF(jRecArrayOut.type() != Json::nullValue &&
                      jRecArrayOut.type() != Json::arrayValue);
         VORN_FAIL_IF(0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND));
         VORN_FAIL_IF(0 > SqlFilterConditionFromJson(jRecParam, strSqlLimit));
-        VORN_FAIL_IF(0 > SqlExpandMemberName(strSqlPrefix));  // GCOVR_EXCL_BR_LINE: cannot fail
+        // From here on the statement is a part of what is logged of a failure.
+        strSqlRun.reserve(vornjsondb::kUsualStatement);
+        strSqlRun.append("SELECT ");
+        VORN_FAIL_IF_TEXT(0 > SqlExpandMemberName(strSqlRun),  // GCOVR_EXCL_BR_LINE: cannot fail
+                          "0 > SqlExpandMemberName(strSqlPrefix)");
         // The blank after the name makes two before WHERE: hosts compare statements as texts.
         // Pinned by List.ConditionStandsBehindTwoBlanks.
-        strSqlRun.append(strSqlPrefix).append(" FROM ").append(m_strName).append(" ");
+        strSqlRun.append(" FROM ").append(m_strName).append(" ");
         if (!strSql.empty()) {
             strSqlRun.append(" WHERE ").append(strSql);
         }
@@ -48,7 +52,7 @@ int VornJsonDbApi::recGetOne(Json::Value& jRecParam, Json::Value& jRecOut) {
     if (jRecArray.empty()) {
         return 0;
     }
-    Json::Value& jFound = jRecArray[0];
+    Json::Value& jFound = *jRecArray.begin();
     if (jRecOut.empty() && !jRecOut.isArray() && !jFound.empty()) {
         // Nothing to merge with, so nothing to copy.
         jRecOut.swapPayload(jFound);

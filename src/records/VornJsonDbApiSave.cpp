@@ -22,10 +22,11 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
         strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
         strSql.append(Handle.strName).append(" (");
-        VORN_FAIL_IF_TEXT(0 > AppendMemberNames(Handle, &jRec, strSql),  // GCOVR_EXCL_BR_LINE
+        const Json::Value& jMember = Handle.Declared();
+        VORN_FAIL_IF_TEXT(0 > AppendMemberNames(jMember, &jRec, strSql),  // GCOVR_EXCL_BR_LINE
                           "0 > SqlExpandMemberName(strSql, &jRecInOut)");
         strSql.append(") VALUES (");
-        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, jRec, strSql),
+        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, jMember, jRec, strSql),
                           "0 > SqlExpandMemberSymbol(strSql, jRecInOut)");
         strSql.append(";select * from ").append(Handle.strName);
         strSql.append(" where rowid == last_insert_rowid();");
@@ -39,7 +40,7 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
         }
         // GCOVR_EXCL_STOP
         VORN_FAIL_IF(0 == jArrayTmp.size());
-        jStored.swap(jArrayTmp[0]);
+        jStored.swap(*jArrayTmp.begin());
         return 0;
     };
     if (0 <= Save()) {

@@ -49,7 +49,7 @@ void AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& j
     const char* pNext = strFormat.c_str();
     m_strText.clear();
     while (const char* pSign = std::strchr(pNext, '%')) {
-        m_strText.append(pNext, pSign);
+        m_strText.append(pNext, static_cast<size_t>(pSign - pNext));
         if (pSign[1] != '%' && pSign[1] != '\0') {
             m_strText += strValue;
             pNext = "";

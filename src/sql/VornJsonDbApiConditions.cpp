@@ -94,7 +94,7 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
         VORN_FAIL_IF_TEXT(!szSql,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
         if (i == 0) {
-            strList.append(Member.Name.pBegin, Member.Name.pEnd).append(" in (");
+            strList.append(Member.Name.pBegin, Member.Name.Length()).append(" in (");
         }
         const char* szQuote = IsQuoted(eElement) ? "'" : "";
         strList.append(szQuote).append(szSql.get()).append(szQuote);

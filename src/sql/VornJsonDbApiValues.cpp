@@ -14,9 +14,8 @@
 // SQLite refuses it. Hosts rely on such records being refused.
 // Pinned by Names.MissingLastMemberLeavesATrailingComma.
 
-int vornjsondb::AppendMemberNames(const HandleParts& Handle, const Json::Value* pjRec,
+int vornjsondb::AppendMemberNames(const Json::Value& jMember, const Json::Value* pjRec,
                                   std::string& strSql) {
-    const Json::Value& jMember = DeclaredMembers(Handle.jTableDef, Handle.strName);
     MemberCursor RecordCursor(pjRec != nullptr ? *pjRec : Json::Value::nullSingleton());
     Json::ArrayIndex nLeft = jMember.size();
     const Json::Value::const_iterator itEnd = jMember.end();
@@ -26,7 +25,7 @@ int vornjsondb::AppendMemberNames(const HandleParts& Handle, const Json::Value* 
         if (pjRec != nullptr && RecordCursor.Find(Key) == nullptr) {
             continue;
         }
-        strSql.append(Key.pBegin, Key.pEnd);
+        strSql.append(Key.pBegin, Key.Length());
         if (nLeft > 0) {
             strSql += ',';
         }
@@ -34,10 +33,9 @@ int vornjsondb::AppendMemberNames(const HandleParts& Handle, const Json::Value* 
     return 0;
 }
 
-int vornjsondb::AppendMemberValues(const HandleParts& Handle, const Json::Value& jRec,
-                                   std::string& strSql) {
+int vornjsondb::AppendMemberValues(const HandleParts& Handle, const Json::Value& jMember,
+                                   const Json::Value& jRec, std::string& strSql) {
     TypeCursor Types(Handle.LookUp().Types());
-    const Json::Value& jMember = DeclaredMembers(Handle.jTableDef, Handle.strName);
     AccumulatedFormat Text(strSql);
     MemberCursor RecordCursor(jRec);
     Json::ArrayIndex nLeft = jMember.size();
@@ -70,11 +68,11 @@ int vornjsondb::AppendMemberValues(const HandleParts& Handle, const Json::Value&
 }
 
 int VornJsonDbApi::SqlExpandMemberName(std::string& strSql, Json::Value* pjRec) {
-    return vornjsondb::AppendMemberNames({m_pDb, m_strName, m_jTableDef, m_strSqlError}, pjRec,
+    return vornjsondb::AppendMemberNames(vornjsondb::DeclaredMembers(m_jTableDef, m_strName), pjRec,
                                          strSql);
 }
 
 int VornJsonDbApi::SqlExpandMemberSymbol(std::string& strSql, Json::Value& jRec) {
-    return vornjsondb::AppendMemberValues({m_pDb, m_strName, m_jTableDef, m_strSqlError}, jRec,
-                                          strSql);
+    const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
+    return vornjsondb::AppendMemberValues(Handle, Handle.Declared(), jRec, strSql);
 }

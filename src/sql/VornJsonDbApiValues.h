@@ -9,11 +9,12 @@
 
 namespace vornjsondb {
 
-// SqlExpandMemberName.
-int AppendMemberNames(const HandleParts& Handle, const Json::Value* pjRec, std::string& strSql);
+// SqlExpandMemberName of the declared members.
+int AppendMemberNames(const Json::Value& jMember, const Json::Value* pjRec, std::string& strSql);
 
-// SqlExpandMemberSymbol.
-int AppendMemberValues(const HandleParts& Handle, const Json::Value& jRec, std::string& strSql);
+// SqlExpandMemberSymbol of the declared members.
+int AppendMemberValues(const HandleParts& Handle, const Json::Value& jMember,
+                       const Json::Value& jRec, std::string& strSql);
 
 }  // namespace vornjsondb
 
