@@ -32,6 +32,10 @@ SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
     if (jValue.isString()) {
         return SqlText(sqlite3_mprintf("%q", jValue.asCString()));
     }
+    if (jValue.type() == Json::intValue) {
+        // The same text as below, made in one step.
+        return SqlText(sqlite3_mprintf("%lld", static_cast<long long>(jValue.asInt64())));
+    }
     return SqlText(sqlite3_mprintf("%q", jValue.asString().c_str()));
 } catch (const Json::Exception&) {
     return nullptr;
