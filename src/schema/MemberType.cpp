@@ -43,7 +43,7 @@ Number ReadNumber(const char* szText, Number (*pfnGeneral)(const char*, char**, 
 
 // By way of long, also for the unsigned types: out of range it is clamped where long has 32 bits
 // and cut where it has 64. Stored data is read so everywhere.
-// Pinned by RowsTest.UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion.
+// Pinned by RowValues.UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion.
 void ReadInt(const char* szText, Json::Value& jOut) {
     Set(jOut, static_cast<Json::Int>(ReadNumber(szText, std::strtol)));
 }

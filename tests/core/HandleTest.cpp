@@ -1,14 +1,12 @@
 // Construction, table creation, the message slot and the end of a handle.
-#include <cerrno>
 #include <type_traits>
 
-#include "../support/TableFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
 using HandleTest = TableTest;
 
 static_assert(!std::is_polymorphic<VornJsonDbApi>::value, "no virtual functions");
@@ -17,29 +15,21 @@ static_assert(!std::is_copy_assignable<VornJsonDbApi>::value, "handles are not a
 
 // Lines of a construction whose CREATE statement failed.
 Lines FailedCreate(const std::string& strError, const std::string& strSql) {
-    return {Plain("i=0,errno=0, run sql failed, error=" + strError + ", sql=" + strSql),
-            Located("create table failed, sql=" + strSql),
-            Plain("sql error, err=" + strError + ", sql=" + strSql), Check("0 > tableCreate()")};
-}
-
-Lines Joined(Lines vecFirst, const Lines& vecSecond) {
-    vecFirst.insert(vecFirst.end(), vecSecond.begin(), vecSecond.end());
-    return vecFirst;
+    return {RunFailed(strError, strSql), Located("create table failed, sql=" + strSql),
+            SqlError(strError, strSql), Check("0 > tableCreate()")};
 }
 
 }  // namespace
 
 TEST_F(HandleTest, ConstructionRunsTheCreateStatementUnchangedAndOnce) {
-    const std::string strTable = UniqueTable();
-    const std::string strCreate = "create  table " + strTable + "(x) ; -- as it stands";
-    const auto pHandle = NewHandle(m_pDb, strTable, Definition(strTable, "x:int"), strCreate);
-    EXPECT_EQ(TakeSql(), (Lines{strCreate}));
+    const std::string strCreate = "create  table u(x) ; -- as it stands";
+    const auto pHandle = NewHandle(m_pDb, "u", Definition("u", "x:int"), strCreate);
+    EXPECT_EQ(TakeSql(), Lines{strCreate});
     EXPECT_EQ(TakeLog(), Lines());
-    EXPECT_EQ(Rows("SELECT name FROM sqlite_master WHERE name = '" + strTable + "'"), strTable);
+    EXPECT_EQ(Rows("SELECT count(*) FROM u"), "0");
 }
 
 TEST_F(HandleTest, EmptyNameDefinitionAndStatementAreAllReportedAndTheHandleLives) {
-    errno = 0;
     const auto pHandle = NewHandle(m_pDb, "", Json::Value(), "");
     EXPECT_EQ(TakeLog(), Joined({ShortCheck("strName.empty()"), ShortCheck("jTableDef.empty()"),
                                  ShortCheck("strSqlCreate.empty()"), Check("0 >= strSql.length()")},
@@ -49,39 +39,36 @@ TEST_F(HandleTest, EmptyNameDefinitionAndStatementAreAllReportedAndTheHandleLive
 }
 
 TEST_F(HandleTest, NullConnectionIsReportedAndTheCreateFailsWithoutAText) {
-    const auto pHandle = NewHandle(nullptr, m_strTable, m_jDefinition, m_strCreate);
-    EXPECT_EQ(TakeLog(), Joined({ShortCheck("!pDb")}, FailedCreate("Unknow Error!!", m_strCreate)));
-    EXPECT_EQ(TakeSql(), (Lines{m_strCreate}));
+    const auto pHandle = NewHandle(nullptr, "t", m_jDefinition, kCreateItem);
+    EXPECT_EQ(TakeLog(), Joined({ShortCheck("!pDb")}, FailedCreate("Unknow Error!!", kCreateItem)));
+    EXPECT_EQ(TakeSql(), (Lines{kCreateItem}));
     EXPECT_EQ(pHandle->getErrMsg(), "");
 }
 
 TEST_F(HandleTest, EmptyNameAloneIsReportedAndTheTableIsCreated) {
-    const std::string strTable = UniqueTable();
-    NewHandle(m_pDb, "", m_jDefinition, "CREATE TABLE " + strTable + "(x)");
-    EXPECT_EQ(TakeLog(), (Lines{ShortCheck("strName.empty()")}));
-    EXPECT_EQ(Rows("SELECT count(*) FROM " + strTable), "0");
+    NewHandle(m_pDb, "", m_jDefinition, "CREATE TABLE u(x)");
+    EXPECT_EQ(TakeLog(), Lines{ShortCheck("strName.empty()")});
+    EXPECT_EQ(Rows("SELECT count(*) FROM u"), "0");
 }
 
 TEST_F(HandleTest, DefinitionCountsAsEmptyWhenNullOrWithoutElements) {
     for (const char* szDefinition : {"null", "{}", "[]"}) {
-        const std::string strTable = UniqueTable();
-        NewHandle(m_pDb, strTable, ParseJson(szDefinition), "CREATE TABLE " + strTable + "(x)");
-        EXPECT_EQ(TakeLog(), (Lines{ShortCheck("jTableDef.empty()")})) << szDefinition;
-        EXPECT_EQ(Rows("SELECT count(*) FROM " + strTable), "0");
+        NewHandle(m_pDb, "u", ParseJson(szDefinition), "CREATE TABLE u(x)");
+        EXPECT_EQ(TakeLog(), Lines{ShortCheck("jTableDef.empty()")}) << szDefinition;
+        Sql("DROP TABLE u");
     }
 }
 
 TEST_F(HandleTest, EmptyStatementAloneIsReportedAndRefusedByTheRunner) {
-    errno = 0;
-    NewHandle(m_pDb, m_strTable, m_jDefinition, "");
+    NewHandle(m_pDb, "t", m_jDefinition, "");
     EXPECT_EQ(TakeLog(), Joined({ShortCheck("strSqlCreate.empty()"), Check("0 >= strSql.length()")},
                                 FailedCreate("Unknow Error!!", "")));
 }
 
 TEST_F(HandleTest, FailedCreateLogsTheSqlErrorAndLeavesAUsableHandle) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
-    const auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
-    EXPECT_EQ(TakeLog(), FailedCreate("table " + m_strTable + " already exists", m_strCreate));
+    Sql("INSERT INTO t VALUES (1, 'a')");
+    const auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, kCreateItem);
+    EXPECT_EQ(TakeLog(), FailedCreate("table t already exists", kCreateItem));
     Json::Value jNoQuery;
     Json::Value jRows;
     EXPECT_EQ(pSecond->recList(jNoQuery, jRows), 0);
@@ -89,27 +76,26 @@ TEST_F(HandleTest, FailedCreateLogsTheSqlErrorAndLeavesAUsableHandle) {
 }
 
 TEST_F(HandleTest, MessageSlotIsEmptyAfterConstructionEvenWhenTheCreateFailed) {
-    const auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    const auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, kCreateItem);
     EXPECT_EQ(pSecond->getErrMsg(), "");
-    EXPECT_EQ(SqlErrorOf(*pSecond), "table " + m_strTable + " already exists");
+    EXPECT_EQ(SqlErrorOf(*pSecond), "table t already exists");
 }
 
 TEST_F(HandleTest, SecondHandleIsSilentWhenTheStatementToleratesTheTable) {
-    const std::string strCreate = "CREATE TABLE IF NOT EXISTS " + m_strTable + " (x)";
-    const auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, strCreate);
+    const std::string strCreate = "CREATE TABLE IF NOT EXISTS t (x)";
+    const auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, strCreate);
     EXPECT_EQ(TakeLog(), Lines());
     EXPECT_EQ(TakeSql(), (Lines{strCreate}));
 }
 
 TEST_F(HandleTest, HandleKeepsCopiesOfItsArguments) {
-    std::string strName = UniqueTable();
-    const std::string strTable = strName;
-    Json::Value jDefinition = Definition(strTable, "id:int");
-    std::string strCreate = "CREATE TABLE " + strTable + " (id)";
+    std::string strName = "u";
+    Json::Value jDefinition = Definition("u", "id:int");
+    std::string strCreate = "CREATE TABLE u (id)";
     VornJsonDbApi handle(m_pDb, strName, jDefinition, strCreate);
-    Sql("INSERT INTO " + strTable + " VALUES (5)");
+    Sql("INSERT INTO u VALUES (5)");
     strName = "elsewhere";
-    jDefinition[strTable]["member"] = ParseJson("{\"other\":{\"cpptype\":\"string\"}}");
+    jDefinition["u"]["member"] = ParseJson("{\"other\":{\"cpptype\":\"string\"}}");
     strCreate = "nonsense";
     TakeSql();
     Json::Value jNoQuery;
@@ -117,34 +103,31 @@ TEST_F(HandleTest, HandleKeepsCopiesOfItsArguments) {
     EXPECT_EQ(handle.recList(jNoQuery, jRows), 0);
     EXPECT_EQ(Compact(jRows), R"([{"id":5}])");
     EXPECT_EQ(handle.tableCreate(), -1);
-    EXPECT_EQ(TakeSql(),
-              (Lines{"SELECT id FROM " + strTable + " ;", "CREATE TABLE " + strTable + " (id)"}));
+    EXPECT_EQ(TakeSql(), (Lines{"SELECT id FROM u ;", "CREATE TABLE u (id)"}));
 }
 
 TEST_F(HandleTest, ConstructionLeavesItsArgumentsAlone) {
-    std::string strName = UniqueTable();
-    const std::string strTable = strName;
-    Json::Value jDefinition = Definition(strTable, "id:int");
-    const Json::Value jBefore = jDefinition;
-    std::string strCreate = "CREATE TABLE " + strTable + " (id)";
+    std::string strName = "u";
+    Json::Value jDefinition = Definition("u", "id:int");
+    std::string strCreate = "CREATE TABLE u (id)";
     const VornJsonDbApi handle(m_pDb, strName, jDefinition, strCreate);
-    EXPECT_EQ(strName, strTable);
-    EXPECT_EQ(jDefinition, jBefore);
-    EXPECT_EQ(strCreate, "CREATE TABLE " + strTable + " (id)");
+    EXPECT_EQ(strName, "u");
+    EXPECT_EQ(jDefinition, Definition("u", "id:int"));
+    EXPECT_EQ(strCreate, "CREATE TABLE u (id)");
 }
 
 TEST_F(HandleTest, TableCreateGivesZeroWhateverNumberOfRowsChanged) {
-    const std::string strSql = "INSERT INTO " + m_strTable + "(name) VALUES ('a'), ('b'), ('c')";
-    const auto pHandle = NewHandle(m_pDb, m_strTable, m_jDefinition, strSql);
+    const std::string strSql = "INSERT INTO t(name) VALUES ('a'), ('b'), ('c')";
+    const auto pHandle = NewHandle(m_pDb, "t", m_jDefinition, strSql);
     EXPECT_EQ(pHandle->tableCreate(), 0);
     EXPECT_EQ(TakeLog(), Lines());
-    EXPECT_EQ(Rows("SELECT count(*) FROM " + m_strTable), "6");
+    EXPECT_EQ(Count(), "6");
 }
 
 TEST_F(HandleTest, TableCreateFailureLogsItsTwoLinesAndNoConditionOfTheConstructor) {
     EXPECT_EQ(m_pHandle->tableCreate(), -1);
-    const std::string strError = "table " + m_strTable + " already exists";
-    Lines vecExpected = FailedCreate(strError, m_strCreate);
+    const std::string strError = "table t already exists";
+    Lines vecExpected = FailedCreate(strError, kCreateItem);
     vecExpected.pop_back();
     EXPECT_EQ(TakeLog(), vecExpected);
 }
@@ -152,13 +135,13 @@ TEST_F(HandleTest, TableCreateFailureLogsItsTwoLinesAndNoConditionOfTheConstruct
 TEST_F(HandleTest, TableCreateSaysNothingOfAnErrorWithAnEmptyText) {
     FailNextExec({{SQLITE_ERROR, "", 0}});
     EXPECT_EQ(m_pHandle->tableCreate(), -1);
-    EXPECT_EQ(TakeLog(), (Lines{Plain("i=0,errno=0, run sql failed, error=, sql=" + m_strCreate),
-                                Located("create table failed, sql=" + m_strCreate)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("", kCreateItem),
+                                Located(std::string("create table failed, sql=") + kCreateItem)}));
 }
 
 TEST_F(HandleTest, TableCreateSucceedsAgainAfterTheTableIsDropped) {
     EXPECT_EQ(m_pHandle->tableCreate(), -1);
-    Sql("DROP TABLE " + m_strTable);
+    Sql("DROP TABLE t");
     TakeLog();
     EXPECT_EQ(m_pHandle->tableCreate(), 0);
     EXPECT_EQ(TakeLog(), Lines());
@@ -185,7 +168,7 @@ TEST_F(HandleTest, FailingStatementLeavesTheMessageSlotAlone) {
 }
 
 TEST_F(HandleTest, MessageSlotsOfTwoHandlesAreApart) {
-    const auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, "SELECT 1");
+    const auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, "SELECT 1");
     m_pHandle->setErrMsg("first");
     pSecond->setErrMsg("second");
     EXPECT_EQ(m_pHandle->getErrMsg(), "first");
@@ -193,10 +176,10 @@ TEST_F(HandleTest, MessageSlotsOfTwoHandlesAreApart) {
 }
 
 TEST_F(HandleTest, DestroyedHandleLeavesTheConnectionToItsOwnerAndToOtherHandles) {
-    auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, "SELECT 1");
+    auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, "SELECT 1");
     pSecond.reset();
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
-    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE " + m_strTable + " SET name = 'b'"), 1);
-    EXPECT_EQ(Rows("SELECT * FROM " + m_strTable), "1|b");
+    Sql("INSERT INTO t VALUES (1, 'a')");
+    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE t SET name = 'b'"), 1);
+    EXPECT_EQ(All(), "1|b");
     EXPECT_EQ(TakeLog(), Lines());
 }

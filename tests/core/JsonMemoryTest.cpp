@@ -12,7 +12,9 @@
 
 #include <gtest/gtest.h>
 
-#include "../support/TestHost.h"
+#include "../support/TableTest.h"
+
+using namespace testhost;
 
 extern "C" void* __libc_malloc(size_t nBytes);
 
@@ -46,11 +48,7 @@ void operator delete(void* pMemory, size_t) noexcept {
 
 namespace {
 
-using testhost::DbTest;
-using testhost::Definition;
-using testhost::UniqueTable;
-
-class JsonMemoryTest : public DbTest {
+class JsonMemoryTest : public TableTest {
   protected:
     // Runs the call while each of its allocations fails in turn, until none does. Returns how
     // often it threw; any exception but std::bad_alloc fails the test.
@@ -81,21 +79,19 @@ class JsonMemoryTest : public DbTest {
         return nThrown;
     }
 
-    std::string m_strTable = UniqueTable();
-    std::string m_strCreate =
-        "CREATE TABLE IF NOT EXISTS " + m_strTable + " (id INTEGER PRIMARY KEY, name TEXT)";
-    Json::Value m_jDefinition = Definition(m_strTable, "id:int,name:string");
     const std::string m_strLong = std::string(100, 'x');
 };
 
 TEST_F(JsonMemoryTest, ConstructorThrowsBadAllocOnly) {
-    EXPECT_GT(
-        ThrowsOutOf([&] { VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate); }),
-        0);
+    std::string strName = "t";
+    std::string strCreate = "SELECT 1";
+    EXPECT_GT(ThrowsOutOf([&] { VornJsonDbApi Handle(m_pDb, strName, m_jDefinition, strCreate); }),
+              0);
 }
 
 TEST_F(JsonMemoryTest, FirstTypeLookupThrowsBadAllocOnly) {
-    EXPECT_GT(ThrowsOutOf([&] { VORN_JSON_DB::recType(m_jDefinition, m_strTable); }), 0);
+    std::string strName = "t";
+    EXPECT_GT(ThrowsOutOf([&] { VORN_JSON_DB::recType(m_jDefinition, strName); }), 0);
 }
 
 TEST_F(JsonMemoryTest, MemberCopyThrowsBadAllocOnly) {
@@ -109,82 +105,68 @@ TEST_F(JsonMemoryTest, MemberCopyThrowsBadAllocOnly) {
 }
 
 TEST_F(JsonMemoryTest, DefaultsThrowBadAllocOnly) {
-    m_jDefinition[m_strTable]["member"]["name"]["cppDefaultValue"] = m_strLong;
-    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
+    m_jDefinition["t"]["member"]["name"]["cppDefaultValue"] = m_strLong;
+    OpenDefinition(m_jDefinition, kCreateItem);
     EXPECT_GT(ThrowsOutOf([&] {
                   Json::Value jRecord;
-                  Handle.fillDefaultValue(jRecord, false);
+                  m_pHandle->fillDefaultValue(jRecord, false);
               }),
               0);
     Json::Value jRecord;
     jRecord["id"] = 1;
     EXPECT_GT(ThrowsOutOf([&] {
                   Json::Value jStored;
-                  Handle.recCreate(jRecord, jStored);
+                  m_pHandle->recCreate(jRecord, jStored);
               }),
               0);
 }
 
 TEST_F(JsonMemoryTest, UpdateWithAFilterInTheRecordThrowsBadAllocOnly) {
-    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
     Json::Value jRecord;
     jRecord["name"] = m_strLong;
     jRecord["vornSqlWhereFilter"] = "1";
     std::string strWhere = "id = 1";
-    EXPECT_GT(ThrowsOutOf([&] { Handle.recUpdateByWhere(jRecord, strWhere); }), 0);
+    EXPECT_GT(ThrowsOutOf([&] { m_pHandle->recUpdateByWhere(jRecord, strWhere); }), 0);
 }
 
 TEST_F(JsonMemoryTest, DeleteByNameThrowsBadAllocOnly) {
-    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
     std::string strValue = m_strLong;
-    EXPECT_GT(ThrowsOutOf([&] { Handle.recDeleteByName(strValue, "name"); }), 0);
+    EXPECT_GT(ThrowsOutOf([&] { m_pHandle->recDeleteByName(strValue, "name"); }), 0);
 }
 
-// In a fresh process: a statement past those whose names are shared is read another way, in which
-// JsonCpp's own report of missing memory passes for a text that cannot be read.
 TEST_F(JsonMemoryTest, RowWithoutMemoryIsRefusedWithOneLine) {
-    EXPECT_EQ(
-        0, testhost::InFreshProcess([this] {
-            VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
-            Json::Value jNoQuery;
-            Json::Value jRows(Json::arrayValue);
-            ASSERT_EQ(Handle.recList(jNoQuery, jRows), 0);
-            const testhost::RowCallback fnCallback = testhost::LastRowCallback();
-            char szName[] = "name";
-            char* aszNames[] = {szName};
-            std::string strLong = m_strLong;
-            char* aszTexts[] = {strLong.data()};
-            int nRefused = 0;
-            int nResult = -1;
-            for (int nAt = 1; nResult != 0 && nAt < 1000; ++nAt) {
-                testhost::TakeLog();
-                g_nFailAt = nAt;
-                nResult = fnCallback(&jRows, 1, aszTexts, aszNames);
-                g_nFailAt = 0;
-                if (nResult != 0) {
-                    ++nRefused;
-                    EXPECT_EQ(nResult, -1);
-                    EXPECT_EQ(jRows.size(), 0U);
-                    EXPECT_EQ(
-                        testhost::TakeLog(),
-                        std::vector<std::string>{testhost::Check(
-                            "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)")});
-                }
-            }
-            EXPECT_GT(nRefused, 0);
-            EXPECT_EQ(jRows[0]["name"].asString(), m_strLong);
-        }));
+    Listed();
+    const RowCallback fnCallback = LastRowCallback();
+    char szName[] = "name";
+    char* aszNames[] = {szName};
+    std::string strLong = m_strLong;
+    char* aszTexts[] = {strLong.data()};
+    Json::Value jRows(Json::arrayValue);
+    int nRefused = 0;
+    int nResult = -1;
+    for (int nAt = 1; nResult != 0 && nAt < 1000; ++nAt) {
+        g_nFailAt = nAt;
+        nResult = fnCallback(&jRows, 1, aszTexts, aszNames);
+        g_nFailAt = 0;
+        if (nResult != 0) {
+            ++nRefused;
+            EXPECT_EQ(nResult, -1);
+            EXPECT_EQ(jRows.size(), 0U);
+            EXPECT_EQ(TakeLog(), Lines{Check(kRowFailed)});
+        }
+    }
+    EXPECT_GT(nRefused, 0);
+    EXPECT_EQ(jRows[0]["name"].asString(), m_strLong);
 }
 
 TEST_F(JsonMemoryTest, SortedListAndGetThrowBadAllocOnly) {
-    VornJsonDbApi Handle(m_pDb, m_strTable, m_jDefinition, m_strCreate);
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a name that is not short')");
+    Sql("INSERT INTO t VALUES (1, 'a name that is not short')");
     Json::Value jQuery;
     jQuery["sort_by"] = "name";
     jQuery["sort_direction"] = "desc";
     Json::Value jFound;
     jFound["kept"] = 1;
-    EXPECT_GT(ThrowsOutOf([&] { Handle.recGetOne(jQuery, jFound); }), 0);
+    EXPECT_GT(ThrowsOutOf([&] { m_pHandle->recGetOne(jQuery, jFound); }), 0);
 }
 
 }  // namespace

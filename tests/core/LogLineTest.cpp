@@ -6,13 +6,11 @@
 #include <cerrno>
 #include <cstring>
 
-#include "../support/TableFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
-
-using Lines = std::vector<std::string>;
 
 // Taken before any test sets them.
 const bool kLogToStdoutAtLoad = blLogToStdout;
@@ -35,12 +33,11 @@ class LogLineTest : public TableTest {
     void SetUp() override {
         TableTest::SetUp();
         m_strPid = std::to_string(::getpid());
-        errno = 0;
     }
 
     // One short condition check, with errno as it is when this is called; its later lines follow.
     static SyslogCall ShortCheckCall() {
-        NewHandle(nullptr, UniqueTable(), ParseJson("{\"x\":1}"), "SELECT 1");
+        NewHandle(nullptr, "u", ParseJson("{\"x\":1}"), "SELECT 1");
         const std::vector<SyslogCall> vecCalls = TakeSyslogCalls();
         return vecCalls.empty() ? SyslogCall{} : vecCalls[0];
     }
@@ -88,7 +85,7 @@ TEST_F(LogLineTest, ShortCheckOnStdoutIsPidFileLineTextAndOneNewline) {
     StdoutCapture capture;
     blLogToStdout = true;
     errno = ENOENT;
-    NewHandle(nullptr, UniqueTable(), ParseJson("{\"x\":1}"), "SELECT 1");
+    NewHandle(nullptr, "u", ParseJson("{\"x\":1}"), "SELECT 1");
     const std::string strPrinted = capture.Take();
     const std::string strExpected =
         "(" + m_strPid + ") VornJsonDbApi.cpp:" + LineNumberIn(strPrinted) + " Failed [!pDb]\n";
@@ -181,10 +178,9 @@ TEST_F(LogLineTest, PrintedLinesReadTheSameAsThoseInTheSystemLog) {
         EXPECT_EQ(m_pHandle->tableCreate(), -1);
         return TakeLog();
     };
-    const Lines vecExpected = {
-        Plain("i=0,errno=2, run sql failed, error=no such luck, sql=" + m_strCreate),
-        Located("create table failed, sql=" + m_strCreate),
-        Plain("sql error, err=no such luck, sql=" + m_strCreate)};
+    const Lines vecExpected = {RunFailed("no such luck", kCreateItem, ENOENT),
+                               Located(std::string("create table failed, sql=") + kCreateItem),
+                               SqlError("no such luck", kCreateItem)};
     EXPECT_EQ(fail(), vecExpected);
     StdoutCapture capture;
     blLogToStdout = true;
@@ -222,7 +218,7 @@ TEST_F(LogLineTest, StdoutFlagSetWithinOneOperationMovesItsRemainingLines) {
     StdoutCapture capture;
     OnExec([](int) { blLogToStdout = true; });
     const std::string strSql = "SELECT 1";
-    NewHandle(nullptr, UniqueTable(), ParseJson("{\"x\":1}"), strSql);
+    NewHandle(nullptr, "u", ParseJson("{\"x\":1}"), strSql);
     EXPECT_EQ(TakeSyslogCalls().size(), 1U);
     EXPECT_EQ(
         TakeLog(),
@@ -273,7 +269,7 @@ TEST_F(LogLineTest, DebugLineAfterAnErrorReadsItsFlagBehindIt) {
 
 TEST_F(LogLineTest, PrintedLineStaysInTheBufferOfTheHost) {
     // In a process whose standard output is a pipe: there nothing but a flush empties the buffer.
-    EXPECT_EQ(0, InFreshProcess([] {
+    EXPECT_EQ(InFreshProcess([] {
                   StdoutCapture capture;
                   blLogToStdout = true;
                   LongCheck();
@@ -281,7 +277,8 @@ TEST_F(LogLineTest, PrintedLineStaysInTheBufferOfTheHost) {
                   EXPECT_EQ(::fstat(STDOUT_FILENO, &status), 0);
                   EXPECT_EQ(status.st_size, 0);
                   EXPECT_NE(capture.Take(), "");
-              }));
+              }),
+              0);
 }
 
 TEST_F(LogLineTest, SystemLogIsNeitherOpenedNorClosed) {

@@ -1,20 +1,12 @@
 // The row callback called as SQLite would call it, with what SQLite itself never hands over. The
 // library gives its callback to sqlite3_exec and to nobody else, so it is caught there.
-#include <cerrno>
-
-#include "../support/TableFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
-
-const char* const kFieldCheck =
-    "0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))";
-const char* const kRecCheck = "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)";
-
-// m_fnCallback is the library's, and m_strTable the table whose statement ran last.
+// m_fnCallback is the library's, and t the table whose statement ran last.
 class RowCallbackTest : public TableTest {
   protected:
     void SetUp() override {
@@ -24,7 +16,6 @@ class RowCallbackTest : public TableTest {
         ASSERT_EQ(m_pHandle->recList(jNoQuery, jRows), 0);
         m_fnCallback = LastRowCallback();
         ASSERT_NE(m_fnCallback, nullptr);
-        errno = 0;
     }
 
     RowCallback m_fnCallback = nullptr;
@@ -62,36 +53,32 @@ TEST_F(RowCallbackTest, ArrayArgumentOfAnotherKindIsRefusedAndLeftAlone) {
 }
 
 TEST_F(RowCallbackTest, ObjectAsArrayArgumentMakesTheFirstRowStopTheStatement) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b')");
-    const std::string strSql = "SELECT * FROM " + m_strTable;
+    Sql("INSERT INTO t VALUES (1, 'a'), (2, 'b')");
+    const std::string strSql = "SELECT * FROM t";
     Json::Value jObject(Json::objectValue);
     EXPECT_EQ(m_pHandle->runSqlEx(strSql, m_fnCallback, &jObject), -1);
-    EXPECT_EQ(TakeLog(),
-              (Lines{Check("pjRecArray->type() != Json::arrayValue && "
-                           "pjRecArray->type() != Json::nullValue"),
-                     Plain("i=0,errno=0, run sql failed, error=" +
-                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+    EXPECT_EQ(TakeLog(), (Lines{Check("pjRecArray->type() != Json::arrayValue && "
+                                      "pjRecArray->type() != Json::nullValue"),
+                                RunFailed(sqlite3_errstr(SQLITE_ABORT), strSql)}));
 }
 
 TEST_F(RowCallbackTest, RowidColumnFailsTheStatementBecauseTheDefinitionLacksIt) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
-    const std::string strSql = "SELECT id, rowid AS rowid FROM " + m_strTable;
+    Sql("INSERT INTO t VALUES (1, 'a')");
+    const std::string strSql = "SELECT id, rowid AS rowid FROM t";
     Json::Value jRows;
     EXPECT_EQ(m_pHandle->runSqlEx(strSql, m_fnCallback, &jRows), -1);
     EXPECT_EQ(TakeLog(),
-              (Lines{Check("!jType.isMember(strName)"), Check(kFieldCheck),
-                     Plain("column_name[1]=rowid"), Plain("column_value[1]=1"), Check(kRecCheck),
-                     Plain("i=0,errno=0, run sql failed, error=" +
-                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+              (Lines{Check("!jType.isMember(strName)"), Check(kFieldFailed),
+                     Plain("column_name[1]=rowid"), Plain("column_value[1]=1"), Check(kRowFailed),
+                     RunFailed(sqlite3_errstr(SQLITE_ABORT), strSql)}));
     EXPECT_TRUE(jRows.isNull());
 }
 
 TEST_F(RowCallbackTest, PlaceOfALateColumnIsADecimalNumber) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a')");
+    Sql("INSERT INTO t VALUES (1, 'a')");
     Json::Value jRows;
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT id, id, id, id, id, id, id, id, id, id, rowid AS rowid "
-                                  "FROM " +
-                                      m_strTable,
+                                  "FROM t",
                                   m_fnCallback, &jRows),
               -1);
     const Lines vecLog = TakeLog();
@@ -106,8 +93,8 @@ TEST_F(RowCallbackTest, RowWithoutNamesOrValuesIsRefused) {
     EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, nullptr), -1);
     EXPECT_EQ(m_fnCallback(&jRows, 0, nullptr, nullptr), -1);
     const std::string strCheck = Check("NULL == column_name || NULL == column_value");
-    EXPECT_EQ(TakeLog(), (Lines{strCheck, Check(kRecCheck), strCheck, Check(kRecCheck), strCheck,
-                                Check(kRecCheck)}));
+    EXPECT_EQ(TakeLog(), (Lines{strCheck, Check(kRowFailed), strCheck, Check(kRowFailed), strCheck,
+                                Check(kRowFailed)}));
     EXPECT_EQ(Compact(jRows), "[]");
 }
 
@@ -125,19 +112,18 @@ TEST_F(RowCallbackTest, FirstColumnWithoutANameLogsOnlyTheConditions) {
     Json::Value jRows(Json::arrayValue);
     m_aszNames[0] = nullptr;
     EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
-    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRecCheck)}));
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRowFailed)}));
     EXPECT_EQ(Compact(jRows), "[]");
 }
 
 TEST_F(RowCallbackTest, FirstColumnWithoutANameIsRefusedBeforeTheTypesAreLookedUp) {
-    const std::string strTable = UniqueTable();
-    const auto pHandle = NewHandle(m_pDb, strTable, Json::Value(), "SELECT 1");
+    const auto pHandle = NewHandle(m_pDb, "u", Json::Value(), "SELECT 1");
     EXPECT_EQ(pHandle->runSqlEx("SELECT 1"), 0);
     TakeLog();
     Json::Value jRows;
     m_aszNames[0] = nullptr;
     EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
-    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRecCheck)}));
+    EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Check(kRowFailed)}));
 }
 
 TEST_F(RowCallbackTest, LaterColumnWithoutANameAlsoLogsItsValue) {
@@ -145,7 +131,7 @@ TEST_F(RowCallbackTest, LaterColumnWithoutANameAlsoLogsItsValue) {
     m_aszNames[1] = nullptr;
     EXPECT_EQ(m_fnCallback(&jRows, 2, m_aszValues, m_aszNames), -1);
     EXPECT_EQ(TakeLog(), (Lines{Check("NULL == column_name[i]"), Plain("column_name[1]=(null)"),
-                                Plain("column_value[1]=x"), Check(kRecCheck)}));
+                                Plain("column_value[1]=x"), Check(kRowFailed)}));
     EXPECT_EQ(Compact(jRows), "[]");
 }
 
@@ -159,9 +145,7 @@ TEST_F(RowCallbackTest, SecondColumnOfTheSameNameWins) {
 }
 
 TEST_F(RowCallbackTest, TypesAreThoseOfTheTableWhoseStatementRanLast) {
-    const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
-                                  "CREATE TABLE " + strOther + " (id)");
+    const auto pOther = NewHandle(m_pDb, "u", Definition("u", "id:string"), "CREATE TABLE u (id)");
     Json::Value jNoQuery;
     Json::Value jRows;
     EXPECT_EQ(pOther->recList(jNoQuery, jRows), 0);
@@ -172,30 +156,23 @@ TEST_F(RowCallbackTest, TypesAreThoseOfTheTableWhoseStatementRanLast) {
 }
 
 TEST_F(RowCallbackTest, LookupByTheCallbackAloneSpoilsTheTableNameForGood) {
-    const std::string strTable = UniqueTable();
-    const Json::Value jDefinition = Definition(strTable, "id:int");
-    const auto pHandle =
-        NewHandle(m_pDb, strTable, jDefinition, "CREATE TABLE " + strTable + " (id)");
-    Sql("INSERT INTO " + strTable + " VALUES (1)");
-    const std::string strSql = "SELECT id FROM " + strTable;
+    OpenItem();
+    Sql("INSERT INTO t VALUES (1, 'a')");
+    const std::string strSql = "SELECT id FROM t";
     Json::Value jRows;
-    EXPECT_EQ(pHandle->runSqlEx(strSql, m_fnCallback, &jRows), -1);
-    Lines vecLog = TakeLog();
-    ASSERT_EQ(vecLog.size(), 8U);
-    EXPECT_EQ(vecLog[3].compare(0, 18, "util plain: jType="), 0) << vecLog[3];
-    vecLog.erase(vecLog.begin() + 3);  // the whole cache, whatever other tests left in it
-    EXPECT_EQ(vecLog,
-              (Lines{UtilCheck("jTableDef.empty()"), UtilPlain("strJsonName=" + strTable),
-                     UtilPlain("jTableDef=null"), Check("!jType.isMember(strName)"),
-                     Check(kFieldCheck), Check(kRecCheck),
-                     Plain("i=0,errno=0, run sql failed, error=" +
-                           std::string(sqlite3_errstr(SQLITE_ABORT)) + ", sql=" + strSql)}));
+    EXPECT_EQ(m_pHandle->runSqlEx(strSql, m_fnCallback, &jRows), -1);
+    EXPECT_EQ(TakeLog(),
+              (Lines{UtilCheck("jTableDef.empty()"), UtilPlain("strJsonName=t"),
+                     UtilPlain("jTableDef=null"), UtilPlain("jType=null"),
+                     Check("!jType.isMember(strName)"), Check(kFieldFailed), Check(kRowFailed),
+                     RunFailed(sqlite3_errstr(SQLITE_ABORT), strSql)}));
     Json::Value jNoQuery;
-    EXPECT_EQ(pHandle->recList(jNoQuery, jRows), -1);
-    vecLog = TakeLog();
-    ASSERT_GE(vecLog.size(), 3U);
-    EXPECT_EQ(vecLog[0], UtilCheck("jType[strJsonName].type() != Json::objectValue"));
-    EXPECT_EQ(vecLog[1], UtilPlain("strJsonName=" + strTable));
-    EXPECT_EQ(vecLog[2], UtilPlain("jTableDef=" + Compact(jDefinition)));
+    EXPECT_EQ(m_pHandle->recList(jNoQuery, jRows), -1);
+    Lines vecLog = TakeLog();
+    vecLog.resize(4);
+    EXPECT_EQ(vecLog,
+              (Lines{UtilCheck("jType[strJsonName].type() != Json::objectValue"),
+                     UtilPlain("strJsonName=t"), UtilPlain("jTableDef=" + Compact(m_jDefinition)),
+                     UtilPlain(R"(jType={"t":null})")}));
     EXPECT_TRUE(jRows.isNull());
 }

@@ -1,7 +1,7 @@
 // Rows into records: what each type makes of a column's text.
 #include <limits>
 
-#include "RowsFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
@@ -19,31 +19,48 @@ std::string Repeated(const std::string& str, size_t nTimes) {
 const Json::Int kOfLongMax = sizeof(long) == 8 ? -1 : std::numeric_limits<Json::Int>::max();
 const Json::Int kOfLongMin = sizeof(long) == 8 ? 0 : std::numeric_limits<Json::Int>::min();
 
+class RowValues : public TableTest {
+  protected:
+    // What a member of the given type reads from a stored text.
+    void ExpectRead(const char* szType, const std::string& strText, const Json::Value& jExpected) {
+        SCOPED_TRACE(szType + (": " + strText));
+        Open(std::string("a:") + szType);
+        char* szSql = sqlite3_mprintf("INSERT INTO t VALUES (%Q)", strText.c_str());
+        Sql(szSql);
+        sqlite3_free(szSql);
+        const Json::Value jRows = Listed();
+        ASSERT_EQ(jRows.size(), 1U);
+        ASSERT_TRUE(jRows[0].isMember("a"));
+        EXPECT_EQ(jRows[0]["a"], jExpected);
+        EXPECT_EQ(jRows[0]["a"].type(), jExpected.type());
+    }
+};
+
 }  // namespace
 
-TEST_F(RowsTest, NullColumnLeavesTheMemberOutWhateverItsType) {
+TEST_F(RowValues, NullColumnLeavesTheMemberOutWhateverItsType) {
     Open(
         "a:string,b:int,c:bool,d:long long,e:Json::Value,f:double,g:no such type,h:unsigned "
         "int,i:Json::arrayValue");
-    Insert("(NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL)");
-    Insert("('x', NULL, NULL, NULL, NULL, NULL, NULL, 8, NULL)");
+    Sql("INSERT INTO t VALUES (NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL, NULL)");
+    Sql("INSERT INTO t VALUES ('x', NULL, NULL, NULL, NULL, NULL, NULL, 8, NULL)");
     EXPECT_EQ(Compact(Listed()), R"([{},{"a":"x","h":8}])");
 }
 
-TEST_F(RowsTest, StringIsTheTextItself) {
+TEST_F(RowValues, StringIsTheTextItself) {
     for (const char* szText : {"", " ", "abc", "12", "null", "it's", "100%", "%s%n", "a\nb\t\"c\"",
                                "\xC3\xBC\xE2\x82\xAC\xF0\x9F\x98\x80", "{\"a\":1}"}) {
         ExpectRead("string", szText, Json::Value(szText));
     }
 }
 
-TEST_F(RowsTest, StringOfANumberColumnIsItsText) {
+TEST_F(RowValues, StringOfANumberColumnIsItsText) {
     Open("a:string,b:string");
-    Insert("(12, -1.5)");
+    Sql("INSERT INTO t VALUES (12, -1.5)");
     EXPECT_EQ(Compact(Listed()), R"([{"a":"12","b":"-1.5"}])");
 }
 
-TEST_F(RowsTest, IntFollowsTheRulesOfTheCLibrary) {
+TEST_F(RowValues, IntFollowsTheRulesOfTheCLibrary) {
     for (const char* szType : {"int", "unsigned int"}) {
         ExpectRead(szType, "42", Json::Value(Json::Int(42)));
         ExpectRead(szType, "-7", Json::Value(Json::Int(-7)));
@@ -60,7 +77,7 @@ TEST_F(RowsTest, IntFollowsTheRulesOfTheCLibrary) {
     }
 }
 
-TEST_F(RowsTest, IntBeyondItsRangeKeepsTheLowBitsOfALongOrClampsToIt) {
+TEST_F(RowValues, IntBeyondItsRangeKeepsTheLowBitsOfALongOrClampsToIt) {
     const bool blLong64 = sizeof(long) == 8;
     const Json::Int nMax = std::numeric_limits<Json::Int>::max();
     const Json::Int nMin = std::numeric_limits<Json::Int>::min();
@@ -73,14 +90,14 @@ TEST_F(RowsTest, IntBeyondItsRangeKeepsTheLowBitsOfALongOrClampsToIt) {
     }
 }
 
-TEST_F(RowsTest, UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion) {
+TEST_F(RowValues, UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion) {
     const bool blLong64 = sizeof(long) == 8;
     const Json::Int nMax = std::numeric_limits<Json::Int>::max();
     ExpectRead("unsigned int", "3000000000", Json::Value(blLong64 ? Json::Int(-1294967296) : nMax));
     ExpectRead("unsigned int", "4294967295", Json::Value(blLong64 ? Json::Int(-1) : nMax));
 }
 
-TEST_F(RowsTest, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
+TEST_F(RowValues, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
     const Json::Int64 nMax = std::numeric_limits<Json::Int64>::max();
     const Json::Int64 nMin = std::numeric_limits<Json::Int64>::min();
     for (const char* szType : {"long long", "unsigned long long"}) {
@@ -102,7 +119,7 @@ TEST_F(RowsTest, LongLongIsASignedSixtyFourBitIntegerClampedToItsRange) {
     }
 }
 
-TEST_F(RowsTest, BoolIsTrueForTheNumberOneOnly) {
+TEST_F(RowValues, BoolIsTrueForTheNumberOneOnly) {
     for (const char* szTrue : {"1", " 1", "+1", "01", "1.9", "1x", "1a"}) {
         ExpectRead("bool", szTrue, Json::Value(true));
     }
@@ -112,7 +129,7 @@ TEST_F(RowsTest, BoolIsTrueForTheNumberOneOnly) {
     }
 }
 
-TEST_F(RowsTest, JsonTypesParseTheirTextWhateverKindItHolds) {
+TEST_F(RowValues, JsonTypesParseTheirTextWhateverKindItHolds) {
     for (const char* szType : {"Json::Value", "Json::objectValue", "Json::arrayValue"}) {
         for (const char* szText : {R"({"a":[1,-2,true,null,"x"],"b":{}})", R"([[],{"k":"v"},1.5])",
                                    "{}", "[]", R"({"u":18446744073709551615,"i":-5})"}) {
@@ -121,15 +138,16 @@ TEST_F(RowsTest, JsonTypesParseTheirTextWhateverKindItHolds) {
     }
 }
 
-TEST_F(RowsTest, JsonTypesReadScalarsToo) {
+TEST_F(RowValues, JsonTypesReadScalarsToo) {
     for (const char* szText : {"5", "-1.5", "true", "null", "\"text\""}) {
         ExpectRead("Json::Value", szText, ParseJson(szText));
     }
 }
 
-TEST_F(RowsTest, TextThatIsNoJsonIsNoFailure) {
+TEST_F(RowValues, TextThatIsNoJsonIsNoFailure) {
     Open("a:Json::objectValue,b:int");
-    Insert("('no json', 1), ('{\"x\":', 2), ('', 3), ('{\"x\":1}', 4), ('\xFF', 5)");
+    Sql("INSERT INTO t VALUES ('no json', 1), ('{\"x\":', 2), ('', 3), ('{\"x\":1}', 4), ('\xFF', "
+        "5)");
     const Json::Value jRows = Listed();
     ASSERT_EQ(jRows.size(), 5U);
     for (Json::ArrayIndex i = 0; i < 5; ++i) {
@@ -139,7 +157,7 @@ TEST_F(RowsTest, TextThatIsNoJsonIsNoFailure) {
 }
 
 // The reader gives up half way and leaves what it has read so far.
-TEST_F(RowsTest, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoesOn) {
+TEST_F(RowValues, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoesOn) {
     const std::string aTexts[] = {
         Repeated("[", 1100) + Repeated("]", 1100),
         Repeated("[", 1100),
@@ -152,8 +170,9 @@ TEST_F(RowsTest, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoes
     Open("a:int,b:Json::arrayValue,c:int");
     for (const std::string& strText : aTexts) {
         SCOPED_TRACE(strText.substr(0, 30));
-        char* szSql = sqlite3_mprintf("(1, '[1]', 3), (4, %Q, 6), (7, '[2]', 9)", strText.c_str());
-        Insert(szSql);
+        char* szSql = sqlite3_mprintf(
+            "INSERT INTO t VALUES (1, '[1]', 3), (4, %Q, 6), (7, '[2]', 9)", strText.c_str());
+        Sql(szSql);
         sqlite3_free(szSql);
         Json::Value jRows = Listed();
         ASSERT_EQ(jRows.size(), 3U);
@@ -161,11 +180,11 @@ TEST_F(RowsTest, JsonNestedTooDeepLeavesTheMemberAsTheReaderLeftItAndTheListGoes
         EXPECT_TRUE(jRows[1]["b"] == ReadLeniently(strText));
         EXPECT_EQ(jRows[1]["c"], Json::Value(6));
         EXPECT_EQ(Compact(jRows[2]), R"({"a":7,"b":[2],"c":9})");
-        Sql("DELETE FROM " + m_strTable);
+        Sql("DELETE FROM t");
     }
 }
 
-TEST_F(RowsTest, RecordNestedTooDeepToBeReadIsCreated) {
+TEST_F(RowValues, RecordNestedTooDeepToBeReadIsCreated) {
     Open("a:Json::arrayValue,b:int");
     Json::Value jRecord(Json::objectValue);
     jRecord["a"] = Json::Value(Json::arrayValue);
@@ -180,11 +199,11 @@ TEST_F(RowsTest, RecordNestedTooDeepToBeReadIsCreated) {
     EXPECT_EQ(TakeLog().size(), 0U);
     EXPECT_EQ(jStored["b"], Json::Value(7));
     EXPECT_TRUE(jStored["a"] == ReadLeniently(Repeated("[", 1101) + Repeated("]", 1101)));
-    EXPECT_EQ(Rows("SELECT length(a) FROM " + m_strTable), "2202");
+    EXPECT_EQ(Rows("SELECT length(a) FROM t"), "2202");
 }
 
-TEST_F(RowsTest, NumberOutOfRangeInStoredJsonIsNoFailure) {
+TEST_F(RowValues, NumberOutOfRangeInStoredJsonIsNoFailure) {
     Open("a:Json::arrayValue,b:int");
-    Insert("('[1e999, 99999999999999999999999]', 1)");
+    Sql("INSERT INTO t VALUES ('[1e999, 99999999999999999999999]', 1)");
     EXPECT_EQ(Listed()[0]["b"], Json::Value(Json::Int(1)));
 }

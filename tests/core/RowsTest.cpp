@@ -1,15 +1,39 @@
 // Rows into records: what stops a statement, what is said then, and whose the records are.
-#include "RowsFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
+class RowsTest : public TableTest {
+  protected:
+    int List(Json::Value& jRows) {
+        Json::Value jNoQuery;
+        return m_pHandle->recList(jNoQuery, jRows);
+    }
 
-const char* const kFieldCheck =
-    "0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))";
-const char* const kRecCheck = "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)";
+    // The lines of recList after the callback has stopped its statement.
+    static Lines StoppedList(const Lines& vecLines, const std::string& strColumns) {
+        const std::string strError = sqlite3_errstr(SQLITE_ABORT);
+        const std::string strSql = "SELECT " + strColumns + " FROM t ;";
+        return Joined(vecLines, {RunFailed(strError, strSql), Check(kListFailed),
+                                 Plain("jRecParam=null"), SqlError(strError, strSql)});
+    }
+
+    // Saves {"id":1,"name":"a"} into a table whose read-back is stopped with these lines.
+    void ExpectStoppedSave(const Lines& vecLines) {
+        Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
+        EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
+        const std::string strError = sqlite3_errstr(SQLITE_ABORT);
+        const char* const szSql =
+            "INSERT INTO t (id,name) VALUES (1,'a') ;select * from t where rowid == "
+            "last_insert_rowid();";
+        EXPECT_EQ(TakeLog(),
+                  Joined(vecLines, {RunFailed(strError, szSql), Check(kSaveFailed),
+                                    Plain("blCreate=1, jRecInOut=" + Compact(jRecord)),
+                                    Plain("jType=" + Types()), SqlError(strError, szSql)}));
+    }
+};
 
 }  // namespace
 
@@ -17,11 +41,11 @@ TEST_F(RowsTest, TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions) {
     for (const char* szType : {"long", "unsigned long", "unsigned", "double", "float", "uid_t",
                                "time_t", "String", "int ", "", "BOOL", "%s"}) {
         Open(std::string("a:") + szType + ",b:int");
-        Insert("(1, 2)");
+        Sql("INSERT INTO t VALUES (1, 2)");
         Json::Value jRows;
         EXPECT_EQ(List(jRows), -1) << szType;
         EXPECT_EQ(TakeLog(), StoppedList({Located(std::string("type error, strType=") + szType),
-                                          Check(kFieldCheck), Check(kRecCheck)},
+                                          Check(kFieldFailed), Check(kRowFailed)},
                                          "a,b"));
         EXPECT_TRUE(jRows.isNull()) << szType;
     }
@@ -29,12 +53,12 @@ TEST_F(RowsTest, TypeWithoutAConversionAtTheFirstColumnLogsOnlyItsConditions) {
 
 TEST_F(RowsTest, TypeWithoutAConversionAtALaterColumnAlsoLogsItsNameAndValue) {
     Open("a:int,b:string,c:double");
-    Insert("(1, 'x', 2.5)");
+    Sql("INSERT INTO t VALUES (1, 'x', 2.5)");
     Json::Value jRows;
     EXPECT_EQ(List(jRows), -1);
-    EXPECT_EQ(TakeLog(), StoppedList({Located("type error, strType=double"), Check(kFieldCheck),
+    EXPECT_EQ(TakeLog(), StoppedList({Located("type error, strType=double"), Check(kFieldFailed),
                                       Plain("column_name[2]=c"), Plain("column_value[2]=2.5"),
-                                      Check(kRecCheck)},
+                                      Check(kRowFailed)},
                                      "a,b,c"));
 }
 
@@ -43,16 +67,14 @@ TEST_F(RowsTest, TypeNameThatGoesOnBehindANulIsAnotherName) {
                                        std::string("Json::Value"), std::string("bool")}) {
         for (const std::string& strMore :
              {std::string(1, '\0'), std::string("\0x", 2), std::string(40, '\0')}) {
-            m_strTable = UniqueTable();
-            Json::Value jDefinition = Definition(m_strTable, "a:int");
-            jDefinition[m_strTable]["member"]["a"]["cpptype"] = strName + strMore;
-            m_pHandle =
-                NewHandle(m_pDb, m_strTable, jDefinition, "CREATE TABLE " + m_strTable + " (a)");
-            Insert("(1)");
+            Json::Value jMembers(Json::objectValue);
+            jMembers["a"]["cpptype"] = strName + strMore;
+            OpenMembers(jMembers, "a");
+            Sql("INSERT INTO t VALUES (1)");
             Json::Value jRows;
             EXPECT_EQ(List(jRows), -1);
             EXPECT_EQ(TakeLog(), StoppedList({Located("type error, strType=" + strName),
-                                              Check(kFieldCheck), Check(kRecCheck)},
+                                              Check(kFieldFailed), Check(kRowFailed)},
                                              "a"));
         }
     }
@@ -60,7 +82,7 @@ TEST_F(RowsTest, TypeNameThatGoesOnBehindANulIsAnotherName) {
 
 TEST_F(RowsTest, BadRowStopsTheStatementAndEarlierRecordsStay) {
     Open("a:int,b:double");
-    Insert("(1, NULL), (2, NULL), (3, 'x'), (4, NULL)");
+    Sql("INSERT INTO t VALUES (1, NULL), (2, NULL), (3, 'x'), (4, NULL)");
     Json::Value jRows = ParseJson("[\"old\"]");
     EXPECT_EQ(List(jRows), -1);
     EXPECT_EQ(Compact(jRows), R"(["old",{"a":1},{"a":2}])");
@@ -70,36 +92,24 @@ TEST_F(RowsTest, BadRowStopsTheStatementAndEarlierRecordsStay) {
 }
 
 TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRow) {
-    Open("id:int,name:string", ", more DEFAULT 'm'");
-    Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
-    EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
-    EXPECT_EQ(TakeLog(), StoppedSave({Check("!jType.isMember(strName)"), Check(kFieldCheck),
-                                      Plain("column_name[2]=more"), Plain("column_value[2]=m"),
-                                      Check(kRecCheck)},
-                                     R"({"id":1,"name":"a"})", "(id,name) VALUES (1,'a') "));
-    EXPECT_EQ(Rows("SELECT * FROM " + m_strTable), "1|a|m");
+    Open(kItem, "id, name, more DEFAULT 'm'");
+    ExpectStoppedSave({Check("!jType.isMember(strName)"), Check(kFieldFailed),
+                       Plain("column_name[2]=more"), Plain("column_value[2]=m"),
+                       Check(kRowFailed)});
+    EXPECT_EQ(All(), "1|a|m");
 }
 
 TEST_F(RowsTest, ColumnMissingFromTheDefinitionFailsTheRowEvenWhenItIsNull) {
-    Open("id:int,name:string", ", more");
-    Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
-    EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
-    EXPECT_EQ(TakeLog(), StoppedSave({Check("!jType.isMember(strName)"), Check(kFieldCheck),
-                                      Plain("column_name[2]=more"), Plain("column_value[2]=(null)"),
-                                      Check(kRecCheck)},
-                                     R"({"id":1,"name":"a"})", "(id,name) VALUES (1,'a') "));
+    Open(kItem, "id, name, more");
+    ExpectStoppedSave({Check("!jType.isMember(strName)"), Check(kFieldFailed),
+                       Plain("column_name[2]=more"), Plain("column_value[2]=(null)"),
+                       Check(kRowFailed)});
 }
 
 TEST_F(RowsTest, FirstColumnMissingFromTheDefinitionLogsNoNameAndValue) {
-    m_strTable = UniqueTable();
-    m_pHandle = NewHandle(m_pDb, m_strTable, Definition(m_strTable, "id:int,name:string"),
-                          "CREATE TABLE " + m_strTable + " (more DEFAULT 'm', id, name)");
-    Json::Value jRecord = ParseJson(R"({"id":1,"name":"a"})");
-    EXPECT_EQ(m_pHandle->recSave(jRecord, true), -1);
-    EXPECT_EQ(TakeLog(),
-              StoppedSave({Check("!jType.isMember(strName)"), Check(kFieldCheck), Check(kRecCheck)},
-                          R"({"id":1,"name":"a"})", "(id,name) VALUES (1,'a') "));
-    EXPECT_EQ(Rows("SELECT * FROM " + m_strTable), "m|1|a");
+    Open(kItem, "more DEFAULT 'm', id, name");
+    ExpectStoppedSave({Check("!jType.isMember(strName)"), Check(kFieldFailed), Check(kRowFailed)});
+    EXPECT_EQ(All(), "m|1|a");
 }
 
 TEST_F(RowsTest, NullArrayBecomesAnArrayWithTheFirstRowOnly) {
@@ -107,15 +117,15 @@ TEST_F(RowsTest, NullArrayBecomesAnArrayWithTheFirstRowOnly) {
     Json::Value jRows;
     EXPECT_EQ(List(jRows), 0);
     EXPECT_TRUE(jRows.isNull());
-    Insert("(1)");
+    Sql("INSERT INTO t VALUES (1)");
     EXPECT_EQ(List(jRows), 0);
     EXPECT_EQ(Compact(jRows), R"([{"a":1}])");
 }
 
 TEST_F(RowsTest, ColumnsMayComeInAnyOrderAndNullAtAnyPlace) {
     Open("z:int,a:string,\xC3\xBC:bool,a1:long long,B:int");
-    Insert(
-        "(1, 'x', 1, 2, 3), (NULL, 'x', 1, 2, 3), (1, NULL, 1, 2, 3), (1, 'x', NULL, 2, 3), "
+    Sql("INSERT INTO t VALUES (1, 'x', 1, 2, 3), (NULL, 'x', 1, 2, 3), (1, NULL, 1, 2, 3), (1, "
+        "'x', NULL, 2, 3), "
         "(1, 'x', 1, NULL, 3), (1, 'x', 1, 2, NULL), (NULL, NULL, NULL, NULL, NULL)");
     Listed();
     const RowCallback fnCallback = LastRowCallback();
@@ -128,44 +138,38 @@ TEST_F(RowsTest, ColumnsMayComeInAnyOrderAndNullAtAnyPlace) {
         "{\"a\":\"x\",\"a1\":2,\"z\":1,\"\xC3\xBC\":true},{}]");
     for (const char* szColumns : {"*", "a, z, a1, B, \xC3\xBC", "\xC3\xBC, z, B, a, a1", "*"}) {
         Json::Value jRows;
-        EXPECT_EQ(m_pHandle->runSqlEx("SELECT " + std::string(szColumns) + " FROM " + m_strTable,
-                                      fnCallback, &jRows),
-                  0);
+        EXPECT_EQ(
+            m_pHandle->runSqlEx("SELECT " + std::string(szColumns) + " FROM t", fnCallback, &jRows),
+            0);
         EXPECT_EQ(jRows, jExpected) << szColumns;
     }
     EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(RowsTest, ManyTablesEachKeepTheirOwnTypes) {
-    struct Table {
-        std::string strTable;
-        std::unique_ptr<VornJsonDbApi> pHandle;
-        std::string strExpected;
-    };
     const std::pair<const char*, const char*> aTypes[] = {
         {"string", "\"1\""}, {"int", "1"}, {"bool", "true"}};
-    std::vector<Table> vecTables;
+    std::vector<std::unique_ptr<VornJsonDbApi>> vecHandles;
     for (size_t i = 0; i < 300; ++i) {
-        Open(std::string("a:") + aTypes[i % 3].first + ",b:int");
-        Insert("(1, " + std::to_string(i) + ")");
-        vecTables.push_back({m_strTable, std::move(m_pHandle),
-                             "[{\"a\":" + std::string(aTypes[i % 3].second) +
-                                 ",\"b\":" + std::to_string(i) + "}]"});
+        const std::string strTable = "t" + std::to_string(i);
+        const std::string strMembers = std::string("a:") + aTypes[i % 3].first + ",b:int";
+        vecHandles.push_back(NewHandle(
+            m_pDb, strTable, Definition(strTable, strMembers),
+            "CREATE TABLE " + strTable + " AS SELECT 1 AS a, " + std::to_string(i) + " AS b"));
     }
-    for (int nPass = 0; nPass < 2; ++nPass) {
-        for (const Table& table : vecTables) {
-            Json::Value jNoQuery;
-            Json::Value jRows;
-            EXPECT_EQ(table.pHandle->recList(jNoQuery, jRows), 0);
-            EXPECT_EQ(Compact(jRows), table.strExpected);
-        }
+    for (size_t i = 0; i < 600; ++i) {
+        Json::Value jNoQuery;
+        Json::Value jRows;
+        EXPECT_EQ(vecHandles[i % 300]->recList(jNoQuery, jRows), 0);
+        EXPECT_EQ(Compact(jRows), "[{\"a\":" + std::string(aTypes[i % 3].second) +
+                                      ",\"b\":" + std::to_string(i % 300) + "}]");
     }
     EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(RowsTest, RecordsAreTheCallersToChangeAndToKeep) {
     Open("a:int,b:Json::Value");
-    Insert("(1, '{\"x\":[1]}'), (2, '{\"x\":[1]}')");
+    Sql("INSERT INTO t VALUES (1, '{\"x\":[1]}'), (2, '{\"x\":[1]}')");
     Json::Value jRows = Listed();
     jRows[0]["b"]["x"][0] = 9;
     jRows[0]["a"] = "text";
@@ -173,7 +177,7 @@ TEST_F(RowsTest, RecordsAreTheCallersToChangeAndToKeep) {
     jRows[0].removeMember("b");
     EXPECT_EQ(Compact(jRows), R"([{"a":"text","c":3},{"a":2,"b":{"x":[1]}}])");
     EXPECT_EQ(Compact(Listed()), R"([{"a":1,"b":{"x":[1]}},{"a":2,"b":{"x":[1]}}])");
-    Sql("DROP TABLE " + m_strTable);
+    Sql("DROP TABLE t");
     m_pHandle.reset();
     EXPECT_EQ(Compact(jRows), R"([{"a":"text","c":3},{"a":2,"b":{"x":[1]}}])");
 }
@@ -181,8 +185,7 @@ TEST_F(RowsTest, RecordsAreTheCallersToChangeAndToKeep) {
 TEST_F(RowsTest, LargeNumberOfRowsKeepsItsOrder) {
     Open("a:int");
     Sql("WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 2000) INSERT "
-        "INTO " +
-        m_strTable + " SELECT i FROM n");
+        "INTO t SELECT i FROM n");
     const Json::Value jRows = Listed();
     ASSERT_EQ(jRows.size(), 2000U);
     for (Json::ArrayIndex i = 0; i < 2000; ++i) {

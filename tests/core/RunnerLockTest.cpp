@@ -2,22 +2,14 @@
 #include <cerrno>
 
 #include "../support/LockHolder.h"
-#include "../support/TableFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
-
 constexpr size_t kAttempts = 500;
 const char* const kLockText = "database is locked";
-
-std::string FailureLine(const std::string& strError, const std::string& strSql, int nErrno,
-                        size_t nAttempts) {
-    return Plain("i=" + std::to_string(nAttempts) + ",errno=" + std::to_string(nErrno) +
-                 ", run sql failed, error=" + strError + ", sql=" + strSql);
-}
 
 std::string RetryLine(size_t nAttempt, int nErrno, const std::string& strError,
                       const std::string& strSql) {
@@ -67,7 +59,7 @@ TEST_F(RunnerLockTest, GivesUpAfterFiveHundredAttemptsEachFollowedByAPause) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql(), Lines(kAttempts, "SELECT 1"));
     EXPECT_EQ(TakePauses(), Pauses(kAttempts));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine(kLockText, "SELECT 1", 0, 500)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed(kLockText, "SELECT 1", 0, 500)}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), kLockText);
 }
 
@@ -79,7 +71,7 @@ TEST_F(RunnerLockTest, GivingUpWithDebugFlagShowsEveryRetry) {
     for (size_t i = 0; i < kAttempts; ++i) {
         vecExpected.push_back(RetryLine(i, EAGAIN, kLockText, "SELECT 1"));
     }
-    vecExpected.push_back(FailureLine(kLockText, "SELECT 1", EAGAIN, 500));
+    vecExpected.push_back(RunFailed(kLockText, "SELECT 1", EAGAIN, 500));
     vecExpected.push_back(Plain("run sql fail, err=database is locked"));
     EXPECT_EQ(TakeLog(), vecExpected);
 }
@@ -103,10 +95,10 @@ TEST_F(RunnerLockTest, PauseComesAfterItsRetryLineAndBeforeTheNextAttempt) {
 }
 
 TEST_F(RunnerLockTest, ClearedLockGivesTheSuccessResultAndLogsNothing) {
-    Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b')");
+    Sql("INSERT INTO t VALUES (1, 'a'), (2, 'b')");
     LockNextExec(3);
-    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM " + m_strTable), 2);
-    EXPECT_EQ(TakeSql(), Lines(4, "DELETE FROM " + m_strTable));
+    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM t"), 2);
+    EXPECT_EQ(TakeSql(), Lines(4, "DELETE FROM t"));
     EXPECT_EQ(TakePauses(), Pauses(3));
     EXPECT_EQ(TakeLog(), Lines());
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "");
@@ -135,14 +127,14 @@ TEST_F(RunnerLockTest, OtherErrorDuringRetriesEndsThemWithItsOwnTextAndCount) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql().size(), 3U);
     EXPECT_EQ(TakePauses(), Pauses(2));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("database or disk is full", "SELECT 1", ENOSPC, 2)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("database or disk is full", "SELECT 1", ENOSPC, 2)}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "database or disk is full");
 }
 
 TEST_F(RunnerLockTest, FailureWithoutATextDuringRetriesIsAnUnknownError) {
     FailNextExec({{SQLITE_BUSY, kLockText, 0}, {SQLITE_IOERR, nullptr, 0}});
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", 0, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 1", 0, 1)}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
 }
 
@@ -159,7 +151,7 @@ TEST_F(RunnerLockTest, TextsThatOnlyResembleTheLockTextAreNotRetried) {
         EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1) << szError;
         EXPECT_EQ(TakeSql().size(), 1U) << szError;
         EXPECT_EQ(TakePauses(), Pauses(0)) << szError;
-        EXPECT_EQ(TakeLog(), (Lines{FailureLine(szError, "SELECT 1", 0, 0)})) << szError;
+        EXPECT_EQ(TakeLog(), (Lines{RunFailed(szError, "SELECT 1", 0, 0)})) << szError;
     }
 }
 
@@ -167,7 +159,7 @@ TEST_F(RunnerLockTest, ResultCodeDoesNotDecideOnRetry) {
     FailNextExec({{SQLITE_ERROR, kLockText, 0}, {SQLITE_BUSY, "busy", 0}});
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql().size(), 2U);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("busy", "SELECT 1", 0, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("busy", "SELECT 1", 0, 1)}));
 }
 
 TEST_F(RunnerLockTest, EagainCountsAsLockedWhateverTheText) {
@@ -184,14 +176,14 @@ TEST_F(RunnerLockTest, EagainHasTheSameLimit) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql().size(), kAttempts);
     EXPECT_EQ(TakePauses(), Pauses(kAttempts));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("disk I/O error", "SELECT 1", EAGAIN, 500)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("disk I/O error", "SELECT 1", EAGAIN, 500)}));
 }
 
 TEST_F(RunnerLockTest, EagainOfOneAttemptIsClearedBeforeTheNext) {
     FailNextExec({{SQLITE_BUSY, kLockText, EAGAIN}});
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
     EXPECT_EQ(TakeSql(), Lines(2, "nonsense"));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
 }
 
 TEST_F(RunnerLockTest, ErrnoThatAFreeLeavesDoesNotDecideOnTheRetry) {
@@ -199,11 +191,11 @@ TEST_F(RunnerLockTest, ErrnoThatAFreeLeavesDoesNotDecideOnTheRetry) {
     FailNextExec({{SQLITE_BUSY, kLockText, 0}, {SQLITE_IOERR, "disk I/O error", ENOSPC}});
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakePauses(), Pauses(1));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("disk I/O error", "SELECT 1", ENOSPC, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("disk I/O error", "SELECT 1", ENOSPC, 1)}));
     // A statement that leaves errno as it finds it.
     LockNextExec(1);
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", "nonsense", 0, 1)}));
 }
 
 TEST_F(RunnerLockTest, FailureWithoutATextIsNoLockWhateverErrnoHolds) {
@@ -212,13 +204,13 @@ TEST_F(RunnerLockTest, FailureWithoutATextIsNoLockWhateverErrnoHolds) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql(), Lines{"SELECT 1"});
     EXPECT_EQ(TakePauses(), Pauses(0));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", EAGAIN, 0),
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 1", EAGAIN, 0),
                                 Plain("run sql fail, err=(null)")}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
     blDebugOutput = false;
     FailNextExec({{SQLITE_BUSY, kLockText, EAGAIN}, {SQLITE_BUSY, nullptr, EAGAIN}});
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", EAGAIN, 1)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 1", EAGAIN, 1)}));
 }
 
 TEST_F(RunnerLockTest, CallbackThatStopsWithEagainIsRunAgain) {
@@ -226,8 +218,7 @@ TEST_F(RunnerLockTest, CallbackThatStopsWithEagainIsRunAgain) {
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1", StopWithEagain, &nCalls), -1);
     EXPECT_EQ(nCalls, 500);
     EXPECT_EQ(TakePauses(), Pauses(kAttempts));
-    EXPECT_EQ(TakeLog(),
-              (Lines{FailureLine(sqlite3_errstr(SQLITE_ABORT), "SELECT 1", EAGAIN, 500)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed(sqlite3_errstr(SQLITE_ABORT), "SELECT 1", EAGAIN, 500)}));
 }
 
 TEST_F(RunnerLockTest, TextOfThePreviousAttemptIsKeptDuringTheRetry) {
@@ -241,10 +232,8 @@ TEST_F(RunnerLockTest, TextOfThePreviousAttemptIsKeptDuringTheRetry) {
 }
 
 TEST_F(RunnerLockTest, EveryAttemptNamesItsTableAgain) {
-    const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
-                                  "CREATE TABLE " + strOther + " (id)");
-    Sql("INSERT INTO " + m_strTable + " VALUES (7, 'a')");
+    const auto pOther = NewHandle(m_pDb, "u", Definition("u", "id:string"), "CREATE TABLE u (id)");
+    Sql("INSERT INTO t VALUES (7, 'a')");
     LockNextExec(1);
     OnPause([&](int) { EXPECT_EQ(pOther->runSqlEx("SELECT 1"), 1); });
     Json::Value jNoQuery;
@@ -261,8 +250,7 @@ TEST_F(RunnerFileLockTest, LockOfAnotherConnectionHeldTooLongFailsTheStatement) 
     EXPECT_EQ(TakePauses(), Pauses(kAttempts));
     const std::vector<SyslogCall> vecCalls = TakeSyslogCalls();
     ASSERT_EQ(vecCalls.size(), 1U);
-    EXPECT_EQ(TakeLog(),
-              (Lines{FailureLine(kLockText, m_strInsert, vecCalls[0].nErrno, kAttempts)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed(kLockText, m_strInsert, vecCalls[0].nErrno, kAttempts)}));
     lock.Release();
     EXPECT_EQ(Rows("SELECT count(*) FROM f.stored"), "0");
 }
@@ -302,8 +290,7 @@ TEST_F(RunnerFileLockTest, LockOfAnotherProcessHeldTooLongFailsTheStatement) {
     EXPECT_EQ(TakePauses(), Pauses(kAttempts));
     const std::vector<SyslogCall> vecCalls = TakeSyslogCalls();
     ASSERT_EQ(vecCalls.size(), 1U);
-    EXPECT_EQ(TakeLog(),
-              (Lines{FailureLine(kLockText, m_strInsert, vecCalls[0].nErrno, kAttempts)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed(kLockText, m_strInsert, vecCalls[0].nErrno, kAttempts)}));
     lock.Release();
     EXPECT_EQ(Rows("SELECT count(*) FROM f.stored"), "0");
 }
@@ -323,8 +310,7 @@ TEST_F(RunnerFileLockTest, LockOfAnotherProcessReleasedAfterSomePausesLetsTheSta
 }
 
 TEST_F(RunnerFileLockTest, RetryRunsTheWholeTextAgainFromItsFirstStatement) {
-    const std::string strSql =
-        "INSERT INTO " + m_strTable + "(name) VALUES ('before'); " + m_strInsert;
+    const std::string strSql = "INSERT INTO t(name) VALUES ('before'); " + m_strInsert;
     LockingConnection lock(m_strPath);
     OnExec([&](int nCall) {
         if (nCall == 3) {
@@ -333,7 +319,7 @@ TEST_F(RunnerFileLockTest, RetryRunsTheWholeTextAgainFromItsFirstStatement) {
     });
     EXPECT_EQ(m_pHandle->runSqlEx(strSql), 1);
     EXPECT_EQ(TakeSql(), Lines(4, strSql));
-    EXPECT_EQ(Rows("SELECT name FROM " + m_strTable), "before\nbefore\nbefore\nbefore");
+    EXPECT_EQ(Rows("SELECT name FROM t"), "before\nbefore\nbefore\nbefore");
     EXPECT_EQ(Rows("SELECT count(*) FROM f.stored"), "1");
 }
 

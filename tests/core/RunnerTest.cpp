@@ -1,19 +1,11 @@
 // runSqlEx without a lock in the way: results, error texts, log lines.
 #include <cerrno>
 
-#include "../support/TableFixture.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
-
-using Lines = std::vector<std::string>;
-
-std::string FailureLine(const std::string& strError, const std::string& strSql, int nErrno = 0,
-                        int nAttempts = 0) {
-    return Plain("i=" + std::to_string(nAttempts) + ",errno=" + std::to_string(nErrno) +
-                 ", run sql failed, error=" + strError + ", sql=" + strSql);
-}
 
 int CountRows(void* pArg, int, char**, char**) {
     ++*static_cast<int*>(pArg);
@@ -28,10 +20,9 @@ class RunnerTest : public TableTest {
   protected:
     void SetUp() override {
         TableTest::SetUp();
-        Sql("INSERT INTO " + m_strTable + " VALUES (1, 'a'), (2, 'b'), (3, 'c')");
+        Sql("INSERT INTO t VALUES (1, 'a'), (2, 'b'), (3, 'c')");
         // A statement that changes nothing by its kind returns the count of the one before it.
-        Sql("DELETE FROM " + m_strTable + " WHERE 0");
-        errno = 0;
+        Sql("DELETE FROM t WHERE 0");
     }
 };
 
@@ -40,7 +31,7 @@ class RunnerTest : public TableTest {
 TEST_F(RunnerTest, EmptyStatementIsRefusedWithoutCallingSqlite) {
     EXPECT_EQ(m_pHandle->runSqlEx(""), -1);
     EXPECT_EQ(TakeSql(), Lines());
-    EXPECT_EQ(TakeLog(), (Lines{Check("0 >= strSql.length()"), FailureLine("Unknow Error!!", "")}));
+    EXPECT_EQ(TakeLog(), (Lines{Check("0 >= strSql.length()"), RunFailed("Unknow Error!!", "")}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
 }
 
@@ -62,47 +53,47 @@ TEST_F(RunnerTest, EmptyStatementShowsErrnoAsItStands) {
     errno = ENOENT;
     EXPECT_EQ(m_pHandle->runSqlEx(""), -1);
     EXPECT_EQ(TakeLog(),
-              (Lines{Check("0 >= strSql.length()"), FailureLine("Unknow Error!!", "", ENOENT)}));
+              (Lines{Check("0 >= strSql.length()"), RunFailed("Unknow Error!!", "", ENOENT)}));
 }
 
 TEST_F(RunnerTest, EmptyStatementWritesTheDebugLineWithoutAText) {
     blDebugOutput = true;
     EXPECT_EQ(m_pHandle->runSqlEx(""), -1);
-    EXPECT_EQ(TakeLog(), (Lines{Check("0 >= strSql.length()"), FailureLine("Unknow Error!!", ""),
+    EXPECT_EQ(TakeLog(), (Lines{Check("0 >= strSql.length()"), RunFailed("Unknow Error!!", ""),
                                 Plain("run sql fail, err=(null)")}));
 }
 
 TEST_F(RunnerTest, UpdateOrDeleteThatMatchesNothingReturnsZero) {
-    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE " + m_strTable + " SET name = 'x' WHERE id = 99"), 0);
-    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM " + m_strTable + " WHERE id = 99"), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE t SET name = 'x' WHERE id = 99"), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM t WHERE id = 99"), 0);
     EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(RunnerTest, ResultWithoutCallbackIsTheNumberOfChangedRows) {
-    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE " + m_strTable + " SET name = 'x' WHERE id > 1"), 2);
-    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM " + m_strTable), 3);
+    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE t SET name = 'x' WHERE id > 1"), 2);
+    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM t"), 3);
     EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(RunnerTest, ResultOfSeveralStatementsIsTheCountOfTheLastThatChangedRows) {
-    const std::string strDelete = "DELETE FROM " + m_strTable;
+    const std::string strDelete = "DELETE FROM t";
     EXPECT_EQ(m_pHandle->runSqlEx(strDelete + " WHERE id < 3; " + strDelete + "; SELECT 1"), 1);
-    EXPECT_EQ(Rows("SELECT count(*) FROM " + m_strTable), "0");
+    EXPECT_EQ(Count(), "0");
 }
 
 TEST_F(RunnerTest, StatementThatCannotChangeRowsReturnsTheCountBeforeIt) {
-    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE " + m_strTable + " SET name = 'x' WHERE id > 1"), 2);
-    EXPECT_EQ(m_pHandle->runSqlEx("SELECT * FROM " + m_strTable), 2);
+    EXPECT_EQ(m_pHandle->runSqlEx("UPDATE t SET name = 'x' WHERE id > 1"), 2);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT * FROM t"), 2);
 }
 
 TEST_F(RunnerTest, ResultWithCallbackIsZeroHoweverManyRowsCame) {
     int nRows = 0;
-    EXPECT_EQ(m_pHandle->runSqlEx("SELECT * FROM " + m_strTable, CountRows, &nRows), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("SELECT * FROM t", CountRows, &nRows), 0);
     EXPECT_EQ(nRows, 3);
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1 WHERE 0", CountRows, &nRows), 0);
     EXPECT_EQ(nRows, 3);
-    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM " + m_strTable, CountRows, &nRows), 0);
-    EXPECT_EQ(Rows("SELECT count(*) FROM " + m_strTable), "0");
+    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM t", CountRows, &nRows), 0);
+    EXPECT_EQ(Count(), "0");
     EXPECT_EQ(TakeLog(), Lines());
 }
 
@@ -124,14 +115,14 @@ TEST_F(RunnerTest, SyntaxErrorIsNotRetried) {
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
     EXPECT_EQ(TakeSql(), (Lines{"nonsense"}));
     EXPECT_EQ(TakePauses(), std::vector<unsigned>());
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense")}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", "nonsense")}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "near \"nonsense\": syntax error");
 }
 
 TEST_F(RunnerTest, FailureWithDebugFlagAddsTheRawErrorText) {
     blDebugOutput = true;
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense"),
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", "nonsense"),
                                 Plain("run sql fail, err=near \"nonsense\": syntax error")}));
 }
 
@@ -139,7 +130,7 @@ TEST_F(RunnerTest, FailureWithCallbackIsReportedTheSameWay) {
     int nRows = 0;
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT * FROM nowhere", CountRows, &nRows), -1);
     EXPECT_EQ(nRows, 0);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("no such table: nowhere", "SELECT * FROM nowhere")}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("no such table: nowhere", "SELECT * FROM nowhere")}));
 }
 
 TEST_F(RunnerTest, SuccessEmptiesAnEarlierErrorText) {
@@ -161,7 +152,7 @@ TEST_F(RunnerTest, EarlierErrorTextIsGoneBeforeTheFirstAttempt) {
 }
 
 TEST_F(RunnerTest, ErrorTextsOfTwoHandlesAreApart) {
-    const auto pSecond = NewHandle(m_pDb, m_strTable, m_jDefinition, "SELECT 1");
+    const auto pSecond = NewHandle(m_pDb, "t", m_jDefinition, "SELECT 1");
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
     EXPECT_EQ(pSecond->runSqlEx("SELECT 1"), 0);
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "near \"nonsense\": syntax error");
@@ -173,19 +164,19 @@ TEST_F(RunnerTest, FailureWithoutATextIsAnUnknownError) {
     blDebugOutput = true;
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
     EXPECT_EQ(TakeSql(), (Lines{"SELECT 1"}));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1", ENOENT),
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 1", ENOENT),
                                 Plain("run sql fail, err=(null)")}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
 }
 
 TEST_F(RunnerTest, NullConnectionFailsOnceWithAnUnknownError) {
-    const auto pHandle = NewHandle(nullptr, m_strTable, m_jDefinition, "SELECT 1");
+    const auto pHandle = NewHandle(nullptr, "t", m_jDefinition, "SELECT 1");
     TakeLog();
     TakeSql();
     EXPECT_EQ(pHandle->runSqlEx("SELECT 2"), -1);
     EXPECT_EQ(TakeSql(), (Lines{"SELECT 2"}));
     EXPECT_EQ(TakePauses(), std::vector<unsigned>());
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 2")}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 2")}));
     EXPECT_EQ(SqlErrorOf(*pHandle), "Unknow Error!!");
 }
 
@@ -203,7 +194,7 @@ TEST_F(RunnerTest, NegativeChangeCountIsAFailureAndTheResult) {
     FakeNextChanges(-5);
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -5);
     EXPECT_EQ(TakeSql(), (Lines{"SELECT 1"}));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("Unknow Error!!", "SELECT 1")}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("Unknow Error!!", "SELECT 1")}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), "Unknow Error!!");
 }
 
@@ -218,43 +209,40 @@ TEST_F(RunnerTest, ErrnoFromBeforeTheCallIsCleared) {
     errno = EAGAIN;
     EXPECT_EQ(m_pHandle->runSqlEx("nonsense"), -1);
     EXPECT_EQ(TakeSql(), (Lines{"nonsense"}));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", "nonsense")}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", "nonsense")}));
 }
 
 TEST_F(RunnerTest, ErrnoOfTheFailedCallIsShown) {
     FailNextExec({{SQLITE_CANTOPEN, "unable to open database file", EACCES}});
     EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1);
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("unable to open database file", "SELECT 1", EACCES)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("unable to open database file", "SELECT 1", EACCES)}));
 }
 
 TEST_F(RunnerTest, CallbackThatStopsFailsTheStatementWithoutRetry) {
-    const std::string strSql = "SELECT * FROM " + m_strTable;
+    const std::string strSql = "SELECT * FROM t";
     EXPECT_EQ(m_pHandle->runSqlEx(strSql, StopAtFirstRow), -1);
     EXPECT_EQ(TakeSql(), (Lines{strSql}));
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine(sqlite3_errstr(SQLITE_ABORT), strSql)}));
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed(sqlite3_errstr(SQLITE_ABORT), strSql)}));
     EXPECT_EQ(SqlErrorOf(*m_pHandle), sqlite3_errstr(SQLITE_ABORT));
 }
 
 TEST_F(RunnerTest, StatementsBeforeAFailingOneKeepTheirEffect) {
-    const std::string strSql =
-        "DELETE FROM " + m_strTable + " WHERE id = 1; nonsense; DELETE FROM " + m_strTable;
+    const std::string strSql = "DELETE FROM t WHERE id = 1; nonsense; DELETE FROM t";
     EXPECT_EQ(m_pHandle->runSqlEx(strSql), -1);
-    EXPECT_EQ(Rows("SELECT id FROM " + m_strTable), "2\n3");
-    EXPECT_EQ(TakeLog(), (Lines{FailureLine("near \"nonsense\": syntax error", strSql)}));
+    EXPECT_EQ(Rows("SELECT id FROM t"), "2\n3");
+    EXPECT_EQ(TakeLog(), (Lines{RunFailed("near \"nonsense\": syntax error", strSql)}));
 }
 
 TEST_F(RunnerTest, TransactionsAreTheCallersOwn) {
     EXPECT_EQ(m_pHandle->runSqlEx("BEGIN"), 0);
-    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM " + m_strTable), 3);
+    EXPECT_EQ(m_pHandle->runSqlEx("DELETE FROM t"), 3);
     EXPECT_EQ(m_pHandle->runSqlEx("ROLLBACK"), 3);
-    EXPECT_EQ(Rows("SELECT count(*) FROM " + m_strTable), "3");
+    EXPECT_EQ(Count(), "3");
 }
 
 TEST_F(RunnerTest, RowsAreReadWithTheTypesOfTheHandleThatAsked) {
-    const std::string strOther = UniqueTable();
-    const auto pOther = NewHandle(m_pDb, strOther, Definition(strOther, "id:string"),
-                                  "CREATE TABLE " + strOther + " (id)");
-    Sql("INSERT INTO " + strOther + " VALUES (7)");
+    const auto pOther = NewHandle(m_pDb, "u", Definition("u", "id:string"), "CREATE TABLE u (id)");
+    Sql("INSERT INTO u VALUES (7)");
     Json::Value jNoQuery;
     Json::Value jFirst;
     Json::Value jOther;

@@ -1,61 +1,54 @@
 // recList: one SELECT for a query object, every row appended as a typed record.
-#include "../schema/FreshTable.h"
+#include "../support/TableTest.h"
 
-namespace testhost {
+using namespace testhost;
 
 namespace {
 
-const char kRun[] = "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)";
 const char kExpand[] = "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)";
 const char kQueryKind[] =
     "jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue";
 const char kOutKind[] =
     "jRecArrayOut.type() != Json::nullValue && jRecArrayOut.type() != Json::arrayValue";
 
-class List : public FreshTableTest {
+class List : public TableTest {
   protected:
     // Three rows: 1|a, 2|b, 3|c.
-    VornJsonDbApi& OpenItem() {
-        VornJsonDbApi& api = Open("id:int,name:string", "id integer primary key,name text");
-        Sql("insert into " + m_strTable + " values (1,'a'),(2,'b'),(3,'c');");
-        return api;
+    void SetUp() override {
+        TableTest::SetUp();
+        Sql("insert into t values (1,'a'),(2,'b'),(3,'c');");
     }
 
-    std::string Select(const std::string& strRest) {
-        return "SELECT id,name FROM " + m_strTable + " " + strRest;
-    }
+    std::string Select(const std::string& strRest) { return "SELECT id,name FROM t " + strRest; }
 
     // The rows for a query as JSON text; the one statement run is left for TakeSql.
-    std::string Listed(VornJsonDbApi& api, const Json::Value& jGiven) {
+    std::string Listed(const Json::Value& jGiven) {
         Json::Value jQuery = jGiven;
         Json::Value jRows;
-        EXPECT_EQ(0, api.recList(jQuery, jRows));
-        EXPECT_EQ(jGiven, jQuery);
-        EXPECT_EQ(Lines{}, TakeLog());
+        EXPECT_EQ(m_pHandle->recList(jQuery, jRows), 0);
+        EXPECT_EQ(jQuery, jGiven);
+        EXPECT_EQ(TakeLog(), Lines());
         return Compact(jRows);
     }
 
-    std::string Listed(VornJsonDbApi& api, const char* szQuery) {
-        return Listed(api, ParseJson(szQuery));
-    }
+    std::string Listed(const char* szQuery) { return Listed(ParseJson(szQuery)); }
 
-    void ExpectRefused(VornJsonDbApi& api, const char* szQuery, const Lines& vecHead,
-                       const Lines& vecTail = {}) {
+    void ExpectRefused(const char* szQuery, const Lines& vecHead, const Lines& vecTail = {}) {
         Json::Value jQuery = ParseJson(szQuery);
         Json::Value jRows = ParseJson("[0]");
-        EXPECT_EQ(-1, api.recList(jQuery, jRows));
+        EXPECT_EQ(m_pHandle->recList(jQuery, jRows), -1);
         Lines vecExpected = vecHead;
         vecExpected.push_back(Plain(std::string("jRecParam=") + szQuery));
         vecExpected.insert(vecExpected.end(), vecTail.begin(), vecTail.end());
-        EXPECT_EQ(vecExpected, TakeLog());
-        EXPECT_EQ("[0]", Compact(jRows));
+        EXPECT_EQ(TakeLog(), vecExpected);
+        EXPECT_EQ(Compact(jRows), "[0]");
     }
 
-    void ExpectSqlFailure(VornJsonDbApi& api, const char* szQuery, const std::string& strError,
+    void ExpectSqlFailure(const char* szQuery, const std::string& strError,
                           const std::string& strSql) {
-        ExpectRefused(api, szQuery, {RunFailed(strError, strSql), Check(kRun)},
+        ExpectRefused(szQuery, {RunFailed(strError, strSql), Check(kListFailed)},
                       {SqlError(strError, strSql)});
-        EXPECT_EQ(Lines{strSql}, TakeSql());
+        EXPECT_EQ(TakeSql(), Lines{strSql});
     }
 };
 
@@ -64,232 +57,204 @@ const char kAll[] = R"([{"id":1,"name":"a"},{"id":2,"name":"b"},{"id":3,"name":"
 }  // namespace
 
 TEST_F(List, NullOrEmptyQueryListsTheWholeTable) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(kAll, Listed(api, "null"));
-    EXPECT_EQ(kAll, Listed(api, "{}"));
-    EXPECT_EQ((Lines{Select(";"), Select(";")}), TakeSql());
+    EXPECT_EQ(Listed("null"), kAll);
+    EXPECT_EQ(Listed("{}"), kAll);
+    EXPECT_EQ(TakeSql(), (Lines{Select(";"), Select(";")}));
 }
 
 TEST_F(List, ColumnsAreThoseOfTheDefinitionInNameOrder) {
-    VornJsonDbApi& api = Open("b:int,a:int", "b,extra,a");
-    Sql("insert into " + m_strTable + " values (1,'e',2);");
-    EXPECT_EQ(R"([{"a":2,"b":1}])", Listed(api, "null"));
-    EXPECT_EQ(Lines{"SELECT a,b FROM " + m_strTable + " ;"}, TakeSql());
+    Open("b:int,a:int", "b,extra,a");
+    Sql("insert into t values (1,'e',2);");
+    EXPECT_EQ(Listed("null"), R"([{"a":2,"b":1}])");
+    EXPECT_EQ(TakeSql(), Lines{"SELECT a,b FROM t ;"});
 }
 
 TEST_F(List, ConditionStandsBehindTwoBlanks) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(R"([{"id":2,"name":"b"}])", Listed(api, R"({"name":"b"})"));
-    EXPECT_EQ(Lines{Select(" WHERE  (name='b' );")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"name":"b"})"), R"([{"id":2,"name":"b"}])");
+    EXPECT_EQ(TakeSql(), Lines{Select(" WHERE  (name='b' );")});
 }
 
 TEST_F(List, SeveralConditionsAreJoinedByAnd) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ("null", Listed(api, R"({"id":1,"name":"b"})"));
-    EXPECT_EQ(Lines{Select(" WHERE  (id=1 and name='b' );")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"id":1,"name":"b"})"), "null");
+    EXPECT_EQ(TakeSql(), Lines{Select(" WHERE  (id=1 and name='b' );")});
 }
 
 TEST_F(List, SortAndLimitAloneStandBehindTwoBlanksWithoutWhere) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jRows;
     Json::Value jQuery = ParseJson(R"({"sort_by":"id","limit":2})");
-    EXPECT_EQ(0, api.recList(jQuery, jRows));
-    EXPECT_EQ(2U, jRows.size());
-    EXPECT_EQ(Lines{Select(" order by 'id' LIMIT 2;")}, TakeSql());
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), 0);
+    EXPECT_EQ(jRows.size(), 2U);
+    EXPECT_EQ(TakeSql(), Lines{Select(" order by 'id' LIMIT 2;")});
 }
 
 TEST_F(List, EveryPieceTogether) {
-    VornJsonDbApi& api = OpenItem();
-    Listed(api, R"({"limit":1,"name":"b","offset":0,"sort_by":"id","sort_direction":"desc",
+    Listed(R"({"limit":1,"name":"b","offset":0,"sort_by":"id","sort_direction":"desc",
                     "vornSqlWhereFilter":"id > 1"})");
     EXPECT_EQ(
-        Lines{Select(" WHERE  (name='b' and  id > 1  ) order by 'id' DESC LIMIT 1 OFFSET 0;")},
-        TakeSql());
+        TakeSql(),
+        Lines{Select(" WHERE  (name='b' and  id > 1  ) order by 'id' DESC LIMIT 1 OFFSET 0;")});
 }
 
 TEST_F(List, LimitAndOffsetPageTheRows) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(R"([{"id":2,"name":"b"}])", Listed(api, R"({"limit":1,"offset":1})"));
-    EXPECT_EQ(Lines{Select(" LIMIT 1 OFFSET 1;")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"limit":1,"offset":1})"), R"([{"id":2,"name":"b"}])");
+    EXPECT_EQ(TakeSql(), Lines{Select(" LIMIT 1 OFFSET 1;")});
 }
 
 TEST_F(List, OffsetWithoutLimitHasNoEffect) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(kAll, Listed(api, R"({"offset":1})"));
-    EXPECT_EQ(Lines{Select(";")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"offset":1})"), kAll);
+    EXPECT_EQ(TakeSql(), Lines{Select(";")});
 }
 
 TEST_F(List, LimitGivenAsTextReachesSqliteInDoubleQuotes) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jQuery = ParseJson(R"({"limit":"2"})");
     Json::Value jRows;
-    api.recList(jQuery, jRows);
-    EXPECT_EQ(Lines{Select(" LIMIT \"2\";")}, TakeSql());
+    m_pHandle->recList(jQuery, jRows);
+    EXPECT_EQ(TakeSql(), Lines{Select(" LIMIT \"2\";")});
     TakeLog();
 }
 
 TEST_F(List, SortTermIsAConstantSoTheDirectionDoesNotOrderTheRows) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(kAll, Listed(api, R"({"sort_by":"id","sort_direction":"desc"})"));
-    EXPECT_EQ(Lines{Select(" order by 'id' DESC;")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"sort_by":"id","sort_direction":"desc"})"), kAll);
+    EXPECT_EQ(TakeSql(), Lines{Select(" order by 'id' DESC;")});
 }
 
 TEST_F(List, RawFilterSelectsRows) {
-    VornJsonDbApi& api = OpenItem();
-    EXPECT_EQ(R"([{"id":2,"name":"b"},{"id":3,"name":"c"}])",
-              Listed(api, R"({"vornSqlWhereFilter":"id > 1"})"));
-    EXPECT_EQ(Lines{Select(" WHERE  ( id > 1  );")}, TakeSql());
+    EXPECT_EQ(Listed(R"({"vornSqlWhereFilter":"id > 1"})"),
+              R"([{"id":2,"name":"b"},{"id":3,"name":"c"}])");
+    EXPECT_EQ(TakeSql(), Lines{Select(" WHERE  ( id > 1  );")});
 }
 
 TEST_F(List, OneElementListSelectsAndTwoRunTogether) {
-    VornJsonDbApi& api = OpenItem();
-    Sql("insert into " + m_strTable + " values (12,'a''b');");
-    EXPECT_EQ(R"([{"id":1,"name":"a"}])", Listed(api, R"({"name":["a"]})"));
-    EXPECT_EQ(R"([{"id":12,"name":"a'b"}])", Listed(api, R"({"name":["a","b"]})"));
-    EXPECT_EQ(R"([{"id":12,"name":"a'b"}])", Listed(api, R"({"id":[1,2]})"));
-    EXPECT_EQ((Lines{Select(" WHERE  (name in ('a' ) );"), Select(" WHERE  (name in ('a''b' ) );"),
-                     Select(" WHERE  (id in (12 ) );")}),
-              TakeSql());
+    Sql("insert into t values (12,'a''b');");
+    EXPECT_EQ(Listed(R"({"name":["a"]})"), R"([{"id":1,"name":"a"}])");
+    EXPECT_EQ(Listed(R"({"name":["a","b"]})"), R"([{"id":12,"name":"a'b"}])");
+    EXPECT_EQ(Listed(R"({"id":[1,2]})"), R"([{"id":12,"name":"a'b"}])");
+    EXPECT_EQ(TakeSql(),
+              (Lines{Select(" WHERE  (name in ('a' ) );"), Select(" WHERE  (name in ('a''b' ) );"),
+                     Select(" WHERE  (id in (12 ) );")}));
 }
 
 TEST_F(List, JoinerLeftByAnEmptyListIsRejectedBySqlite) {
-    VornJsonDbApi& api = OpenItem();
-    ExpectSqlFailure(api, R"({"id":[],"name":"a"})", "near \"and\": syntax error",
+    ExpectSqlFailure(R"({"id":[],"name":"a"})", "near \"and\": syntax error",
                      Select(" WHERE  ( and name='a' );"));
-    ExpectSqlFailure(api, R"({"id":1,"name":[]})", "near \")\": syntax error",
+    ExpectSqlFailure(R"({"id":1,"name":[]})", "near \")\": syntax error",
                      Select(" WHERE  (id=1 and  );"));
 }
 
 TEST_F(List, EmptyListAloneIsRejectedBySqlite) {
-    VornJsonDbApi& api = OpenItem();
-    ExpectSqlFailure(api, R"({"name":[]})", "near \")\": syntax error", Select(" WHERE  ( );"));
+    ExpectSqlFailure(R"({"name":[]})", "near \")\": syntax error", Select(" WHERE  ( );"));
 }
 
 TEST_F(List, RowsAreAppendedBehindThoseAlreadyThere) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jQuery;
     Json::Value jRows = ParseJson(R"(["old",{"id":0}])");
-    EXPECT_EQ(0, api.recList(jQuery, jRows));
-    EXPECT_EQ(R"(["old",{"id":0},{"id":1,"name":"a"},{"id":2,"name":"b"},{"id":3,"name":"c"}])",
-              Compact(jRows));
-    EXPECT_EQ(0, api.recList(jQuery, jRows));
-    EXPECT_EQ(8U, jRows.size());
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), 0);
+    EXPECT_EQ(Compact(jRows),
+              R"(["old",{"id":0},{"id":1,"name":"a"},{"id":2,"name":"b"},{"id":3,"name":"c"}])");
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), 0);
+    EXPECT_EQ(jRows.size(), 8U);
 }
 
 TEST_F(List, OutputKeepsItsKindWhenNoRowMatches) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jQuery = ParseJson(R"({"id":99})");
     Json::Value jNull;
     Json::Value jArray(Json::arrayValue);
-    EXPECT_EQ(0, api.recList(jQuery, jNull));
-    EXPECT_EQ(0, api.recList(jQuery, jArray));
+    EXPECT_EQ(m_pHandle->recList(jQuery, jNull), 0);
+    EXPECT_EQ(m_pHandle->recList(jQuery, jArray), 0);
     EXPECT_TRUE(jNull.isNull());
-    EXPECT_EQ("[]", Compact(jArray));
-    EXPECT_EQ(Lines{}, TakeLog());
+    EXPECT_EQ(Compact(jArray), "[]");
+    EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(List, SameNullObjectAsQueryAndOutputBecomesTheRows) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jBoth;
-    EXPECT_EQ(0, api.recList(jBoth, jBoth));
-    EXPECT_EQ(kAll, Compact(jBoth));
+    EXPECT_EQ(m_pHandle->recList(jBoth, jBoth), 0);
+    EXPECT_EQ(Compact(jBoth), kAll);
 }
 
 TEST_F(List, QueryOfAWrongKindRunsNothing) {
-    VornJsonDbApi& api = OpenItem();
     for (const char* szQuery : {"[]", "[1]", "\"name\"", "7", "1.5", "true"}) {
         SCOPED_TRACE(szQuery);
-        ExpectRefused(api, szQuery, {Check(kQueryKind)});
+        ExpectRefused(szQuery, {Check(kQueryKind)});
     }
-    EXPECT_EQ(Lines{}, TakeSql());
+    EXPECT_EQ(TakeSql(), Lines());
 }
 
 TEST_F(List, OutputOfAWrongKindRunsNothing) {
-    VornJsonDbApi& api = OpenItem();
     for (const char* szOut : {"{}", "{\"id\":1}", "\"text\"", "7", "1.5", "false"}) {
         SCOPED_TRACE(szOut);
         Json::Value jQuery = ParseJson(R"({"id":1})");
         Json::Value jOut = ParseJson(szOut);
-        EXPECT_EQ(-1, api.recList(jQuery, jOut));
-        EXPECT_EQ((Lines{Check(kOutKind), Plain(R"(jRecParam={"id":1})")}), TakeLog());
-        EXPECT_EQ(szOut, Compact(jOut));
+        EXPECT_EQ(m_pHandle->recList(jQuery, jOut), -1);
+        EXPECT_EQ(TakeLog(), (Lines{Check(kOutKind), Plain(R"(jRecParam={"id":1})")}));
+        EXPECT_EQ(Compact(jOut), szOut);
     }
-    EXPECT_EQ(Lines{}, TakeSql());
+    EXPECT_EQ(TakeSql(), Lines());
 }
 
 TEST_F(List, KindOfTheQueryIsCheckedBeforeTheOutput) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jQuery = ParseJson("[1]");
     Json::Value jOut = ParseJson("{}");
-    EXPECT_EQ(-1, api.recList(jQuery, jOut));
-    EXPECT_EQ((Lines{Check(kQueryKind), Plain("jRecParam=[1]")}), TakeLog());
+    EXPECT_EQ(m_pHandle->recList(jQuery, jOut), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check(kQueryKind), Plain("jRecParam=[1]")}));
 }
 
 TEST_F(List, KindOfTheOutputIsCheckedBeforeTheCondition) {
-    VornJsonDbApi& api = OpenItem();
     Json::Value jQuery = ParseJson(R"({"vornSqlWhereFilter":5})");
     Json::Value jOut = ParseJson("{}");
-    EXPECT_EQ(-1, api.recList(jQuery, jOut));
-    EXPECT_EQ((Lines{Check(kOutKind), Plain(R"(jRecParam={"vornSqlWhereFilter":5})")}), TakeLog());
+    EXPECT_EQ(m_pHandle->recList(jQuery, jOut), -1);
+    EXPECT_EQ(TakeLog(), (Lines{Check(kOutKind), Plain(R"(jRecParam={"vornSqlWhereFilter":5})")}));
 }
 
 TEST_F(List, ConditionIsBuiltBeforeTheSortTerm) {
-    VornJsonDbApi& api = OpenItem();
-    ExpectRefused(api, R"({"sort_by":7,"vornSqlWhereFilter":5})",
+    ExpectRefused(R"({"sort_by":7,"vornSqlWhereFilter":5})",
                   {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kExpand)});
 }
 
 TEST_F(List, RefusedConditionRunsNothing) {
-    VornJsonDbApi& api = OpenItem();
-    ExpectRefused(api, R"({"vornSqlWhereFilter":5})",
+    ExpectRefused(R"({"vornSqlWhereFilter":5})",
                   {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kExpand)});
     ExpectRefused(
-        api, R"({"id":{}})",
+        R"({"id":{}})",
         {Check(R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))"),
          Check("0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)"), Check(kExpand)});
-    EXPECT_EQ(Lines{}, TakeSql());
+    EXPECT_EQ(TakeSql(), Lines());
 }
 
 TEST_F(List, RefusedSortTermRunsNothing) {
-    VornJsonDbApi& api = OpenItem();
     ExpectRefused(
-        api, R"({"sort_by":7})",
+        R"({"sort_by":7})",
         {Check("!szSql"), Check("0 > SqlFilterConditionFromJson(jRecParam, strSqlLimit)")});
-    EXPECT_EQ(Lines{}, TakeSql());
-    EXPECT_EQ(kAll, Listed(api, "{}"));
+    EXPECT_EQ(TakeSql(), Lines());
+    EXPECT_EQ(Listed("{}"), kAll);
 }
 
 TEST_F(List, EarlierErrorTextShowsWithAnEmptyStatementInTheTail) {
-    VornJsonDbApi& api = OpenItem();
-    MakeStaleError(api);
-    ExpectRefused(api, "[]", {Check(kQueryKind)}, {SqlError("no such column: stale", "")});
-    EXPECT_EQ(kAll, Listed(api, "{}"));
-    ExpectRefused(api, "[]", {Check(kQueryKind)});
+    MakeStaleError();
+    ExpectRefused("[]", {Check(kQueryKind)}, {SqlError("no such column: stale", "")});
+    EXPECT_EQ(Listed("{}"), kAll);
+    ExpectRefused("[]", {Check(kQueryKind)});
 }
 
 TEST_F(List, StatementThatSqliteRejectsIsReportedWhole) {
-    VornJsonDbApi& api = OpenItem();
-    ExpectSqlFailure(api, R"({"vornSqlWhereFilter":"nonsense = 1"})", "no such column: nonsense",
+    ExpectSqlFailure(R"({"vornSqlWhereFilter":"nonsense = 1"})", "no such column: nonsense",
                      Select(" WHERE  ( nonsense = 1  );"));
-    EXPECT_EQ("", api.getErrMsg());
+    EXPECT_EQ(m_pHandle->getErrMsg(), "");
 }
 
 TEST_F(List, RowsBeforeAFailingRowStay) {
-    VornJsonDbApi& api = Open("a:int,b:double");
-    Sql("insert into " + m_strTable + " values (1,null),(2,2.5),(3,null);");
+    Open("a:int,b:double");
+    Sql("insert into t values (1,null),(2,2.5),(3,null);");
     Json::Value jQuery(Json::objectValue);
     Json::Value jRows;
-    EXPECT_EQ(-1, api.recList(jQuery, jRows));
-    const std::string strSql = "SELECT a,b FROM " + m_strTable + " ;";
-    EXPECT_EQ(
-        (Lines{Located("type error, strType=double"),
-               Check("0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))"),
-               Plain("column_name[1]=b"), Plain("column_value[1]=2.5"),
-               Check("0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)"),
-               RunFailed("query aborted", strSql), Check(kRun), Plain("jRecParam={}"),
-               SqlError("query aborted", strSql)}),
-        TakeLog());
-    EXPECT_EQ(R"([{"a":1}])", Compact(jRows));
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), -1);
+    const std::string strSql = "SELECT a,b FROM t ;";
+    EXPECT_EQ(TakeLog(),
+              (Lines{Located("type error, strType=double"), Check(kFieldFailed),
+                     Plain("column_name[1]=b"), Plain("column_value[1]=2.5"), Check(kRowFailed),
+                     RunFailed("query aborted", strSql), Check(kListFailed), Plain("jRecParam={}"),
+                     SqlError("query aborted", strSql)}));
+    EXPECT_EQ(Compact(jRows), R"([{"a":1}])");
 }
 
 TEST_F(List, EveryTypeReadsItsColumnInItsOwnWay) {
@@ -321,9 +286,9 @@ TEST_F(List, EveryTypeReadsItsColumnInItsOwnWay) {
     };
     for (const Case& oneCase : kCases) {
         SCOPED_TRACE(std::string(oneCase.szType) + " " + oneCase.szStored);
-        VornJsonDbApi& api = Open(std::string("m:") + oneCase.szType);
-        Sql("insert into " + m_strTable + " values (" + oneCase.szStored + "),(null);");
-        EXPECT_EQ("[" + std::string(oneCase.szRecord) + ",{}]", Listed(api, "null"));
+        Open(std::string("m:") + oneCase.szType);
+        Sql("insert into t values (" + std::string(oneCase.szStored) + "),(null);");
+        EXPECT_EQ(Listed("null"), "[" + std::string(oneCase.szRecord) + ",{}]");
     }
 }
 
@@ -331,51 +296,46 @@ TEST_F(List, OtherTypesCannotBeReadBackUnlessTheColumnIsNull) {
     for (const char* szType : {"long", "unsigned long", "unsigned", "double", "float", "uid_t",
                                "time_t", "Int", "", "nonsense"}) {
         SCOPED_TRACE(szType);
-        VornJsonDbApi& api = Open(std::string("m:") + szType);
-        Sql("insert into " + m_strTable + " values (null);");
-        EXPECT_EQ("[{}]", Listed(api, "null"));
-        Sql("update " + m_strTable + " set m = 1;");
+        Open(std::string("m:") + szType);
+        Sql("insert into t values (null);");
+        EXPECT_EQ(Listed("null"), "[{}]");
+        Sql("update t set m = 1;");
         Json::Value jQuery;
         Json::Value jRows;
-        EXPECT_EQ(-1, api.recList(jQuery, jRows));
+        EXPECT_EQ(m_pHandle->recList(jQuery, jRows), -1);
         EXPECT_TRUE(jRows.isNull());
-        EXPECT_EQ(Located(std::string("type error, strType=") + szType), TakeLog().at(0));
+        EXPECT_EQ(TakeLog().at(0), Located(std::string("type error, strType=") + szType));
     }
 }
 
 TEST_F(List, MemberNamedLimitIsConditionAndPageAtOnce) {
-    VornJsonDbApi& api = Open("\"limit\":int,limit:int", "\"limit\"");
+    Open("\"limit\":int,limit:int", "\"limit\"");
     Json::Value jQuery = ParseJson(R"({"limit":1})");
     Json::Value jRows;
-    EXPECT_EQ(-1, api.recList(jQuery, jRows));
-    EXPECT_EQ(Lines{"SELECT \"limit\",limit FROM " + m_strTable + "  WHERE  (limit=1 ) LIMIT 1;"},
-              TakeSql());
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), -1);
+    EXPECT_EQ(TakeSql(), Lines{"SELECT \"limit\",limit FROM t  WHERE  (limit=1 ) LIMIT 1;"});
     TakeLog();
 }
 
 TEST_F(List, ApostrophesAndForeignLettersMatch) {
-    VornJsonDbApi& api = OpenItem();
-    Sql(u8"update " + m_strTable + u8" set name = 'O''Neil ☂ 100% %s' where id = 2;");
+    Sql(u8"update t set name = 'O''Neil ☂ 100% %s' where id = 2;");
     Json::Value jQuery(Json::objectValue);
     jQuery["name"] = u8"O'Neil ☂ 100% %s";
-    EXPECT_EQ(u8R"([{"id":2,"name":"O'Neil ☂ 100% %s"}])", Listed(api, jQuery));
+    EXPECT_EQ(Listed(jQuery), u8R"([{"id":2,"name":"O'Neil ☂ 100% %s"}])");
 }
 
 TEST_F(List, TextOfAMillionBytesMatches) {
-    VornJsonDbApi& api = OpenItem();
-    Sql("update " + m_strTable + " set name = '" + LongText() + "' where id = 3;");
+    Sql("update t set name = '" + LongText() + "' where id = 3;");
     Json::Value jQuery(Json::objectValue);
     jQuery["name"] = LongText();
-    EXPECT_TRUE(R"([{"id":3,"name":")" + LongText() + R"("}])" == Listed(api, jQuery));
+    EXPECT_TRUE(R"([{"id":3,"name":")" + LongText() + R"("}])" == Listed(jQuery));
 }
 
 TEST_F(List, DefinitionWithoutTheTableSelectsNoColumns) {
-    VornJsonDbApi& api = OpenAs(UniqueTable(), ParseJson(R"({"other":1})"), "id");
+    OpenDefinition(ParseJson(R"({"other":1})"), "CREATE TABLE t (id)");
     Json::Value jQuery;
     Json::Value jRows;
-    EXPECT_EQ(-1, api.recList(jQuery, jRows));
-    EXPECT_EQ(Lines{"SELECT  FROM " + m_strTable + " ;"}, TakeSql());
-    EXPECT_EQ(UtilCheck("!jTableDef.isMember(strJsonName)"), TakeLog().at(0));
+    EXPECT_EQ(m_pHandle->recList(jQuery, jRows), -1);
+    EXPECT_EQ(TakeSql(), Lines{"SELECT  FROM t ;"});
+    EXPECT_EQ(TakeLog().at(0), UtilCheck("!jTableDef.isMember(strJsonName)"));
 }
-
-}  // namespace testhost

@@ -1,28 +1,23 @@
 // Where each operation looks up the member types. A lookup is silent unless the table's name was
 // refused before: then each one writes its four lines, so their number and their places show.
-#include "../schema/FreshTable.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-const char* const kFieldCheck =
-    "0 > (iTmp = DbCallBackFillField(*pjRec, column_name, column_value, i))";
-const char* const kRecCheck = "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)";
+const char kRows[] = "SELECT id,name FROM t ;";
 
-class Lookups : public FreshTableTest {
+class Lookups : public TableTest {
   protected:
-    // A handle with a faultless definition on a table of two rows, whose name was refused before.
+    // The handle's definition is faultless, but the name of its table was refused before.
     void SetUp() override {
-        FreshTableTest::SetUp();
-        std::string strTable = UniqueTable();
+        TableTest::SetUp();
+        Sql("insert into t values (1,'a'),(2,'b');");
+        std::string strTable = "t";
         Json::Value jNone;
         VORN_JSON_DB::recType(jNone, strTable);
         TakeLog();
-        m_jDefinition = Definition(strTable, "id:int,name:string");
-        m_pApi = &OpenAs(strTable, m_jDefinition, "id integer primary key,name text");
-        Sql("insert into " + strTable + " values (1,'a'),(2,'b');");
-        m_strRows = "SELECT id,name FROM " + strTable + " ;";
     }
 
     // The lines since the last call, those of a lookup replaced by one word.
@@ -45,35 +40,35 @@ class Lookups : public FreshTableTest {
 
     int Save(bool blOfCreate, const char* szRecord) {
         Json::Value jRec = ParseJson(szRecord);
-        return blOfCreate ? m_pApi->recCreate(jRec, jRec) : m_pApi->recSave(jRec, true);
+        return blOfCreate ? m_pHandle->recCreate(jRec, jRec) : m_pHandle->recSave(jRec, true);
     }
 
     int List(const char* szQuery, const char* szOut = "null") {
         Json::Value jQuery = ParseJson(szQuery);
         Json::Value jRows = ParseJson(szOut);
-        return m_pApi->recList(jQuery, jRows);
+        return m_pHandle->recList(jQuery, jRows);
     }
 
     int ByWhere(const char* szRecord, std::string strWhere) {
         Json::Value jRec = ParseJson(szRecord);
-        return m_pApi->recUpdateByWhere(jRec, strWhere);
+        return m_pHandle->recUpdateByWhere(jRec, strWhere);
     }
 
     int ByFilter(const char* szFilter, const char* szRecord) {
         Json::Value jFilter = ParseJson(szFilter);
         Json::Value jRec = ParseJson(szRecord);
-        return m_pApi->recUpdateByFilter(jFilter, jRec);
+        return m_pHandle->recUpdateByFilter(jFilter, jRec);
     }
 
     int Delete(const char* szQuery, bool blAllowAll = false) {
         Json::Value jQuery = ParseJson(szQuery);
-        return m_pApi->recDelete(jQuery, blAllowAll);
+        return m_pHandle->recDelete(jQuery, blAllowAll);
     }
 
     int Expand(const char* szQuery, int nMode) {
         Json::Value jQuery = ParseJson(szQuery);
         std::string strSql;
-        return m_pApi->SqlExpandMemberList(jQuery, strSql, nMode);
+        return m_pHandle->SqlExpandMemberList(jQuery, strSql, nMode);
     }
 
     // The steps of a list whose first row is refused.
@@ -81,17 +76,17 @@ class Lookups : public FreshTableTest {
         return {"lookup",
                 "lookup of the row callback",
                 Check("!jType.isMember(strName)"),
-                Check(kFieldCheck),
-                Check(kRecCheck),
-                RunFailed("query aborted", m_strRows),
-                Check("0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)"),
+                Check(kFieldFailed),
+                Check(kRowFailed),
+                RunFailed("query aborted", kRows),
+                Check(kListFailed),
                 Plain("jRecParam=null"),
-                SqlError("query aborted", m_strRows)};
+                SqlError("query aborted", kRows)};
     }
 
     // The steps of a refused assignment, from the statement on.
     Lines RefusedUpdate(Lines vecSteps, const std::string& strWhere) const {
-        const std::string strSql = "UPDATE " + m_strTable + " SET  WHERE " + strWhere + ";";
+        const std::string strSql = "UPDATE t SET  WHERE " + strWhere + ";";
         const char* const szError = "near \"WHERE\": syntax error";
         vecSteps.insert(vecSteps.end(),
                         {RunFailed(szError, strSql), Check("0 > runSqlEx(strSql, NULL, NULL)"),
@@ -99,15 +94,11 @@ class Lookups : public FreshTableTest {
         return vecSteps;
     }
 
-    VornJsonDbApi* m_pApi = nullptr;
-    Json::Value m_jDefinition;
-    std::string m_strRows;
-
   private:
     bool IsLookup(const Lines& vecLog, size_t nAt, const std::string& strDefinition) const {
         return vecLog.size() - nAt >= 4 &&
                vecLog[nAt] == UtilCheck("jType[strJsonName].type() != Json::objectValue") &&
-               vecLog[nAt + 1] == UtilPlain("strJsonName=" + m_strTable) &&
+               vecLog[nAt + 1] == UtilPlain("strJsonName=t") &&
                vecLog[nAt + 2] == UtilPlain("jTableDef=" + strDefinition) &&
                vecLog[nAt + 3].compare(0, 18, "util plain: jType=") == 0;
     }
@@ -152,9 +143,9 @@ TEST_F(Lookups, SaveLooksUpForItselfAndForTheValues) {
 }
 
 TEST_F(Lookups, FirstOfAnOperationNamesTheReasonAndTheOthersTheRefusal) {
-    VornJsonDbApi& api = OpenAs(UniqueTable(), ParseJson(R"({"other":1})"), "id");
+    OpenDefinition(ParseJson(R"({"other":1})"), "CREATE TABLE t (id)");
     Json::Value jRec = ParseJson(R"({"id":3})");
-    EXPECT_EQ(api.recSave(jRec, true), -1);
+    EXPECT_EQ(m_pHandle->recSave(jRec, true), -1);
     const Lines vecLog = TakeLog();
     ASSERT_GE(vecLog.size(), 8U);
     EXPECT_EQ(vecLog[0], UtilCheck("!jTableDef.isMember(strJsonName)"));
@@ -166,11 +157,11 @@ TEST_F(Lookups, FirstOfAnOperationNamesTheReasonAndTheOthersTheRefusal) {
 TEST_F(Lookups, ListLooksUpForTheConditionsAndForTheRow) {
     EXPECT_EQ(List("null"), -1);
     EXPECT_EQ(Steps(), RefusedRow());
-    EXPECT_EQ(TakeSql(), Lines{m_strRows});
+    EXPECT_EQ(TakeSql(), Lines{kRows});
 }
 
 TEST_F(Lookups, ListOfNoRowsLooksUpForTheConditionsOnly) {
-    Sql("delete from " + m_strTable + ";");
+    Sql("delete from t;");
     EXPECT_EQ(List("null"), 0);
     EXPECT_EQ(Steps(), Lines{"lookup"});
 }
@@ -196,7 +187,7 @@ TEST_F(Lookups, ListLooksUpBeforeTheSortTerm) {
 TEST_F(Lookups, GetOneLooksUpAsItsListDoes) {
     Json::Value jNoQuery;
     Json::Value jOut;
-    EXPECT_EQ(m_pApi->recGetOne(jNoQuery, jOut), -1);
+    EXPECT_EQ(m_pHandle->recGetOne(jNoQuery, jOut), -1);
     Lines vecSteps = RefusedRow();
     vecSteps.push_back(Check("0 > recList(jRecParam, jRecArray)"));
     EXPECT_EQ(Steps(), vecSteps);
@@ -265,28 +256,28 @@ TEST_F(Lookups, DeleteChecksTheKindBeforeTheLookup) {
 }
 
 TEST_F(Lookups, DeleteAllLooksUpThoughItNeedsNoTypes) {
-    EXPECT_EQ(m_pApi->recDeleteAll(), 2);
+    EXPECT_EQ(m_pHandle->recDeleteAll(), 2);
     EXPECT_EQ(Steps(), Lines{"lookup"});
 }
 
 TEST_F(Lookups, DeleteByArrayLooksUpOnceBeforeEveryCheck) {
     Lines vecNone;
-    EXPECT_EQ(m_pApi->recDeleteByArray(vecNone, nullptr), -1);
+    EXPECT_EQ(m_pHandle->recDeleteByArray(vecNone, nullptr), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("0 >= strVector.size()"),
                               Plain("recDeleteByArray failed, name=(null), strVector=")}));
     Lines vecOne{"a"};
-    EXPECT_EQ(m_pApi->recDeleteByArray(vecOne, "name"), -1);
+    EXPECT_EQ(m_pHandle->recDeleteByArray(vecOne, "name"), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jType.isMember(szKey)"),
                               Plain("recDeleteByArray failed, name=name, strVector=a")}));
 }
 
 TEST_F(Lookups, DeleteByNameLooksUpOnceBeforeEveryCheck) {
     std::string strValue;
-    EXPECT_EQ(m_pApi->recDeleteByName(strValue, nullptr), -1);
+    EXPECT_EQ(m_pHandle->recDeleteByName(strValue, nullptr), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("strValue.empty()"),
                               Plain("recDeleteByName failed, name=(null), strValue=")}));
     strValue = "a";
-    EXPECT_EQ(m_pApi->recDeleteByName(strValue, "name"), -1);
+    EXPECT_EQ(m_pHandle->recDeleteByName(strValue, "name"), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jType.isMember(szKey)"),
                               Plain("recDeleteByName failed, name=name, strValue=a")}));
 }
@@ -294,9 +285,9 @@ TEST_F(Lookups, DeleteByNameLooksUpOnceBeforeEveryCheck) {
 TEST_F(Lookups, QueryObjectOfAVectorNeedsNone) {
     Lines vecOne{"a"};
     Json::Value jOut;
-    EXPECT_EQ(m_pApi->VectorParamToJson(vecOne, "nobody", jOut), 0);
+    EXPECT_EQ(m_pHandle->VectorParamToJson(vecOne, "nobody", jOut), 0);
     jOut = 7;
-    EXPECT_EQ(m_pApi->VectorParamToJson(vecOne, "nobody", jOut), -1);
+    EXPECT_EQ(m_pHandle->VectorParamToJson(vecOne, "nobody", jOut), -1);
     EXPECT_EQ(Steps(), Lines{Check("jParamOut.type() != Json::objectValue && "
                                    "jParamOut.type() != Json::nullValue")});
 }
@@ -305,17 +296,17 @@ TEST_F(Lookups, QueryObjectOfAVectorNeedsNone) {
 
 TEST_F(Lookups, TypeCheckLooksUpBeforeTheKindOfTheRecord) {
     Json::Value jRec = ParseJson("[1]");
-    EXPECT_EQ(m_pApi->checkJsonType(jRec), -1);
+    EXPECT_EQ(m_pHandle->checkJsonType(jRec), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jRecParam.isObject()")}));
     jRec = ParseJson(R"({"id":"no number"})");
-    EXPECT_EQ(m_pApi->checkJsonType(jRec), 0);
+    EXPECT_EQ(m_pHandle->checkJsonType(jRec), 0);
     EXPECT_EQ(Steps(), Lines{"lookup"});
 }
 
 TEST_F(Lookups, DefaultsAreLookedUpOnceInEachMode) {
     for (const bool blStrict : {false, true}) {
         Json::Value jRec;
-        EXPECT_EQ(m_pApi->fillDefaultValue(jRec, blStrict), 0);
+        EXPECT_EQ(m_pHandle->fillDefaultValue(jRec, blStrict), 0);
         EXPECT_EQ(Steps(), Lines{"lookup"});
     }
 }
@@ -323,11 +314,11 @@ TEST_F(Lookups, DefaultsAreLookedUpOnceInEachMode) {
 TEST_F(Lookups, NamesAndTailNeedNone) {
     std::string strSql;
     Json::Value jFilter = ParseJson(R"({"sort_by":"name","limit":2})");
-    EXPECT_EQ(m_pApi->SqlExpandMemberName(strSql), 0);
-    EXPECT_EQ(m_pApi->SqlFilterConditionFromJson(jFilter, strSql), 0);
+    EXPECT_EQ(m_pHandle->SqlExpandMemberName(strSql), 0);
+    EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), 0);
     EXPECT_EQ(strSql, "id,name order by 'name' LIMIT 2");
     jFilter = 7;
-    EXPECT_EQ(m_pApi->SqlFilterConditionFromJson(jFilter, strSql), -1);
+    EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), -1);
     EXPECT_EQ(Steps(), Lines{Check("jFilter.type() != Json::objectValue && "
                                    "jFilter.type() != Json::nullValue")});
 }
@@ -335,7 +326,7 @@ TEST_F(Lookups, NamesAndTailNeedNone) {
 TEST_F(Lookups, ValuesLookUpOnceAndKnowNoMember) {
     std::string strSql = "(";
     Json::Value jRec;
-    EXPECT_EQ(m_pApi->SqlExpandMemberSymbol(strSql, jRec), -1);
+    EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jType.isMember(strKey)")}));
 }
 
@@ -353,17 +344,18 @@ TEST_F(Lookups, ConditionsOnOneMemberLookUpBeforeTheirChecks) {
     std::string strField = "id";
     std::string strSql;
     Json::Value jValue = 1;
-    EXPECT_EQ(m_pApi->SqlMakeByMatchField(strField, jValue, strSql), -1);
+    EXPECT_EQ(m_pHandle->SqlMakeByMatchField(strField, jValue, strSql), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jType.isMember(strField)")}));
-    EXPECT_EQ(m_pApi->SqlMakeByListField(nullptr, jValue, strSql), -1);
+    EXPECT_EQ(m_pHandle->SqlMakeByListField(nullptr, jValue, strSql), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!szField || !szField[0]")}));
-    EXPECT_EQ(m_pApi->SqlMakeByListField("id", jValue, strSql), -1);
+    EXPECT_EQ(m_pHandle->SqlMakeByListField("id", jValue, strSql), -1);
     EXPECT_EQ(Steps(), (Lines{"lookup", Check("!jType.isMember(szField)")}));
 }
 
 TEST_F(Lookups, RunningAStatementAndCreatingTheTableNeedNone) {
-    EXPECT_EQ(m_pApi->runSqlEx("delete from " + m_strTable + " where 0;"), 0);
-    EXPECT_EQ(m_pApi->tableCreate(), 0);
+    EXPECT_EQ(m_pHandle->runSqlEx("delete from t where 0;"), 0);
+    Sql("drop table t");
+    EXPECT_EQ(m_pHandle->tableCreate(), 0);
     EXPECT_EQ(Steps(), Lines());
 }
 

@@ -1,58 +1,58 @@
 // SqlMakeByMatchField and SqlMakeByListField: one member of a query object as SQL text.
-#include "../schema/FreshTable.h"
+#include "../support/TableTest.h"
 
-namespace testhost {
+using namespace testhost;
 
 namespace {
 
-class MemberCondition : public FreshTableTest {
+class MemberCondition : public TableTest {
   protected:
-    std::string Match(VornJsonDbApi& api, const std::string& strName, const Json::Value& jGiven) {
+    std::string Match(const std::string& strName, const Json::Value& jGiven) {
         std::string strField = strName;
         std::string strSql = "WHERE ";
         Json::Value jValue = jGiven;
-        EXPECT_EQ(0, api.SqlMakeByMatchField(strField, jValue, strSql));
+        EXPECT_EQ(m_pHandle->SqlMakeByMatchField(strField, jValue, strSql), 0);
         ExpectUntouched(strName == strField && jGiven == jValue);
-        EXPECT_EQ(Lines{}, TakeLog());
+        EXPECT_EQ(TakeLog(), Lines());
         return Behind(strSql);
     }
 
-    std::string List(VornJsonDbApi& api, const char* szName, const Json::Value& jGiven) {
+    std::string List(const char* szName, const Json::Value& jGiven) {
         std::string strSql = "WHERE ";
         Json::Value jList = jGiven;
-        EXPECT_EQ(0, api.SqlMakeByListField(szName, jList, strSql));
+        EXPECT_EQ(m_pHandle->SqlMakeByListField(szName, jList, strSql), 0);
         ExpectUntouched(jGiven == jList);
-        EXPECT_EQ(Lines{}, TakeLog());
+        EXPECT_EQ(TakeLog(), Lines());
         return Behind(strSql);
     }
 
-    void ExpectMatchRefused(VornJsonDbApi& api, const std::string& strName,
-                            const Json::Value& jGiven, const std::string& strCondition) {
+    void ExpectMatchRefused(const std::string& strName, const Json::Value& jGiven,
+                            const std::string& strCondition) {
         std::string strField = strName;
         std::string strSql = "WHERE ";
         Json::Value jValue = jGiven;
-        EXPECT_EQ(-1, api.SqlMakeByMatchField(strField, jValue, strSql));
+        EXPECT_EQ(m_pHandle->SqlMakeByMatchField(strField, jValue, strSql), -1);
         ExpectUntouched(strSql == "WHERE " && jGiven == jValue);
-        EXPECT_EQ(Lines{Check(strCondition)}, TakeLog());
+        EXPECT_EQ(TakeLog(), Lines{Check(strCondition)});
     }
 
-    void ExpectListRefused(VornJsonDbApi& api, const char* szName, const Json::Value& jGiven,
+    void ExpectListRefused(const char* szName, const Json::Value& jGiven,
                            const std::string& strCondition) {
         std::string strSql = "WHERE ";
         Json::Value jList = jGiven;
-        EXPECT_EQ(-1, api.SqlMakeByListField(szName, jList, strSql));
+        EXPECT_EQ(m_pHandle->SqlMakeByListField(szName, jList, strSql), -1);
         ExpectUntouched(strSql == "WHERE " && jGiven == jList);
-        EXPECT_EQ(Lines{Check(strCondition)}, TakeLog());
+        EXPECT_EQ(TakeLog(), Lines{Check(strCondition)});
     }
 
   private:
     void ExpectUntouched(bool blSame) {
         EXPECT_TRUE(blSame);
-        EXPECT_EQ(Lines{}, TakeSql());
+        EXPECT_EQ(TakeSql(), Lines());
     }
 
     std::string Behind(const std::string& strSql) {
-        EXPECT_EQ(0U, strSql.find("WHERE "));
+        EXPECT_EQ(strSql.find("WHERE "), 0U);
         return strSql.substr(6);
     }
 };
@@ -102,141 +102,152 @@ Json::Value ListOf(const Json::Value& jElement) {
 // ---- equality ----------------------------------------------------------------------------------
 
 TEST_F(MemberCondition, StringTypeQuotesTheStringFormOfEveryKind) {
-    VornJsonDbApi& api = Open("m:string");
+    Open("m:string");
     for (std::size_t i = 0; i < kCount; ++i) {
         SCOPED_TRACE(kValues[i]);
         if (kAsString[i] == nullptr) {
-            ExpectMatchRefused(api, "m", ParseJson(kValues[i]), kMatchText);
+            ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchText);
         } else {
-            EXPECT_EQ("m='" + std::string(kAsString[i]) + "'",
-                      Match(api, "m", ParseJson(kValues[i])));
+            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m='" + std::string(kAsString[i]) + "'");
         }
     }
 }
 
 TEST_F(MemberCondition, JsonTypesQuoteTheJsonTextOfEveryKind) {
     for (const char* szType : kJsonTypes) {
-        VornJsonDbApi& api = Open(std::string("m:") + szType);
+        Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
             SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
-            EXPECT_EQ("m='" + std::string(kAsJson[i]) + "'",
-                      Match(api, "m", ParseJson(kValues[i])));
+            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m='" + std::string(kAsJson[i]) + "'");
         }
     }
 }
 
 TEST_F(MemberCondition, BoolTypeWritesTheIntegerOfEveryKind) {
-    VornJsonDbApi& api = Open("m:bool");
+    Open("m:bool");
     for (std::size_t i = 0; i < kCount; ++i) {
         SCOPED_TRACE(kValues[i]);
         if (kAsInt[i] == nullptr) {
-            ExpectMatchRefused(api, "m", ParseJson(kValues[i]), kMatchBool);
+            ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchBool);
         } else {
-            EXPECT_EQ("m=" + std::string(kAsInt[i]), Match(api, "m", ParseJson(kValues[i])));
+            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m=" + std::string(kAsInt[i]));
         }
     }
 }
 
 TEST_F(MemberCondition, EveryOtherTypeNameWritesTheStringFormBare) {
     for (const char* szType : kBareTypes) {
-        VornJsonDbApi& api = Open(std::string("m:") + szType);
+        Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
             SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
             if (kAsString[i] == nullptr) {
-                ExpectMatchRefused(api, "m", ParseJson(kValues[i]), kMatchText);
+                ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchText);
             } else {
-                EXPECT_EQ("m=" + std::string(kAsString[i]), Match(api, "m", ParseJson(kValues[i])));
+                EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m=" + std::string(kAsString[i]));
             }
         }
     }
 }
 
 TEST_F(MemberCondition, ApostropheInAStringMemberIsDoubled) {
-    EXPECT_EQ("name='O''Neil'", Match(Open("name:string"), "name", "O'Neil"));
+    Open("name:string");
+    EXPECT_EQ(Match("name", "O'Neil"), "name='O''Neil'");
 }
 
 TEST_F(MemberCondition, NumberGivenAsTextIsABareLiteral) {
-    VornJsonDbApi& api = Open("id:int");
-    EXPECT_EQ("id=5", Match(api, "id", 5));
-    EXPECT_EQ("id=5", Match(api, "id", "5"));
-    EXPECT_EQ("id=5 or 1=1", Match(api, "id", "5 or 1=1"));
+    Open("id:int");
+    EXPECT_EQ(Match("id", 5), "id=5");
+    EXPECT_EQ(Match("id", "5"), "id=5");
+    EXPECT_EQ(Match("id", "5 or 1=1"), "id=5 or 1=1");
 }
 
 TEST_F(MemberCondition, TrueIsOneInAnEqualityAndAWordInAList) {
-    VornJsonDbApi& api = Open("name:bool");
-    EXPECT_EQ("name=1", Match(api, "name", true));
-    EXPECT_EQ("name in (true )", List(api, "name", ListOf(true)));
+    Open("name:bool");
+    EXPECT_EQ(Match("name", true), "name=1");
+    EXPECT_EQ(List("name", ListOf(true)), "name in (true )");
 }
 
 TEST_F(MemberCondition, JsonMemberHoldingAnObjectIsQuotedJsonText) {
-    EXPECT_EQ(R"(j='{"a":[1,"it''s"]}')",
-              Match(Open("j:Json::Value"), "j", ParseJson(R"({"a":[1,"it's"]})")));
+    Open("j:Json::Value");
+    EXPECT_EQ(Match("j", ParseJson(R"({"a":[1,"it's"]})")), R"(j='{"a":[1,"it''s"]}')");
 }
 
 TEST_F(MemberCondition, NullForAStringMemberIsTheEmptyText) {
-    EXPECT_EQ("name=''", Match(Open("name:string"), "name", Json::Value()));
+    Open("name:string");
+    EXPECT_EQ(Match("name", Json::Value()), "name=''");
 }
 
 TEST_F(MemberCondition, MemberUnknownToTheTableIsRefused) {
-    VornJsonDbApi& api = Open("id:int");
-    ExpectMatchRefused(api, "Id", 1, "!jType.isMember(strField)");
-    ExpectMatchRefused(api, "", 1, "!jType.isMember(strField)");
-    ExpectMatchRefused(api, "x", ParseJson("{}"), "!jType.isMember(strField)");
+    Open("id:int");
+    ExpectMatchRefused("Id", 1, "!jType.isMember(strField)");
+    ExpectMatchRefused("", 1, "!jType.isMember(strField)");
+    ExpectMatchRefused("x", ParseJson("{}"), "!jType.isMember(strField)");
 }
 
 TEST_F(MemberCondition, PercentSignsAreNoConversions) {
-    EXPECT_EQ("m='100% %s %% %n'", Match(Open("m:string"), "m", "100% %s %% %n"));
-    EXPECT_EQ("m='[\"%d\"]'", Match(Open("m:Json::Value"), "m", ParseJson(R"(["%d"])")));
-    EXPECT_EQ("m in ('%s%%' )", List(Open("m:string"), "m", ListOf("%s%%")));
+    Open("m:string");
+    EXPECT_EQ(Match("m", "100% %s %% %n"), "m='100% %s %% %n'");
+    Open("m:Json::Value");
+    EXPECT_EQ(Match("m", ParseJson(R"(["%d"])")), "m='[\"%d\"]'");
+    Open("m:string");
+    EXPECT_EQ(List("m", ListOf("%s%%")), "m in ('%s%%' )");
 }
 
 TEST_F(MemberCondition, TextEndsAtAnEmbeddedNul) {
     const Json::Value jText(std::string("ab\0cd", 5));
-    EXPECT_EQ("m='ab'", Match(Open("m:string"), "m", jText));
-    EXPECT_EQ("m=ab", Match(Open("m:int"), "m", jText));
-    EXPECT_EQ("m in ('ab' )", List(Open("m:string"), "m", ListOf(jText)));
+    Open("m:string");
+    EXPECT_EQ(Match("m", jText), "m='ab'");
+    Open("m:int");
+    EXPECT_EQ(Match("m", jText), "m=ab");
+    Open("m:string");
+    EXPECT_EQ(List("m", ListOf(jText)), "m in ('ab' )");
 }
 
 TEST_F(MemberCondition, ForeignLettersAndNamesStayAsTheyAre) {
-    EXPECT_EQ(u8"größe='Grün ☂'", Match(Open(u8"größe:string"), u8"größe", u8"Grün ☂"));
-    EXPECT_EQ("\"a b\"=1", Match(Open("\"a b\":int"), "\"a b\"", 1));
+    Open(u8"größe:string");
+    EXPECT_EQ(Match(u8"größe", u8"Grün ☂"), u8"größe='Grün ☂'");
+    Open("\"a b\":int");
+    EXPECT_EQ(Match("\"a b\"", 1), "\"a b\"=1");
 }
 
 TEST_F(MemberCondition, TextOfAMillionBytesIsWrittenWhole) {
-    VornJsonDbApi& api = Open("m:string");
-    EXPECT_TRUE("m='" + LongText() + "'" == Match(api, "m", LongText()));
-    EXPECT_TRUE("m in ('" + LongText() + "' )" == List(api, "m", ListOf(LongText())));
+    Open("m:string");
+    EXPECT_TRUE("m='" + LongText() + "'" == Match("m", LongText()));
+    EXPECT_TRUE("m in ('" + LongText() + "' )" == List("m", ListOf(LongText())));
 }
 
 TEST_F(MemberCondition, FormatterWithoutMemoryIsNamedInAnEquality) {
     ScarceMemory scarce;
-    ExpectMatchRefused(Open("m:string"), "m", LongText(), kMatchText);
-    ExpectMatchRefused(Open("m:int"), "m", LongText(), kMatchText);
-    ExpectMatchRefused(Open("m:Json::Value"), "m", LongText(), kMatchJson);
+    Open("m:string");
+    ExpectMatchRefused("m", LongText(), kMatchText);
+    Open("m:int");
+    ExpectMatchRefused("m", LongText(), kMatchText);
+    Open("m:Json::Value");
+    ExpectMatchRefused("m", LongText(), kMatchJson);
 }
 
 // ---- membership --------------------------------------------------------------------------------
 
 TEST_F(MemberCondition, StringListQuotesTheStringFormOfEveryKind) {
-    VornJsonDbApi& api = Open("m:string");
+    Open("m:string");
     for (std::size_t i = 0; i < kCount; ++i) {
         SCOPED_TRACE(kValues[i]);
         if (kAsString[i] == nullptr) {
-            ExpectListRefused(api, "m", ListOf(ParseJson(kValues[i])), kListText);
+            ExpectListRefused("m", ListOf(ParseJson(kValues[i])), kListText);
         } else {
-            EXPECT_EQ("m in ('" + std::string(kAsString[i]) + "' )",
-                      List(api, "m", ListOf(ParseJson(kValues[i]))));
+            EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+                      "m in ('" + std::string(kAsString[i]) + "' )");
         }
     }
 }
 
 TEST_F(MemberCondition, JsonListQuotesTheJsonTextOfEveryKind) {
     for (const char* szType : kJsonTypes) {
-        VornJsonDbApi& api = Open(std::string("m:") + szType);
+        Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
             SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
-            EXPECT_EQ("m in ('" + std::string(kAsJson[i]) + "' )",
-                      List(api, "m", ListOf(ParseJson(kValues[i]))));
+            EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+                      "m in ('" + std::string(kAsJson[i]) + "' )");
         }
     }
 }
@@ -245,29 +256,31 @@ TEST_F(MemberCondition, ListOfAnyOtherTypeBoolIncludedIsBare) {
     std::vector<std::string> vecTypes(std::begin(kBareTypes), std::end(kBareTypes));
     vecTypes.push_back("bool");
     for (const std::string& strType : vecTypes) {
-        VornJsonDbApi& api = Open(std::string("m:") + strType.c_str());
+        Open(std::string("m:") + strType.c_str());
         for (std::size_t i = 0; i < kCount; ++i) {
             SCOPED_TRACE(strType + " " + kValues[i]);
             if (kAsString[i] == nullptr) {
-                ExpectListRefused(api, "m", ListOf(ParseJson(kValues[i])), kListText);
+                ExpectListRefused("m", ListOf(ParseJson(kValues[i])), kListText);
             } else {
-                EXPECT_EQ("m in (" + std::string(kAsString[i]) + " )",
-                          List(api, "m", ListOf(ParseJson(kValues[i]))));
+                EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+                          "m in (" + std::string(kAsString[i]) + " )");
             }
         }
     }
 }
 
 TEST_F(MemberCondition, EmptyListWritesNothingAtAll) {
-    VornJsonDbApi& api = Open("m:string");
-    EXPECT_EQ("", List(api, "m", ParseJson("[]")));
+    Open("m:string");
+    EXPECT_EQ(List("m", ParseJson("[]")), "");
 }
 
 TEST_F(MemberCondition, ElementsFollowEachOtherWithoutSeparator) {
-    EXPECT_EQ("name in ('a''b' )", List(Open("name:string"), "name", ParseJson(R"(["a","b"])")));
-    EXPECT_EQ("name in (12 )", List(Open("name:int"), "name", ParseJson("[1,2]")));
-    EXPECT_EQ("name in ('{}''[]''1' )",
-              List(Open("name:Json::Value"), "name", ParseJson("[{},[],1]")));
+    Open("name:string");
+    EXPECT_EQ(List("name", ParseJson(R"(["a","b"])")), "name in ('a''b' )");
+    Open("name:int");
+    EXPECT_EQ(List("name", ParseJson("[1,2]")), "name in (12 )");
+    Open("name:Json::Value");
+    EXPECT_EQ(List("name", ParseJson("[{},[],1]")), "name in ('{}''[]''1' )");
 }
 
 // An array need not store all of its elements; one that it does not is a null.
@@ -284,57 +297,67 @@ TEST_F(MemberCondition, ElementThatTheListDoesNotStoreIsANull) {
     for (const auto& [szType, szText] : aTexts) {
         Json::Value jList(Json::arrayValue);
         jList[2] = 7;
-        EXPECT_EQ(szText, List(Open(std::string("m:") + szType), "m", jList)) << szType;
+        Open(std::string("m:") + szType);
+        EXPECT_EQ(List("m", jList), szText) << szType;
     }
 }
 
 TEST_F(MemberCondition, ElementsMissingAtTheEndAreNulls) {
     Json::Value jList = ListOf("x");
     jList.resize(3);
-    EXPECT_EQ("m in ('x''''' )", List(Open("m:string"), "m", jList));
-    EXPECT_EQ(R"(m in ('"x"''null''null' ))", List(Open("m:Json::Value"), "m", jList));
+    Open("m:string");
+    EXPECT_EQ(List("m", jList), "m in ('x''''' )");
+    Open("m:Json::Value");
+    EXPECT_EQ(List("m", jList), R"(m in ('"x"''null''null' ))");
     Json::Value jNone(Json::arrayValue);
     jNone.resize(2);
-    EXPECT_EQ("m in ('''' )", List(Open("m:string"), "m", jNone));
-    EXPECT_EQ("m in ( )", List(Open("m:int"), "m", jNone));
+    Open("m:string");
+    EXPECT_EQ(List("m", jNone), "m in ('''' )");
+    Open("m:int");
+    EXPECT_EQ(List("m", jNone), "m in ( )");
 }
 
 TEST_F(MemberCondition, ReadingPastTheEndMakesElements) {
     Json::Value jList = ListOf("x");
     EXPECT_TRUE(jList[3].isNull());
-    EXPECT_EQ("m in ('x''''''' )", List(Open("m:string"), "m", jList));
+    Open("m:string");
+    EXPECT_EQ(List("m", jList), "m in ('x''''''' )");
 }
 
 TEST_F(MemberCondition, ElementMissingInsideAnElementIsWrittenAsNull) {
     Json::Value jList(Json::arrayValue);
     jList[1][1] = "x";
-    EXPECT_EQ(R"(m in ('null''[null,"x"]' ))", List(Open("m:Json::Value"), "m", jList));
-    ExpectListRefused(Open("m:string"), "m", jList, kListText);
+    Open("m:Json::Value");
+    EXPECT_EQ(List("m", jList), R"(m in ('null''[null,"x"]' ))");
+    Open("m:string");
+    ExpectListRefused("m", jList, kListText);
 }
 
 TEST_F(MemberCondition, LaterElementOfAWrongKindDropsTheWholeList) {
-    ExpectListRefused(Open("m:string"), "m", ParseJson(R"(["a","b",[]])"), kListText);
-    ExpectListRefused(Open("m:int"), "m", ParseJson("[1,{}]"), kListText);
+    Open("m:string");
+    ExpectListRefused("m", ParseJson(R"(["a","b",[]])"), kListText);
+    Open("m:int");
+    ExpectListRefused("m", ParseJson("[1,{}]"), kListText);
 }
 
 TEST_F(MemberCondition, ListWithoutAFieldNameIsRefused) {
-    VornJsonDbApi& api = Open("m:string");
-    ExpectListRefused(api, nullptr, ParseJson("[1]"), "!szField || !szField[0]");
-    ExpectListRefused(api, "", ParseJson("[1]"), "!szField || !szField[0]");
-    ExpectListRefused(api, nullptr, ParseJson("5"), "!szField || !szField[0]");
+    Open("m:string");
+    ExpectListRefused(nullptr, ParseJson("[1]"), "!szField || !szField[0]");
+    ExpectListRefused("", ParseJson("[1]"), "!szField || !szField[0]");
+    ExpectListRefused(nullptr, ParseJson("5"), "!szField || !szField[0]");
 }
 
 TEST_F(MemberCondition, ListOfAMemberUnknownToTheTableIsRefusedBeforeItsKindIsSeen) {
-    VornJsonDbApi& api = Open("m:string");
-    ExpectListRefused(api, "x", ParseJson("[1]"), "!jType.isMember(szField)");
-    ExpectListRefused(api, "x", ParseJson("5"), "!jType.isMember(szField)");
+    Open("m:string");
+    ExpectListRefused("x", ParseJson("[1]"), "!jType.isMember(szField)");
+    ExpectListRefused("x", ParseJson("5"), "!jType.isMember(szField)");
 }
 
 TEST_F(MemberCondition, ListThatIsNoArrayIsRefused) {
-    VornJsonDbApi& api = Open("m:string");
+    Open("m:string");
     for (const char* szValue : {"null", "{}", "{\"0\":1}", "\"a\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szValue);
-        ExpectListRefused(api, "m", ParseJson(szValue), "jList.type() != Json::arrayValue");
+        ExpectListRefused("m", ParseJson(szValue), "jList.type() != Json::arrayValue");
     }
 }
 
@@ -342,17 +365,18 @@ TEST_F(MemberCondition, FormatterWithoutMemoryIsNamedInAList) {
     ScarceMemory scarce;
     Json::Value jList = ListOf("a");
     jList.append(LongText());
-    ExpectListRefused(Open("m:string"), "m", jList, kListText);
-    ExpectListRefused(Open("m:bool"), "m", jList, kListText);
-    ExpectListRefused(Open("m:Json::objectValue"), "m", jList, kListJson);
+    Open("m:string");
+    ExpectListRefused("m", jList, kListText);
+    Open("m:bool");
+    ExpectListRefused("m", jList, kListText);
+    Open("m:Json::objectValue");
+    ExpectListRefused("m", jList, kListJson);
 }
 
 TEST_F(MemberCondition, HandleWorksOnAfterEveryRefusal) {
-    VornJsonDbApi& api = Open("m:string");
-    ExpectMatchRefused(api, "m", ParseJson("[]"), kMatchText);
-    EXPECT_EQ("m='x'", Match(api, "m", "x"));
-    ExpectListRefused(api, "m", ParseJson("[[]]"), kListText);
-    EXPECT_EQ("m in ('x' )", List(api, "m", ListOf("x")));
+    Open("m:string");
+    ExpectMatchRefused("m", ParseJson("[]"), kMatchText);
+    EXPECT_EQ(Match("m", "x"), "m='x'");
+    ExpectListRefused("m", ParseJson("[[]]"), kListText);
+    EXPECT_EQ(List("m", ListOf("x")), "m in ('x' )");
 }
-
-}  // namespace testhost

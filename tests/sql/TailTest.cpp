@@ -1,42 +1,40 @@
 // SqlFilterConditionFromJson: order, limit and offset of a SELECT.
-#include "../schema/FreshTable.h"
+#include "../support/TableTest.h"
 
-namespace testhost {
+using namespace testhost;
 
 namespace {
 
-class Tail : public FreshTableTest {
+class Tail : public TableTest {
   protected:
     std::string Written(const Json::Value& jGiven) {
-        VornJsonDbApi& api = Open("name:string");
         std::string strSql;
         Json::Value jFilter = jGiven;
-        EXPECT_EQ(0, api.SqlFilterConditionFromJson(jFilter, strSql));
-        EXPECT_EQ(jGiven, jFilter);
-        EXPECT_EQ(Lines{}, TakeLog());
-        EXPECT_EQ(Lines{}, TakeSql());
+        EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), 0);
+        EXPECT_EQ(jFilter, jGiven);
+        EXPECT_EQ(TakeLog(), Lines());
+        EXPECT_EQ(TakeSql(), Lines());
         return strSql;
     }
 
     std::string Written(const char* szFilter) { return Written(ParseJson(szFilter)); }
 
     void ExpectRefused(const Json::Value& jGiven, const std::string& strCondition) {
-        VornJsonDbApi& api = Open("name:string");
         std::string strSql = "x";
         Json::Value jFilter = jGiven;
-        EXPECT_EQ(-1, api.SqlFilterConditionFromJson(jFilter, strSql));
-        EXPECT_EQ("x", strSql);
-        EXPECT_EQ(jGiven, jFilter);
-        EXPECT_EQ(Lines{Check(strCondition)}, TakeLog());
+        EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), -1);
+        EXPECT_EQ(strSql, "x");
+        EXPECT_EQ(jFilter, jGiven);
+        EXPECT_EQ(TakeLog(), Lines{Check(strCondition)});
     }
 };
 
 }  // namespace
 
 TEST_F(Tail, NullOrAnObjectWithoutTheseKeysWritesNothing) {
-    EXPECT_EQ("", Written("null"));
-    EXPECT_EQ("", Written("{}"));
-    EXPECT_EQ("", Written(R"({"name":"x","Limit":1,"vornSqlWhereFilter":5})"));
+    EXPECT_EQ(Written("null"), "");
+    EXPECT_EQ(Written("{}"), "");
+    EXPECT_EQ(Written(R"({"name":"x","Limit":1,"vornSqlWhereFilter":5})"), "");
 }
 
 TEST_F(Tail, FilterOfAWrongKindIsRefused) {
@@ -48,16 +46,15 @@ TEST_F(Tail, FilterOfAWrongKindIsRefused) {
 }
 
 TEST_F(Tail, AllFourPiecesFollowEachOtherDirectly) {
-    EXPECT_EQ(" order by 'name' DESC LIMIT 10 OFFSET 20",
-              Written(R"({"sort_by":"name","sort_direction":"desc","limit":10,"offset":20})"));
+    EXPECT_EQ(Written(R"({"sort_by":"name","sort_direction":"desc","limit":10,"offset":20})"),
+              " order by 'name' DESC LIMIT 10 OFFSET 20");
 }
 
 TEST_F(Tail, AppendsToTheTextItIsGiven) {
-    VornJsonDbApi& api = Open("name:string");
     std::string strSql = "x";
     Json::Value jFilter = ParseJson(R"({"limit":1})");
-    EXPECT_EQ(0, api.SqlFilterConditionFromJson(jFilter, strSql));
-    EXPECT_EQ("x LIMIT 1", strSql);
+    EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jFilter, strSql), 0);
+    EXPECT_EQ(strSql, "x LIMIT 1");
 }
 
 TEST_F(Tail, EveryDirectionButExactlyDescIsAscending) {
@@ -65,30 +62,30 @@ TEST_F(Tail, EveryDirectionButExactlyDescIsAscending) {
                                     "\"\"", "\"descending\"", "null", "1", "true", "1.5"}) {
         SCOPED_TRACE(szDirection);
         EXPECT_EQ(
-            " order by 'name' ASC",
             Written((std::string(R"({"sort_by":"name","sort_direction":)") + szDirection + "}")
-                        .c_str()));
+                        .c_str()),
+            " order by 'name' ASC");
     }
 }
 
 TEST_F(Tail, SortWithoutDirectionHasNoDirectionWord) {
-    EXPECT_EQ(" order by 'name'", Written(R"({"sort_by":"name"})"));
-    EXPECT_EQ(" order by 'name' LIMIT 3", Written(R"({"sort_by":"name","limit":3})"));
+    EXPECT_EQ(Written(R"({"sort_by":"name"})"), " order by 'name'");
+    EXPECT_EQ(Written(R"({"sort_by":"name","limit":3})"), " order by 'name' LIMIT 3");
 }
 
 TEST_F(Tail, DirectionWithoutSortIsIgnored) {
-    EXPECT_EQ("", Written(R"({"sort_direction":"desc"})"));
-    EXPECT_EQ(" LIMIT 3", Written(R"({"sort_direction":"desc","limit":3})"));
+    EXPECT_EQ(Written(R"({"sort_direction":"desc"})"), "");
+    EXPECT_EQ(Written(R"({"sort_direction":"desc","limit":3})"), " LIMIT 3");
 }
 
 TEST_F(Tail, OffsetWithoutLimitIsIgnored) {
-    EXPECT_EQ("", Written(R"({"offset":5})"));
-    EXPECT_EQ(" order by 'name'", Written(R"({"sort_by":"name","offset":5})"));
+    EXPECT_EQ(Written(R"({"offset":5})"), "");
+    EXPECT_EQ(Written(R"({"sort_by":"name","offset":5})"), " order by 'name'");
 }
 
 TEST_F(Tail, LimitGivenAsTextKeepsItsDoubleQuotes) {
-    EXPECT_EQ(R"( LIMIT "10")", Written(R"({"limit":"10"})"));
-    EXPECT_EQ(R"( LIMIT "10" OFFSET "5")", Written(R"({"limit":"10","offset":"5"})"));
+    EXPECT_EQ(Written(R"({"limit":"10"})"), R"( LIMIT "10")");
+    EXPECT_EQ(Written(R"({"limit":"10","offset":"5"})"), R"( LIMIT "10" OFFSET "5")");
 }
 
 TEST_F(Tail, LimitAndOffsetAreTheJsonTextOfAnyKind) {
@@ -97,25 +94,25 @@ TEST_F(Tail, LimitAndOffsetAreTheJsonTextOfAnyKind) {
         SCOPED_TRACE(szValue);
         const std::string strFilter =
             std::string(R"({"limit":)") + szValue + R"(,"offset":)" + szValue + "}";
-        EXPECT_EQ(std::string(" LIMIT ") + szValue + " OFFSET " + szValue,
-                  Written(strFilter.c_str()));
+        EXPECT_EQ(Written(strFilter.c_str()),
+                  std::string(" LIMIT ") + szValue + " OFFSET " + szValue);
     }
 }
 
 TEST_F(Tail, QuoteInTheSortColumnIsDoubled) {
-    EXPECT_EQ(" order by 'it''s'", Written(R"({"sort_by":"it's"})"));
+    EXPECT_EQ(Written(R"({"sort_by":"it's"})"), " order by 'it''s'");
 }
 
 TEST_F(Tail, SortColumnMayBeAnyText) {
-    EXPECT_EQ(" order by ''", Written(R"({"sort_by":""})"));
-    EXPECT_EQ(u8" order by 'größe'", Written(u8R"({"sort_by":"größe"})"));
-    EXPECT_EQ(" order by '100% %s %%'", Written(R"({"sort_by":"100% %s %%"})"));
+    EXPECT_EQ(Written(R"({"sort_by":""})"), " order by ''");
+    EXPECT_EQ(Written(u8R"({"sort_by":"größe"})"), u8" order by 'größe'");
+    EXPECT_EQ(Written(R"({"sort_by":"100% %s %%"})"), " order by '100% %s %%'");
 }
 
 TEST_F(Tail, SortColumnEndsAtAnEmbeddedNul) {
     Json::Value jFilter(Json::objectValue);
     jFilter["sort_by"] = Json::Value(std::string("ab\0cd", 5));
-    EXPECT_EQ(" order by 'ab'", Written(jFilter));
+    EXPECT_EQ(Written(jFilter), " order by 'ab'");
 }
 
 TEST_F(Tail, SortColumnOfAMillionBytes) {
@@ -139,5 +136,3 @@ TEST_F(Tail, FormatterWithoutMemoryIsReported) {
     ScarceMemory scarce;
     ExpectRefused(jFilter, "!szSql");
 }
-
-}  // namespace testhost

@@ -1,33 +1,33 @@
 // SqlExpandMemberSymbol: the value list of an INSERT. Percent signs have a test file of their own.
 #include <stdexcept>
 
-#include "../schema/FreshTable.h"
+#include "../support/TableTest.h"
 
-namespace testhost {
+using namespace testhost;
 
 namespace {
 
-class Values : public FreshTableTest {
+class Values : public TableTest {
   protected:
     // The text after a successful rendering behind "(", without a line logged or a statement run.
-    std::string Rendered(VornJsonDbApi& api, const Json::Value& jRecord) {
+    std::string Rendered(const Json::Value& jRecord) {
         std::string strSql = "(";
         Json::Value jRec = jRecord;
-        EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
-        EXPECT_EQ(jRecord, jRec);
-        EXPECT_EQ(Lines{}, TakeLog());
-        EXPECT_EQ(Lines{}, TakeSql());
+        EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), 0);
+        EXPECT_EQ(jRec, jRecord);
+        EXPECT_EQ(TakeLog(), Lines());
+        EXPECT_EQ(TakeSql(), Lines());
         return strSql;
     }
 
-    void ExpectRefused(VornJsonDbApi& api, const Json::Value& jRecord, const Lines& vecLines) {
+    void ExpectRefused(const Json::Value& jRecord, const Lines& vecLines) {
         std::string strSql = "(";
         Json::Value jRec = jRecord;
-        EXPECT_EQ(-1, api.SqlExpandMemberSymbol(strSql, jRec));
-        EXPECT_EQ("(", strSql);
-        EXPECT_EQ(jRecord, jRec);
-        EXPECT_EQ(vecLines, TakeLog());
-        EXPECT_EQ(Lines{}, TakeSql());
+        EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), -1);
+        EXPECT_EQ(strSql, "(");
+        EXPECT_EQ(jRec, jRecord);
+        EXPECT_EQ(TakeLog(), vecLines);
+        EXPECT_EQ(TakeSql(), Lines());
     }
 };
 
@@ -130,159 +130,167 @@ Json::Value RecordOf(const char* szValue) {
 
 TEST_F(Values, EveryTypeRendersEveryKindOrNamesTheMember) {
     for (const Rendering& rendering : kRenderings) {
-        VornJsonDbApi& api = Open(std::string("m:") + rendering.szType);
+        Open(std::string("m:") + rendering.szType);
         for (std::size_t i = 0; i < 11; ++i) {
             SCOPED_TRACE(std::string(rendering.szType) + " " + kValues[i]);
             const Json::Value jRec = RecordOf(kValues[i]);
             if (rendering.pszTexts[i] == nullptr) {
-                ExpectRefused(api, jRec,
-                              {Located("type failed, strKey=m, jRecParam=" + Compact(jRec))});
+                ExpectRefused(jRec, {Located("type failed, strKey=m, jRecParam=" + Compact(jRec))});
                 continue;
             }
             const std::string strText = rendering.pszTexts[i] == kAsSqlite
                                             ? SqliteFixed(jRec["m"].asDouble())
                                             : rendering.pszTexts[i];
-            EXPECT_EQ("(" + strText + ") ", Rendered(api, jRec));
+            EXPECT_EQ(Rendered(jRec), "(" + strText + ") ");
         }
     }
 }
 
 TEST_F(Values, OtherTypeNamesAreRefusedWhateverTheValue) {
     for (const char* szType : kRefusedTypes) {
-        VornJsonDbApi& api = Open(std::string("m:") + szType);
+        Open(std::string("m:") + szType);
         for (const char* szValue : kValues) {
             SCOPED_TRACE(std::string(szType) + " " + szValue);
-            ExpectRefused(api, RecordOf(szValue),
+            ExpectRefused(RecordOf(szValue),
                           {Located(std::string("cannot support this type=") + szType)});
         }
     }
 }
 
 TEST_F(Values, RefusedTypeDoesNotMatterWhileTheRecordLacksTheMember) {
-    EXPECT_EQ("(1) ", Rendered(Open("a:time_t,b:int"), ParseJson(R"({"b":1})")));
+    Open("a:time_t,b:int");
+    EXPECT_EQ(Rendered(ParseJson(R"({"b":1})")), "(1) ");
 }
 
 TEST_F(Values, StatementOfTheTextbook) {
-    VornJsonDbApi& api = Open("id:int,name:string");
+    Open("id:int,name:string");
     std::string strSql = "INSERT INTO t (id,name) VALUES (";
     Json::Value jRec = ParseJson(R"({"id":7,"name":"O'Neil"})");
-    EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
-    EXPECT_EQ("INSERT INTO t (id,name) VALUES (7,'O''Neil') ", strSql);
+    EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), 0);
+    EXPECT_EQ(strSql, "INSERT INTO t (id,name) VALUES (7,'O''Neil') ");
 }
 
 TEST_F(Values, MissingMiddleMemberLeavesNoGap) {
-    EXPECT_EQ("(1,3) ", Rendered(Open("a:int,b:int,c:int"), ParseJson(R"({"a":1,"c":3})")));
+    Open("a:int,b:int,c:int");
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":1,"c":3})")), "(1,3) ");
 }
 
 TEST_F(Values, MissingLastMemberLeavesTheListOpen) {
-    EXPECT_EQ("(1,2,", Rendered(Open("a:int,b:int,c:int"), ParseJson(R"({"a":1,"b":2})")));
+    Open("a:int,b:int,c:int");
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":1,"b":2})")), "(1,2,");
 }
 
 TEST_F(Values, RecordWithoutAnyMemberOfTheTableWritesNothing) {
-    VornJsonDbApi& api = Open("a:int,b:int");
-    EXPECT_EQ("(", Rendered(api, ParseJson("{}")));
-    EXPECT_EQ("(", Rendered(api, ParseJson(R"({"x":[],"y":{}})")));
+    Open("a:int,b:int");
+    EXPECT_EQ(Rendered(ParseJson("{}")), "(");
+    EXPECT_EQ(Rendered(ParseJson(R"({"x":[],"y":{}})")), "(");
 }
 
 TEST_F(Values, RecordOfAWrongKindHasNoMembers) {
-    VornJsonDbApi& api = Open("a:int,b:int");
+    Open("a:int,b:int");
     for (const char* szRecord : {"null", "[]", "[1,2]", "\"a\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szRecord);
-        EXPECT_EQ("(", Rendered(api, ParseJson(szRecord)));
+        EXPECT_EQ(Rendered(ParseJson(szRecord)), "(");
     }
 }
 
 TEST_F(Values, UnknownMembersAreIgnoredSilently) {
-    EXPECT_EQ("(1) ", Rendered(Open("a:int"), ParseJson(R"({"a":1,"b":[],"c":"x"})")));
+    Open("a:int");
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":1,"b":[],"c":"x"})")), "(1) ");
 }
 
 TEST_F(Values, TrueIsOneAndAFloatHasSixDecimals) {
-    EXPECT_EQ("(1,1.500000) ",
-              Rendered(Open("b:bool,f:float"), ParseJson(R"({"b":true,"f":1.5})")));
+    Open("b:bool,f:float");
+    EXPECT_EQ(Rendered(ParseJson(R"({"b":true,"f":1.5})")), "(1,1.500000) ");
 }
 
 TEST_F(Values, FloatGoesThroughSinglePrecisionAndDoubleDoesNot) {
-    EXPECT_EQ("(16777217.000000,16777216.000000) ",
-              Rendered(Open("d:double,f:float"), ParseJson(R"({"d":16777217,"f":16777217})")));
+    Open("d:double,f:float");
+    EXPECT_EQ(Rendered(ParseJson(R"({"d":16777217,"f":16777217})")),
+              "(16777217.000000,16777216.000000) ");
 }
 
 TEST_F(Values, RealBeyondTheIntegersCannotBeRenderedAsOne) {
-    ExpectRefused(Open("m:int"), RecordOf("1e30"),
+    Open("m:int");
+    ExpectRefused(RecordOf("1e30"),
                   {Located("type failed, strKey=m, jRecParam=" + Compact(RecordOf("1e30")))});
-    ExpectRefused(Open("m:unsigned"), RecordOf("-1.5"),
-                  {Located(R"(type failed, strKey=m, jRecParam={"m":-1.5})")});
+    Open("m:unsigned");
+    ExpectRefused(RecordOf("-1.5"), {Located(R"(type failed, strKey=m, jRecParam={"m":-1.5})")});
 }
 
 TEST_F(Values, FirstRealBeyondARangeIsRefusedInsteadOfChangingItsSign) {
-    VornJsonDbApi& api = Open("s:long long,u:unsigned long long");
+    Open("s:long long,u:unsigned long long");
     Json::Value jRec;
     jRec["s"] = 9223372036854775808.0;
-    ExpectRefused(api, jRec, {Located("type failed, strKey=s, jRecParam=" + Compact(jRec))});
+    ExpectRefused(jRec, {Located("type failed, strKey=s, jRecParam=" + Compact(jRec))});
     jRec["s"] = -9223372036854775808.0;
     jRec["u"] = 9223372036854775808.0;
-    EXPECT_EQ("(-9223372036854775808,9223372036854775808) ", Rendered(api, jRec));
+    EXPECT_EQ(Rendered(jRec), "(-9223372036854775808,9223372036854775808) ");
     jRec["u"] = 18446744073709551616.0;
-    ExpectRefused(api, jRec, {Located("type failed, strKey=u, jRecParam=" + Compact(jRec))});
+    ExpectRefused(jRec, {Located("type failed, strKey=u, jRecParam=" + Compact(jRec))});
 }
 
 TEST_F(Values, FailureAfterEarlierMembersLeavesTheTextUnchanged) {
-    VornJsonDbApi& api = Open("a:int,b:string,c:time_t");
-    ExpectRefused(api, ParseJson(R"({"a":1,"b":"x","c":3})"),
+    Open("a:int,b:string,c:time_t");
+    ExpectRefused(ParseJson(R"({"a":1,"b":"x","c":3})"),
                   {Located("cannot support this type=time_t")});
-    ExpectRefused(api, ParseJson(R"({"a":1,"b":[]})"),
+    ExpectRefused(ParseJson(R"({"a":1,"b":[]})"),
                   {Located(R"(type failed, strKey=b, jRecParam={"a":1,"b":[]})")});
-    EXPECT_EQ("(1,'x',", Rendered(api, ParseJson(R"({"a":1,"b":"x"})")));
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":1,"b":"x"})")), "(1,'x',");
 }
 
 TEST_F(Values, MemberThatTheCachedTypesLackIsRefusedEvenWhenTheRecordLacksIt) {
-    VornJsonDbApi& first = Open("a:int");
-    EXPECT_EQ("(1) ", Rendered(first, ParseJson(R"({"a":1})")));
-    VornJsonDbApi& second = OpenAs(m_strTable, Definition(m_strTable, "a:int,b:int"), "a");
-    ExpectRefused(second, ParseJson(R"({"a":1,"b":2})"), {Check("!jType.isMember(strKey)")});
-    ExpectRefused(second, ParseJson(R"({"a":1})"), {Check("!jType.isMember(strKey)")});
+    Open("a:int");
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":1})")), "(1) ");
+    m_pHandle = NewHandle(m_pDb, "t", Definition("t", "a:int,b:int"), "SELECT 1");
+    TakeSql();
+    ExpectRefused(ParseJson(R"({"a":1,"b":2})"), {Check("!jType.isMember(strKey)")});
+    ExpectRefused(ParseJson(R"({"a":1})"), {Check("!jType.isMember(strKey)")});
 }
 
 TEST_F(Values, DefinitionWithoutMembersRendersNothing) {
-    VornJsonDbApi& api = OpenMembers(ParseJson("{}"), "a");
+    OpenMembers("{}", "a");
     std::string strSql = "100%s (";
     Json::Value jRec = ParseJson(R"({"a":1})");
-    EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
-    EXPECT_EQ("100%s (", strSql);
+    EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), 0);
+    EXPECT_EQ(strSql, "100%s (");
     const Lines vecLines = TakeLog();
-    ASSERT_EQ(4U, vecLines.size());
-    EXPECT_EQ(UtilCheck("jType == Json::nullValue || !jType.isMember(strJsonName)"), vecLines[0]);
+    ASSERT_EQ(vecLines.size(), 4U);
+    EXPECT_EQ(vecLines[0], UtilCheck("jType == Json::nullValue || !jType.isMember(strJsonName)"));
 }
 
 TEST_F(Values, TextEndsAtAnEmbeddedNul) {
     Json::Value jRec(Json::objectValue);
     jRec["a"] = Json::Value(std::string("ab\0cd", 5));
     jRec["b"] = 1;
-    EXPECT_EQ("('ab',1) ", Rendered(Open("a:string,b:int"), jRec));
+    Open("a:string,b:int");
+    EXPECT_EQ(Rendered(jRec), "('ab',1) ");
 }
 
 TEST_F(Values, NulInTheCallersTextCutsItThereBeforeEachMember) {
-    VornJsonDbApi& api = Open("a:int,b:string");
+    Open("a:int,b:string");
     Json::Value jRec = ParseJson(R"({"a":7,"b":"x"})");
     std::string strSql("VALUES\0 (", 9);
-    EXPECT_EQ(0, api.SqlExpandMemberSymbol(strSql, jRec));
-    EXPECT_EQ("VALUES,'x') ", strSql);
-    EXPECT_EQ(Lines{}, TakeLog());
+    EXPECT_EQ(m_pHandle->SqlExpandMemberSymbol(strSql, jRec), 0);
+    EXPECT_EQ(strSql, "VALUES,'x') ");
+    EXPECT_EQ(TakeLog(), Lines());
 }
 
 TEST_F(Values, EmbeddedNulInsideJsonTextIsEscapedAndKept) {
     Json::Value jRec(Json::objectValue);
     jRec["a"]["k"] = Json::Value(std::string("ab\0cd", 5));
-    EXPECT_EQ("('{\"k\":\"ab\\u0000cd\"}') ", Rendered(Open("a:Json::objectValue"), jRec));
+    Open("a:Json::objectValue");
+    EXPECT_EQ(Rendered(jRec), "('{\"k\":\"ab\\u0000cd\"}') ");
 }
 
 TEST_F(Values, ForeignLettersStayAsTheyAre) {
-    EXPECT_EQ(u8"('Grün ☂ 😀','[\"é\"]') ", Rendered(Open("a:string,b:Json::arrayValue"),
-                                                    ParseJson(u8R"({"a":"Grün ☂ 😀","b":["é"]})")));
+    Open("a:string,b:Json::arrayValue");
+    EXPECT_EQ(Rendered(ParseJson(u8R"({"a":"Grün ☂ 😀","b":["é"]})")), u8"('Grün ☂ 😀','[\"é\"]') ");
 }
 
 TEST_F(Values, OnlySingleQuotesAreDoubled) {
-    EXPECT_EQ("('''\"\\`;--\n''''') ",
-              Rendered(Open("a:string"), ParseJson(R"({"a":"'\"\\`;--\n''"})")));
+    Open("a:string");
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":"'\"\\`;--\n''"})")), "('''\"\\`;--\n''''') ");
 }
 
 TEST_F(Values, TextOfAMillionBytesIsRenderedWhole) {
@@ -290,29 +298,24 @@ TEST_F(Values, TextOfAMillionBytesIsRenderedWhole) {
     jRec["a"] = LongText();
     jRec["b"] = LongText();
     const std::string strExpected = "('" + LongText() + "','" + LongText() + "') ";
-    EXPECT_TRUE(strExpected == Rendered(Open("a:string,b:string"), jRec));
+    Open("a:string,b:string");
+    EXPECT_TRUE(strExpected == Rendered(jRec));
 }
 
 TEST_F(Values, FiveHundredAndTwelveMembers) {
-    Json::Value jMembers(Json::objectValue);
     Json::Value jRec(Json::objectValue);
-    std::string strExpected = "(";
-    for (int i = 0; i < 512; ++i) {
-        const std::string strName = "m" + std::to_string(1000 + i);
-        jMembers[strName]["cpptype"] = i % 2 == 0 ? "int" : "string";
-        if (i % 2 == 0) {
-            jRec[strName] = i;
-            strExpected += std::to_string(i) + ",";
-        } else {
-            jRec[strName] = "v" + std::to_string(i);
-            strExpected += "'v" + std::to_string(i) + "'" + (i == 511 ? ") " : ",");
-        }
+    std::string strExpected;
+    for (const std::string& strName : ManyMembers().getMemberNames()) {
+        strExpected += (jRec.empty() ? "(" : ",") + std::to_string(jRec.size());
+        jRec[strName] = jRec.size();
     }
-    EXPECT_EQ(strExpected, Rendered(OpenMembers(jMembers, "a"), jRec));
+    strExpected += ") ";
+    OpenMembers(ManyMembers(), "a");
+    EXPECT_EQ(Rendered(jRec), strExpected);
 }
 
 TEST_F(Values, FormatterWithoutMemoryRaisesLogicErrorAndKeepsTheText) {
-    VornJsonDbApi& api = Open("a:string,b:double");
+    Open("a:string,b:double");
     Json::Value jRec(Json::objectValue);
     jRec["a"] = LongText();
     jRec["b"] = 1e300;
@@ -320,15 +323,13 @@ TEST_F(Values, FormatterWithoutMemoryRaisesLogicErrorAndKeepsTheText) {
     {
         ScarceMemory scarce(1);
         try {
-            api.SqlExpandMemberSymbol(strSql, jRec);
+            m_pHandle->SqlExpandMemberSymbol(strSql, jRec);
             ADD_FAILURE() << "no exception";
         } catch (const std::logic_error& Error) {
             EXPECT_STREQ("vornjsondb: the SQL formatter gave no text", Error.what());
         }
     }
-    EXPECT_EQ("(", strSql);
-    EXPECT_EQ(Lines{}, TakeLog());
-    EXPECT_EQ("('x',1.500000) ", Rendered(api, ParseJson(R"({"a":"x","b":1.5})")));
+    EXPECT_EQ(strSql, "(");
+    EXPECT_EQ(TakeLog(), Lines());
+    EXPECT_EQ(Rendered(ParseJson(R"({"a":"x","b":1.5})")), "('x',1.500000) ");
 }
-
-}  // namespace testhost

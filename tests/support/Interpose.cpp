@@ -12,6 +12,7 @@
 #include <cstdlib>
 #include <deque>
 
+#include "../../src/schema/KnownTables.h"
 #include "Recorder.h"
 #include "TestHost.h"
 
@@ -24,7 +25,7 @@ using SleepFunction = int (*)(unsigned);
 using ChangesFunction = int (*)(sqlite3*);
 using FreeFunction = void (*)(void*);
 
-std::vector<std::string> g_vecSql;
+Lines g_vecSql;
 std::deque<ExecFault> g_queFaults;
 std::function<void(int)> g_fnOnExec;
 RowCallback g_fnRowCallback = nullptr;
@@ -99,7 +100,7 @@ int RealExec(sqlite3* pDb, const char* szSql, int (*callback)(void*, int, char**
     return fnReal(pDb, szSql, callback, pArg, ppszError);
 }
 
-std::vector<std::string> TakeSql() {
+Lines TakeSql() {
     return std::exchange(g_vecSql, {});
 }
 
@@ -131,7 +132,13 @@ void OnPause(std::function<void(int)> fn) {
     g_fnOnPause = std::move(fn);
 }
 
+void ForgetTables() {
+    vornjsondb::KnownTables::OfProcess().Forget();
+}
+
 void ResetHost() {
+    ForgetTables();
+    errno = 0;
     blLogToStdout = false;
     blDebugOutput = false;
     FailNextExec({});

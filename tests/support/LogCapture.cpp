@@ -12,7 +12,7 @@
 namespace testhost {
 namespace {
 
-std::vector<std::string> g_vecLog;
+Lines g_vecLog;
 std::vector<SyslogCall> g_vecSyslog;
 std::function<void()> g_fnOnNextLine;
 
@@ -139,7 +139,7 @@ std::string UtilCheck(const std::string& strCondition) {
     return UtilLocated(FailedText(strCondition) + ", err=%m");
 }
 
-std::vector<std::string> TakeLog() {
+Lines TakeLog() {
     ParsePrinted();
     return std::exchange(g_vecLog, {});
 }

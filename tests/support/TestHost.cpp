@@ -74,34 +74,10 @@ std::string BareRows(sqlite3* pDb, const std::string& strSql) {
     return strRows;
 }
 
-void DbTest::SetUp() {
-    ASSERT_EQ(sqlite3_open(":memory:", &m_pDb), SQLITE_OK);
-    ResetHost();
-}
-
-void DbTest::TearDown() {
-    ResetHost();
-    EXPECT_EQ(sqlite3_close(m_pDb), SQLITE_OK);
-}
-
-void DbTest::Sql(const std::string& strSql) {
-    std::string strError;
-    ASSERT_EQ(BareExec(m_pDb, strSql, &strError), SQLITE_OK) << strSql << ": " << strError;
-}
-
-std::string DbTest::Rows(const std::string& strSql) {
-    return BareRows(m_pDb, strSql);
-}
-
 Json::Value ParseJson(const std::string& strText) {
     Json::Value jValue;
     EXPECT_TRUE(jsonhelpers::Parse(strText, jValue)) << strText;
     return jValue;
-}
-
-std::string UniqueTable() {
-    static int nTables = 0;
-    return "t" + std::to_string(++nTables);
 }
 
 std::string TempFile(const char* szStem) {

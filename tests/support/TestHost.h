@@ -20,6 +20,8 @@
 
 namespace testhost {
 
+using Lines = std::vector<std::string>;
+
 // ---- log lines ---------------------------------------------------------------------------------
 // A line in canonical form names its source ("class" for files beginning VornJsonDbApi, "util" for
 // util.cpp), its kind ("located" or "plain") and its text. "%m" stays the two characters %m.
@@ -34,7 +36,7 @@ std::string UtilPlain(const std::string& strText);
 
 // Lines since the last take, in the order in which they were written, from the system log and,
 // while a StdoutCapture lives, from standard output.
-std::vector<std::string> TakeLog();
+Lines TakeLog();
 
 struct SyslogCall {
     int nPriority;
@@ -62,7 +64,7 @@ class StdoutCapture {
 // ---- SQL ---------------------------------------------------------------------------------------
 // Text of every sqlite3_exec call since the last take. Calls that SQLite makes itself and calls of
 // the functions further down are not among them.
-std::vector<std::string> TakeSql();
+Lines TakeSql();
 
 struct ExecFault {
     int nResult;
@@ -91,24 +93,16 @@ void FakeNextChanges(int nChanges);
 std::vector<unsigned> TakePauses();
 void OnPause(std::function<void(int nPause)> fn);
 
-// Forgets everything recorded, planned faults and hooks, and sets both log flags to false.
+// Has the library forget all tables: the process is as it was when it started.
+void ForgetTables();
+
+// The same, and forgets everything recorded, planned faults and hooks; clears errno and both flags.
 void ResetHost();
 
 // ---- database ----------------------------------------------------------------------------------
 // The real sqlite3_exec, past the recorder.
 int BareExec(sqlite3* pDb, const std::string& strSql, std::string* pstrError = nullptr);
 std::string BareRows(sqlite3* pDb, const std::string& strSql);
-
-class DbTest : public ::testing::Test {
-  protected:
-    void SetUp() override;
-    void TearDown() override;
-
-    void Sql(const std::string& strSql);          // must succeed
-    std::string Rows(const std::string& strSql);  // "a|b\nc|d", NULL as "NULL"
-
-    sqlite3* m_pDb = nullptr;
-};
 
 // ---- JSON --------------------------------------------------------------------------------------
 using jsonhelpers::Compact;
@@ -119,9 +113,6 @@ using jsonhelpers::ReadLeniently;
 
 // Strict; a malformed text fails the test.
 Json::Value ParseJson(const std::string& strText);
-
-// A fresh table name per call, because the type cache is process-wide.
-std::string UniqueTable();
 
 // ---- processes and files -----------------------------------------------------------------------
 // Runs fn in a new process in which the library has not been used yet: the test executable is

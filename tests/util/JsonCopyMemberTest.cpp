@@ -1,21 +1,16 @@
 // jsonCopyMember: a merge, not a replacement.
-#include "../support/TestHost.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
-
 const char* const kDestinationCheck =
     "jIn.type() != Json::nullValue && jIn.type() != Json::objectValue";
 const char* const kSourceCheck = "jSubSet.type() != Json::objectValue";
 
-class JsonCopyMemberTest : public ::testing::Test {
+class JsonCopyMemberTest : public TableTest {
   protected:
-    void SetUp() override { ResetHost(); }
-    void TearDown() override { ResetHost(); }
-
     // Copies and checks that the source stays as it is.
     int Copy(const std::string& strSource, bool blOverwrite) {
         Json::Value jSource = ParseJson(strSource);

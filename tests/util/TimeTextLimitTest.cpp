@@ -7,11 +7,10 @@
 #include <clocale>
 #include <ctime>
 #include <string>
-#include <vector>
-
-#include <gtest/gtest.h>
 
 #include "../support/TestHost.h"
+
+using namespace testhost;
 
 namespace {
 
@@ -49,26 +48,26 @@ extern "C" size_t strftime(char* szText, size_t nMax, const char* szFormat,
 
 namespace {
 
-std::vector<std::string> LogOfARefusedText(int nType) {
-    testhost::TakeLog();
+Lines LogOfARefusedText(int nType) {
+    TakeLog();
     std::string strOut = "as it was";
     g_blWritesNothing = true;
     EXPECT_EQ(VORN_JSON_DB::convert2ReadableTime(0, strOut, nType), -1);
     g_blWritesNothing = false;
     EXPECT_EQ(strOut, "as it was");
-    return testhost::TakeLog();
+    return TakeLog();
 }
 
 TEST(TimeTextLimit, DateLayoutThatWritesNothingIsRefused) {
-    EXPECT_EQ(LogOfARefusedText(3),
-              std::vector<std::string>{testhost::UtilCheck(
-                  "0 == strftime(szTime, sizeof(szTime), \"%a, %d %b %Y %T GMT\", &sTime)")});
+    EXPECT_EQ(
+        LogOfARefusedText(3),
+        Lines{UtilCheck("0 == strftime(szTime, sizeof(szTime), \"%a, %d %b %Y %T GMT\", &sTime)")});
 }
 
 TEST(TimeTextLimit, NumericLayoutThatWritesNothingIsRefused) {
-    EXPECT_EQ(LogOfARefusedText(5),
-              std::vector<std::string>{testhost::UtilCheck(
-                  "0 == strftime(szTime, sizeof(szTime), \"%Y-%m-%d %H:%M:%S\", &sTime)")});
+    EXPECT_EQ(
+        LogOfARefusedText(5),
+        Lines{UtilCheck("0 == strftime(szTime, sizeof(szTime), \"%Y-%m-%d %H:%M:%S\", &sTime)")});
 }
 
 TEST(TimeTextLimit, NamesAreThoseThatTheLocaleOfTheHostWrites) {

@@ -3,24 +3,22 @@
 #include <ctime>
 #include <limits>
 
-#include "../support/TestHost.h"
+#include "../support/TableTest.h"
 
 using namespace testhost;
 
 namespace {
 
-using Lines = std::vector<std::string>;
-
 constexpr long kStamp = 1794742200;  // 2026-11-15 11:30:00 UTC, a Sunday
 
-class TimeTextTest : public ::testing::Test {
+class TimeTextTest : public TableTest {
   protected:
     void SetUp() override {
+        TableTest::SetUp();
         const char* szZone = std::getenv("TZ");
         m_blHadZone = szZone != nullptr;
         m_strZone = m_blHadZone ? szZone : "";
         SetZone("UTC0");
-        ResetHost();
     }
 
     void TearDown() override {
@@ -30,7 +28,7 @@ class TimeTextTest : public ::testing::Test {
             ::unsetenv("TZ");
             ::tzset();
         }
-        ResetHost();
+        TableTest::TearDown();
     }
 
     static void SetZone(const char* szZone) {
