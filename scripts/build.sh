@@ -3,11 +3,18 @@
 
 jobs=$(nproc)
 
+# Warnings are errors where changes are checked, and only there: nobody else shall be stopped by a
+# compiler that warns of more than ours.
+werror=OFF
+if [[ ${CI:-} == true ]]; then
+    werror=ON
+fi
+
 # configure NAME [CMAKE-OPTION...] makes build/NAME. Ninja and ccache are used where they are at hand.
 configure() {
     local folder=build/$1
     shift
-    local -a options=()
+    local -a options=(-DVORNJSONDB_WERROR="$werror")
     if [[ ! -e $folder/CMakeCache.txt ]] && command -v ninja >/dev/null; then
         options+=(-G Ninja)
     fi
