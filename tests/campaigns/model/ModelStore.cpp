@@ -19,7 +19,8 @@ Model::Model(sqlite3* pDb, std::string strName, Json::Value jDefinition, std::st
 // ---- statements ---------------------------------------------------------------------------------
 
 bool Model::ReadRow(sqlite3_stmt* pStatement, Json::Value& jRows) const {
-    const Json::Value& jTypes = ModelTypes(Json::Value(), m_strName);
+    const Json::Value jNoDefinition;
+    const Json::Value& jTypes = ModelTypes(jNoDefinition, m_strName);
     Json::Value jRecord(Json::objectValue);
     for (int i = 0; i < sqlite3_column_count(pStatement); ++i) {
         const std::string strName = sqlite3_column_name(pStatement, i);
