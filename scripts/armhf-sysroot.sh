@@ -3,38 +3,20 @@
 # where this machine's come from, and their signatures are checked.
 # shellcheck shell=bash
 
+source scripts/debian-archive.sh
+
 armhf_sysroot=$PWD/build/armhf-sysroot
 armhf_packages=(libsqlite3-0 libsqlite3-dev libjsoncpp25 libjsoncpp-dev libgtest-dev libgmock-dev)
 
-# Prints the first package source of this machine that is a Debian archive with the component main, as
-# one line for the 32-bit ARM packages.
-armhf_source_line() {
-    local deb822=/etc/apt/sources.list.d/debian.sources
-    if [[ -e $deb822 ]]; then
-        awk -F': *' '
-            /^#/ { next }
-            $1 == "URIs" { split($0, words, ": *"); uri = $0; sub(/^URIs: */, "", uri) }
-            $1 == "Suites" { suite = $2; sub(/ .*/, "", suite) }
-            $1 == "Signed-By" { key = $2 }
-            /^$/ { exit }
-            END { printf "deb [arch=armhf signed-by=%s] %s %s main\n", key, uri, suite }' "$deb822"
-    else
-        awk '$1 == "deb" && / main( |$)/ {
-            sub(/^deb +(\[[^]]*\] +)?/, "")
-            print "deb [arch=armhf signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] " $1 " " $2 " main"
-            exit
-        }' /etc/apt/sources.list
-    fi
-}
-
 make_armhf_sysroot() {
-    local work=$PWD/build/armhf-apt package
+    local work=$PWD/build/armhf-apt archive package
     if [[ -e $armhf_sysroot/complete ]]; then
         return 0
     fi
     rm -rf "$armhf_sysroot" "$work"
     mkdir -p "$armhf_sysroot" "$work/lists/partial" "$work/cache/archives/partial" "$work/packages"
-    armhf_source_line >"$work/armhf.list"
+    archive=$(debian_archive)
+    echo "deb [arch=armhf signed-by=$debian_keyring] $archive main" >"$work/armhf.list"
     cat >"$work/apt.conf" <<CONF
 APT::Architecture "amd64";
 APT::Architectures { "amd64"; "armhf"; };

@@ -8,7 +8,7 @@ set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
-source scripts/armhf-sysroot.sh
+source scripts/debian-archive.sh
 
 steps=("$@")
 if ((${#steps[@]} == 0)); then
@@ -55,14 +55,15 @@ run_suite() {
 # The checked containers have another layout, so that JsonCpp and GoogleTest must be built with them,
 # too: JsonCpp from Debian's source package, whose signature apt checks.
 make_checked_libraries() {
-    local prefix=$PWD/build/analysis-prefix work=$PWD/build/analysis-source flags=$1
+    local prefix=$PWD/build/analysis-prefix work=$PWD/build/analysis-source flags=$1 archive
     if [[ -e $prefix/complete ]]; then
         return 0
     fi
     need_packages dpkg-dev:dpkg-source googletest
     rm -rf "$work" "$prefix"
     mkdir -p "$work/lists/partial" "$work/cache/archives/partial" "$prefix/lib"
-    armhf_source_line | sed 's/^deb \[arch=armhf /deb-src [/' >"$work/source.list"
+    archive=$(debian_archive)
+    echo "deb-src [signed-by=$debian_keyring] $archive main" >"$work/source.list"
     (
         cd "$work"
         printf '%s\n' 'APT::Sandbox::User "root";' "Dir::State::lists \"$work/lists\";" \
