@@ -1,11 +1,11 @@
-// Reads log lines as the library writes them and gives their canonical form (see TestHost.h).
+// Reads log lines as the library writes them and gives their canonical form (see HostExits.h).
 #ifndef VORNJSONDB_TESTS_SUPPORT_CANONICALLINE_H
 #define VORNJSONDB_TESTS_SUPPORT_CANONICALLINE_H
 
 #include <string>
 #include <vector>
 
-#include "TestHost.h"
+#include "HostExits.h"
 
 namespace testhost {
 

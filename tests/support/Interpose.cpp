@@ -11,10 +11,10 @@
 #include <cstdio>
 #include <cstdlib>
 #include <deque>
+#include <utility>
 
-#include "../../src/schema/KnownTables.h"
+#include "HostExits.h"
 #include "Recorder.h"
-#include "TestHost.h"
 
 namespace testhost {
 namespace {
@@ -132,13 +132,7 @@ void OnPause(std::function<void(int)> fn) {
     g_fnOnPause = std::move(fn);
 }
 
-void ForgetTables() {
-    vornjsondb::KnownTables::OfProcess().Forget();
-}
-
-void ResetHost() {
-    ForgetTables();
-    errno = 0;
+void ResetExits() {
     blLogToStdout = false;
     blDebugOutput = false;
     FailNextExec({});

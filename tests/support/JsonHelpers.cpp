@@ -31,11 +31,16 @@ Json::Value ReadLeniently(const std::string& strText) {
 }
 
 std::string Compact(const Json::Value& jValue) {
-    Json::StreamWriterBuilder builder;
-    builder["indentation"] = "";
-    builder["commentStyle"] = "None";
-    builder["emitUTF8"] = true;
-    return Json::writeString(builder, jValue);
+    static const std::unique_ptr<Json::StreamWriter> s_pWriter = [] {
+        Json::StreamWriterBuilder builder;
+        builder["indentation"] = "";
+        builder["commentStyle"] = "None";
+        builder["emitUTF8"] = true;
+        return std::unique_ptr<Json::StreamWriter>(builder.newStreamWriter());
+    }();
+    std::ostringstream stream;
+    s_pWriter->write(jValue, &stream);
+    return stream.str();
 }
 
 std::string KindsOf(const Json::Value& jValue) {

@@ -4,10 +4,11 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
+#include <utility>
 
 #include "CanonicalLine.h"
+#include "HostExits.h"
 #include "Recorder.h"
-#include "TestHost.h"
 
 namespace testhost {
 namespace {
@@ -168,7 +169,7 @@ StdoutCapture::~StdoutCapture() {
     ::close(g_capture.nFd);
     std::fclose(g_capture.pFile);
     g_capture = Capture();
-    if (::testing::Test::HasFailure()) {
+    if (IsCapturedTextShown()) {
         std::fwrite(strAll.data(), 1, strAll.size(), stdout);
     }
 }

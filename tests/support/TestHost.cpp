@@ -3,11 +3,13 @@
 #include <sys/types.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <memory>
 
+#include "../../src/schema/KnownTables.h"
 #include "Recorder.h"
 
 namespace testhost {
@@ -54,6 +56,21 @@ class TempDirectory {
 };
 
 }  // namespace
+
+// A failed test shows it: its own messages are in it, too.
+bool IsCapturedTextShown() {
+    return ::testing::Test::HasFailure();
+}
+
+void ForgetTables() {
+    vornjsondb::KnownTables::OfProcess().Forget();
+}
+
+void ResetHost() {
+    ForgetTables();
+    ResetExits();
+    errno = 0;
+}
 
 int BareExec(sqlite3* pDb, const std::string& strSql, std::string* pstrError) {
     char* szError = nullptr;
