@@ -9,14 +9,20 @@
 #include <json/json.h>
 
 #include "../support/Campaign.h"
+#include "ModelHost.h"
 
 namespace campaign {
 
+// A condition that gives the rows of these numbers, and fails at the first other one.
+constexpr char kFailsMidway[] = "rowid < 3 or abs(-9223372036854775807 - 1 + 0 * rowid)";
+
+// What belongs to one table. strBareName is a plain SQL name that no other table has.
 class Generator {
   public:
-    Generator(Random& random, std::string strTable);
+    Generator(Random& random, const std::string& strBareName);
 
     const std::string& TableName() const { return m_strTable; }
+    const std::string& NameInSql() const { return m_strInCreate; }
     const std::string& Create() const { return m_strCreate; }
 
     // The definition that fits the table, or now and then one that is faulty.
@@ -37,14 +43,21 @@ class Generator {
         std::string strType;
     };
 
+    Json::Value Array(int nDepth);
     Json::Value Fitting(const std::string& strType);
-    void ChooseMembers();
+    void ChooseNames(const std::string& strBareName);
+    void ChooseColumns();
+    void Spoil(Json::Value& jDefinition);
 
     Random& m_random;
     std::string m_strTable;
+    std::string m_strInCreate;  // the table's name as the CREATE statement has it
     std::string m_strCreate;
     std::vector<Member> m_vecMembers;
 };
+
+// What the host does during one step. Without a connection no statement is answered with success.
+Plan AnyPlan(Random& random, bool blConnected);
 
 }  // namespace campaign
 

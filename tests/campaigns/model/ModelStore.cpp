@@ -1,263 +1,260 @@
-// The model's statements and record operations, and its time texts.
-
-#include <cstdio>
-#include <cstdlib>
-#include <memory>
+// The model's record operations.
 
 #include "Model.h"
 
 namespace campaign {
 
-Model::Model(sqlite3* pDb, std::string strName, Json::Value jDefinition, std::string strCreate)
-    : m_pDb(pDb),
-      m_strName(std::move(strName)),
-      m_jDefinition(std::move(jDefinition)),
-      m_strCreate(std::move(strCreate)) {
-    TableCreate();
-}
-
-// ---- statements ---------------------------------------------------------------------------------
-
-bool Model::ReadRow(sqlite3_stmt* pStatement, Json::Value& jRows) const {
-    const Json::Value jNoDefinition;
-    const Json::Value& jTypes = ModelTypes(jNoDefinition, m_strName);
-    Json::Value jRecord(Json::objectValue);
-    for (int i = 0; i < sqlite3_column_count(pStatement); ++i) {
-        const std::string strName = sqlite3_column_name(pStatement, i);
-        if (!jTypes.isObject() || !jTypes.isMember(strName)) {
-            return false;
-        }
-        const std::string strType = jTypes[strName]["cpptype"].asString();
-        const char* szText = reinterpret_cast<const char*>(sqlite3_column_text(pStatement, i));
-        if (szText == nullptr) {
-            continue;
-        }
-        const std::string strText = szText;
-        if (strType == "string") {
-            jRecord[strName] = strText;
-        } else if (strType == "int" || strType == "unsigned int") {
-            jRecord[strName] = static_cast<Json::Int>(std::strtol(szText, nullptr, 10));
-        } else if (strType == "long long" || strType == "unsigned long long") {
-            jRecord[strName] = static_cast<Json::Int64>(std::strtoll(szText, nullptr, 10));
-        } else if (strType == "bool") {
-            jRecord[strName] = std::strtol(szText, nullptr, 10) == 1;
-        } else if (strType.compare(0, 6, "Json::") == 0 &&
-                   (strType == "Json::Value" || strType == "Json::objectValue" ||
-                    strType == "Json::arrayValue")) {
-            const std::unique_ptr<Json::CharReader> pReader(
-                Json::CharReaderBuilder().newCharReader());
-            pReader->parse(szText, szText + strText.size(), &jRecord[strName], nullptr);
-        } else {
-            return false;
-        }
-    }
-    jRows.append(jRecord);
-    return true;
-}
-
-bool Model::RunOne(sqlite3_stmt* pStatement, Json::Value* pjRows) {
-    int nStatus = SQLITE_ROW;
-    bool blRead = true;
-    while (nStatus == SQLITE_ROW) {
-        nStatus = sqlite3_step(pStatement);
-        if (nStatus == SQLITE_ROW && pjRows != nullptr && !ReadRow(pStatement, *pjRows)) {
-            blRead = false;
-            break;
-        }
-    }
-    sqlite3_finalize(pStatement);
-    if (!blRead) {
-        m_strSqlError = "query aborted";
-        return false;
-    }
-    m_strSqlError = nStatus == SQLITE_DONE ? "" : sqlite3_errmsg(m_pDb);
-    return nStatus == SQLITE_DONE;
-}
-
-int Model::RunSql(const std::string& strSql, Json::Value* pjRows) {
-    if (strSql.empty()) {
-        m_strSqlError = "Unknow Error!!";
-        return -1;
-    }
-    m_strSqlError.clear();
-    const char* szRest = strSql.c_str();
-    while (*szRest != '\0') {
-        sqlite3_stmt* pStatement = nullptr;
-        if (sqlite3_prepare_v2(m_pDb, szRest, -1, &pStatement, &szRest) != SQLITE_OK) {
-            m_strSqlError = sqlite3_errmsg(m_pDb);
-            return -1;
-        }
-        if (pStatement != nullptr && !RunOne(pStatement, pjRows)) {
-            return -1;
-        }
-    }
-    return pjRows == nullptr ? sqlite3_changes(m_pDb) : 0;
-}
-
-int Model::Refused() {
+// The message slot tells a refused duplicate, also one that an earlier statement met.
+void Model::NoteDuplicate() {
     if (m_strSqlError.find("UNIQUE constraint failed") != std::string::npos) {
         strErrMsg = "DUPLICATE_PRIMARY_KEY";
     }
-    return -1;
 }
 
-// ---- records ------------------------------------------------------------------------------------
+// ---- save, create -------------------------------------------------------------------------------
 
-int Model::RecSave(Json::Value& jRecord, bool blCreate) {
-    Types();
-    std::string strSql = (blCreate ? "INSERT INTO " : "REPLACE INTO ") + m_strName + " (";
-    Names(strSql, &jRecord);
+bool Model::Save(Json::Value& jRecord, bool blCreate, std::string& strSql) {
+    strSql = (blCreate ? "INSERT INTO " : "REPLACE INTO ") + m_strName + " (";
+    if (Host().Fails(0 > Names(strSql, &jRecord), "0 > SqlExpandMemberName(strSql, &jRecInOut)")) {
+        return false;
+    }
     strSql += ") VALUES (";
-    if (0 > Values(strSql, jRecord)) {
-        return -1;
+    if (Host().Fails(0 > Values(strSql, jRecord), "0 > SqlExpandMemberSymbol(strSql, jRecInOut)")) {
+        return false;
     }
     strSql += ";select * from " + m_strName + " where rowid == last_insert_rowid();";
     Json::Value jRows(Json::arrayValue);
-    if (0 > RunSql(strSql, &jRows) || jRows.empty()) {
-        return -1;
+    if (Host().Fails(0 > RunSql(strSql, ModelRow, &jRows),
+                     "0 > runSqlEx(strSql, DbCallBackFillList, &jArrayTmp)") ||
+        Host().Fails(jRows.empty(), "0 == jArrayTmp.size()")) {
+        return false;
     }
     const Json::Value jStored = jRows[0];
     jRecord = jStored;
-    return 0;
+    return true;
+}
+
+int Model::RecSave(Json::Value& jRecord, bool blCreate) {
+    const Json::Value& jTypes = Types();
+    std::string strSql;
+    if (Save(jRecord, blCreate, strSql)) {
+        return 0;
+    }
+    Host().Plain("blCreate=%d, jRecInOut=%s", {blCreate ? 1 : 0, jRecord});
+    Host().Plain("jType=%s", {jTypes});
+    TellSqlError(strSql);
+    return -1;
 }
 
 int Model::RecCreate(const Json::Value& jIn, Json::Value& jOut) {
     Json::Value jRecord = jIn;
-    if (jIn.empty() || 0 > Fill(jRecord, false) || 0 > Check(jRecord) ||
-        0 > RecSave(jRecord, true)) {
-        return Refused();
+    if (Host().Fails(jIn.empty(), "jRecIn.empty()") ||
+        Host().Fails(0 > Fill(jRecord, false), "0 > fillDefaultValue(jParam, false)") ||
+        Host().Fails(0 > Check(jRecord), "0 > checkJsonType(jParam)") ||
+        Host().Fails(0 > RecSave(jRecord, true), "0 > recSave(jParam, true)")) {
+        Host().Plain("call create rec, rec=%s", {jRecord});
+        NoteDuplicate();
+        return -1;
     }
     jOut = jRecord;
     return 0;
 }
 
-int Model::RecList(const Json::Value& jQuery, Json::Value& jOut) {
+// ---- list, get one ------------------------------------------------------------------------------
+
+bool Model::Select(const Json::Value& jQuery, Json::Value& jOut, std::string& strSql) {
     std::string strWhere;
     std::string strTail;
-    if ((!jQuery.isObject() && !jQuery.isNull()) || (!jOut.isNull() && !jOut.isArray()) ||
-        0 > Conditions(jQuery, strWhere, 1) || 0 > Tail(jQuery, strTail)) {
-        return -1;
+    std::string strHead = "SELECT ";
+    if (Host().Fails(
+            !IsObjectOrNull(jQuery),
+            "jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue") ||
+        Host().Fails(
+            !jOut.isNull() && !jOut.isArray(),
+            "jRecArrayOut.type() != Json::nullValue && jRecArrayOut.type() != Json::arrayValue") ||
+        Host().Fails(0 > Conditions(jQuery, strWhere, 1),
+                     "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)") ||
+        Host().Fails(0 > Tail(jQuery, strTail),
+                     "0 > SqlFilterConditionFromJson(jRecParam, strSqlLimit)") ||
+        Host().Fails(0 > Names(strHead, nullptr), "0 > SqlExpandMemberName(strSqlPrefix)")) {
+        return false;
     }
-    std::string strSql = "SELECT ";
-    Names(strSql, nullptr);
-    strSql += " FROM " + m_strName + " " + (strWhere.empty() ? "" : " WHERE " + strWhere);
-    return RunSql(strSql + strTail + ";", &jOut) < 0 ? -1 : 0;
+    strSql = strHead + " FROM " + m_strName + " ";
+    strSql += strWhere.empty() ? "" : " WHERE " + strWhere;
+    strSql += strTail + ";";
+    return !Host().Fails(0 > RunSql(strSql, ModelRow, &jOut),
+                         "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)");
+}
+
+int Model::RecList(const Json::Value& jQuery, Json::Value& jOut) {
+    std::string strSql;
+    if (Select(jQuery, jOut, strSql)) {
+        return 0;
+    }
+    Host().Plain("jRecParam=%s", {jQuery});
+    TellSqlError(strSql);
+    return -1;
 }
 
 int Model::RecGetOne(const Json::Value& jQuery, Json::Value& jOut) {
     Json::Value jRows(Json::arrayValue);
-    if (0 > RecList(jQuery, jRows)) {
+    if (Host().Fails(0 > RecList(jQuery, jRows), "0 > recList(jRecParam, jRecArray)")) {
         return -1;
     }
     if (jRows.empty()) {
         return 0;
     }
-    return ModelCopyMember(jOut, jRows[0], true) < 0 ? -1 : 1;
+    return Host().Fails(0 > ModelCopyMember(jOut, jRows[0], true),
+                        "0 > jsonCopyMember(jRecOut, jRecArray[0], true)")
+               ? -1
+               : 1;
 }
 
-int Model::RecUpdateByWhere(const Json::Value& jNew, const std::string& strWhere) {
-    if (strWhere.empty() || jNew.empty()) {
-        return -1;
+// ---- update -------------------------------------------------------------------------------------
+
+bool Model::UpdateByWhere(const Json::Value& jNew, const std::string& strWhere,
+                          std::string& strSql) {
+    if (Host().Fails(strWhere.empty(), "strSqlWhere.empty()") ||
+        Host().Fails(jNew.empty(), "jRecIn.empty()")) {
+        return false;
     }
+    strSql = "UPDATE " + m_strName + " SET ";
     Json::Value jColumns = jNew;
     if (jColumns.isObject()) {
         jColumns.removeMember("vornSqlWhereFilter");
     }
     std::string strSet;
-    if (0 > Conditions(jColumns, strSet, 2)) {
-        return -1;
+    if (Host().Fails(0 > Conditions(jColumns, strSet, 2),
+                     "0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA)")) {
+        return false;
     }
-    const std::string strSql =
-        "UPDATE " + m_strName + " SET " + strSet + " WHERE " + strWhere + ";";
-    return RunSql(strSql, nullptr) < 0 ? -1 : 0;
+    strSql += strSet + " WHERE " + strWhere + ";";
+    return !Host().Fails(0 > RunSql(strSql), "0 > runSqlEx(strSql, NULL, NULL)");
+}
+
+int Model::RecUpdateByWhere(const Json::Value& jNew, const std::string& strWhere) {
+    std::string strSql;
+    if (UpdateByWhere(jNew, strWhere, strSql)) {
+        return 0;
+    }
+    Host().Plain("jRecIn=%s", {jNew});
+    TellSqlError(strSql);
+    return -1;
+}
+
+bool Model::UpdateByFilter(const Json::Value& jQuery, const Json::Value& jNew) {
+    std::string strWhere;
+    return !Host().Fails(jQuery.empty(), "jFilterIn.empty()") &&
+           !Host().Fails(jQuery.type() != Json::objectValue,
+                         "jFilterIn.type() != Json::objectValue") &&
+           !Host().Fails(jNew.type() != Json::objectValue,
+                         "jParamIn.type() != Json::objectValue") &&
+           !Host().Fails(0 > Conditions(jQuery, strWhere, 1),
+                         "0 > SqlExpandMemberList(jFilterIn, strSql, VORN_SQL_WHERE_TYPE_AND)") &&
+           !Host().Fails(strWhere.empty(), "strSql.empty()") &&
+           !Host().Fails(0 > Check(jNew), "0 > checkJsonType(jParamIn)") &&
+           !Host().Fails(0 > RecUpdateByWhere(jNew, strWhere),
+                         "0 > recUpdateByWhere(jParamIn, strSql)");
 }
 
 int Model::RecUpdateByFilter(const Json::Value& jQuery, const Json::Value& jNew) {
-    std::string strWhere;
-    if (jQuery.empty() || !jQuery.isObject() || !jNew.isObject() ||
-        0 > Conditions(jQuery, strWhere, 1) || strWhere.empty() || 0 > Check(jNew) ||
-        0 > RecUpdateByWhere(jNew, strWhere)) {
-        return Refused();
+    if (UpdateByFilter(jQuery, jNew)) {
+        return 0;
     }
-    return 0;
+    Host().Plain("recUpdateByFilter failed, jParamIn=%s", {jNew});
+    NoteDuplicate();
+    return -1;
+}
+
+// ---- delete -------------------------------------------------------------------------------------
+
+int Model::Delete(const Json::Value& jQuery, bool blAllowAll, std::string& strSql) {
+    std::string strWhere;
+    if (Host().Fails(jQuery.type() != Json::objectValue, "jRecParam.type() != Json::objectValue") ||
+        Host().Fails(0 > Conditions(jQuery, strWhere, 1),
+                     "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)") ||
+        Host().Fails(strWhere.empty() && !blAllowAll, "strSql.empty()")) {
+        return -1;
+    }
+    strSql = "DELETE FROM " + m_strName + " ";
+    strSql += strWhere.empty() ? ";" : " WHERE " + strWhere + ";";
+    const int nDeleted = RunSql(strSql);
+    if (Host().Fails(0 > nDeleted, "0 > (err = runSqlEx(strSqlRun))")) {
+        return -1;
+    }
+    Host().Debug("delete rec number=%d", {nDeleted});
+    return nDeleted;
 }
 
 int Model::RecDelete(const Json::Value& jQuery, bool blAllowAll) {
-    std::string strWhere;
-    if (!jQuery.isObject() || 0 > Conditions(jQuery, strWhere, 1) ||
-        (strWhere.empty() && !blAllowAll)) {
-        return -1;
-    }
-    const std::string strSql =
-        "DELETE FROM " + m_strName + " " + (strWhere.empty() ? "" : " WHERE " + strWhere) + ";";
-    return RunSql(strSql, nullptr);
+    std::string strSql;
+    const int nDeleted = Delete(jQuery, blAllowAll, strSql);
+    TellSqlError(strSql);
+    return nDeleted;
 }
 
-int Model::ToList(const std::vector<std::string>& vecValues, const char* szKey, Json::Value& jOut) {
-    if ((!jOut.isObject() && !jOut.isNull()) || szKey == nullptr || szKey[0] == '\0') {
+int Model::ToList(const std::vector<std::string>& vecValues, const char* szKey,
+                  Json::Value& jOut) const {
+    if (Host().Fails(
+            !IsObjectOrNull(jOut),
+            "jParamOut.type() != Json::objectValue && jParamOut.type() != Json::nullValue") ||
+        Host().Fails(szKey == nullptr || szKey[0] == '\0', "!szKey || !szKey[0]")) {
         return -1;
     }
-    jOut[szKey] = Json::Value(Json::arrayValue);
+    Json::Value jList(Json::arrayValue);
     for (const std::string& strValue : vecValues) {
-        jOut[szKey].append(strValue);
+        jList.append(strValue);
     }
+    jOut[szKey] = jList;
     return 0;
+}
+
+int Model::DeleteByArray(const std::vector<std::string>& vecValues, const char* szKey) {
+    const Json::Value& jTypes = Types();
+    Json::Value jQuery(Json::objectValue);
+    if (Host().Fails(vecValues.empty(), "0 >= strVector.size()") ||
+        Host().Fails(szKey == nullptr || szKey[0] == '\0', "!szKey || !szKey[0]") ||
+        Host().Fails(!Has(jTypes, szKey), "!jType.isMember(szKey)") ||
+        Host().Fails(jTypes[szKey]["cpptype"].asString() != "string",
+                     R"(jType[szKey]["cpptype"].asString() != "string")") ||
+        Host().Fails(0 > ToList(vecValues, szKey, jQuery),
+                     "0 > VectorParamToJson(strVector, szKey, jParam)")) {
+        return -1;
+    }
+    const int nDeleted = RecDelete(jQuery, false);
+    return Host().Fails(0 > nDeleted, "0 > (err = recDelete(jParam))") ? -1 : nDeleted;
 }
 
 int Model::RecDeleteByArray(const std::vector<std::string>& vecValues, const char* szKey) {
+    const int nDeleted = DeleteByArray(vecValues, szKey);
+    if (nDeleted < 0) {
+        std::string strValues;
+        for (const std::string& strValue : vecValues) {
+            strValues += (&strValue == vecValues.data() ? "" : ",") + strValue;
+        }
+        Host().Plain("recDeleteByArray failed, name=%s, strVector=%s", {szKey, strValues});
+    }
+    return nDeleted;
+}
+
+int Model::DeleteByName(const std::string& strValue, const char* szKey) {
     const Json::Value& jTypes = Types();
-    if (vecValues.empty() || szKey == nullptr || szKey[0] == '\0' || !jTypes.isObject() ||
-        !jTypes.isMember(szKey) || jTypes[szKey]["cpptype"].asString() != "string") {
+    if (Host().Fails(strValue.empty(), "strValue.empty()") ||
+        Host().Fails(szKey == nullptr || szKey[0] == '\0', "!szKey || !szKey[0]") ||
+        Host().Fails(!Has(jTypes, szKey), "!jType.isMember(szKey)")) {
         return -1;
     }
-    Json::Value jQuery;
-    ToList(vecValues, szKey, jQuery);
-    return RecDelete(jQuery, false);
+    const int nDeleted = RecDeleteByArray({strValue}, szKey);
+    return Host().Fails(0 > nDeleted, "0 > (err = recDeleteByArray(strVector, szKey))") ? -1
+                                                                                        : nDeleted;
 }
 
 int Model::RecDeleteByName(const std::string& strValue, const char* szKey) {
-    Types();
-    return strValue.empty() ? -1 : RecDeleteByArray({strValue}, szKey);
-}
-
-// ---- time texts ---------------------------------------------------------------------------------
-
-int ModelTimeText(long nStamp, std::string& strOut, int nType) {
-    if ((nType & 6) == 0) {
-        return -1;
+    const int nDeleted = DeleteByName(strValue, szKey);
+    if (nDeleted < 0) {
+        Host().Plain("recDeleteByName failed, name=%s, strValue=%s", {szKey, strValue});
     }
-    const long long nLocal = static_cast<long long>(nStamp) + ((nType & 1) != 0 ? 0 : 3600);
-    long long nDay = nLocal / 86400;
-    const int nSecond = static_cast<int>(nLocal % 86400);
-    const int nWeekDay = static_cast<int>((nDay + 4) % 7);
-    int nYear = 1970;
-    const auto IsLeap = [](int n) { return (n % 4 == 0 && n % 100 != 0) || n % 400 == 0; };
-    while (nDay >= (IsLeap(nYear) ? 366 : 365)) {
-        nDay -= IsLeap(nYear++) ? 366 : 365;
-    }
-    const int anDays[] = {31, IsLeap(nYear) ? 29 : 28, 31, 30, 31, 30, 31, 31, 30, 31, 30, 31};
-    int nMonth = 0;
-    while (nDay >= anDays[nMonth]) {
-        nDay -= anDays[nMonth++];
-    }
-    char szClock[32];
-    char szOut[96];
-    std::snprintf(szClock, sizeof(szClock), "%02d:%02d:%02d", nSecond / 3600, nSecond / 60 % 60,
-                  nSecond % 60);
-    if ((nType & 2) != 0) {
-        const std::string strDays = "SunMonTueWedThuFriSat";
-        const std::string strMonths = "JanFebMarAprMayJunJulAugSepOctNovDec";
-        std::snprintf(szOut, sizeof(szOut), "%s, %02d %s %d %s GMT",
-                      strDays.substr(static_cast<std::size_t>(nWeekDay) * 3, 3).c_str(),
-                      static_cast<int>(nDay) + 1,
-                      strMonths.substr(static_cast<std::size_t>(nMonth) * 3, 3).c_str(), nYear,
-                      szClock);
-    } else {
-        std::snprintf(szOut, sizeof(szOut), "%d-%02d-%02d %s", nYear, nMonth + 1,
-                      static_cast<int>(nDay) + 1, szClock);
-    }
-    strOut = szOut;
-    return 0;
+    return nDeleted;
 }
 
 }  // namespace campaign

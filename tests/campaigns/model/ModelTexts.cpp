@@ -1,26 +1,13 @@
-// The model's texts: types, checks, conditions, value lists.
+// The model's SQL texts: names, values, conditions, the tail of a SELECT.
 
-#include <cstdio>
 #include <map>
+#include <set>
 
 #include "Model.h"
 
 namespace campaign {
 
 namespace {
-
-bool Has(const Json::Value& jValue, const std::string& strName) {
-    return jValue.isObject() && jValue.isMember(strName);
-}
-
-bool IsOneOf(const std::string& strText, const std::vector<std::string>& vecTexts) {
-    for (const std::string& strOne : vecTexts) {
-        if (strOne == strText) {
-            return true;
-        }
-    }
-    return false;
-}
 
 // Takes ownership of a text of SQLite's.
 std::string Taken(char* szText) {
@@ -33,148 +20,15 @@ std::string Escaped(const std::string& strText) {
     return Taken(sqlite3_mprintf("%q", strText.c_str()));
 }
 
-const std::vector<std::string> kJsonTypes = {"Json::Value", "Json::objectValue",
-                                             "Json::arrayValue"};
-
-}  // namespace
-
-// ---- types --------------------------------------------------------------------------------------
-
-Json::Value& ModelTypes(const Json::Value& jDefinition, const std::string& strName) {
-    static std::map<std::string, Json::Value> s_types;
-    if (s_types.count(strName) > 0) {
-        return s_types[strName];
-    }
-    Json::Value& jEntry = s_types[strName];
-    if (!Has(jDefinition, strName) || !Has(jDefinition[strName], "member") ||
-        !jDefinition[strName]["member"].isObject() || strName.empty()) {
-        return jEntry;
-    }
-    const Json::Value& jMembers = jDefinition[strName]["member"];
-    for (const std::string& strMember : jMembers.getMemberNames()) {
-        if (!Has(jMembers[strMember], "cpptype") || !jMembers[strMember]["cpptype"].isString()) {
-            break;
-        }
-        jEntry[strMember]["cpptype"] = jMembers[strMember]["cpptype"];
-        if (Has(jMembers[strMember], "cppDefaultValue")) {
-            jEntry[strMember]["cppDefaultValue"] = jMembers[strMember]["cppDefaultValue"];
-        }
-    }
-    return jEntry;
-}
-
-int ModelCopyMember(Json::Value& jIn, const Json::Value& jSubSet, bool blOverwrite) {
-    if ((!jIn.isNull() && !jIn.isObject()) || !jSubSet.isObject()) {
-        return -1;
-    }
-    for (const std::string& strName : jSubSet.getMemberNames()) {
-        if (blOverwrite || !Has(jIn, strName)) {
-            jIn[strName] = jSubSet[strName];
-        }
-    }
-    return 0;
-}
-
-// ---- JSON text ----------------------------------------------------------------------------------
-
-namespace {
-
-std::string QuotedText(const std::string& strText) {
-    std::string strOut = "\"";
-    for (const char c : strText) {
-        static const std::map<char, std::string> s_named = {
-            {'"', "\\\""}, {'\\', "\\\\"}, {'\b', "\\b"}, {'\f', "\\f"},
-            {'\n', "\\n"}, {'\r', "\\r"},  {'\t', "\\t"}};
-        const auto named = s_named.find(c);
-        if (named != s_named.end()) {
-            strOut += named->second;
-        } else if (static_cast<unsigned char>(c) < 0x20) {
-            char szCode[8];
-            std::snprintf(szCode, sizeof(szCode), "\\u%04x", static_cast<unsigned>(c));
-            strOut += szCode;
-        } else {
-            strOut += c;
-        }
-    }
-    return strOut + "\"";
+bool IsJsonType(const std::string& strType) {
+    static const std::set<std::string> s_types = {"Json::Value", "Json::objectValue",
+                                                  "Json::arrayValue"};
+    return s_types.count(strType) > 0;
 }
 
 }  // namespace
-
-std::string ModelText(const Json::Value& jValue) {
-    std::string strOut;
-    if (jValue.isString()) {
-        return QuotedText(jValue.asString());
-    }
-    if (jValue.isArray()) {
-        for (const Json::Value& jElement : jValue) {
-            strOut += (strOut.empty() ? "" : ",") + ModelText(jElement);
-        }
-        return "[" + strOut + "]";
-    }
-    if (jValue.isObject()) {
-        for (const std::string& strName : jValue.getMemberNames()) {
-            strOut += (strOut.empty() ? "" : ",") + QuotedText(strName) + ":" +
-                      ModelText(jValue[strName]);
-        }
-        return "{" + strOut + "}";
-    }
-    return jValue.isNull() ? "null" : jValue.asString();
-}
-
-// ---- records ------------------------------------------------------------------------------------
-
-int Model::Check(const Json::Value& jParam) const {
-    const Json::Value& jTypes = Types();
-    if (!jParam.isObject()) {
-        return -1;
-    }
-    for (const std::string& strName : jParam.getMemberNames()) {
-        if (!Has(jTypes, strName)) {
-            continue;
-        }
-        const std::string strType = jTypes[strName]["cpptype"].asString();
-        const Json::Value& jValue = jParam[strName];
-        const bool blFits =
-            (IsOneOf(strType, {"int", "long long", "uid_t", "time_t"}) && jValue.isIntegral()) ||
-            (strType == "bool" && jValue.isBool()) || (strType == "string" && jValue.isString()) ||
-            (strType == "Json::arrayValue" && jValue.isArray()) ||
-            (strType == "Json::objectValue" && jValue.isObject());
-        if (!blFits) {
-            return -1;
-        }
-    }
-    return 0;
-}
-
-int Model::Fill(Json::Value& jParam, bool blStrict) const {
-    const Json::Value& jTypes = Types();
-    if (!jTypes.isObject()) {
-        return 0;
-    }
-    for (const std::string& strName : jTypes.getMemberNames()) {
-        if (Has(jParam, strName)) {
-            continue;
-        }
-        if (blStrict) {
-            return -1;
-        }
-        if (jTypes[strName].isMember("cppDefaultValue") && (jParam.isNull() || jParam.isObject())) {
-            jParam[strName] = jTypes[strName]["cppDefaultValue"];
-        }
-    }
-    return 0;
-}
 
 // ---- value lists --------------------------------------------------------------------------------
-
-std::vector<std::string> Model::Declared() const {
-    if (!Has(m_jDefinition, m_strName) || !Has(m_jDefinition[m_strName], "member") ||
-        !m_jDefinition[m_strName]["member"].isObject()) {
-        return {};
-    }
-    return m_jDefinition[m_strName]["member"].getMemberNames();
-}
 
 int Model::Names(std::string& strSql, const Json::Value* pjRecord) const {
     const std::vector<std::string> vecNames = Declared();
@@ -188,29 +42,15 @@ int Model::Names(std::string& strSql, const Json::Value* pjRecord) const {
 
 namespace {
 
-// Whether the text would be formatted as it is meant: every percent sign before the last conversion
-// is doubled.
-bool IsSafeFormat(const std::string& strFormat, std::size_t nSpecifier) {
-    for (std::size_t i = 0; i < nSpecifier; ++i) {
-        if (strFormat[i] != '%') {
-            continue;
-        }
-        if (strFormat[i + 1] != '%') {
-            return false;
-        }
-        ++i;
-    }
-    return true;
-}
-
-// The whole text is the format of the next value, as documented. Throws what JsonCpp throws.
+// The next value is formatted as strType asks. Throws what JsonCpp throws.
 std::string Formatted(const std::string& strFormat, const std::string& strType,
                       const Json::Value& jValue) {
+    static const std::set<std::string> s_signed = {"long long", "int", "long", "bool"};
     const char* szFormat = strFormat.c_str();
     if (strType == "string") {
         return Taken(sqlite3_mprintf(szFormat, jValue.asString().c_str()));
     }
-    if (IsOneOf(strType, {"long long", "int", "long", "bool"})) {
+    if (s_signed.count(strType) > 0) {
         return Taken(sqlite3_mprintf(szFormat, static_cast<sqlite3_int64>(jValue.asInt64())));
     }
     if (strType.compare(0, 8, "unsigned") == 0) {
@@ -222,7 +62,23 @@ std::string Formatted(const std::string& strFormat, const std::string& strType,
     if (strType == "double") {
         return Taken(sqlite3_mprintf(szFormat, jValue.asDouble()));
     }
-    return Taken(sqlite3_mprintf(szFormat, ModelText(jValue).c_str()));
+    return Taken(sqlite3_mprintf(szFormat, Compact(jValue).c_str()));
+}
+
+// Whether formatting the text so far, which a specifier follows, has a defined result: each percent
+// sign is followed by another. A NUL byte ends the format.
+bool IsDefined(const std::string& strText, const std::string& strSpecifier) {
+    const std::string strFormat = (strText + strSpecifier).c_str();
+    for (std::size_t i = 0; i < strText.size() && i < strFormat.size(); ++i) {
+        if (strFormat[i] != '%') {
+            continue;
+        }
+        if (strFormat[i + 1] != '%') {
+            return false;
+        }
+        ++i;
+    }
+    return true;
 }
 
 }  // namespace
@@ -238,21 +94,27 @@ int Model::Values(std::string& strSql, const Json::Value& jRecord) const {
     const std::vector<std::string> vecNames = Declared();
     std::string strText = strSql;
     for (std::size_t i = 0; i < vecNames.size(); ++i) {
-        if (!Has(jTypes, vecNames[i])) {
+        const std::string& strKey = vecNames[i];
+        if (Host().Fails(!Has(jTypes, strKey), "!jType.isMember(strKey)")) {
             return -1;
         }
-        if (!Has(jRecord, vecNames[i])) {
+        if (!Has(jRecord, strKey)) {
             continue;
         }
-        const std::string strType = jTypes[vecNames[i]]["cpptype"].asString();
+        const std::string strType = jTypes[strKey]["cpptype"].asString();
         const auto specifier = s_specifiers.find(strType);
-        if (specifier == s_specifiers.end() ||
-            !IsSafeFormat(strText + specifier->second, strText.size())) {
+        if (specifier == s_specifiers.end()) {
+            Host().Located("cannot support this type=%s", {strType});
+            return -1;
+        }
+        if (!IsDefined(strText, specifier->second)) {
+            Host().FailsInOwnWords();
             return -1;
         }
         try {
-            strText = Formatted(strText + specifier->second, strType, jRecord[vecNames[i]]);
+            strText = Formatted(strText + specifier->second, strType, jRecord[strKey]);
         } catch (const Json::Exception&) {
+            Host().Located("type failed, strKey=%s, jRecParam=%s", {strKey, jRecord});
             return -1;
         }
         strText += i + 1 < vecNames.size() ? "," : ") ";
@@ -263,60 +125,76 @@ int Model::Values(std::string& strSql, const Json::Value& jRecord) const {
 
 // ---- conditions ---------------------------------------------------------------------------------
 
-namespace {
-
-// One value after "=" or in a list. Throws what JsonCpp throws.
-std::string Rendered(const std::string& strType, const Json::Value& jValue, bool blInList) {
-    if (strType == "string") {
-        return "'" + Escaped(jValue.asString()) + "'";
-    }
-    if (IsOneOf(strType, kJsonTypes)) {
-        return "'" + Escaped(ModelText(jValue)) + "'";
-    }
-    if (strType == "bool" && !blInList) {
-        return std::to_string(jValue.asInt());
-    }
-    return Escaped(jValue.asString());
-}
-
-}  // namespace
-
 int Model::Match(const std::string& strField, const Json::Value& jValue,
                  std::string& strOut) const {
     const Json::Value& jTypes = Types();
-    if (!Has(jTypes, strField)) {
+    if (Host().Fails(!Has(jTypes, strField), "!jType.isMember(strField)")) {
         return -1;
     }
+    const std::string strType = jTypes[strField]["cpptype"].asString();
+    std::string strValue;
     try {
-        strOut += strField + "=" + Rendered(jTypes[strField]["cpptype"].asString(), jValue, false);
+        if (strType == "string") {
+            strValue = "'" + Escaped(jValue.asString()) + "'";
+        } else if (IsJsonType(strType)) {
+            strValue = "'" + Escaped(Compact(jValue)) + "'";
+        } else if (strType == "bool") {
+            strValue = std::to_string(jValue.asInt());
+        } else {
+            strValue = Escaped(jValue.asString());
+        }
     } catch (const Json::Exception&) {
+        Host().Fails(true, strType == "bool"
+                               ? R"(NULL == (szSql = sqlite3_mprintf("%d", jParam.asInt())))"
+                               : "NULL == (szSql = sqlite3_mprintf(\"%q\", "
+                                 "jParam.asString().c_str()))");
         return -1;
     }
+    strOut += std::string(strField).append("=").append(strValue);
     return 0;
 }
 
 int Model::List(const char* szField, const Json::Value& jList, std::string& strOut) const {
     const Json::Value& jTypes = Types();
-    if (szField == nullptr || szField[0] == '\0' || !Has(jTypes, szField) || !jList.isArray()) {
+    if (Host().Fails(szField == nullptr || szField[0] == '\0', "!szField || !szField[0]") ||
+        Host().Fails(!Has(jTypes, szField), "!jType.isMember(szField)")) {
         return -1;
     }
-    std::string strElements;
-    try {
-        for (const Json::Value& jElement : jList) {
-            strElements += Rendered(jTypes[szField]["cpptype"].asString(), jElement, true);
+    const std::string strType = jTypes[szField]["cpptype"].asString();
+    if (Host().Fails(jList.type() != Json::arrayValue, "jList.type() != Json::arrayValue")) {
+        return -1;
+    }
+    std::string strList;
+    for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
+        const Json::Value& jElement = jList[i];  // null where the array has a hole
+        strList += i == 0 ? std::string(szField) + " in (" : "";
+        try {
+            if (strType == "string") {
+                strList += "'" + Escaped(jElement.asString()) + "'";
+            } else if (IsJsonType(strType)) {
+                strList += "'" + Escaped(Compact(jElement)) + "'";
+            } else {
+                strList += Escaped(jElement.asString());
+            }
+        } catch (const Json::Exception&) {
+            Host().Fails(true,
+                         "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
+            return -1;
         }
-    } catch (const Json::Exception&) {
-        return -1;
     }
-    if (!jList.empty()) {
-        strOut += std::string(szField) + " in (" + strElements + " )";
-    }
+    strOut += strList.empty() ? "" : strList + " )";
     return 0;
 }
 
 int Model::Conditions(const Json::Value& jQuery, std::string& strOut, int nMode) const {
     const Json::Value& jTypes = Types();
-    if ((!jQuery.isObject() && !jQuery.isNull()) || nMode < 0 || nMode > 2) {
+    if (Host().Fails(
+            !IsObjectOrNull(jQuery),
+            "jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue")) {
+        return -1;
+    }
+    if (nMode < 0 || nMode > 2) {
+        Host().Located("error andType=%d", {nMode});
         return -1;
     }
     const char* const aszJoiners[] = {" or ", " and ", " , "};
@@ -330,12 +208,18 @@ int Model::Conditions(const Json::Value& jQuery, std::string& strOut, int nMode)
         strOut += blWritten ? aszJoiners[nMode] : (nMode < 2 ? " (" : "");
         blWritten = true;
         if (blFilter) {
-            if (!jValue.isString()) {
+            if (Host().Fails(!jValue.isString(), "!jRecParam[jmFieldName[i]].isString()")) {
                 return -1;
             }
             strOut += " " + jValue.asString() + " ";
-        } else if (0 > (jValue.isArray() ? List(strName.c_str(), jValue, strOut)
-                                         : Match(strName, jValue, strOut))) {
+        } else if (jValue.isArray()) {
+            if (Host().Fails(
+                    0 > List(strName.c_str(), jValue, strOut),
+                    "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)")) {
+                return -1;
+            }
+        } else if (Host().Fails(0 > Match(strName, jValue, strOut),
+                                "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)")) {
             return -1;
         }
     }
@@ -343,22 +227,25 @@ int Model::Conditions(const Json::Value& jQuery, std::string& strOut, int nMode)
     return blWritten ? 0 : 1;
 }
 
-int Model::Tail(const Json::Value& jQuery, std::string& strOut) {
-    if (!jQuery.isObject() && !jQuery.isNull()) {
+// ---- the tail of a SELECT -----------------------------------------------------------------------
+
+int Model::Tail(const Json::Value& jQuery, std::string& strOut) const {
+    if (Host().Fails(!IsObjectOrNull(jQuery),
+                     "jFilter.type() != Json::objectValue && jFilter.type() != Json::nullValue")) {
         return -1;
     }
-    if (jQuery.isMember("sort_by")) {
-        if (!jQuery["sort_by"].isString()) {
+    if (Has(jQuery, "sort_by")) {
+        if (Host().Fails(!jQuery["sort_by"].isString(), "!szSql")) {
             return -1;
         }
         strOut += " order by '" + Escaped(jQuery["sort_by"].asString()) + "'";
-        if (jQuery.isMember("sort_direction")) {
+        if (Has(jQuery, "sort_direction")) {
             strOut += jQuery["sort_direction"] == Json::Value("desc") ? " DESC" : " ASC";
         }
     }
-    if (jQuery.isMember("limit")) {
-        strOut += " LIMIT " + ModelText(jQuery["limit"]);
-        strOut += jQuery.isMember("offset") ? " OFFSET " + ModelText(jQuery["offset"]) : "";
+    if (Has(jQuery, "limit")) {
+        strOut += " LIMIT " + Compact(jQuery["limit"]);
+        strOut += Has(jQuery, "offset") ? " OFFSET " + Compact(jQuery["offset"]) : "";
     }
     return 0;
 }
