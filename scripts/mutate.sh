@@ -1,13 +1,18 @@
 #!/usr/bin/env bash
-# Changes one operator, constant, character of a text, condition or statement of src/ at a time, and
-# runs the tests against each changed library: a change that no test notices is a survivor. Nothing
-# in src/ is touched.
+# Changes one thing in src/ at a time, and runs the tests against each changed library: a change that
+# no test notices is a survivor, and fails the check. Nothing in src/ is touched.
 #
-#    scripts/mutate.sh [--count N] [--seconds N] [--seed N] [--only TEXT] [--lines]
+#    scripts/mutate.sh [--count N | --all] [--seconds N] [--seed N] [--only TEXT] [--kind KIND]
+#                      [--lines] [--record]
 #
 # Without an option 12 changes are tried, for 90 seconds at most. --only keeps the files whose name
-# holds TEXT; --lines lists all possible changes and tries none. Survivors that cannot be told apart
-# from the original stand in tests/mutants/equivalent.txt, each with its reason; any other fails.
+# holds TEXT; --kind keeps "structure" (statements, conditions and calls that are dropped, doubled,
+# exchanged or moved), "text" (characters of texts) or "other" (operators, numbers, conditions).
+# --lines lists the changes and tries none; --record puts the figures into docs/reliability.md.
+#
+# The seed, which decides what is drawn, comes from the commit if it is not given.
+#
+# A change that nobody can tell from the original is marked at its line, see scripts/mutants.py.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -18,4 +23,5 @@ configure mutate -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPL
     -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
 build_quietly mutate vornjsondb_tests
 
-exec python3 scripts/mutate.py --folder build/mutate --jobs "$jobs" "$@"
+seed=$(git rev-parse --short=7 HEAD 2>/dev/null || echo 1)
+exec python3 scripts/mutate.py --folder build/mutate --jobs "$jobs" --seed "$((16#$seed))" "$@"

@@ -69,7 +69,9 @@ TEST_F(RowValues, IntFollowsTheRulesOfTheCLibrary) {
         ExpectRead(szType, "12abc", Json::Value(Json::Int(12)));
         ExpectRead(szType, "3.9", Json::Value(Json::Int(3)));
         ExpectRead(szType, "010", Json::Value(Json::Int(10)));
+        ExpectRead(szType, " 010", Json::Value(Json::Int(10)));
         ExpectRead(szType, "0x10", Json::Value(Json::Int(0)));
+        ExpectRead(szType, "+0x10", Json::Value(Json::Int(0)));
         ExpectRead(szType, "abc", Json::Value(Json::Int(0)));
         ExpectRead(szType, "", Json::Value(Json::Int(0)));
         ExpectRead(szType, "2147483647", Json::Value(Json::Int(2147483647)));
