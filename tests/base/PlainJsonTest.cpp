@@ -202,6 +202,7 @@ TEST(PlainJson, ValuesOutOfTheOrdinaryAreLeftToJsonCpp) {
         ReadLeniently("{\"a\\\"b\":1}"),
         ReadLeniently("[[1,[2.5]]]"),
         ReadLeniently("[[[[[[[[[1]]]]]]]]]"),
+        ReadLeniently(R"({"a":{"a":{"a":{"a":{"a":{"a":{"a":{"a":{"a":1}}}}}}}}})"),
     };
     for (const Json::Value& jValue : jOthers) {
         std::string strWritten;

@@ -50,6 +50,9 @@ namespace {
 
 class JsonMemoryTest : public TableTest {
   protected:
+    // The member of the one row that the callback makes of the text, once it has memory for it.
+    Json::Value ReadWhileMemoryFails(std::string strMember, std::string strText);
+
     // Runs the call while each of its allocations fails in turn, until none does. Returns how
     // often it threw; any exception but std::bad_alloc fails the test.
     static int ThrowsOutOf(const std::function<void()>& Call) {
@@ -134,13 +137,11 @@ TEST_F(JsonMemoryTest, DeleteByNameThrowsBadAllocOnly) {
     EXPECT_GT(ThrowsOutOf([&] { m_pHandle->recDeleteByName(strValue, "name"); }), 0);
 }
 
-TEST_F(JsonMemoryTest, RowWithoutMemoryIsRefusedWithOneLine) {
+Json::Value JsonMemoryTest::ReadWhileMemoryFails(std::string strMember, std::string strText) {
     Listed();
     const RowCallback fnCallback = LastRowCallback();
-    char szName[] = "name";
-    char* aszNames[] = {szName};
-    std::string strLong = m_strLong;
-    char* aszTexts[] = {strLong.data()};
+    char* aszNames[] = {strMember.data()};
+    char* aszTexts[] = {strText.data()};
     Json::Value jRows(Json::arrayValue);
     int nRefused = 0;
     int nResult = -1;
@@ -156,7 +157,20 @@ TEST_F(JsonMemoryTest, RowWithoutMemoryIsRefusedWithOneLine) {
         }
     }
     EXPECT_GT(nRefused, 0);
-    EXPECT_EQ(jRows[0]["name"].asString(), m_strLong);
+    return jRows[0][strMember];
+}
+
+TEST_F(JsonMemoryTest, RowWithoutMemoryIsRefusedWithOneLine) {
+    EXPECT_EQ(ReadWhileMemoryFails("name", m_strLong), Json::Value(m_strLong));
+}
+
+TEST_F(JsonMemoryTest, JsonTextWithoutMemoryIsRefusedLikeAnyOther) {
+    Open("j:Json::Value");
+    // At first memory fails while the reader is made, then while it reads.
+    for (int i = 0; i < 2; ++i) {
+        const Json::Value jRead = ReadWhileMemoryFails("j", "[\"\\t" + m_strLong + "\"]");
+        EXPECT_EQ(jRead[0], Json::Value("\t" + m_strLong));
+    }
 }
 
 TEST_F(JsonMemoryTest, SortedListAndGetThrowBadAllocOnly) {
