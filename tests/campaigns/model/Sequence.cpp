@@ -125,7 +125,7 @@ class Sequence {
 
     // Mostly the last one.
     std::size_t Last(std::size_t nCount) {
-        return m_random.OneIn(3) ? m_random.Next() % nCount : nCount - 1;
+        return m_random.OneIn(3) ? static_cast<std::size_t>(m_random.Next() % nCount) : nCount - 1;
     }
 
     Difference Both(const Plan& plan, const std::function<int()>& fnLibrary,
