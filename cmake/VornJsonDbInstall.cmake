@@ -1,4 +1,5 @@
-# What `cmake --install` lays down: header, library with its links, CMake package, pkg-config file.
+# What `cmake --install` lays down: headers, libraries with their links, CMake package, pkg-config
+# files.
 
 set(VORNJSONDB_PACKAGE_DIR "${CMAKE_INSTALL_LIBDIR}/cmake/vornjsondb")
 
@@ -7,6 +8,13 @@ install(TARGETS vornjsondb EXPORT vornjsondbTargets
         COMPONENT runtime NAMELINK_COMPONENT development)
 install(FILES include/VornJsonDbApi.h
     DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}" COMPONENT development)
+
+if(VORNJSONDB_TABLE)
+    install(TARGETS vornjsondb_table EXPORT vornjsondbTargets
+        ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development)
+    install(FILES include/VornJsonDbTable.h
+        DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}" COMPONENT development)
+endif()
 
 install(EXPORT vornjsondbTargets NAMESPACE vornjsondb::
     DESTINATION "${VORNJSONDB_PACKAGE_DIR}" COMPONENT development)
@@ -34,6 +42,12 @@ else()
     set(VORNJSONDB_PC_LIBDIR "\${prefix}/${CMAKE_INSTALL_LIBDIR}")
     set(VORNJSONDB_PC_INCLUDEDIR "\${prefix}/${CMAKE_INSTALL_INCLUDEDIR}")
 endif()
-configure_file(cmake/vornjsondb.pc.in vornjsondb.pc @ONLY)
-install(FILES "${CMAKE_CURRENT_BINARY_DIR}/vornjsondb.pc"
-    DESTINATION "${VORNJSONDB_PC_DIR}" COMPONENT development)
+set(VORNJSONDB_PC_NAMES vornjsondb)
+if(VORNJSONDB_TABLE)
+    list(APPEND VORNJSONDB_PC_NAMES vornjsondb-table)
+endif()
+foreach(VORNJSONDB_PC_NAME IN LISTS VORNJSONDB_PC_NAMES)
+    configure_file(cmake/${VORNJSONDB_PC_NAME}.pc.in ${VORNJSONDB_PC_NAME}.pc @ONLY)
+    install(FILES "${CMAKE_CURRENT_BINARY_DIR}/${VORNJSONDB_PC_NAME}.pc"
+        DESTINATION "${VORNJSONDB_PC_DIR}" COMPONENT development)
+endforeach()

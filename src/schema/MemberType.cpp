@@ -1,7 +1,9 @@
 #include "MemberType.h"
 
+#include <cstdint>
 #include <cstdlib>
 #include <cstring>
+#include <limits>
 #include <stdexcept>
 
 #include <sqlite3.h>
@@ -126,27 +128,54 @@ constexpr ConditionForm kJson = ConditionForm::kQuotedJson;
 constexpr ConditionForm kFlag = ConditionForm::kBoolean;
 constexpr ConditionForm kBare = ConditionForm::kBareText;
 
+constexpr BoundForm Integer(Json::Int64 nLeast, Json::Int64 nMost, Json::Int64 nMostRead) {
+    return BoundForm{BoundKind::kInteger, nLeast, nMost, nMostRead, 0};
+}
+
+constexpr BoundForm Real(double dMost) {
+    return BoundForm{BoundKind::kReal, 0, 0, 0, dMost};
+}
+
+constexpr BoundForm NoNumber(BoundKind eKind) {
+    return BoundForm{eKind, 0, 0, 0, 0};
+}
+
+constexpr BoundForm kInt32 = Integer(INT32_MIN, INT32_MAX, INT32_MAX);
+constexpr BoundForm kUInt32 = Integer(0, UINT32_MAX, INT32_MAX);
+constexpr BoundForm kInt64 = Integer(INT64_MIN, INT64_MAX, INT64_MAX);
+constexpr BoundForm kUInt63 = Integer(0, INT64_MAX, INT64_MAX);
+constexpr BoundForm kDouble = Real(std::numeric_limits<double>::max());
+constexpr BoundForm kFloat = Real(static_cast<double>(std::numeric_limits<float>::max()));
+constexpr BoundForm kString = NoNumber(BoundKind::kText);
+constexpr BoundForm kBool = NoNumber(BoundKind::kBoolean);
+constexpr BoundForm kObject = NoNumber(BoundKind::kObject);
+constexpr BoundForm kList = NoNumber(BoundKind::kList);
+constexpr BoundForm kAnyJson = NoNumber(BoundKind::kJson);
+constexpr BoundForm kAny = NoNumber(BoundKind::kAny);
+
+// "any" is for handles that bind values: in all else it is treated as an unknown name.
 // clang-format off
 constexpr MemberType kMemberTypes[] = {
-    {"string",             ReadText,   Fits<&Value::isString>,   AppendText,     "%Q",    kText, true},
-    {"int",                ReadInt,    Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false},
-    {"long long",          ReadInt64,  Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false},
-    {"bool",               ReadBool,   Fits<&Value::isBool>,     AppendSigned,   "%lld",  kFlag, false},
-    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   AppendJson,     "%Q",    kJson, false},
-    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    AppendJson,     "%Q",    kJson, false},
-    {"Json::Value",        FromString, nullptr,                  nullptr,        nullptr, kJson, false},
-    {"unsigned int",       ReadInt,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
-    {"unsigned long long", ReadInt64,  nullptr,                  AppendUnsigned, "%llu",  kBare, false},
-    {"long",               nullptr,    nullptr,                  AppendSigned,   "%lld",  kBare, false},
-    {"unsigned long",      nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
-    {"unsigned",           nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false},
-    {"double",             nullptr,    nullptr,                  AppendDouble,   "%lf",   kBare, false},
-    {"float",              nullptr,    nullptr,                  AppendFloat,    "%f",    kBare, false},
-    {"uid_t",              nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false},
-    {"time_t",             nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false},
+    {"string",             ReadText,   Fits<&Value::isString>,   AppendText,     "%Q",    kText, true,  kString},
+    {"int",                ReadInt,    Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false, kInt32},
+    {"long long",          ReadInt64,  Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false, kInt64},
+    {"bool",               ReadBool,   Fits<&Value::isBool>,     AppendSigned,   "%lld",  kFlag, false, kBool},
+    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   AppendJson,     "%Q",    kJson, false, kObject},
+    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    AppendJson,     "%Q",    kJson, false, kList},
+    {"Json::Value",        FromString, nullptr,                  nullptr,        nullptr, kJson, false, kAnyJson},
+    {"unsigned int",       ReadInt,    nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt32},
+    {"unsigned long long", ReadInt64,  nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt63},
+    {"long",               nullptr,    nullptr,                  AppendSigned,   "%lld",  kBare, false, kInt64},
+    {"unsigned long",      nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt63},
+    {"unsigned",           nullptr,    nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt32},
+    {"double",             nullptr,    nullptr,                  AppendDouble,   "%lf",   kBare, false, kDouble},
+    {"float",              nullptr,    nullptr,                  AppendFloat,    "%f",    kBare, false, kFloat},
+    {"uid_t",              nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false, kUInt32},
+    {"time_t",             nullptr,    Fits<&Value::isIntegral>, nullptr,        nullptr, kBare, false, kInt64},
+    {"any",                nullptr,    nullptr,                  nullptr,        nullptr, kBare, false, kAny},
 };
 constexpr MemberType kUnknownType =
-    {"",                   nullptr,    nullptr,                  nullptr,        nullptr, kBare, false};
+    {"",                   nullptr,    nullptr,                  nullptr,        nullptr, kBare, false, NoNumber(BoundKind::kNone)};
 // clang-format on
 
 // The "cpptype" text of a member's entry; empty when there is none.

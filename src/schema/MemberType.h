@@ -17,6 +17,18 @@ enum class ConditionForm {
     kBareText     // the escaped string form without quotes
 };
 
+// What a value of a type is, for statements that bind values instead of writing them.
+enum class BoundKind { kNone, kText, kBoolean, kInteger, kReal, kObject, kList, kJson, kAny };
+
+// Its kind and, for numbers, its range; nMostRead is the greatest integer that pfnRead gives back.
+struct BoundForm {
+    BoundKind eKind;
+    Json::Int64 nLeast;
+    Json::Int64 nMost;
+    Json::Int64 nMostRead;
+    double dMost;  // of reals, and its negative the least
+};
+
 // One type name and its treatments. The treatments were never made alike for all types, and hosts
 // depend on each: a missing one is a refusal, not an omission. Pinned by the vocabulary tests.
 struct MemberType {
@@ -38,6 +50,9 @@ struct MemberType {
 
     // Whether records may be deleted by a list of values of such a member.
     bool blDeleteByList;
+
+    // Complete for every type, unlike the treatments above.
+    BoundForm Bound;
 };
 
 // The row of that name; for an unknown name a row that refuses all but bare conditions.

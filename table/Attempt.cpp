@@ -1,0 +1,62 @@
+#include "Attempt.h"
+
+#include <algorithm>
+#include <thread>
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr int kLongestPauseMs = 50;
+
+}  // namespace
+
+Patience::Patience(int nWaitMs)
+    : m_End(std::chrono::steady_clock::now() + std::chrono::milliseconds(nWaitMs)) {}
+
+bool Patience::Wait() {
+    const auto Left = m_End - std::chrono::steady_clock::now();
+    if (Left <= std::chrono::steady_clock::duration::zero()) {
+        return false;
+    }
+    const std::chrono::steady_clock::duration Pause = std::chrono::milliseconds(m_nPauseMs);
+    std::this_thread::sleep_for(std::min(Pause, Left));
+    m_nPauseMs = std::min(2 * m_nPauseMs, kLongestPauseMs);
+    return true;
+}
+
+std::string WaitedText(int nWaitMs) {
+    return " (waited " + std::to_string(nWaitMs) + " ms)";
+}
+
+int Whole::Begin() {
+    m_blSavepoint = sqlite3_get_autocommit(m_pDb) == 0;
+    const int nResult = Run(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE");
+    m_blOpen = nResult == SQLITE_OK;
+    return nResult;
+}
+
+int Whole::Keep() {
+    const int nResult = Run(m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT");
+    m_blOpen = nResult != SQLITE_OK;
+    return nResult;
+}
+
+// A full disk and an interrupt may have undone the whole transaction already; a ROLLBACK would then
+// fail and hide the reason.
+Whole::~Whole() {
+    if (!m_blOpen || sqlite3_get_autocommit(m_pDb) != 0) {
+        return;
+    }
+    const char* szSql = m_blSavepoint ? "ROLLBACK TO vornjsondb; RELEASE vornjsondb" : "ROLLBACK";
+    sqlite3_exec(m_pDb, szSql, nullptr, nullptr, nullptr);
+}
+
+int Whole::Run(const char* szSql) {
+    Statement Lent;
+    const int nResult = m_Kept.Take(
+        szSql, [szSql] { return std::string(szSql); }, Lent);
+    return nResult == SQLITE_OK ? Lent.Finish() : nResult;
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,99 @@
+// Whole operation or nothing, and waiting for locks.
+
+#ifndef VORN_TABLE_ATTEMPT_H
+#define VORN_TABLE_ATTEMPT_H
+
+#include <chrono>
+#include <string>
+
+#include <sqlite3.h>
+
+#include "Failure.h"
+#include "Statements.h"
+
+namespace vornjsondb {
+
+// The time that a call may wait for a lock. SQLite's own busy handler, which is the caller's, may
+// block at each try as well, so the clock decides and not the number of tries.
+class Patience {
+  public:
+    explicit Patience(int nWaitMs);
+
+    // Waits a little, longer each time. False when the time is over.
+    bool Wait();
+
+  private:
+    std::chrono::steady_clock::time_point m_End;
+    int m_nPauseMs = 1;
+};
+
+// " (waited 5000 ms)"
+std::string WaitedText(int nWaitMs);
+
+// Calls fnOnce until it gives something else than a lock, or the time is over. In a transaction
+// that is open already there is one try: the other side may be waiting for just this transaction.
+template <typename Once>
+Status Attempt(sqlite3* pDb, int nWaitMs, Once&& fnOnce) {
+    if (sqlite3_get_autocommit(pDb) == 0) {
+        return fnOnce();
+    }
+    Status Outcome = fnOnce();
+    if (!IsLock(Outcome)) {
+        return Outcome;
+    }
+    Patience Left(nWaitMs);
+    while (Left.Wait()) {
+        Outcome = fnOnce();
+        if (!IsLock(Outcome)) {
+            return Outcome;
+        }
+    }
+    return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
+}
+
+// Several statements as one: a transaction, or a savepoint inside of one that is open. Undone at
+// the end of its life unless Keep succeeded.
+class Whole {
+  public:
+    Whole(sqlite3* pDb, Statements& Kept) : m_pDb(pDb), m_Kept(Kept) {}
+    Whole(const Whole&) = delete;
+    Whole& operator=(const Whole&) = delete;
+    ~Whole();
+
+    // SQLite's results.
+    int Begin();
+    int Keep();
+
+  private:
+    int Run(const char* szSql);
+
+    sqlite3* m_pDb;
+    Statements& m_Kept;
+    bool m_blOpen = false;
+    bool m_blSavepoint = false;
+};
+
+// fnSteps, which returns a Status, as a whole or not at all, waiting for locks.
+template <typename Steps>
+Status AttemptWhole(sqlite3* pDb, Statements& Kept, int nWaitMs, const Doing& What,
+                    Steps&& fnSteps) {
+    return Attempt(pDb, nWaitMs, [&]() -> Status {
+        Whole All(pDb, Kept);
+        int nResult = All.Begin();
+        if (nResult != SQLITE_OK) {
+            return FailBySqlite(pDb, nResult, What);
+        }
+        Status Outcome = fnSteps();
+        if (Outcome.Ok()) {
+            nResult = All.Keep();
+            if (nResult != SQLITE_OK) {
+                Outcome = FailBySqlite(pDb, nResult, What);
+            }
+        }
+        return Outcome;
+    });
+}
+
+}  // namespace vornjsondb
+
+#endif  // VORN_TABLE_ATTEMPT_H

@@ -1,0 +1,156 @@
+#include "ConditionSql.h"
+
+#include <algorithm>
+
+namespace vornjsondb {
+
+namespace {
+
+using VORN_JSON_DB::Condition;
+using Node = Condition::Node;
+using Kind = Node::Kind;
+
+// SQLite looks for indexes in all that is joined by AND and OR, however nested, and multiplies what
+// it finds: a few hundred conditions keep it busy for minutes. IS TRUE behind a group hides what is
+// inside. What is small is left open, so that indexes serve it.
+constexpr size_t kOpenLeaves = 16;
+constexpr int kOpenLevels = 2;
+constexpr size_t kOpenParts = 60;
+
+// Longer chains would exceed SQLite's depth of expressions.
+constexpr size_t kChain = 8;
+
+class ConditionWriter {
+  public:
+    ConditionWriter(const Members& Of, JsonCodec& Codec, bool blChange, size_t nLeaves,
+                    BoundSql& Out, FindingList& vecFindings)
+        : m_Leaf(Of, Codec, Out),
+          m_blChange(blChange),
+          m_nLeaves(nLeaves),
+          m_strSql(Out.strSql),
+          m_vecFindings(vecFindings) {}
+
+    // blOpen: SQLite looks into it.
+    void WriteGroup(const std::vector<Condition>& vecParts, Kind eKind, int nLevel, bool blOpen) {
+        if (vecParts.size() == 1) {
+            Write(vecParts[0].Root(), nLevel, blOpen, nullptr);
+            return;
+        }
+        std::vector<const Node*> vecNodes;
+        for (const Condition& Part : vecParts) {
+            vecNodes.push_back(&Part.Root());
+        }
+        // The deepest part goes first: there it costs SQLite's parser least.
+        const auto itDeepest = std::max_element(
+            vecNodes.begin(), vecNodes.end(),
+            [](const Node* pLeft, const Node* pRight) { return pLeft->nLevels < pRight->nLevels; });
+        std::rotate(vecNodes.begin(), itDeepest, itDeepest + 1);
+        const Chain All{vecNodes, eKind == Kind::kAll ? " AND " : " OR ", nLevel + 1, blOpen};
+        const size_t nParts = vecNodes.size();
+        const size_t nOpen = blOpen && eKind == Kind::kAll ? std::min(nParts, kOpenParts) : nParts;
+        const size_t nFirst = vecNodes[0]->nLevels > 0 ? 1 : nOpen;
+        WriteChain(All, 0, nFirst);
+        WriteRest(All, nFirst, nOpen, ")");
+        WriteRest(All, nOpen, nParts, ") IS TRUE");
+    }
+
+  private:
+    struct Chain {
+        const std::vector<const Node*>& vecNodes;
+        const char* szJoiner;
+        int nLevel;
+        bool blOpen;
+    };
+
+    // Parts nFrom to nTo; many of them as a tree of chains.
+    void WriteChain(const Chain& Of, size_t nFrom, size_t nTo) {
+        if (nTo - nFrom > kChain) {
+            const size_t nMiddle = nFrom + (nTo - nFrom) / 2;
+            m_strSql += '(';
+            WriteChain(Of, nFrom, nMiddle);
+            m_strSql += ')';
+            WriteRest(Of, nMiddle, nTo, ")");
+            return;
+        }
+        for (size_t i = nFrom; i < nTo; ++i) {
+            m_strSql += i > nFrom ? Of.szJoiner : "";
+            Write(*Of.vecNodes[i], Of.nLevel, Of.blOpen, nullptr);
+        }
+    }
+
+    void WriteRest(const Chain& Of, size_t nFrom, size_t nTo, const char* szClose) {
+        if (nFrom < nTo) {
+            const bool blOne = nTo - nFrom == 1;
+            m_strSql.append(Of.szJoiner).append(blOne ? "" : "(");
+            WriteChain(Of, nFrom, nTo);
+            m_strSql += blOne ? "" : szClose;
+        }
+    }
+
+    // szClose: in parentheses, and with this behind; nullptr: as it needs to be.
+    void Write(const Node& What, int nLevel, bool blOpen, const char* szClose) {
+        const bool blHidden = blOpen && nLevel > kOpenLevels && m_nLeaves > kOpenLeaves;
+        const bool blGroup = What.eKind == Kind::kAll || What.eKind == Kind::kAny;
+        if (blGroup && szClose == nullptr) {
+            szClose = blHidden ? ") IS TRUE" : ")";
+        }
+        m_strSql += szClose != nullptr ? "(" : "";
+        if (What.eKind == Kind::kLeaf) {
+            WriteLeaf(What);
+        } else if (What.eKind == Kind::kNot) {
+            Write(What.vecParts[0].Root(), nLevel, false, ") IS NOT TRUE");
+        } else if (What.eKind == Kind::kTooDeep) {
+            Report(m_vecFindings, FindingCode::kNestedTooDeep, "/where",
+                   "the conditions are nested too deep");
+        } else if (What.vecParts.empty()) {
+            Report(m_vecFindings, FindingCode::kEmptyGroup, "/where", "a group holds no condition");
+        } else {
+            WriteGroup(What.vecParts, What.eKind, nLevel, blOpen && !blHidden);
+        }
+        m_strSql += szClose != nullptr ? szClose : "";
+    }
+
+    void WriteLeaf(const Node& Leaf) {
+        Problem Why;
+        if (!m_Leaf.Write(Leaf, Why)) {
+            Report(m_vecFindings, Why.eCode, PathOf(Leaf) + Why.strStep, Why.strMessage);
+        } else if (m_blChange && Leaf.eOp == VORN_JSON_DB::Op::kNotIn && Leaf.jOperand.empty()) {
+            Report(m_vecFindings, FindingCode::kEmptyNin, PathOf(Leaf),
+                   "\"$nin\" of no values is true for every record");
+        }
+    }
+
+    static std::string PathOf(const Node& Leaf) {
+        if (!Leaf.strPath.empty()) {
+            return Leaf.strPath;
+        }
+        const std::string strMember = Below("/where", Leaf.strMember);
+        return Leaf.eOp == VORN_JSON_DB::Op::kEqual ? strMember
+                                                    : Below(strMember, RowOf(Leaf.eOp).szName);
+    }
+
+    LeafSql m_Leaf;
+    bool m_blChange;
+    size_t m_nLeaves;
+    std::string& m_strSql;
+    FindingList& m_vecFindings;
+};
+
+}  // namespace
+
+void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of, JsonCodec& Codec,
+                      bool blChange, BoundSql& Out, FindingList& vecFindings) {
+    size_t nLeaves = 0;
+    for (const Condition& Each : vecWhere) {
+        nLeaves += Each.Root().nLeaves;
+    }
+    if (nLeaves > kMaxConditions) {
+        Report(vecFindings, FindingCode::kTooManyConditions, "/where",
+               "the query has more than 1000 conditions");
+    } else if (!vecWhere.empty()) {
+        ConditionWriter(Of, Codec, blChange, nLeaves, Out, vecFindings)
+            .WriteGroup(vecWhere, Kind::kAll, 1, true);
+    }
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,119 @@
+// The CREATE TABLE statement that a definition asks for.
+
+#include "CreateStatement.h"
+
+#include <VornJsonDbTable.h>
+
+#include <string_view>
+
+#include "../src/base/JsonText.h"
+#include "FindingCodes.h"
+#include "Fit.h"
+
+namespace vornjsondb {
+
+namespace {
+
+// By which SQLite keeps values as they are bound.
+const char* DeclaredType(BoundKind eKind) {
+    switch (eKind) {
+        case BoundKind::kBoolean:
+        case BoundKind::kInteger:
+            return " INTEGER";
+        case BoundKind::kReal:
+            return " REAL";
+        case BoundKind::kAny:
+            return "";
+        default:
+            return " TEXT";
+    }
+}
+
+std::string TextLiteral(std::string_view strText) {
+    std::string strLiteral = "'";
+    for (const char c : strText) {
+        strLiteral.append(c == '\'' ? 2 : 1, c);
+    }
+    return strLiteral += '\'';
+}
+
+// A key of one whole number is the rowid itself: SQLite hands out values, and finds rows fastest.
+bool IsRowid(const Members& Of) {
+    return Of.Key().size() == 1 && Of.At(Of.Key()[0]).Kind() == BoundKind::kInteger;
+}
+
+}  // namespace
+
+std::string DefaultClause(const Member& Declared) {
+    if (Declared.pjDefault == nullptr) {
+        return {};
+    }
+    JsonCodec Codec;
+    std::string strJson;
+    BoundValue Value;
+    const Misfit eMisfit =
+        FitJson(*Declared.pType, *Declared.pjDefault, false, Codec, strJson, Value);
+    // What does not fit is refused when a record needs it, and no literal can hold a NUL byte.
+    const bool blText = Value.eKind == BoundValue::Kind::kText;
+    if (eMisfit != Misfit::kNone ||
+        (blText && Value.strBytes.find('\0') != std::string_view::npos)) {
+        return {};
+    }
+    char szReal[32];
+    switch (Value.eKind) {
+        case BoundValue::Kind::kInteger:
+            return " DEFAULT " + std::to_string(Value.nValue);
+        case BoundValue::Kind::kReal:
+            sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
+            return std::string(" DEFAULT ") + szReal;
+        case BoundValue::Kind::kText:
+            return " DEFAULT " + TextLiteral(Value.strBytes);
+        default:
+            return {};
+    }
+}
+
+std::string ColumnClause(const Member& Declared, bool blNotNull) {
+    return Declared.strQuoted + DeclaredType(Declared.Kind()) + (blNotNull ? " NOT NULL" : "") +
+           DefaultClause(Declared);
+}
+
+std::string CreateTableSql(const Members& Of) {
+    std::string strSql = "CREATE TABLE IF NOT EXISTS " + Of.QuotedTable() + " (";
+    const char* szBefore = "";
+    for (const Member& Declared : Of.All()) {
+        const bool blRowid = Declared.blKey && IsRowid(Of);
+        // SQLite lets other keys be NULL, any number of times.
+        strSql +=
+            szBefore + (blRowid ? Declared.strQuoted + " INTEGER PRIMARY KEY"
+                                : ColumnClause(Declared, Declared.blNotNull || Declared.blKey));
+        strSql += Declared.blUnique && !blRowid ? " UNIQUE" : "";
+        szBefore = ", ";
+    }
+    if (!Of.Key().empty() && !IsRowid(Of)) {
+        strSql += ", PRIMARY KEY";
+        szBefore = " (";
+        for (const size_t nMember : Of.Key()) {
+            strSql += szBefore + Of.At(nMember).strQuoted;
+            szBefore = ", ";
+        }
+        strSql += ")";
+    }
+    return strSql + ")";
+}
+
+}  // namespace vornjsondb
+
+namespace VORN_JSON_DB {
+
+Status CreateStatement(const std::string& strTable, const Json::Value& jDefinition,
+                       std::string& strSql) {
+    FindingList vecFindings;
+    const vornjsondb::Members Of(strTable, jDefinition, vecFindings);
+    if (!vornjsondb::HasError(vecFindings)) {
+        strSql = vornjsondb::CreateTableSql(Of);
+    }
+    return vornjsondb::FromFindings(std::move(vecFindings), {"make a statement for", &strTable});
+}
+
+}  // namespace VORN_JSON_DB

@@ -1,0 +1,227 @@
+#include "Fit.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "../src/base/JsonMember.h"
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr double kTwoTo63 = 9223372036854775808.0;
+
+// Levels that every release of JsonCpp reads; how many more depends on the release.
+constexpr size_t kSureLevels = 128;
+
+size_t ReaderLevels() {
+    Json::CharReaderBuilder Builder;
+    return Builder["stackLimit"].asUInt();
+}
+
+bool IsNaN(const Json::Value& jValue) {
+    return jValue.type() == Json::realValue && std::isnan(jValue.asDouble());
+}
+
+// What no JSON text can hold, or no reader gives back, anywhere in the value.
+Misfit CheckTree(const Json::Value& jValue, size_t nLevelsLeft) {
+    if (nLevelsLeft == 0) {
+        return Misfit::kDepth;
+    }
+    if (!jValue.isArray() && !jValue.isObject()) {
+        return IsNaN(jValue) ? Misfit::kNotANumber : Misfit::kNone;
+    }
+    const Json::Value::const_iterator itEnd = jValue.end();
+    for (Json::Value::const_iterator it = jValue.begin(); it != itEnd; ++it) {
+        const Misfit eMisfit = CheckTree(*it, nLevelsLeft - 1);
+        if (eMisfit != Misfit::kNone) {
+            return eMisfit;
+        }
+    }
+    return Misfit::kNone;
+}
+
+Misfit CheckTree(const Json::Value& jValue) {
+    const Misfit eMisfit = CheckTree(jValue, kSureLevels);
+    return eMisfit == Misfit::kDepth ? CheckTree(jValue, ReaderLevels()) : eMisfit;
+}
+
+Misfit Readable(const MemberType& Type, bool blCompatible) {
+    return blCompatible && Type.pfnRead == nullptr ? Misfit::kUnreadable : Misfit::kNone;
+}
+
+// A whole number beyond 63 bits, which SQLite has no integers for: at most a real that equals it.
+Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, BoundValue& Out) {
+    const double dValue = static_cast<double>(nValue);
+    const bool blExact = dValue < 2 * kTwoTo63 && static_cast<std::uint64_t>(dValue) == nValue;
+    const bool blReal = Type.Bound.eKind == BoundKind::kReal || Type.Bound.eKind == BoundKind::kAny;
+    return blReal && !blExact ? Misfit::kRange : FitReal(Type, dValue, blCompatible, Out);
+}
+
+Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
+               JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
+    const BoundKind eKind = Type.Bound.eKind;
+    const bool blFits = eKind == BoundKind::kJson ||
+                        (eKind == BoundKind::kObject && jValue.isObject()) ||
+                        (eKind == BoundKind::kList && jValue.isArray());
+    if (!blFits) {
+        return Misfit::kKind;
+    }
+    const Misfit eMisfit = CheckTree(jValue);
+    if (eMisfit != Misfit::kNone) {
+        return eMisfit;
+    }
+    strJson = Codec.Write(jValue);
+    Out.eKind = BoundValue::Kind::kText;
+    Out.strBytes = strJson;
+    return Readable(Type, blCompatible);
+}
+
+}  // namespace
+
+int BoundValue::Bind(sqlite3_stmt* pStatement, int nParameter) const {
+    switch (eKind) {
+        case Kind::kInteger:
+            return sqlite3_bind_int64(pStatement, nParameter, nValue);
+        case Kind::kReal:
+            return sqlite3_bind_double(pStatement, nParameter, dValue);
+        case Kind::kText:
+            // A null pointer would bind NULL.
+            return sqlite3_bind_text64(pStatement, nParameter,
+                                       strBytes.empty() ? "" : strBytes.data(), strBytes.size(),
+                                       SQLITE_STATIC, SQLITE_UTF8);
+        case Kind::kBlob:
+            return sqlite3_bind_blob64(pStatement, nParameter,
+                                       strBytes.empty() ? "" : strBytes.data(), strBytes.size(),
+                                       SQLITE_STATIC);
+        default:
+            return sqlite3_bind_null(pStatement, nParameter);
+    }
+}
+
+Misfit FitBoolean(const MemberType& Type, bool blValue, BoundValue& Out) {
+    Out.eKind = BoundValue::Kind::kInteger;
+    Out.nValue = blValue ? 1 : 0;
+    return Type.Bound.eKind == BoundKind::kBoolean ? Misfit::kNone : Misfit::kKind;
+}
+
+Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible, BoundValue& Out) {
+    const BoundForm& Form = Type.Bound;
+    if (Form.eKind == BoundKind::kReal) {
+        Out.eKind = BoundValue::Kind::kReal;
+        Out.dValue = static_cast<double>(nValue);
+        const bool blExact =
+            Out.dValue < kTwoTo63 && static_cast<std::int64_t>(Out.dValue) == nValue;
+        return blExact ? Readable(Type, blCompatible) : Misfit::kRange;
+    }
+    Out.eKind = BoundValue::Kind::kInteger;
+    Out.nValue = nValue;
+    if (Form.eKind == BoundKind::kAny) {
+        return Readable(Type, blCompatible);
+    }
+    if (Form.eKind != BoundKind::kInteger) {
+        return Misfit::kKind;
+    }
+    if (nValue < Form.nLeast || nValue > Form.nMost) {
+        return Misfit::kRange;
+    }
+    return blCompatible && nValue > Form.nMostRead ? Misfit::kUnreadable
+                                                   : Readable(Type, blCompatible);
+}
+
+Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out) {
+    const BoundForm& Form = Type.Bound;
+    if (std::isnan(dValue)) {
+        return Misfit::kNotANumber;
+    }
+    if (Form.eKind == BoundKind::kInteger) {
+        // A whole number is one, however it is written.
+        const bool blWhole = std::trunc(dValue) == dValue;
+        if (blWhole && (dValue < -kTwoTo63 || dValue >= kTwoTo63)) {
+            return Misfit::kRange;
+        }
+        return blWhole ? FitInteger(Type, static_cast<std::int64_t>(dValue), blCompatible, Out)
+                       : Misfit::kKind;
+    }
+    if (Form.eKind != BoundKind::kReal && Form.eKind != BoundKind::kAny) {
+        return Misfit::kKind;
+    }
+    Out.eKind = BoundValue::Kind::kReal;
+    Out.dValue = dValue;
+    const bool blBeyond =
+        Form.eKind == BoundKind::kReal && std::isfinite(dValue) && std::fabs(dValue) > Form.dMost;
+    return blBeyond ? Misfit::kRange : Readable(Type, blCompatible);
+}
+
+Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompatible,
+               BoundValue& Out) {
+    const BoundKind eKind = Type.Bound.eKind;
+    if (eKind != BoundKind::kText && eKind != BoundKind::kAny) {
+        return Misfit::kKind;
+    }
+    Out.eKind = BoundValue::Kind::kText;
+    Out.strBytes = strValue;
+    const bool blCut = blCompatible && strValue.find('\0') != std::string_view::npos;
+    return blCut ? Misfit::kUnreadable : Readable(Type, blCompatible);
+}
+
+Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompatible,
+               BoundValue& Out) {
+    Out.eKind = BoundValue::Kind::kBlob;
+    Out.strBytes = strBytes;
+    return Type.Bound.eKind == BoundKind::kAny ? Readable(Type, blCompatible) : Misfit::kKind;
+}
+
+Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
+               JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
+    if (jValue.isNull()) {
+        Out.eKind = BoundValue::Kind::kNull;
+        return Misfit::kNone;
+    }
+    if (Type.Bound.eKind == BoundKind::kJson) {
+        return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
+    }
+    switch (jValue.type()) {
+        case Json::booleanValue:
+            return FitBoolean(Type, jValue.asBool(), Out);
+        case Json::intValue:
+            return FitInteger(Type, jValue.asInt64(), blCompatible, Out);
+        case Json::uintValue:
+            return jValue.isInt64() ? FitInteger(Type, jValue.asInt64(), blCompatible, Out)
+                                    : FitHuge(Type, jValue.asUInt64(), blCompatible, Out);
+        case Json::realValue:
+            return FitReal(Type, jValue.asDouble(), blCompatible, Out);
+        case Json::stringValue: {
+            MemberName Text = {};
+            jValue.getString(&Text.pBegin, &Text.pEnd);
+            return FitText(Type, std::string_view(Text.pBegin, Text.Length()), blCompatible, Out);
+        }
+        default:
+            return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
+    }
+}
+
+std::string Expected(const MemberType& Type) {
+    const BoundForm& Form = Type.Bound;
+    switch (Form.eKind) {
+        case BoundKind::kText:
+            return "a text";
+        case BoundKind::kBoolean:
+            return "true or false";
+        case BoundKind::kInteger:
+            return "a whole number from " + std::to_string(Form.nLeast) + " to " +
+                   std::to_string(Form.nMost);
+        case BoundKind::kReal:
+            return "a number";
+        case BoundKind::kObject:
+            return "an object";
+        case BoundKind::kList:
+            return "a list";
+        case BoundKind::kJson:
+            return "any JSON";
+        default:
+            return "a text or a number";
+    }
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,232 @@
+#include "LeafSql.h"
+
+namespace vornjsondb {
+
+namespace {
+
+using VORN_JSON_DB::Op;
+
+bool IsLess(const Json::Value& jLeft, const Json::Value& jRight) {
+    if (jLeft.isString() || (jLeft.isInt64() && jRight.isInt64())) {
+        return jLeft < jRight;
+    }
+    return jLeft.asDouble() < jRight.asDouble();
+}
+
+bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
+    switch (eForm) {
+        case OperandForm::kPair:
+            return jOperand.isArray() && jOperand.size() == 2;
+        case OperandForm::kList:
+            return jOperand.isArray();
+        case OperandForm::kText:
+            return jOperand.isString();
+        case OperandForm::kFlag:
+            return jOperand.isBool();
+        default:
+            return true;
+    }
+}
+
+Problem WrongOperand(const Operator& Row, const Json::Value& jOperand) {
+    return {FindingCode::kWrongOperand,
+            Quoted(Row.szName) + " takes " + Expected(Row.eForm) + ", not " + Shown(jOperand)};
+}
+
+}  // namespace
+
+bool IsOrderedAsText(const Member& Of) {
+    return !Of.IsNumber() && Of.Kind() != BoundKind::kBoolean;
+}
+
+const char* JsonTypeTest(ValueKind eKind) {
+    static constexpr const char* kTests[kValueKinds] = {" = 'null'",  " IN ('integer', 'real')",
+                                                        " = 'text'",  " = 'true'",
+                                                        " = 'false'", " = 'object'",
+                                                        " = 'array'"};
+    return kTests[static_cast<size_t>(eKind)];
+}
+
+void BoundSql::Add(const BoundValue& Value) {
+    if (pfnLiteral != nullptr) {
+        pfnLiteral(Value, strSql);
+    } else {
+        strSql += '?';
+        vecValues.push_back(Value);
+    }
+}
+
+bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
+    if (!FindPlace(m_Of, Leaf.strMember, m_Where, Why)) {
+        return false;
+    }
+    m_pMember = &m_Of.At(m_Where.nMember);
+    m_blPath = !m_Where.strPath.empty();
+    const Operator& Row = RowOf(Leaf.eOp);
+    if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
+        Why = {FindingCode::kWrongOperator, Quoted(Row.szName) + " is not for member " +
+                                                Quoted(m_pMember->strName) + " of type " +
+                                                Quoted(m_pMember->pType->szName)};
+        return false;
+    }
+    if (!IsOfForm(Row.eForm, Leaf.jOperand)) {
+        Why = WrongOperand(Row, Leaf.jOperand);
+        return false;
+    }
+    return WriteOperator(Row, Leaf.jOperand, Why);
+}
+
+bool LeafSql::WriteOperator(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
+    switch (Row.eForm) {
+        case OperandForm::kValue:
+            return WriteEqual(Row, jOperand, Why);
+        case OperandForm::kOrdered:
+            return WriteOrdered(Row, jOperand, Why);
+        case OperandForm::kPair:
+            return WriteBetween(Row, jOperand, Why);
+        case OperandForm::kList:
+            return WriteIn(Row, jOperand, Why);
+        case OperandForm::kText:
+            return Row.eOp == Op::kLike ? WriteLike(jOperand, Why) : WritePrefix(jOperand, Why);
+        case OperandForm::kElement:
+            return WriteContains(jOperand, Why);
+        default:
+            AddLeft(ValueKind::kNull);
+            m_strSql += jOperand.asBool() ? " IS NULL" : " IS NOT NULL";
+            return true;
+    }
+}
+
+// Texts are compared by their bytes, whatever the table says of the column.
+void LeafSql::AddLeft(ValueKind eKind) {
+    if (m_blPath) {
+        m_strSql += ValueAt(m_pMember->strColumn, m_Where.strPath);
+    } else {
+        m_strSql += m_pMember->strColumn;
+        m_strSql += eKind == ValueKind::kText ? " COLLATE BINARY" : "";
+    }
+}
+
+void LeafSql::AddKindTest(ValueKind eKind) {
+    m_strSql.append(KindAt(m_pMember->strColumn, m_Where.strPath)).append(JsonTypeTest(eKind));
+}
+
+// What is said of a value inside of JSON comes with its kind: true is 1 there, and a list a text.
+void LeafSql::OpenJson() {
+    m_strSql += m_blPath ? "(" : "";
+}
+
+void LeafSql::CloseJson(ValueKind eKind) {
+    if (m_blPath) {
+        m_strSql += " AND ";
+        AddKindTest(eKind);
+        m_strSql += ')';
+    }
+}
+
+// A fraction inside of JSON is compared by its text, so that it becomes the number that SQLite
+// makes of the same text in the record. The plus takes away the CAST's affinity, which would keep
+// SQLite from using an index.
+void LeafSql::AddValue(ValueKind eKind, const BoundValue& Value) {
+    const bool blCast = eKind == ValueKind::kNumber && Value.eKind == BoundValue::Kind::kText;
+    m_strSql += blCast ? "+CAST(" : "";
+    m_Out.Add(Value);
+    m_strSql += blCast ? " AS REAL)" : "";
+}
+
+// IS and IS NOT take NULL for a value, so that one statement serves both.
+bool LeafSql::WriteEqual(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
+    Operand What;
+    if (!m_Reader.Read(m_Where, jOperand, What, Why)) {
+        return false;
+    }
+    const bool blNot = Row.eOp == Op::kNotEqual;
+    if (m_blPath) {
+        m_strSql += blNot ? "(" : "";
+        AddJsonEqual(What);
+        m_strSql += blNot ? ") IS NOT TRUE" : "";
+        return true;
+    }
+    const bool blText = m_pMember->Kind() == BoundKind::kAny ? What.eKind == ValueKind::kText
+                                                             : IsOrderedAsText(*m_pMember);
+    AddLeft(blText ? ValueKind::kText : ValueKind::kNumber);
+    m_strSql += Row.szSql;
+    m_Out.Add(What.Value);
+    return true;
+}
+
+void LeafSql::AddJsonEqual(const Operand& What) {
+    if (What.eKind == ValueKind::kNull) {
+        AddLeft(What.eKind);
+        m_strSql += " IS NULL";
+    } else if (What.Value.eKind == BoundValue::Kind::kNull) {
+        AddKindTest(What.eKind);
+    } else {
+        OpenJson();
+        AddLeft(What.eKind);
+        m_strSql += " IS ";
+        AddValue(What.eKind, What.Value);
+        CloseJson(What.eKind);
+    }
+}
+
+bool LeafSql::ReadOrdered(const Operator& Row, const Json::Value& jValue, Operand& Out,
+                          Problem& Why) {
+    if (jValue.isString() || jValue.isNumeric()) {
+        return m_Reader.Read(m_Where, jValue, Out, Why);
+    }
+    if (jValue.isNull()) {
+        Why = {FindingCode::kNullOperand,
+               Quoted(Row.szName) + ": nothing is less or greater than null"};
+    } else {
+        Why = WrongOperand(Row, jValue);
+    }
+    return false;
+}
+
+bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
+    Operand What;
+    if (!ReadOrdered(Row, jOperand, What, Why)) {
+        return false;
+    }
+    const char* szEnd = What.eKind == ValueKind::kText ? Row.szTextsEnd : Row.szNumbersEnd;
+    const bool blEnd = !m_blPath && szEnd != nullptr;
+    OpenJson();
+    m_strSql += blEnd ? "(" : "";
+    AddLeft(What.eKind);
+    m_strSql += Row.szSql;
+    AddValue(What.eKind, What.Value);
+    if (blEnd) {
+        m_strSql += " AND ";
+        AddLeft(What.eKind);
+        m_strSql.append(szEnd).append(")");
+    }
+    CloseJson(What.eKind);
+    return true;
+}
+
+bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Problem& Why) {
+    Operand Least, Most;
+    if (!ReadOrdered(Row, jPair[0], Least, Why) || !ReadOrdered(Row, jPair[1], Most, Why)) {
+        return false;
+    }
+    if (Least.eKind != Most.eKind) {
+        Why = WrongOperand(Row, jPair);
+        return false;
+    }
+    if (IsLess(jPair[1], jPair[0])) {
+        Why = {FindingCode::kSwappedEnds,
+               "nothing lies between " + Shown(jPair[0]) + " and " + Shown(jPair[1])};
+        return false;
+    }
+    OpenJson();
+    AddLeft(Least.eKind);
+    m_strSql += " BETWEEN ";
+    AddValue(Least.eKind, Least.Value);
+    m_strSql += " AND ";
+    AddValue(Most.eKind, Most.Value);
+    CloseJson(Least.eKind);
+    return true;
+}
+
+}  // namespace vornjsondb

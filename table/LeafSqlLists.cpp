@@ -1,0 +1,73 @@
+// "$in", "$nin" and "$contains".
+
+#include <utility>
+
+#include "LeafSql.h"
+
+namespace vornjsondb {
+
+bool LeafSql::WriteIn(const Operator& Row, const Json::Value& jList, Problem& Why) {
+    ListOperand List;
+    if (!ReadList(m_Where, jList, m_Out.pfnLiteral != nullptr, m_Reader, List, Why)) {
+        return false;
+    }
+    const char* szBefore = "(";
+    const auto Begin = [&] { m_strSql += std::exchange(szBefore, " OR "); };
+    const auto BeginList = [&](ValueKind eKind, const char* szList) {
+        Begin();
+        OpenJson();
+        AddLeft(eKind);
+        m_strSql += szList;
+    };
+    for (size_t i = 0; i < kValueKinds; ++i) {
+        const auto eKind = static_cast<ValueKind>(i);
+        ListOperand::OneKind& Kind = List.Kinds[i];
+        if (Kind.blBare) {
+            Begin();
+            AddJsonEqual(Operand{eKind, BoundValue()});
+        }
+        if (!Kind.strJson.empty()) {
+            BeginList(eKind, " IN (SELECT value FROM json_each(");
+            m_Out.Add(m_Reader.Keep(std::move(Kind.strJson)));
+            m_strSql += "))";
+            CloseJson(eKind);
+        }
+        if (!Kind.vecValues.empty()) {
+            const char* szBeforeValue = "";
+            BeginList(eKind, " IN (");
+            for (const BoundValue& Value : Kind.vecValues) {
+                m_strSql += std::exchange(szBeforeValue, ",");
+                AddValue(eKind, Value);
+            }
+            m_strSql += ')';
+            CloseJson(eKind);
+        }
+    }
+    if (jList.empty()) {
+        BeginList(ValueKind::kNumber, " IN ()");  // true for nothing, NULL included
+        CloseJson(ValueKind::kNumber);
+    }
+    m_strSql += Row.eOp == VORN_JSON_DB::Op::kNotIn ? ") IS NOT TRUE" : ")";
+    return true;
+}
+
+bool LeafSql::WriteContains(const Json::Value& jElement, Problem& Why) {
+    Operand What;
+    if (!m_Reader.ReadJson(jElement, What, Why)) {
+        return false;
+    }
+    // A name that no table of the statement has.
+    const std::string strElement = Quoted(m_Of.Table() + "[]");
+    m_strSql += "EXISTS (SELECT 1 FROM json_each(" +
+                ElementsAt(m_pMember->strColumn, m_Where.strPath) + ") AS " + strElement +
+                " WHERE ";
+    if (What.Value.eKind != BoundValue::Kind::kNull) {
+        m_strSql += strElement + ".value IS ";
+        AddValue(What.eKind, What.Value);
+        m_strSql += " AND ";
+    }
+    m_strSql += strElement + ".type" + JsonTypeTest(What.eKind) + ")";
+    return true;
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,92 @@
+// "$like" and "$prefix".
+
+#include <cstring>
+#include <utility>
+
+#include "LeafSql.h"
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr size_t kLongestPattern = 50000;  // SQLite's limit in its usual build
+
+// What SQLite cannot take for a pattern, or takes for another one; nullptr: nothing.
+const char* PatternFault(std::string_view strPattern) {
+    if (strPattern.size() > kLongestPattern) {
+        return "is longer than SQLite takes";
+    }
+    for (size_t i = 0; i < strPattern.size(); ++i) {
+        if (strPattern[i] == '\0') {
+            return "holds a NUL byte, where SQLite ends it";
+        }
+        if (strPattern[i] == '\\') {
+            ++i;
+            if (i == strPattern.size() || std::strchr("%_\\", strPattern[i]) == nullptr) {
+                return "has a \\ before something else than %, _ and \\";
+            }
+        }
+    }
+    return nullptr;
+}
+
+// What follows all texts with that beginning: it, with its last byte raised. Where no byte can be
+// raised, the blob that comes behind all texts.
+BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
+    while (!strPrefix.empty() && strPrefix.back() == '\xff') {
+        strPrefix.remove_suffix(1);
+    }
+    if (strPrefix.empty()) {
+        BoundValue Blob;
+        Blob.eKind = BoundValue::Kind::kBlob;
+        return Blob;
+    }
+    std::string strBeyond(strPrefix);
+    strBeyond.back() = static_cast<char>(static_cast<unsigned char>(strBeyond.back()) + 1);
+    return Reader.Keep(std::move(strBeyond));
+}
+
+}  // namespace
+
+// With a bare parameter SQLite would prepare the statement again for each pattern.
+bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
+    Operand Pattern;
+    if (!m_Reader.Read(m_Where, jPattern, Pattern, Why)) {
+        return false;
+    }
+    if (const char* szFault = PatternFault(Pattern.Value.strBytes)) {
+        Why = {FindingCode::kBadPattern, "pattern " + Shown(jPattern) + " " + szFault};
+        return false;
+    }
+    m_strSql += '(';
+    AddLeft(ValueKind::kNull);
+    m_strSql += " LIKE ";
+    m_Out.Add(Pattern.Value);
+    m_strSql += "||'' ESCAPE '\\'";
+    if (m_blPath) {
+        CloseJson(ValueKind::kText);
+    } else {
+        m_strSql.append(" AND typeof(").append(m_pMember->strColumn).append(") = 'text')");
+    }
+    return true;
+}
+
+bool LeafSql::WritePrefix(const Json::Value& jPrefix, Problem& Why) {
+    Operand Prefix;
+    if (!m_Reader.Read(m_Where, jPrefix, Prefix, Why)) {
+        return false;
+    }
+    m_strSql += '(';
+    AddLeft(ValueKind::kText);
+    m_strSql += " >= ";
+    m_Out.Add(Prefix.Value);
+    m_strSql += " AND ";
+    AddLeft(ValueKind::kText);
+    m_strSql += " < ";
+    m_Out.Add(Beyond(Prefix.Value.strBytes, m_Reader));
+    m_strSql += m_blPath ? "" : ")";
+    CloseJson(ValueKind::kText);
+    return true;
+}
+
+}  // namespace vornjsondb

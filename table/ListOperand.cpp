@@ -1,0 +1,130 @@
+#include <charconv>
+#include <cmath>
+#include <iterator>
+
+#include "Operand.h"
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr Json::ArrayIndex kMostValues = 100000;
+
+// Up to here a real is a whole number exactly when its integer equals it.
+constexpr double kTwoTo53 = 9007199254740992.0;
+
+// How many bytes the UTF-8 character at the beginning has; 0: it is none.
+size_t CharacterBytes(std::string_view strText) {
+    const auto At = [&strText](size_t i) {
+        return i < strText.size() ? static_cast<unsigned char>(strText[i]) : 0U;
+    };
+    const unsigned nFirst = At(0);
+    const size_t nBytes = nFirst < 0x80   ? 1
+                          : nFirst < 0xc2 ? 0
+                          : nFirst < 0xe0 ? 2
+                          : nFirst < 0xf0 ? 3
+                          : nFirst < 0xf5 ? 4
+                                          : 0;
+    for (size_t i = 1; i < nBytes; ++i) {
+        if ((At(i) & 0xc0U) != 0x80) {
+            return 0;
+        }
+    }
+    // Overlong forms, surrogates, beyond the last character.
+    const unsigned nSecond = At(1);
+    const bool blBad = (nFirst == 0xe0 && nSecond < 0xa0) || (nFirst == 0xed && nSecond > 0x9f) ||
+                       (nFirst == 0xf0 && nSecond < 0x90) || (nFirst == 0xf4 && nSecond > 0x8f);
+    return blBad ? 0 : nBytes;
+}
+
+void AppendInteger(std::int64_t nValue, std::string& strJson) {
+    char szDigits[24];
+    strJson.append(szDigits, std::to_chars(szDigits, std::end(szDigits), nValue).ptr);
+}
+
+void AppendText(std::string_view strText, std::string& strJson) {
+    static constexpr char kHex[] = "0123456789abcdef";
+    strJson += '"';
+    for (const char c : strText) {
+        const auto nByte = static_cast<unsigned char>(c);
+        if (nByte < 0x20) {
+            strJson.append("\\u00").append(1, kHex[nByte >> 4U]).append(1, kHex[nByte & 15U]);
+        } else {
+            strJson.append(c == '"' || c == '\\' ? "\\" : "").append(1, c);
+        }
+    }
+    strJson += '"';
+}
+
+// Appends the value; false: JSON text would not carry it exactly.
+bool AppendExact(const Operand& Each, std::string& strJson) {
+    const BoundValue& Value = Each.Value;
+    switch (Value.eKind) {
+        case BoundValue::Kind::kInteger:
+            AppendInteger(Value.nValue, strJson);
+            return true;
+        case BoundValue::Kind::kReal: {
+            const bool blWhole =
+                std::fabs(Value.dValue) <= kTwoTo53 && std::trunc(Value.dValue) == Value.dValue;
+            if (blWhole) {
+                AppendInteger(static_cast<std::int64_t>(Value.dValue), strJson);
+            }
+            return blWhole;
+        }
+        default:
+            if (Each.eKind == ValueKind::kNumber || !IsPlainText(Value.strBytes)) {
+                return false;
+            }
+            AppendText(Value.strBytes, strJson);
+            return true;
+    }
+}
+
+void Add(const Operand& Each, bool blOneByOne, ListOperand::OneKind& Into) {
+    if (Each.Value.eKind == BoundValue::Kind::kNull) {
+        Into.blBare = true;
+        return;
+    }
+    const size_t nBefore = Into.strJson.size();
+    Into.strJson += nBefore == 0 ? '[' : ',';
+    if (blOneByOne || !AppendExact(Each, Into.strJson)) {
+        Into.strJson.resize(nBefore);
+        Into.vecValues.push_back(Each.Value);
+    }
+}
+
+}  // namespace
+
+bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, OperandReader& Reader,
+              ListOperand& Out, Problem& Why) {
+    if (jList.size() > kMostValues) {
+        Why = {FindingCode::kTooManyValues,
+               "a list may have 100000 values, not " + std::to_string(jList.size())};
+        return false;
+    }
+    for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
+        Operand Each;
+        if (!Reader.Read(Where, jList[i], Each, Why)) {
+            Why.strStep = "/" + std::to_string(i);
+            return false;
+        }
+        Add(Each, blOneByOne, Out.Kinds[static_cast<size_t>(Each.eKind)]);
+    }
+    for (ListOperand::OneKind& Kind : Out.Kinds) {
+        Kind.strJson += Kind.strJson.empty() ? "" : "]";
+    }
+    return true;
+}
+
+bool IsPlainText(std::string_view strText) {
+    while (!strText.empty()) {
+        const size_t nBytes = strText[0] == '\0' ? 0 : CharacterBytes(strText);
+        if (nBytes == 0) {
+            return false;
+        }
+        strText.remove_prefix(nBytes);
+    }
+    return true;
+}
+
+}  // namespace vornjsondb

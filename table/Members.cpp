@@ -1,0 +1,150 @@
+#include "Members.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "../src/base/JsonMember.h"
+#include "../src/base/JsonMemory.h"
+#include "../src/schema/TableDefinition.h"
+#include "FindingCodes.h"
+#include "Nearest.h"
+
+namespace vornjsondb {
+
+namespace {
+
+std::string TextOf(const MemberName& Name) {
+    return {Name.pBegin, Name.pEnd};
+}
+
+bool IsSet(const Json::Value& jEntry, const char* szFlag) {
+    const Json::Value* pjFlag = FindMember(jEntry, szFlag);
+    return pjFlag != nullptr && pjFlag->isBool() && pjFlag->asBool();
+}
+
+// SQLite compares names of columns so.
+std::string InLowerCase(std::string strName) {
+    for (char& c : strName) {
+        c = c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+    }
+    return strName;
+}
+
+bool IsUsableName(const std::string& strName) {
+    return strName.find('\0') == std::string::npos && strName.compare(0, 1, "$") != 0;
+}
+
+}  // namespace
+
+bool Member::IsJson() const {
+    return Kind() == BoundKind::kObject || Kind() == BoundKind::kList || Kind() == BoundKind::kJson;
+}
+
+bool Member::IsNumber() const {
+    return Kind() == BoundKind::kInteger || Kind() == BoundKind::kReal;
+}
+
+Members::Members(const std::string& strTable, const Json::Value& jDefinition,
+                 FindingList& vecFindings) try
+    : m_strTable(strTable), m_strQuotedTable(Quoted(strTable)) {
+    const Json::Value& jMembers = DeclaredMembers(jDefinition, strTable);
+    if (!jMembers.isObject() || jMembers.empty()) {
+        Report(vecFindings, FindingCode::kNoDefinition, Below("", strTable),
+               "the definition names no members of table " + m_strQuotedTable);
+        return;
+    }
+    m_jDefinition[strTable] = *FindMember(jDefinition, strTable);
+    AddAll(DeclaredMembers(m_jDefinition, strTable), vecFindings);
+    if (const Json::Value* pjKey = FindMember(m_jDefinition[strTable], "key")) {
+        TakeKey(*pjKey, vecFindings);
+    }
+}
+VORN_JSON_MEMORY_TO_BAD_ALLOC
+
+void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
+    const std::string strPath = Below(Below("", m_strTable), "member");
+    std::vector<std::string> vecColumns;
+    const Json::Value::const_iterator itEnd = jMembers.end();
+    for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
+        const std::string strName = TextOf(NameOf(it));
+        const MemberType& Type = TypeOfMember(*it);
+        const std::string strColumn = InLowerCase(strName);
+        if (!IsUsableName(strName)) {
+            Report(
+                vecFindings, FindingCode::kBadName, Below(strPath, strName),
+                ShownText(strName) + " cannot be a member: it begins with $ or holds a NUL byte");
+        } else if (std::count(vecColumns.begin(), vecColumns.end(), strColumn) > 0) {
+            Report(vecFindings, FindingCode::kSameColumn, Below(strPath, strName),
+                   ShownText(strName) +
+                       " is another member's column: letter case makes no difference");
+        } else if (Type.Bound.eKind == BoundKind::kNone) {
+            Report(
+                vecFindings, FindingCode::kUnknownType, Below(Below(strPath, strName), "cpptype"),
+                "member " + Quoted(strName) + " has the unknown type " + ShownText(TypeName(*it)));
+        } else {
+            const std::string strQuoted = Quoted(strName);
+            m_vecAll.push_back(Member{strName, strQuoted, m_strQuotedTable + "." + strQuoted, &Type,
+                                      FindMember(*it, "cppDefaultValue"), false,
+                                      IsSet(*it, "notNull"), IsSet(*it, "unique"),
+                                      IsSet(*it, "nullSeen"), false});
+            m_vecNames.push_back(strName);
+            vecColumns.push_back(strColumn);
+        }
+    }
+}
+
+// One name, or a list of them.
+void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
+    const std::string strPath = Below(Below("", m_strTable), "key");
+    Json::Value jNames = jKey;
+    if (!jKey.isArray()) {
+        jNames = Json::Value(Json::arrayValue);
+        jNames.append(jKey);
+    }
+    std::vector<std::string> vecNames;
+    for (const Json::Value& jName : jNames) {
+        const std::string strName = jName.isString() ? jName.asString() : std::string();
+        if (Find(strName) == kNone) {
+            Report(
+                vecFindings, FindingCode::kUnknownKey, strPath,
+                Shown(jName) + " is no member that can be a key" + Suggestion(strName, m_vecNames));
+        }
+        vecNames.push_back(strName);
+    }
+    SetKey(vecNames);
+}
+
+size_t Members::Find(std::string_view strName) const {
+    const auto itFound = std::lower_bound(m_vecNames.begin(), m_vecNames.end(), strName);
+    return itFound != m_vecNames.end() && *itFound == strName
+               ? static_cast<size_t>(itFound - m_vecNames.begin())
+               : kNone;
+}
+
+// SQLite's table may spell a column in another letter case than the definition.
+size_t Members::FindColumn(const std::string& strColumn) const {
+    const std::string strWanted = InLowerCase(strColumn);
+    for (size_t i = 0; i < m_vecNames.size(); ++i) {
+        if (InLowerCase(m_vecNames[i]) == strWanted) {
+            return i;
+        }
+    }
+    return kNone;
+}
+
+void Members::SetKey(const std::vector<std::string>& vecColumns) {
+    std::vector<size_t> vecKey;
+    for (const std::string& strColumn : vecColumns) {
+        const size_t nMember = FindColumn(strColumn);
+        if (nMember == kNone) {
+            return;
+        }
+        vecKey.push_back(nMember);
+    }
+    m_vecKey = std::move(vecKey);
+    for (const size_t nMember : m_vecKey) {
+        m_vecAll[nMember].blKey = true;
+    }
+}
+
+}  // namespace vornjsondb

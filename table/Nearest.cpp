@@ -1,0 +1,68 @@
+#include "Nearest.h"
+
+#include <algorithm>
+
+#include "FindingCodes.h"
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr size_t kLongestCompared = 64;
+
+char Lower(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+// How many single slips lie between the two: a letter that is wrong, missing, too many, or has
+// changed places with its neighbour. Letter case is none.
+size_t Slips(std::string_view strLeft, std::string_view strRight) {
+    size_t nRows[3][kLongestCompared + 1] = {};
+    size_t* pTwoUp = nRows[0];
+    size_t* pUp = nRows[1];
+    size_t* pRow = nRows[2];
+    for (size_t j = 0; j <= strRight.size(); ++j) {
+        pUp[j] = j;
+    }
+    for (size_t i = 1; i <= strLeft.size(); ++i) {
+        pRow[0] = i;
+        for (size_t j = 1; j <= strRight.size(); ++j) {
+            const bool blSame = Lower(strLeft[i - 1]) == Lower(strRight[j - 1]);
+            pRow[j] = std::min({pUp[j] + 1, pRow[j - 1] + 1, pUp[j - 1] + (blSame ? 0 : 1)});
+            const bool blSwapped = i > 1 && j > 1 &&
+                                   Lower(strLeft[i - 1]) == Lower(strRight[j - 2]) &&
+                                   Lower(strLeft[i - 2]) == Lower(strRight[j - 1]);
+            if (blSwapped) {
+                pRow[j] = std::min(pRow[j], pTwoUp[j - 2] + 1);
+            }
+        }
+        std::swap(pTwoUp, pUp);
+        std::swap(pUp, pRow);
+    }
+    return pUp[strRight.size()];
+}
+
+}  // namespace
+
+std::string Nearest(std::string_view strTyped, const std::vector<std::string>& vecCandidates) {
+    const std::string* pNearest = nullptr;
+    size_t nFewest = 1 + std::min<size_t>(3, 1 + strTyped.size() / 4);
+    for (const std::string& strCandidate : vecCandidates) {
+        if (std::max(strTyped.size(), strCandidate.size()) > kLongestCompared) {
+            continue;
+        }
+        const size_t nSlips = Slips(strTyped, strCandidate);
+        if (nSlips < nFewest && nSlips < strCandidate.size()) {
+            nFewest = nSlips;
+            pNearest = &strCandidate;
+        }
+    }
+    return pNearest != nullptr ? *pNearest : std::string();
+}
+
+std::string Suggestion(std::string_view strTyped, const std::vector<std::string>& vecCandidates) {
+    const std::string strNearest = Nearest(strTyped, vecCandidates);
+    return strNearest.empty() ? strNearest : " (did you mean " + Quoted(strNearest) + "?)";
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,124 @@
+#include "Operand.h"
+
+#include <iterator>
+#include <utility>
+
+#include "../src/base/JsonMember.h"
+
+namespace vornjsondb {
+
+namespace {
+
+struct MisfitRow {
+    Misfit eMisfit;
+    FindingCode eCode;
+    const char* szReason;
+};
+constexpr MisfitRow kMisfits[] = {
+    {Misfit::kRange, FindingCode::kOutOfRange, "is beyond its range"},
+    {Misfit::kNotANumber, FindingCode::kNotANumber, "is no number"},
+    {Misfit::kDepth, FindingCode::kNestedTooDeep, "is nested too deep"},
+    {Misfit::kKind, FindingCode::kWrongKind, "is no value of it"},
+};
+
+Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& jValue) {
+    const MisfitRow* pRow = std::begin(kMisfits);
+    while (pRow->eMisfit != eMisfit && pRow + 1 != std::end(kMisfits)) {
+        ++pRow;
+    }
+    return {pRow->eCode, strOf + ": " + Shown(jValue) + " " + pRow->szReason};
+}
+
+std::string_view TextOf(const Json::Value& jText) {
+    MemberName Text = {};
+    jText.getString(&Text.pBegin, &Text.pEnd);
+    return std::string_view(Text.pBegin, Text.Length());
+}
+
+ValueKind KindOf(const BoundValue& Value) {
+    switch (Value.eKind) {
+        case BoundValue::Kind::kNull:
+            return ValueKind::kNull;
+        case BoundValue::Kind::kText:
+            return ValueKind::kText;
+        default:
+            return ValueKind::kNumber;
+    }
+}
+
+}  // namespace
+
+bool OperandReader::Read(const Place& Where, const Json::Value& jValue, Operand& Out,
+                         Problem& Why) {
+    return Where.strPath.empty() ? ReadColumn(m_Of.At(Where.nMember), jValue, Out, Why)
+                                 : ReadJson(jValue, Out, Why);
+}
+
+bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Operand& Out,
+                               Problem& Why) {
+    std::string strJson;
+    const Misfit eMisfit = FitJson(*Of.pType, jValue, false, m_Codec, strJson, Out.Value);
+    if (eMisfit == Misfit::kNone) {
+        if (!strJson.empty()) {
+            Out.Value = Keep(std::move(strJson));
+        }
+        Out.eKind = KindOf(Out.Value);
+        return true;
+    }
+    const std::string strMember = "member " + Quoted(Of.strName);
+    if (eMisfit == Misfit::kKind && Of.Kind() == BoundKind::kList) {
+        Why = {FindingCode::kListMember,
+               strMember + " is a list, and " + Shown(jValue) + " is none"};
+    } else if (eMisfit == Misfit::kKind) {
+        Why = {FindingCode::kWrongKind,
+               strMember + " is " + Expected(*Of.pType) + ", not " + Shown(jValue)};
+    } else {
+        Why = ProblemOf(eMisfit, strMember, jValue);
+    }
+    return false;
+}
+
+bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& Why) {
+    static constexpr char kAnyJson[] = "Json::Value";
+    Out.Value = BoundValue();
+    if (jValue.isNull()) {
+        Out.eKind = ValueKind::kNull;
+        return true;
+    }
+    if (jValue.isBool()) {
+        Out.eKind = jValue.asBool() ? ValueKind::kTrue : ValueKind::kFalse;
+        return true;
+    }
+    if (jValue.isString()) {
+        Out.eKind = ValueKind::kText;
+        Out.Value.eKind = BoundValue::Kind::kText;
+        Out.Value.strBytes = TextOf(jValue);
+        return true;
+    }
+    Out.eKind = jValue.isArray() ? ValueKind::kList
+                                 : (jValue.isObject() ? ValueKind::kObject : ValueKind::kNumber);
+    if (jValue.type() != Json::realValue && jValue.isInt64()) {
+        Out.Value.eKind = BoundValue::Kind::kInteger;
+        Out.Value.nValue = jValue.asInt64();
+        return true;
+    }
+    std::string strJson;
+    const MemberType& Any = FindMemberType(std::begin(kAnyJson), std::end(kAnyJson) - 1);
+    const Misfit eMisfit = FitJson(Any, jValue, false, m_Codec, strJson, Out.Value);
+    if (eMisfit != Misfit::kNone) {
+        Why = ProblemOf(eMisfit, "JSON", jValue);
+        return false;
+    }
+    Out.Value = Keep(std::move(strJson));
+    return true;
+}
+
+BoundValue OperandReader::Keep(std::string strText) {
+    m_listTexts.push_front(std::move(strText));
+    BoundValue Text;
+    Text.eKind = BoundValue::Kind::kText;
+    Text.strBytes = m_listTexts.front();
+    return Text;
+}
+
+}  // namespace vornjsondb

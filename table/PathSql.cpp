@@ -1,0 +1,139 @@
+#include "PathSql.h"
+
+#include <algorithm>
+
+#include "Nearest.h"
+
+namespace vornjsondb {
+
+namespace {
+
+constexpr size_t kMostIndexDigits = 9;   // SQLite lets a longer index wrap around
+constexpr size_t kMostPathBytes = 1000;  // SQLite follows a path by recursion
+
+bool IsDigit(char c) {
+    return c >= '0' && c <= '9';
+}
+
+bool IsNumber(std::string_view strText) {
+    return !strText.empty() && std::all_of(strText.begin(), strText.end(), IsDigit);
+}
+
+// SQLite has no escape for what would end the name or begin one.
+bool IsReachable(std::string_view strName) {
+    return std::none_of(strName.begin(), strName.end(), [](char c) {
+        return c == '"' || c == '\\' || static_cast<unsigned char>(c) < ' ';
+    });
+}
+
+// Takes ".name" from the front of strSteps.
+bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
+    const std::string_view strName = strSteps.substr(1, strSteps.find_first_of(".[", 1) - 1);
+    if (strName.empty() || !IsReachable(strName)) {
+        Why = {FindingCode::kBadPath, strName.empty() ? "a name is missing in it"
+                                                      : "no path leads to " + ShownText(strName)};
+        return false;
+    }
+    if (IsNumber(strName)) {
+        Why = {FindingCode::kNumberInPath, ShownText(strName) + " would be a name, not an index"};
+        return false;
+    }
+    strOut.append(".\"");
+    for (const char c : strName) {
+        strOut.append(c == '\'' ? 2 : 1, c);
+    }
+    strOut += '"';
+    strSteps.remove_prefix(1 + strName.size());
+    return true;
+}
+
+// Takes "[0]".
+bool TakeIndex(std::string_view& strSteps, std::string& strOut, Problem& Why) {
+    const size_t nEnd = std::min(strSteps.find(']'), strSteps.size() - 1);
+    const std::string_view strDigits = strSteps.substr(1, nEnd - 1);
+    if (!IsNumber(strDigits) || strDigits.size() > kMostIndexDigits || strSteps[nEnd] != ']') {
+        Why = {FindingCode::kBadPath, "an index is a whole number in brackets"};
+        return false;
+    }
+    strOut.append(strSteps.substr(0, nEnd + 1));
+    strSteps.remove_prefix(nEnd + 1);
+    return true;
+}
+
+bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
+    strOut = "'$";
+    while (!strSteps.empty()) {
+        if (strSteps[0] != '.' && strSteps[0] != '[') {
+            Why = {FindingCode::kBadPath, "a point or a bracket is missing in it"};
+            return false;
+        }
+        if (!(strSteps[0] == '.' ? TakeName : TakeIndex)(strSteps, strOut, Why)) {
+            return false;
+        }
+    }
+    strOut += '\'';
+    return true;
+}
+
+std::string Guarded(const char* szFunction, const std::string& strColumn,
+                    const std::string& strPath) {
+    return "CASE WHEN json_valid(" + strColumn + ") THEN " + szFunction + "(" + strColumn +
+           (strPath.empty() ? "" : ", ") + strPath + ") END";
+}
+
+}  // namespace
+
+bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem& Why) {
+    Out.nMember = Of.Find(strName);
+    Out.strPath.clear();
+    size_t nEnd = strName.size();
+    while (Out.nMember == Members::kNone && nEnd > 0) {
+        nEnd = strName.find_last_of(".[", nEnd - 1);
+        if (nEnd == std::string_view::npos) {
+            break;
+        }
+        Out.nMember = Of.Find(strName.substr(0, nEnd));
+    }
+    if (Out.nMember == Members::kNone) {
+        const std::string_view strFirst = strName.substr(0, strName.find_first_of(".["));
+        Why = {FindingCode::kUnknownMember, "table " + Of.QuotedTable() + " has no member " +
+                                                ShownText(strFirst) +
+                                                Suggestion(strFirst, Of.Names())};
+        return false;
+    }
+    if (nEnd == strName.size()) {
+        return true;
+    }
+    const Member& Base = Of.At(Out.nMember);
+    if (!Base.IsJson()) {
+        Why = {FindingCode::kNoJsonMember, "member " + ShownText(Base.strName) + " of type \"" +
+                                               Base.pType->szName + "\" has nothing inside"};
+        return false;
+    }
+    const bool blTooLong = strName.size() > kMostPathBytes;
+    if (blTooLong) {
+        Why = {FindingCode::kBadPath, "it is too long"};
+    }
+    if (blTooLong || !TakeSteps(strName.substr(nEnd), Out.strPath, Why)) {
+        Why.strMessage = "path " + ShownText(strName) + ": " + Why.strMessage;
+        return false;
+    }
+    return true;
+}
+
+std::string ValueAt(const std::string& strColumn, const std::string& strPath) {
+    return Guarded("json_extract", strColumn, strPath);
+}
+
+std::string KindAt(const std::string& strColumn, const std::string& strPath) {
+    return Guarded("json_type", strColumn, strPath);
+}
+
+// One CASE in the other: SQLite does not promise to look at the left side of an AND first.
+std::string ElementsAt(const std::string& strColumn, const std::string& strPath) {
+    const std::string strTail = (strPath.empty() ? "" : ", ") + strPath;
+    return "CASE WHEN json_valid(" + strColumn + ") THEN CASE json_type(" + strColumn + strTail +
+           ") WHEN 'array' THEN " + strColumn + " END END" + strTail;
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,157 @@
+#include "QueryPlan.h"
+
+#include <algorithm>
+#include <numeric>
+
+#include "../src/base/SqlText.h"
+#include "ConditionSql.h"
+
+namespace vornjsondb {
+
+namespace {
+
+using VORN_JSON_DB::Query;
+
+bool IsPaged(const Query& Which) {
+    return Which.nLimit != -1 || Which.nOffset != 0;
+}
+
+BoundValue Integer(std::int64_t nValue) {
+    BoundValue Value;
+    Value.eKind = BoundValue::Kind::kInteger;
+    Value.nValue = nValue;
+    return Value;
+}
+
+void CheckPage(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
+    if (Which.nLimit < -1) {
+        Report(vecFindings, FindingCode::kBadCount, "/limit", "the limit is less than 0");
+    }
+    if (Which.nOffset < 0) {
+        Report(vecFindings, FindingCode::kBadCount, "/offset", "the offset is less than 0");
+    }
+    if (eUse == QueryUse::kChange && (IsPaged(Which) || !Which.vecSort.empty())) {
+        Report(vecFindings, FindingCode::kPagedChange, "",
+               "a change reaches all records that the conditions select, in no order");
+    }
+    if (eUse == QueryUse::kChange && Which.vecWhere.empty()) {
+        Report(vecFindings, FindingCode::kNoCondition, "/where",
+               "the query has no condition and would reach every record");
+    }
+}
+
+}  // namespace
+
+void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
+    vecFindings.insert(vecFindings.end(), Which.vecFindings.begin(), Which.vecFindings.end());
+    if (HasError(vecFindings)) {
+        return;
+    }
+    CheckPage(Which, eUse, vecFindings);
+    m_Sql.strSql.reserve(kUsualStatement);
+    AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
+    m_nConditionEnd = m_Sql.strSql.size();
+    if (eUse == QueryUse::kRead) {
+        ResolveMembers(Which, vecFindings);
+        ResolveSort(Which, IsPaged(Which), vecFindings);
+    }
+    if (eUse != QueryUse::kChange && IsPaged(Which)) {
+        AppendPage(Which);
+    }
+    m_nTailEnd = m_Sql.strSql.size();
+    if (!Which.vecMembers.empty()) {
+        for (const size_t nMember : m_vecColumns) {
+            m_Sql.strSql += " " + std::to_string(nMember);
+        }
+    }
+}
+
+void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
+    if (Which.vecMembers.empty()) {
+        m_vecColumns.resize(m_Of.Size());
+        std::iota(m_vecColumns.begin(), m_vecColumns.end(), size_t{0});
+        return;
+    }
+    for (size_t i = 0; i < Which.vecMembers.size(); ++i) {
+        Place Where;
+        Problem Why;
+        if (FindPlace(m_Of, Which.vecMembers[i], Where, Why) && !Where.strPath.empty()) {
+            Why = {FindingCode::kBadMembers, ShownText(Which.vecMembers[i]) + " is a path"};
+        }
+        if (!Why.strMessage.empty()) {
+            Report(vecFindings, Why.eCode, Below("/members", std::to_string(i)), Why.strMessage);
+        }
+        m_vecColumns.push_back(Where.nMember);
+    }
+    std::sort(m_vecColumns.begin(), m_vecColumns.end());
+    m_vecColumns.erase(std::unique(m_vecColumns.begin(), m_vecColumns.end()), m_vecColumns.end());
+}
+
+// The key comes last, so that pages follow each other without gaps, whatever sorting leaves open.
+void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFindings) {
+    std::vector<size_t> vecSorted;
+    for (size_t i = 0; i < Which.vecSort.size(); ++i) {
+        const std::string& strTerm = Which.vecSort[i];
+        Place Where;
+        Problem Why;
+        bool blFound = FindPlace(m_Of, strTerm, Where, Why);
+        const bool blDescending = !blFound && strTerm.compare(0, 1, "-") == 0;
+        if (blDescending) {
+            blFound = FindPlace(m_Of, std::string_view(strTerm).substr(1), Where, Why);
+        }
+        if (!blFound) {
+            Report(vecFindings, Why.eCode, Below("/sort", std::to_string(i)), Why.strMessage);
+            continue;
+        }
+        AppendSort(Where, blDescending);
+        vecSorted.push_back(Where.strPath.empty() ? Where.nMember : Members::kNone);
+    }
+    for (const size_t nMember : m_Of.Key()) {
+        const bool blSorted = std::count(vecSorted.begin(), vecSorted.end(), nMember) > 0;
+        if (!blSorted && (blPaged || !vecSorted.empty())) {
+            AppendSort(Place{nMember, ""}, false);
+        }
+    }
+}
+
+void QueryPlan::AppendSort(const Place& Where, bool blDescending) {
+    const Member& Of = m_Of.At(Where.nMember);
+    const bool blPath = !Where.strPath.empty();
+    m_Sql.strSql += m_Sql.strSql.size() == m_nConditionEnd ? " ORDER BY " : ", ";
+    m_Sql.strSql += blPath ? ValueAt(Of.strColumn, Where.strPath) : Of.strColumn;
+    m_Sql.strSql += !blPath && IsOrderedAsText(Of) ? " COLLATE BINARY" : "";
+    m_Sql.strSql += blDescending ? " DESC" : "";
+}
+
+void QueryPlan::AppendPage(const Query& Which) {
+    m_Sql.strSql += " LIMIT ";
+    m_Sql.Add(Integer(Which.nLimit));
+    m_Sql.strSql += " OFFSET ";
+    m_Sql.Add(Integer(Which.nOffset));
+}
+
+std::string_view QueryPlan::Condition() const {
+    return std::string_view(m_Sql.strSql).substr(0, m_nConditionEnd);
+}
+
+void QueryPlan::AppendWhere(std::string& strSql) const {
+    if (m_nConditionEnd > 0) {
+        strSql.append(" WHERE ").append(Condition());
+    }
+}
+
+void QueryPlan::AppendTail(std::string& strSql) const {
+    strSql.append(m_Sql.strSql, m_nConditionEnd, m_nTailEnd - m_nConditionEnd);
+}
+
+int QueryPlan::Bind(sqlite3_stmt* pStatement, int nFirst) const {
+    for (const BoundValue& Value : m_Sql.vecValues) {
+        const int nResult = Value.Bind(pStatement, nFirst++);
+        if (nResult != SQLITE_OK) {
+            return nResult;
+        }
+    }
+    return SQLITE_OK;
+}
+
+}  // namespace vornjsondb

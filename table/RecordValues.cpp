@@ -1,0 +1,141 @@
+#include "RecordValues.h"
+
+#include <utility>
+
+#include "../src/base/JsonMember.h"
+#include "FindingCodes.h"
+#include "Nearest.h"
+
+namespace vornjsondb {
+
+RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatible,
+                           bool blIgnoreUnknown)
+    : m_Of(Of),
+      m_Codec(Codec),
+      m_blCompatible(blCompatible),
+      m_blIgnoreUnknown(blIgnoreUnknown),
+      m_vecValues(Of.Size()),
+      m_vecJson(Of.Size()),
+      m_strGiven(Of.Size(), '0') {}
+
+void RecordValues::Clear() {
+    m_strGiven.assign(m_strGiven.size(), '0');
+}
+
+bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
+    Clear();
+    if (!jRecord.isObject() || jRecord.empty()) {
+        Report(vecFindings, FindingCode::kNotARecord, "",
+               Shown(jRecord) + " is no record: an object with members is expected");
+        return false;
+    }
+    // Records and definition are sorted alike: one step a member.
+    const std::vector<std::string>& vecNames = m_Of.Names();
+    size_t nNext = 0;
+    const Json::Value::const_iterator itEnd = jRecord.end();
+    for (Json::Value::const_iterator it = jRecord.begin(); it != itEnd; ++it) {
+        const MemberName Name = NameOf(it);
+        int nOrder = 1;
+        while (nNext < vecNames.size() && (nOrder = Compare(NameOf(vecNames[nNext]), Name)) < 0) {
+            ++nNext;
+        }
+        if (nNext < vecNames.size() && nOrder == 0) {
+            SetJson(nNext++, *it, vecFindings);
+        } else if (!m_blIgnoreUnknown) {
+            const std::string strName(Name.pBegin, Name.pEnd);
+            Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
+                   "there is no member " + ShownText(strName) + Suggestion(strName, vecNames));
+        }
+    }
+    return vecFindings.empty();
+}
+
+void RecordValues::Set(size_t nMember, const BoundValue& Value) {
+    m_vecValues[nMember] = Value;
+    m_strGiven[nMember] = '1';
+}
+
+void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
+    const Member& Into = m_Of.At(nMember);
+    const Misfit eMisfit = FitJson(*Into.pType, jValue, m_blCompatible, m_Codec, m_vecJson[nMember],
+                                   m_vecValues[nMember]);
+    m_strGiven[nMember] = '1';
+    if (eMisfit != Misfit::kNone) {
+        ReportMisfit(eMisfit, Into, Shown(jValue), Below("", Into.strName), vecFindings);
+    } else if (Into.blGenerated) {
+        Report(vecFindings, FindingCode::kGenerated, Below("", Into.strName),
+               "member " + Into.strQuoted + " is computed by the table");
+    }
+}
+
+bool RecordValues::FillDefaults(FindingList& vecFindings) {
+    for (size_t i = 0; i < m_Of.Size(); ++i) {
+        const Member& Lacking = m_Of.At(i);
+        if (!Has(i) && Lacking.pjDefault != nullptr && !Lacking.blGenerated) {
+            SetJson(i, *Lacking.pjDefault, vecFindings);
+        }
+    }
+    return vecFindings.empty();
+}
+
+bool RecordValues::HasKey(FindingList& vecFindings) const {
+    if (m_Of.Key().empty()) {
+        Report(vecFindings, FindingCode::kNoKey, "",
+               "the table has no key that tells records apart");
+    }
+    for (const size_t nMember : m_Of.Key()) {
+        if (!Has(nMember) || At(nMember).eKind == BoundValue::Kind::kNull) {
+            Report(vecFindings, FindingCode::kMissingKey, Below("", m_Of.At(nMember).strName),
+                   "the key's member " + m_Of.At(nMember).strQuoted + " has no value");
+        }
+    }
+    return vecFindings.empty();
+}
+
+int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo) const {
+    for (size_t i = 0; i < m_vecValues.size(); ++i) {
+        if (Has(i) && (blKeyToo || !m_Of.At(i).blKey)) {
+            const int nResult = m_vecValues[i].Bind(pStatement, nNext++);
+            if (nResult != SQLITE_OK) {
+                return nResult;
+            }
+        }
+    }
+    return SQLITE_OK;
+}
+
+int RecordValues::BindKey(sqlite3_stmt* pStatement, int& nNext) const {
+    for (const size_t nMember : m_Of.Key()) {
+        const int nResult = m_vecValues[nMember].Bind(pStatement, nNext++);
+        if (nResult != SQLITE_OK) {
+            return nResult;
+        }
+    }
+    return SQLITE_OK;
+}
+
+void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShown,
+                  std::string strPath, FindingList& vecFindings) {
+    struct Row {
+        Misfit eMisfit;
+        FindingCode eCode;
+        const char* szReason;
+    };
+    static constexpr Row kRows[] = {
+        {Misfit::kKind, FindingCode::kWrongKind, " is another kind of value: expected is "},
+        {Misfit::kRange, FindingCode::kOutOfRange, " is out of range: expected is "},
+        {Misfit::kNotANumber, FindingCode::kNotANumber, " is or holds NaN: expected is "},
+        {Misfit::kDepth, FindingCode::kTooDeep,
+         " is nested too deeply to be read back: expected is "},
+        {Misfit::kUnreadable, FindingCode::kOldCannotRead,
+         " could not be read back by a VornJsonDbApi, although it is "},
+    };
+    const Row* pRow = kRows;
+    while (pRow->eMisfit != eMisfit) {
+        ++pRow;
+    }
+    Report(vecFindings, pRow->eCode, std::move(strPath),
+           "member " + Into.strQuoted + ": " + strShown + pRow->szReason + Expected(*Into.pType));
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,177 @@
+#include "RowReader.h"
+
+#include <algorithm>
+#include <new>
+#include <utility>
+
+#include "../src/base/JsonMemory.h"
+
+namespace vornjsondb {
+
+namespace {
+
+using Kind = VORN_JSON_DB::Row::Kind;
+
+// First the pointer, then the length: the other way round SQLite may convert in between. An empty
+// blob has no pointer, and neither has a text for which there is no memory.
+std::string_view TextOf(sqlite3_stmt* pStatement, int nColumn) {
+    const auto* pText = sqlite3_column_text(pStatement, nColumn);
+    if (pText == nullptr) {
+        if (sqlite3_column_bytes(pStatement, nColumn) != 0 ||
+            sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
+            throw std::bad_alloc();
+        }
+        return "";
+    }
+    return {reinterpret_cast<const char*>(pText),
+            static_cast<size_t>(sqlite3_column_bytes(pStatement, nColumn))};
+}
+
+Json::Value TextValue(std::string_view strText) {
+    return {strText.data(), strText.data() + strText.size()};
+}
+
+Json::Value ReadJson(std::string_view strText, JsonCodec& Codec) {
+    Json::Value jRead;
+    if (!Codec.Read(strText.data(), strText.size(), jRead)) {
+        jRead = TextValue(strText);
+    }
+    return jRead;
+}
+
+// What a text member holds in nearly every row, without asking first what kind of value it is.
+bool ReadUsualText(sqlite3_stmt* pStatement, int nColumn, Json::Value& jOut) {
+    const auto* pText = reinterpret_cast<const char*>(sqlite3_column_text(pStatement, nColumn));
+    if (pText == nullptr) {
+        return false;
+    }
+    Json::Value jText(pText, pText + sqlite3_column_bytes(pStatement, nColumn));
+    jOut.swapPayload(jText);
+    return true;
+}
+
+Json::Value ReadColumn(sqlite3_stmt* pStatement, int nColumn, Kind eKind, JsonCodec& Codec) {
+    switch (eKind) {
+        case Kind::kBoolean:
+            return sqlite3_column_int(pStatement, nColumn) == 1;
+        case Kind::kInteger:
+            return static_cast<Json::Int64>(sqlite3_column_int64(pStatement, nColumn));
+        case Kind::kReal:
+            return sqlite3_column_double(pStatement, nColumn);
+        case Kind::kJson:
+            return ReadJson(TextOf(pStatement, nColumn), Codec);
+        default:
+            return TextValue(TextOf(pStatement, nColumn));
+    }
+}
+
+}  // namespace
+
+Kind KindOfColumn(sqlite3_stmt* pStatement, int nColumn, BoundKind eKind) {
+    switch (sqlite3_column_type(pStatement, nColumn)) {
+        case SQLITE_INTEGER: {
+            if (eKind == BoundKind::kBoolean) {
+                const sqlite3_int64 nValue = sqlite3_column_int64(pStatement, nColumn);
+                return nValue == 0 || nValue == 1 ? Kind::kBoolean : Kind::kInteger;
+            }
+            if (eKind == BoundKind::kReal) {
+                return Kind::kReal;
+            }
+            return eKind == BoundKind::kText ? Kind::kText : Kind::kInteger;
+        }
+        case SQLITE_FLOAT:
+            return eKind == BoundKind::kText ? Kind::kText : Kind::kReal;
+        case SQLITE_TEXT:
+            return eKind == BoundKind::kObject || eKind == BoundKind::kList ||
+                           eKind == BoundKind::kJson
+                       ? Kind::kJson
+                       : Kind::kText;
+        case SQLITE_BLOB:
+            return Kind::kBlob;
+        default:
+            return Kind::kNull;
+    }
+}
+
+RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
+                     VORN_JSON_DB::Nulls eNulls) try
+    : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
+    for (size_t i = 0; i < m_vecColumns.size(); ++i) {
+        const Member& Shown = Of.At(m_vecColumns[i]);
+        const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
+                                (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
+        m_vecInKeyOrder.push_back(
+            Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
+        m_jEmpty[Shown.strName] = Json::Value();
+        m_vecNames.push_back(Shown.strName);
+    }
+    // Members are numbered in the order of their names.
+    std::sort(m_vecInKeyOrder.begin(), m_vecInKeyOrder.end(),
+              [](const Column& Left, const Column& Right) { return Left.nMember < Right.nMember; });
+}
+VORN_JSON_MEMORY_TO_BAD_ALLOC
+
+// The empty record is copied and its values replaced: no search for a name in any row.
+void RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec, Json::Value& jRecord) const try {
+    Json::Value jFilled = m_jEmpty;
+    Json::Value::iterator itMember = jFilled.begin();
+    bool blLeaveOut = false;
+    for (const Column& Each : m_vecInKeyOrder) {
+        Json::Value& jMember = *itMember;
+        ++itMember;
+        if (Each.eKind == BoundKind::kText && ReadUsualText(pStatement, Each.nColumn, jMember)) {
+            continue;
+        }
+        const Kind eKind = KindOfColumn(pStatement, Each.nColumn, Each.eKind);
+        if (eKind != Kind::kNull) {
+            Json::Value jValue = ReadColumn(pStatement, Each.nColumn, eKind, Codec);
+            jMember.swapPayload(jValue);
+        }
+        blLeaveOut = blLeaveOut || (eKind == Kind::kNull && !Each.blKeepNull);
+    }
+    if (blLeaveOut) {
+        LeaveOutNulls(pStatement, jFilled);
+    }
+    jRecord.swapPayload(jFilled);
+}
+VORN_JSON_MEMORY_TO_BAD_ALLOC
+
+void RowReader::LeaveOutNulls(sqlite3_stmt* pStatement, Json::Value& jRecord) const {
+    for (const Column& Each : m_vecInKeyOrder) {
+        const bool blNull = sqlite3_column_type(pStatement, Each.nColumn) == SQLITE_NULL;
+        if (blNull && !Each.blKeepNull) {
+            jRecord.removeMember(m_vecNames[static_cast<size_t>(Each.nColumn)]);
+        }
+    }
+}
+
+}  // namespace vornjsondb
+
+namespace VORN_JSON_DB {
+
+int Row::Size() const {
+    return static_cast<int>(m_From.vecColumns.size());
+}
+
+const std::string& Row::Name(int nColumn) const {
+    return m_From.Of.Names()[m_From.vecColumns[static_cast<size_t>(nColumn)]];
+}
+
+Row::Kind Row::KindOf(int nColumn) const {
+    const size_t nMember = m_From.vecColumns[static_cast<size_t>(nColumn)];
+    return vornjsondb::KindOfColumn(m_From.pStatement, nColumn, m_From.Of.At(nMember).Kind());
+}
+
+std::int64_t Row::Integer(int nColumn) const {
+    return sqlite3_column_int64(m_From.pStatement, nColumn);
+}
+
+double Row::Real(int nColumn) const {
+    return sqlite3_column_double(m_From.pStatement, nColumn);
+}
+
+std::string_view Row::Text(int nColumn) const {
+    return vornjsondb::TextOf(m_From.pStatement, nColumn);
+}
+
+}  // namespace VORN_JSON_DB

@@ -1,0 +1,54 @@
+// Columns into records and rows, by the members' types.
+
+#ifndef VORN_TABLE_ROW_READER_H
+#define VORN_TABLE_ROW_READER_H
+
+#include <vector>
+
+#include <json/json.h>
+#include <sqlite3.h>
+
+#include "../src/base/JsonText.h"
+#include "Members.h"
+
+namespace vornjsondb {
+
+class RowReader {
+  public:
+    // For rows whose columns are these members. Of must outlive it.
+    RowReader(const Members& Of, std::vector<size_t> vecColumns, VORN_JSON_DB::Nulls eNulls);
+
+    // The statement's row as a record.
+    void Read(sqlite3_stmt* pStatement, JsonCodec& Codec, Json::Value& jRecord) const;
+
+    const std::vector<size_t>& Columns() const { return m_vecColumns; }
+
+  private:
+    struct Column {
+        int nColumn;
+        size_t nMember;
+        BoundKind eKind;
+        bool blKeepNull;
+    };
+
+    void LeaveOutNulls(sqlite3_stmt* pStatement, Json::Value& jRecord) const;
+
+    std::vector<size_t> m_vecColumns;
+    std::vector<std::string> m_vecNames;
+    std::vector<Column> m_vecInKeyOrder;
+    Json::Value m_jEmpty;  // every member, with null
+};
+
+// What a column holds: its member's kind where the stored value fits it, else the stored one.
+VORN_JSON_DB::Row::Kind KindOfColumn(sqlite3_stmt* pStatement, int nColumn, BoundKind eKind);
+
+}  // namespace vornjsondb
+
+// What a Row shows.
+struct VORN_JSON_DB::Row::Source {
+    sqlite3_stmt* pStatement;
+    const vornjsondb::Members& Of;
+    const std::vector<size_t>& vecColumns;
+};
+
+#endif  // VORN_TABLE_ROW_READER_H

@@ -1,0 +1,93 @@
+#include "Statements.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace vornjsondb {
+
+namespace {
+
+// They are looked through one by one, and each takes some KiB.
+constexpr size_t kMostStatements = 1000;
+
+}  // namespace
+
+int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out) {
+    sqlite3_stmt* pStatement = nullptr;
+    const int nResult = sqlite3_prepare_v3(pDb, strSql.c_str(), static_cast<int>(strSql.size()) + 1,
+                                           SQLITE_PREPARE_PERSISTENT, &pStatement, nullptr);
+    Out.reset(pStatement);
+    return nResult;
+}
+
+Statement::Statement(Statement&& From) noexcept
+    : m_pHome(From.m_pHome),
+      m_pStatement(std::move(From.m_pStatement)),
+      m_strShape(std::move(From.m_strShape)) {}
+
+Statement& Statement::operator=(Statement&& From) noexcept {
+    std::swap(m_pHome, From.m_pHome);
+    std::swap(m_pStatement, From.m_pStatement);
+    std::swap(m_strShape, From.m_strShape);
+    return *this;
+}
+
+Statement::~Statement() {
+    if (m_pStatement) {
+        m_pHome->GiveBack(*this);
+    }
+}
+
+int Statement::Finish() const {
+    int nResult = SQLITE_ROW;
+    while (nResult == SQLITE_ROW) {
+        nResult = Step();
+    }
+    const int nReset = sqlite3_reset(m_pStatement.get());
+    return nResult == SQLITE_DONE ? nReset : nResult;
+}
+
+Statements::Statements(sqlite3* pDb, size_t nMost)
+    : m_pDb(pDb), m_nMost(std::min(nMost, kMostStatements)) {
+    // Giving a statement back must not need memory.
+    m_vecKept.reserve(m_nMost);
+}
+
+bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
+    const auto itFound =
+        std::find_if(m_vecKept.rbegin(), m_vecKept.rend(),
+                     [strShape](const Kept& Each) { return Each.strShape == strShape; });
+    if (itFound == m_vecKept.rend()) {
+        return false;
+    }
+    Lent.m_pHome = this;
+    Lent.m_pStatement = std::move(itFound->pStatement);
+    Lent.m_strShape = std::move(itFound->strShape);
+    m_vecKept.erase(std::next(itFound).base());
+    return true;
+}
+
+int Statements::Prepare(std::string_view strShape, const std::string& strSql, Statement& Lent) {
+    OwnStatement pStatement;
+    const int nResult = vornjsondb::Prepare(m_pDb, strSql, pStatement);
+    if (nResult == SQLITE_OK) {
+        Lent.m_strShape = strShape;
+        Lent.m_pStatement = std::move(pStatement);
+        Lent.m_pHome = this;
+    }
+    return nResult;
+}
+
+void Statements::GiveBack(Statement& Lent) {
+    sqlite3_reset(Lent.m_pStatement.get());
+    sqlite3_clear_bindings(Lent.m_pStatement.get());
+    if (m_vecKept.size() == m_nMost) {
+        if (m_nMost == 0) {
+            return;
+        }
+        m_vecKept.erase(m_vecKept.begin());
+    }
+    m_vecKept.push_back(Kept{std::move(Lent.m_strShape), std::move(Lent.m_pStatement)});
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,85 @@
+// The prepared statements that a Table keeps.
+
+#ifndef VORN_TABLE_STATEMENTS_H
+#define VORN_TABLE_STATEMENTS_H
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include <sqlite3.h>
+
+namespace vornjsondb {
+
+struct FinalizeStatement {
+    void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }
+};
+using OwnStatement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
+
+// Prepares a statement that is used once. Returns SQLite's result.
+int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out);
+
+class Statements;
+
+// A statement on loan. Given back at the end of its life: reset, so that it locks nothing, and with
+// its bindings cleared, so that it points to nothing of the caller's.
+class Statement {
+  public:
+    Statement() = default;
+    Statement(Statement&& From) noexcept;
+    Statement& operator=(Statement&& From) noexcept;
+    ~Statement();
+
+    sqlite3_stmt* Get() const { return m_pStatement.get(); }
+    int Step() const { return sqlite3_step(m_pStatement.get()); }
+
+    // Steps to the end and resets; the result of whichever failed first, or SQLITE_OK. A statement
+    // has done its work only then: a commit may fail as late as in the reset.
+    int Finish() const;
+
+  private:
+    friend class Statements;
+
+    Statements* m_pHome = nullptr;
+    OwnStatement m_pStatement;
+    std::string m_strShape;
+};
+
+// Keeps the statements that were used last, each under a text that tells its shape. One that is on
+// loan is not here, so a callback may ask for the same one and gets another.
+class Statements {
+  public:
+    Statements(sqlite3* pDb, size_t nMost);
+    Statements(const Statements&) = delete;
+    Statements& operator=(const Statements&) = delete;
+    ~Statements() = default;
+
+    // Lends the statement of that shape, prepared from what fnSql returns when it is not here.
+    // Returns SQLite's result.
+    template <typename MakeSql>
+    int Take(std::string_view strShape, MakeSql&& fnSql, Statement& Lent) {
+        return TakeKept(strShape, Lent) ? SQLITE_OK : Prepare(strShape, fnSql(), Lent);
+    }
+
+  private:
+    friend class Statement;
+
+    struct Kept {
+        std::string strShape;
+        OwnStatement pStatement;
+    };
+
+    bool TakeKept(std::string_view strShape, Statement& Lent);
+    int Prepare(std::string_view strShape, const std::string& strSql, Statement& Lent);
+    void GiveBack(Statement& Lent);
+
+    sqlite3* m_pDb;
+    size_t m_nMost;
+    std::vector<Kept> m_vecKept;  // the one used last at the end
+};
+
+}  // namespace vornjsondb
+
+#endif  // VORN_TABLE_STATEMENTS_H

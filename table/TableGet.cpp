@@ -1,0 +1,78 @@
+// Reading the record of one key.
+
+#include <utility>
+
+#include "../src/base/JsonMember.h"
+#include "FindingCodes.h"
+#include "RecordWriter.h"
+#include "SelectSql.h"
+
+namespace vornjsondb {
+
+std::string SelectSql(const Members& Of, const std::vector<size_t>& vecColumns) {
+    std::string strSql = "SELECT ";
+    for (size_t i = 0; i < vecColumns.size(); ++i) {
+        strSql += (i == 0 ? "" : ", ") + Of.At(vecColumns[i]).strColumn;
+    }
+    return strSql + " FROM " + Of.QuotedTable();
+}
+
+std::string SelectOneSql(const Table::Parts& From, bool blByRowid) {
+    const std::string strSql = SelectSql(From.Of, From.WholeRow.Columns());
+    return blByRowid ? strSql + " WHERE " + From.Of.QuotedTable() + "." + From.strRowid + " = ?"
+                     : strSql + WhereKey(From.Of);
+}
+
+}  // namespace vornjsondb
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using Parts = Table::Parts;
+
+// The key's values, from the value of its only member or from an object.
+bool TakeKey(Parts& Of, const Json::Value& jKey, FindingList& vecFindings) {
+    const std::vector<size_t>& vecKey = Of.Of.Key();
+    if (vecKey.size() == 1 &&
+        vornjsondb::FindMember(jKey, Of.Of.At(vecKey[0]).strName) == nullptr) {
+        Of.Wanted.Clear();
+        Of.Wanted.SetJson(vecKey[0], jKey, vecFindings);
+    } else {
+        Of.Wanted.Take(jKey, vecFindings);
+    }
+    return vecFindings.empty() && Of.Wanted.HasKey(vecFindings);
+}
+
+}  // namespace
+
+Status Table::Get(const Json::Value& jKey, Json::Value& jRecord) {
+    constexpr char kDo[] = "get a record from";
+    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    const vornjsondb::Doing What = m_pParts->Do(kDo);
+    FindingList vecFindings;
+    if (!TakeKey(*m_pParts, jKey, vecFindings)) {
+        return vornjsondb::FromFindings(std::move(vecFindings), What);
+    }
+    vornjsondb::Statement Lent;
+    int nResult = SQLITE_OK;
+    Outcome = vornjsondb::FirstStep(
+        *m_pParts, What, "key", [&] { return vornjsondb::SelectOneSql(*m_pParts, false); },
+        [&](sqlite3_stmt* pStatement) {
+            int nNext = 1;
+            return m_pParts->Wanted.BindKey(pStatement, nNext);
+        },
+        Lent, nResult);
+    if (Outcome.Ok() && nResult == SQLITE_ROW) {
+        m_pParts->WholeRow.Read(Lent.Get(), m_pParts->Codec, jRecord);
+    } else if (Outcome.Ok()) {
+        return vornjsondb::Fail(StatusCode::kNotFound, What,
+                                "no record has the key " + vornjsondb::Shown(jKey));
+    }
+    return Outcome;
+}
+
+}  // namespace VORN_JSON_DB

@@ -1,0 +1,58 @@
+// What a Table holds, for all files that are part of it.
+
+#ifndef VORN_TABLE_TABLE_PARTS_H
+#define VORN_TABLE_TABLE_PARTS_H
+
+#include <VornJsonDbTable.h>
+
+#include <string>
+#include <vector>
+
+#include <sqlite3.h>
+
+#include "../src/base/JsonText.h"
+#include "Members.h"
+#include "RecordValues.h"
+#include "RowReader.h"
+#include "Statements.h"
+
+namespace vornjsondb {
+struct RealTable;
+}
+
+struct VORN_JSON_DB::Table::Parts {
+    Parts(sqlite3* pDbOpen, const std::string& strTable, const Json::Value& jDefinition,
+          const Options& HowToOpen, FindingList& vecFindings);
+
+    // Creates the table where Options ask for it, and learns what only the database knows.
+    Status Meet();
+
+    vornjsondb::Doing Do(const char* szDo) const { return {szDo, &Of.Table()}; }
+
+    void Learn(const vornjsondb::RealTable& Real);
+
+    sqlite3* pDb;
+    Options How;
+    vornjsondb::Members Of;
+    std::vector<std::string> vecKeyNames;
+    std::string strRowid;  // a name of the rowid that no column has; empty: rows have none
+    vornjsondb::Statements Kept;
+    vornjsondb::JsonCodec Codec;
+    vornjsondb::RowReader WholeRow;
+    vornjsondb::RecordValues Values;  // of the record that is being written
+    vornjsondb::RecordValues Wanted;  // the key that is being looked for
+    int nReading = 0;                 // callbacks that are running
+};
+
+namespace vornjsondb {
+
+using VORN_JSON_DB::OnDuplicate;
+using VORN_JSON_DB::Written;
+using Table = VORN_JSON_DB::Table;
+
+// A failure when the Table is not open, or is to be changed by a callback that reads from it.
+Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
+
+}  // namespace vornjsondb
+
+#endif  // VORN_TABLE_TABLE_PARTS_H

@@ -1,0 +1,99 @@
+// Writing one record.
+
+#include <utility>
+
+#include "Attempt.h"
+#include "FindingCodes.h"
+#include "RecordWriter.h"
+#include "SelectSql.h"
+#include "TableParts.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using vornjsondb::Doing;
+using vornjsondb::FailBySqlite;
+using Parts = Table::Parts;
+
+// Reads the row that was just written. A row that is new is found by its rowid, which the key may
+// not tell yet; all others by their key.
+Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& jStored) {
+    const bool blByRowid = eWritten == Written::kInserted && !From.strRowid.empty();
+    vornjsondb::Statement Lent;
+    int nResult = From.Kept.Take(
+        blByRowid ? "rowid" : "key", [&] { return vornjsondb::SelectOneSql(From, blByRowid); },
+        Lent);
+    if (nResult == SQLITE_OK) {
+        int nNext = 1;
+        nResult = blByRowid ? sqlite3_bind_int64(Lent.Get(), 1, sqlite3_last_insert_rowid(From.pDb))
+                            : From.Values.BindKey(Lent.Get(), nNext);
+    }
+    if (nResult == SQLITE_OK) {
+        nResult = Lent.Step();
+    }
+    if (nResult == SQLITE_ROW) {
+        From.WholeRow.Read(Lent.Get(), From.Codec, jStored);
+        return {};
+    }
+    return nResult == SQLITE_DONE
+               ? vornjsondb::Fail(StatusCode::kNotFound, What, "the row is gone once it is written")
+               : FailBySqlite(From.pDb, nResult, What);
+}
+
+// A single statement is whole by itself.
+bool IsOneStatement(OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
+    const bool blOne = eOnDuplicate == OnDuplicate::kStop || eOnDuplicate == OnDuplicate::kSkip;
+    return blOne && pjStored == nullptr;
+}
+
+Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What,
+             Json::Value* pjStored, Written& eWritten) {
+    const auto fnSteps = [&]() -> Status {
+        // Once for each try: the first one may have filled defaults.
+        FindingList vecFindings;
+        bool blFits = Into.Values.Take(jRecord, vecFindings);
+        if (blFits && eOnDuplicate != OnDuplicate::kStop) {
+            blFits = Into.Values.HasKey(vecFindings);
+        }
+        if (!blFits) {
+            return vornjsondb::FromFindings(std::move(vecFindings), What);
+        }
+        Status Outcome = WriteRecord(Into, Into.Values, eOnDuplicate, What, eWritten);
+        if (Outcome.Ok() && pjStored != nullptr) {
+            Outcome = ReadBack(Into, eWritten, What, *pjStored);
+        }
+        return Outcome;
+    };
+    return IsOneStatement(eOnDuplicate, pjStored)
+               ? vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, fnSteps)
+               : vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnSteps);
+}
+
+}  // namespace
+
+Status Table::Create(const Json::Value& jRecord, Json::Value* pjStored) {
+    return Save(jRecord, OnDuplicate::kStop, pjStored, nullptr);
+}
+
+Status Table::Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate, Json::Value* pjStored,
+                   Written* peWritten) {
+    constexpr char kDo[] = "save a record in";
+    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, true);
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    Json::Value jStored;
+    Written eWritten = Written::kInserted;
+    Outcome = Write(*m_pParts, jRecord, eOnDuplicate, m_pParts->Do(kDo),
+                    pjStored == nullptr ? nullptr : &jStored, eWritten);
+    if (Outcome.Ok() && pjStored != nullptr) {
+        pjStored->swapPayload(jStored);
+    }
+    if (Outcome.Ok() && peWritten != nullptr) {
+        *peWritten = eWritten;
+    }
+    return Outcome;
+}
+
+}  // namespace VORN_JSON_DB

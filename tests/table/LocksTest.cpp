@@ -1,0 +1,151 @@
+// Two connections on one file, and the time that passes between them.
+
+#include <cstdio>
+#include <numeric>
+
+#include "FakeTime.h"
+#include "TableFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+class LocksTest : public testing::Test {
+  protected:
+    LocksTest() {
+        EXPECT_EQ(SQLITE_OK, sqlite3_open(m_strFile.c_str(), &m_pDb));
+        EXPECT_EQ(SQLITE_OK, sqlite3_open(m_strFile.c_str(), &m_pOther));
+        Options How;
+        How.blCreateTable = true;
+        EXPECT_EQ("ok", Text(m_Table.Open(m_pDb, "task", Parse(kTasks), How)));
+        Other("CREATE TABLE unrelated (a)");
+    }
+    ~LocksTest() override {
+        m_Table = Table();
+        EXPECT_EQ(SQLITE_OK, sqlite3_close(m_pOther));
+        EXPECT_EQ(SQLITE_OK, sqlite3_close(m_pDb));
+        std::remove(m_strFile.c_str());
+        std::remove((m_strFile + "-journal").c_str());
+    }
+    LocksTest(const LocksTest&) = delete;
+    LocksTest& operator=(const LocksTest&) = delete;
+
+    void Other(const char* szSql) {
+        EXPECT_EQ(SQLITE_OK, sqlite3_exec(m_pOther, szSql, nullptr, nullptr, nullptr))
+            << sqlite3_errmsg(m_pOther);
+    }
+
+    std::string Create(int nId) {
+        Json::Value jRecord;
+        jRecord["id"] = nId;
+        return Text(m_Table.Create(jRecord, &m_jStored));
+    }
+
+    std::string m_strFile = testing::TempDir() + "locks-" +
+                            testing::UnitTest::GetInstance()->current_test_info()->name();
+    sqlite3* m_pDb = nullptr;
+    sqlite3* m_pOther = nullptr;
+    Table m_Table;
+    Json::Value m_jStored;
+};
+
+TEST_F(LocksTest, WriterThatGoesAwayIsWaitedFor) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 3) {
+            Other("COMMIT");
+        }
+    });
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ(R"({"done":false,"id":1})", Text(m_jStored));
+    EXPECT_EQ((std::vector<long>{1, 2, 4}), Time.Pauses());
+}
+
+TEST_F(LocksTest, WriterThatStaysIsReportedWhenTheTimeIsOver) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time;
+    Json::Value jRecord = Parse(R"({"id": 1})");
+    const Status Outcome = m_Table.Create(jRecord);
+    EXPECT_EQ("locked: cannot save a record in table \"task\": database is locked (waited 5000 ms)",
+              Text(Outcome));
+    EXPECT_EQ(Retry::kCall, Outcome.Advice());
+    EXPECT_EQ(SQLITE_BUSY, Outcome.SqliteCode());
+    EXPECT_EQ(5000, std::accumulate(Time.Pauses().begin(), Time.Pauses().end(), 0L));
+    EXPECT_EQ(50, Time.Pauses()[10]);
+    Other("COMMIT");
+    EXPECT_EQ("ok", Create(1));
+}
+
+TEST_F(LocksTest, ReaderThatStandsInTheWayOfACommitIsWaitedFor) {
+    EXPECT_EQ("ok", Create(1));
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 2) {
+            Other("COMMIT");
+        }
+    });
+    EXPECT_EQ("ok", Create(2));
+    EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
+}
+
+TEST_F(LocksTest, InsideOfATransactionThereIsNoWaiting) {
+    EXPECT_EQ("ok", Create(1));
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb, Transaction::Mode::kDeferred)));
+    Json::Value jRecord;
+    EXPECT_EQ("ok", Text(m_Table.Get(1, jRecord)));
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time;
+    const Status Outcome = m_Table.Create(Parse(R"({"id": 2})"));
+    EXPECT_EQ("locked: cannot save a record in table \"task\": database is locked", Text(Outcome));
+    EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
+    EXPECT_TRUE(Time.Pauses().empty());
+    EXPECT_EQ("ok", Text(All.Rollback()));
+    Other("COMMIT");
+}
+
+TEST_F(LocksTest, BeginWaitsAndCommitWaits) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 1) {
+            Other("COMMIT; BEGIN; SELECT * FROM task");
+        } else if (nPause == 3) {
+            Other("COMMIT");
+        }
+    });
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ("ok", Text(All.Commit()));
+    EXPECT_EQ((std::vector<long>{1, 1, 2}), Time.Pauses());
+}
+
+TEST_F(LocksTest, CommitThatWaitedInVainCanBeTriedAgain) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time;
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb, Transaction::Mode::kImmediate, 3)));
+    EXPECT_EQ("ok", Create(1));
+    const Status Outcome = All.Commit();
+    EXPECT_EQ("locked: cannot commit a transaction: database is locked (waited 3 ms)",
+              Text(Outcome));
+    EXPECT_EQ(Retry::kCall, Outcome.Advice());
+    EXPECT_TRUE(All.IsOpen());
+    Other("COMMIT");
+    EXPECT_EQ("ok", Text(All.Commit()));
+    EXPECT_FALSE(All.IsOpen());
+}
+
+TEST_F(LocksTest, CallersBusyHandlerStays) {
+    static int s_nCalls = 0;
+    sqlite3_busy_handler(
+        m_pDb, [](void*, int) { return ++s_nCalls > 0 ? 0 : 0; }, nullptr);
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time([this](int) { Other("COMMIT"); });
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ(1, s_nCalls);
+}
+
+}  // namespace
+
+}  // namespace VORN_JSON_DB

@@ -1,0 +1,92 @@
+#include "TableFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using TransactionTest = TableTest;
+
+TEST_F(TransactionTest, LeavingTheScopeRollsBack) {
+    Open();
+    {
+        Transaction All;
+        EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+        EXPECT_TRUE(All.IsOpen());
+        Create(R"({"id": 1})");
+    }
+    EXPECT_EQ("0", Rows("SELECT count(*) FROM task"));
+    EXPECT_NE(0, sqlite3_get_autocommit(m_pDb));
+}
+
+TEST_F(TransactionTest, NestedOnesAreSavepoints) {
+    Open();
+    Transaction Outer;
+    EXPECT_EQ("ok", Text(Outer.Begin(m_pDb)));
+    Create(R"({"id": 1})");
+    {
+        Transaction Inner;
+        EXPECT_EQ("ok", Text(Inner.Begin(m_pDb)));
+        Create(R"({"id": 2})");
+    }
+    {
+        Transaction Inner;
+        EXPECT_EQ("ok", Text(Inner.Begin(m_pDb)));
+        Create(R"({"id": 3})");
+        EXPECT_EQ("ok", Text(Inner.Commit()));
+    }
+    EXPECT_EQ("ok", Text(Outer.Commit()));
+    EXPECT_EQ("1;3", Rows("SELECT id FROM task ORDER BY id"));
+}
+
+TEST_F(TransactionTest, CallsOutOfTurnAreMisuse) {
+    Transaction All;
+    EXPECT_EQ("misuse: cannot commit a transaction: none was begun", Text(All.Commit()));
+    EXPECT_EQ("misuse: cannot roll a transaction back: none was begun", Text(All.Rollback()));
+    EXPECT_EQ("misuse: cannot begin a transaction: there is no connection",
+              Text(All.Begin(nullptr)));
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    EXPECT_EQ("misuse: cannot begin a transaction: it is open already", Text(All.Begin(m_pDb)));
+}
+
+TEST_F(TransactionTest, TransactionThatAFailureHasUndoneSaysSo) {
+    Open();
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    Run("ROLLBACK");
+    const Status Outcome = All.Commit();
+    EXPECT_EQ("misuse: cannot commit a transaction: an earlier failure has undone it",
+              Text(Outcome));
+    EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
+    EXPECT_FALSE(All.IsOpen());
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    Run("ROLLBACK");
+    EXPECT_EQ("ok", Text(All.Rollback()));
+}
+
+TEST_F(TransactionTest, CommitThatAForeignKeyForbidsLeavesTheTransaction) {
+    Run("PRAGMA foreign_keys = ON; CREATE TABLE p (id INTEGER PRIMARY KEY);"
+        "CREATE TABLE c (p REFERENCES p(id) DEFERRABLE INITIALLY DEFERRED)");
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    Run("INSERT INTO c VALUES (1)");
+    EXPECT_EQ("constraint: cannot commit a transaction: FOREIGN KEY constraint failed",
+              Text(All.Commit()));
+    EXPECT_TRUE(All.IsOpen());
+    Run("INSERT INTO p VALUES (1)");
+    EXPECT_EQ("ok", Text(All.Commit()));
+}
+
+TEST_F(TransactionTest, FullDiskUndoesItAllAndTheFirstReasonIsTold) {
+    Open();
+    Run("PRAGMA page_size = 512; VACUUM; PRAGMA max_page_count = 8");
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    Json::Value jRecord;
+    jRecord["name"] = std::string(100000, 'x');
+    EXPECT_EQ("disk-full: cannot save a record in table \"task\": database or disk is full",
+              Text(m_Table.Create(jRecord, &jRecord)));
+}
+
+}  // namespace
+
+}  // namespace VORN_JSON_DB
