@@ -1,8 +1,7 @@
 #include "JsonValues.h"
 
 #include <cstring>
-#include <memory>
-#include <sstream>
+#include <string>
 
 #include "HostileValue.h"
 
@@ -32,64 +31,7 @@ bool SameChildren(const Json::Value& jLeft, const Json::Value& jRight) {
     return itRight == jRight.end();
 }
 
-// The strict JSON of an input; false when it is none.
-bool Parse(const std::string& strText, Json::Value& jOut) {
-    static const std::unique_ptr<Json::CharReader> s_pReader = [] {
-        Json::CharReaderBuilder Builder;
-        Json::CharReaderBuilder::strictMode(&Builder.settings_);
-        Builder["strictRoot"] = false;
-        // Twin keys stop the reader in strict mode, and are worth a try here.
-        Builder["rejectDupKeys"] = false;
-        return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
-    }();
-    try {
-        return s_pReader->parse(strText.data(), strText.data() + strText.size(), &jOut, nullptr);
-    } catch (const Json::Exception&) {
-        return false;
-    }
-}
-
 }  // namespace
-
-Json::Value ReadLeniently(const char* szText) {
-    static const std::unique_ptr<Json::CharReader> s_pReader = [] {
-        Json::CharReaderBuilder Builder;
-        Builder["collectComments"] = false;
-        return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
-    }();
-    Json::Value jResult;
-    try {
-        s_pReader->parse(szText, szText + std::strlen(szText), &jResult, nullptr);
-    } catch (const Json::RuntimeError&) {
-        // Nested too deep: what was read up to there stays.
-    }
-    return jResult;
-}
-
-std::string Compact(const Json::Value& jValue) {
-    static const std::unique_ptr<Json::StreamWriter> s_pWriter = [] {
-        Json::StreamWriterBuilder Builder;
-        Builder["indentation"] = "";
-        Builder["commentStyle"] = "None";
-        Builder["emitUTF8"] = true;
-        return std::unique_ptr<Json::StreamWriter>(Builder.newStreamWriter());
-    }();
-    std::ostringstream Stream;
-    s_pWriter->write(jValue, &Stream);
-    return Stream.str();
-}
-
-Json::Value Definition(const std::string& strTable, const std::string& strMembers) {
-    Json::Value jDefinition;
-    std::istringstream Stream(strMembers);
-    for (std::string strOne; std::getline(Stream, strOne, ',');) {
-        // The type may hold colons, a name does not.
-        const size_t nColon = strOne.find(':');
-        jDefinition[strTable]["member"][strOne.substr(0, nColon)]["cpptype"] =
-            strOne.substr(nColon + 1);
-    }
-    return jDefinition;
-}
 
 bool IsHostile(const uint8_t* pData, size_t nSize) {
     return nSize > 0 && pData[0] == 0;
@@ -100,7 +42,7 @@ bool TakeValue(const uint8_t* pData, size_t nSize, Json::Value& jOut) {
         jOut = HostileValue(pData + 1, nSize - 1);
         return true;
     }
-    return Parse(std::string(reinterpret_cast<const char*>(pData), nSize), jOut);
+    return jsonhelpers::Parse(std::string(reinterpret_cast<const char*>(pData), nSize), jOut);
 }
 
 Json::Value WithoutHoles(const Json::Value& jValue) {

@@ -142,7 +142,7 @@ report() {
         awk '{ printf "| %s | %d | %d | %d | %d | %d | %d |\n", $1, $2, $3, $4, $5, $6, $7 }'
 }
 
-mapfile -t shared_sources < <(find src fuzz -name '*.cpp' ! -path 'fuzz/[a-z]*' | sort)
+mapfile -t shared_sources < <(find src fuzz tests/support/JsonHelpers.cpp -name '*.cpp' ! -path 'fuzz/[a-z]*' | sort)
 sources=("${targets[@]/#/fuzz/}")
 each compile "${shared_sources[@]}" "${sources[@]/%/.cpp}"
 each link_target "${targets[@]}"

@@ -5,25 +5,29 @@
 namespace jsonhelpers {
 
 bool Parse(const std::string& strText, Json::Value& jOut) {
-    Json::CharReaderBuilder builder;
-    Json::CharReaderBuilder::strictMode(&builder.settings_);
-    builder["strictRoot"] = false;
-    builder["rejectDupKeys"] = false;
-    const std::unique_ptr<Json::CharReader> pReader(builder.newCharReader());
+    static const std::unique_ptr<Json::CharReader> s_pReader = [] {
+        Json::CharReaderBuilder builder;
+        Json::CharReaderBuilder::strictMode(&builder.settings_);
+        builder["strictRoot"] = false;
+        builder["rejectDupKeys"] = false;
+        return std::unique_ptr<Json::CharReader>(builder.newCharReader());
+    }();
     try {
-        return pReader->parse(strText.data(), strText.data() + strText.size(), &jOut, nullptr);
+        return s_pReader->parse(strText.data(), strText.data() + strText.size(), &jOut, nullptr);
     } catch (const Json::Exception&) {
         return false;
     }
 }
 
 Json::Value ReadLeniently(const std::string& strText) {
-    Json::CharReaderBuilder builder;
-    builder["collectComments"] = false;
-    const std::unique_ptr<Json::CharReader> pReader(builder.newCharReader());
+    static const std::unique_ptr<Json::CharReader> s_pReader = [] {
+        Json::CharReaderBuilder builder;
+        builder["collectComments"] = false;
+        return std::unique_ptr<Json::CharReader>(builder.newCharReader());
+    }();
     Json::Value jRead;
     try {
-        pReader->parse(strText.data(), strText.data() + strText.size(), &jRead, nullptr);
+        s_pReader->parse(strText.data(), strText.data() + strText.size(), &jRead, nullptr);
     } catch (const Json::RuntimeError&) {
         // Too many levels: what was read up to there stays.
     }
