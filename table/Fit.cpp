@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <limits>
 
 #include "../src/base/JsonMember.h"
 
@@ -10,6 +11,27 @@ namespace vornjsondb {
 namespace {
 
 constexpr double kTwoTo63 = 9223372036854775808.0;
+
+// The numbers of a type; nMostRead is the greatest that an old handle gives back.
+struct Range {
+    std::int64_t nLeast, nMost, nMostRead;
+    double dMost;  // of reals, and its negative the least
+};
+
+// In the order of BoundRange.
+constexpr Range kRanges[] = {
+    {0, 0, 0, 0},
+    {INT32_MIN, INT32_MAX, INT32_MAX, 0},
+    {0, UINT32_MAX, INT32_MAX, 0},
+    {INT64_MIN, INT64_MAX, INT64_MAX, 0},
+    {0, INT64_MAX, INT64_MAX, 0},
+    {0, 0, 0, std::numeric_limits<double>::max()},
+    {0, 0, 0, static_cast<double>(std::numeric_limits<float>::max())},
+};
+
+const Range& RangeOf(const MemberType& Type) {
+    return kRanges[static_cast<size_t>(Type.Bound.eRange)];
+}
 
 // Levels that every release of JsonCpp reads; how many more depends on the release.
 constexpr size_t kSureLevels = 128;
@@ -122,11 +144,12 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
     if (Form.eKind != BoundKind::kInteger) {
         return Misfit::kKind;
     }
-    if (nValue < Form.nLeast || nValue > Form.nMost) {
+    const Range& Of = RangeOf(Type);
+    if (nValue < Of.nLeast || nValue > Of.nMost) {
         return Misfit::kRange;
     }
-    return blCompatible && nValue > Form.nMostRead ? Misfit::kUnreadable
-                                                   : Readable(Type, blCompatible);
+    return blCompatible && nValue > Of.nMostRead ? Misfit::kUnreadable
+                                                 : Readable(Type, blCompatible);
 }
 
 Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out) {
@@ -148,8 +171,8 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
     }
     Out.eKind = BoundValue::Kind::kReal;
     Out.dValue = dValue;
-    const bool blBeyond =
-        Form.eKind == BoundKind::kReal && std::isfinite(dValue) && std::fabs(dValue) > Form.dMost;
+    const bool blBeyond = Form.eKind == BoundKind::kReal && std::isfinite(dValue) &&
+                          std::fabs(dValue) > RangeOf(Type).dMost;
     return blBeyond ? Misfit::kRange : Readable(Type, blCompatible);
 }
 
@@ -202,15 +225,15 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
 }
 
 std::string Expected(const MemberType& Type) {
-    const BoundForm& Form = Type.Bound;
-    switch (Form.eKind) {
+    const Range& Of = RangeOf(Type);
+    switch (Type.Bound.eKind) {
         case BoundKind::kText:
             return "a text";
         case BoundKind::kBoolean:
             return "true or false";
         case BoundKind::kInteger:
-            return "a whole number from " + std::to_string(Form.nLeast) + " to " +
-                   std::to_string(Form.nMost);
+            return "a whole number from " + std::to_string(Of.nLeast) + " to " +
+                   std::to_string(Of.nMost);
         case BoundKind::kReal:
             return "a number";
         case BoundKind::kObject:

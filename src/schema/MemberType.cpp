@@ -1,9 +1,7 @@
 #include "MemberType.h"
 
-#include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <limits>
 #include <stdexcept>
 
 #include <sqlite3.h>
@@ -128,30 +126,19 @@ constexpr ConditionForm kJson = ConditionForm::kQuotedJson;
 constexpr ConditionForm kFlag = ConditionForm::kBoolean;
 constexpr ConditionForm kBare = ConditionForm::kBareText;
 
-constexpr BoundForm Integer(Json::Int64 nLeast, Json::Int64 nMost, Json::Int64 nMostRead) {
-    return BoundForm{BoundKind::kInteger, nLeast, nMost, nMostRead, 0};
-}
-
-constexpr BoundForm Real(double dMost) {
-    return BoundForm{BoundKind::kReal, 0, 0, 0, dMost};
-}
-
-constexpr BoundForm NoNumber(BoundKind eKind) {
-    return BoundForm{eKind, 0, 0, 0, 0};
-}
-
-constexpr BoundForm kInt32 = Integer(INT32_MIN, INT32_MAX, INT32_MAX);
-constexpr BoundForm kUInt32 = Integer(0, UINT32_MAX, INT32_MAX);
-constexpr BoundForm kInt64 = Integer(INT64_MIN, INT64_MAX, INT64_MAX);
-constexpr BoundForm kUInt63 = Integer(0, INT64_MAX, INT64_MAX);
-constexpr BoundForm kDouble = Real(std::numeric_limits<double>::max());
-constexpr BoundForm kFloat = Real(static_cast<double>(std::numeric_limits<float>::max()));
-constexpr BoundForm kString = NoNumber(BoundKind::kText);
-constexpr BoundForm kBool = NoNumber(BoundKind::kBoolean);
-constexpr BoundForm kObject = NoNumber(BoundKind::kObject);
-constexpr BoundForm kList = NoNumber(BoundKind::kList);
-constexpr BoundForm kAnyJson = NoNumber(BoundKind::kJson);
-constexpr BoundForm kAny = NoNumber(BoundKind::kAny);
+constexpr BoundForm kInt32 = {BoundKind::kInteger, BoundRange::kInt32};
+constexpr BoundForm kUInt32 = {BoundKind::kInteger, BoundRange::kUInt32};
+constexpr BoundForm kInt64 = {BoundKind::kInteger, BoundRange::kInt64};
+constexpr BoundForm kUInt63 = {BoundKind::kInteger, BoundRange::kUInt63};
+constexpr BoundForm kDouble = {BoundKind::kReal, BoundRange::kDouble};
+constexpr BoundForm kFloat = {BoundKind::kReal, BoundRange::kFloat};
+constexpr BoundForm kString = {BoundKind::kText, BoundRange::kNone};
+constexpr BoundForm kBool = {BoundKind::kBoolean, BoundRange::kNone};
+constexpr BoundForm kObject = {BoundKind::kObject, BoundRange::kNone};
+constexpr BoundForm kList = {BoundKind::kList, BoundRange::kNone};
+constexpr BoundForm kAnyJson = {BoundKind::kJson, BoundRange::kNone};
+constexpr BoundForm kAny = {BoundKind::kAny, BoundRange::kNone};
+constexpr BoundForm kNothing = {BoundKind::kNone, BoundRange::kNone};
 
 // "any" is for handles that bind values: in all else it is treated as an unknown name.
 // clang-format off
@@ -175,7 +162,7 @@ constexpr MemberType kMemberTypes[] = {
     {"any",                nullptr,    nullptr,                  nullptr,        nullptr, kBare, false, kAny},
 };
 constexpr MemberType kUnknownType =
-    {"",                   nullptr,    nullptr,                  nullptr,        nullptr, kBare, false, NoNumber(BoundKind::kNone)};
+    {"",                   nullptr,    nullptr,                  nullptr,        nullptr, kBare, false, kNothing};
 // clang-format on
 
 // The "cpptype" text of a member's entry; empty when there is none.

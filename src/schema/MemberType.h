@@ -17,16 +17,24 @@ enum class ConditionForm {
     kBareText     // the escaped string form without quotes
 };
 
-// What a value of a type is, for statements that bind values instead of writing them.
-enum class BoundKind { kNone, kText, kBoolean, kInteger, kReal, kObject, kList, kJson, kAny };
+// What a value of a type is, for statements that bind values instead of writing them. A byte each:
+// the table of types has to stay small.
+enum class BoundKind : unsigned char {
+    kNone,
+    kText,
+    kBoolean,
+    kInteger,
+    kReal,
+    kObject,
+    kList,
+    kJson,
+    kAny
+};
+enum class BoundRange : unsigned char { kNone, kInt32, kUInt32, kInt64, kUInt63, kDouble, kFloat };
 
-// Its kind and, for numbers, its range; nMostRead is the greatest integer that pfnRead gives back.
 struct BoundForm {
     BoundKind eKind;
-    Json::Int64 nLeast;
-    Json::Int64 nMost;
-    Json::Int64 nMostRead;
-    double dMost;  // of reals, and its negative the least
+    BoundRange eRange;  // of numbers
 };
 
 // One type name and its treatments. The treatments were never made alike for all types, and hosts
