@@ -35,7 +35,7 @@ need_packages() {
         return 1
     fi
 
-    echo "installing ${missing[*]}"
+    echo "installing ${missing[*]}" >&2
     local -a install=(env DEBIAN_FRONTEND=noninteractive apt-get install -qq -y
         --no-install-recommends "${missing[@]}")
     # The package lists may be absent or outdated: then they are fetched, and it is tried again.
