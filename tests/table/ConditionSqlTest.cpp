@@ -91,11 +91,11 @@ std::vector<Condition> Leaves(const char* szMember, Op eOp, const Json::Value& j
 }  // namespace
 
 TEST_F(ConditionSql, OperatorsOnColumns) {
-    struct Row {
+    struct Case {
         const char* szWhere;
         const char* szSql;
     };
-    const Row kRows[] = {
+    const Case kCases[] = {
         {R"({"id": 5})", R"("id" IS ?)"},
         {R"({"id": null})", R"("id" IS ?)"},
         {R"({"name": "a"})", R"("name" COLLATE BINARY IS ?)"},
@@ -141,7 +141,7 @@ TEST_F(ConditionSql, OperatorsOnColumns) {
         {R"({"name": {"$null": false}})", R"("name" IS NOT NULL)"},
         {R"({"id": {"$not": {"$eq": 5}}})", R"(("id" IS ?) IS NOT TRUE)"},
     };
-    for (const Row& Each : kRows) {
+    for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szSql, Where(Each.szWhere)) << Each.szWhere;
     }
 }
@@ -328,17 +328,17 @@ TEST_F(ConditionSql, OfManyThatMustHoldTheFirstSixtyAreOpen) {
 TEST_F(ConditionSql, NoShapeOfManyConditionsMakesSqliteMultiply) {
     Run("CREATE INDEX i1 ON doc (size); CREATE INDEX i2 ON doc (size, name);"
         "CREATE INDEX i3 ON doc (name)");
-    struct Row {
+    struct Case {
         const char* szMember;
         Op eOp;
         Json::Value jOperand;
     };
-    const Row kRows[] = {{"size", Op::kGreater, 1},
-                         {"size", Op::kEqual, 1},
-                         {"size", Op::kBetween, Pair(1, 5)},
-                         {"name", Op::kGreater, "a"},
-                         {"name", Op::kPrefix, "a"}};
-    for (const Row& Each : kRows) {
+    const Case kCases[] = {{"size", Op::kGreater, 1},
+                           {"size", Op::kEqual, 1},
+                           {"size", Op::kBetween, Pair(1, 5)},
+                           {"name", Op::kGreater, "a"},
+                           {"name", Op::kPrefix, "a"}};
+    for (const Case& Each : kCases) {
         for (const size_t nFan : {2, 3, 4, 20}) {
             for (const bool blAll : {true, false}) {
                 const std::vector<Condition> vecLeaves =
@@ -400,11 +400,11 @@ TEST_F(ConditionSql, IndexesServeWhatTheyCan) {
     Run("CREATE INDEX by_name ON doc (name); CREATE INDEX by_size ON doc (size);"
         "CREATE INDEX by_city ON doc (CASE WHEN json_valid(map) THEN json_extract(map, "
         "'$.\"city\"') END)");
-    struct Row {
+    struct Case {
         const char* szQuery;
         const char* szSteps;
     };
-    const Row kRows[] = {
+    const Case kCases[] = {
         {R"({"where": {"name": "a"}})", "SEARCH doc USING INDEX by_name (name=?)"},
         {R"({"where": {"name": null}})", "SEARCH doc USING INDEX by_name (name=?)"},
         {R"({"where": {"id": 1}})", "SEARCH doc USING INTEGER PRIMARY KEY (rowid=?)"},
@@ -431,7 +431,7 @@ TEST_F(ConditionSql, IndexesServeWhatTheyCan) {
          "USE TEMP B-TREE FOR RIGHT PART OF ORDER BY"},
         {R"({"sort": ["map.city"]})", "SCAN doc USING INDEX by_city"},
     };
-    for (const Row& Each : kRows) {
+    for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szSteps, Steps(Each.szQuery)) << Each.szQuery;
     }
 }

@@ -65,11 +65,11 @@ class OldQuery : public TableTest {
 }  // namespace
 
 TEST_F(OldQuery, ValuesAreLiterals) {
-    struct Row {
+    struct Case {
         const char* szWhere;
         const char* szFilter;
     };
-    const Row kRows[] = {
+    const Case kCases[] = {
         {R"({"id": 5})", R"("id" IS 5)"},
         {R"({"size": -9223372036854775808})", R"("size" IS -9223372036854775808)"},
         {R"({"name": null})", R"("name" COLLATE BINARY IS NULL)"},
@@ -92,7 +92,7 @@ TEST_F(OldQuery, ValuesAreLiterals) {
          R"(+CAST('0.10000000000000001' AS REAL) AND CASE WHEN json_valid("map") THEN )"
          R"(json_type("map", '$."a"') END IN ('integer', 'real')))"},
     };
-    for (const Row& Each : kRows) {
+    for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szFilter, Filter(std::string("{\"where\": ") + Each.szWhere + "}"));
     }
     EXPECT_EQ("\"name\" COLLATE BINARY IS +CAST(x'ff' AS TEXT)", [this] {

@@ -358,11 +358,11 @@ TEST_F(Queries, ValuesOnlyRefusesEveryOperator) {
 // ---- what is wrong ------------------------------------------------------------------------------
 
 TEST_F(Queries, FindingsOfTheNotation) {
-    struct Row {
+    struct Case {
         const char* szQuery;
         const char* szFinding;
     };
-    const Row kRows[] = {
+    const Case kCases[] = {
         {"5", "not-a-query : a query is an object, not 5"},
         {"null", "not-a-query : a query is an object, not null"},
         {"[]", "not-a-query : a query is an object, not a list of 0"},
@@ -411,17 +411,17 @@ TEST_F(Queries, FindingsOfTheNotation) {
          "bad-count /limit: a whole number from 0 belongs here, not null; "
          "unknown-operator /where/$or/0/$x: there is no operator \"$x\""},
     };
-    for (const Row& Each : kRows) {
+    for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szFinding, Wrong(Each.szQuery)) << Each.szQuery;
     }
 }
 
 TEST_F(Queries, FindingsOfNamesAndOperands) {
-    struct Row {
+    struct Case {
         const char* szWhere;
         const char* szFinding;
     };
-    const Row kRows[] = {
+    const Case kCases[] = {
         {R"({"nmae": 1})",
          "unknown-member /where/nmae: table \"doc\" has no member \"nmae\" (did you mean "
          "\"name\"?)"},
@@ -525,7 +525,7 @@ TEST_F(Queries, FindingsOfNamesAndOperands) {
          "-9223372036854775808 "
          "to 9223372036854775807, not \"b\""},
     };
-    for (const Row& Each : kRows) {
+    for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szFinding, WrongWhere(Each.szWhere)) << Each.szWhere;
     }
 }
