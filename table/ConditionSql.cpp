@@ -1,6 +1,8 @@
 #include "ConditionSql.h"
 
 #include <algorithm>
+#include <limits>
+#include <utility>
 
 namespace vornjsondb {
 
@@ -12,13 +14,29 @@ using Kind = Node::Kind;
 
 // SQLite looks for indexes in all that is joined by AND and OR, however nested, and multiplies what
 // it finds: a few hundred conditions keep it busy for minutes. IS TRUE behind a group hides what is
-// inside. What is small is left open, so that indexes serve it.
-constexpr size_t kOpenLeaves = 16;
-constexpr int kOpenLevels = 2;
+// inside. What is small is left open, so that indexes serve it; of more than kFewLeaves two levels
+// of groups, of more than kSomeLeaves one.
+constexpr size_t kFewLeaves = 16;
+constexpr size_t kSomeLeaves = 100;
 constexpr size_t kOpenParts = 60;
+
+int OpenLevels(size_t nLeaves) {
+    if (nLeaves <= kFewLeaves) {
+        return std::numeric_limits<int>::max();
+    }
+    return nLeaves <= kSomeLeaves ? 2 : 1;
+}
 
 // Longer chains would exceed SQLite's depth of expressions.
 constexpr size_t kChain = 8;
+
+std::vector<const Node*> NodesOf(const std::vector<Condition>& vecParts) {
+    std::vector<const Node*> vecNodes;
+    for (const Condition& Part : vecParts) {
+        vecNodes.push_back(&Part.Root());
+    }
+    return vecNodes;
+}
 
 class ConditionWriter {
   public:
@@ -26,19 +44,15 @@ class ConditionWriter {
                     BoundSql& Out, FindingList& vecFindings)
         : m_Leaf(Of, Codec, Out),
           m_blChange(blChange),
-          m_nLeaves(nLeaves),
+          m_nOpenLevels(OpenLevels(nLeaves)),
           m_strSql(Out.strSql),
           m_vecFindings(vecFindings) {}
 
     // blOpen: SQLite looks into it.
-    void WriteGroup(const std::vector<Condition>& vecParts, Kind eKind, int nLevel, bool blOpen) {
-        if (vecParts.size() == 1) {
-            Write(vecParts[0].Root(), nLevel, blOpen, nullptr);
+    void WriteGroup(std::vector<const Node*> vecNodes, Kind eKind, int nLevel, bool blOpen) {
+        if (vecNodes.size() == 1) {
+            Write(*vecNodes[0], nLevel, blOpen, nullptr);
             return;
-        }
-        std::vector<const Node*> vecNodes;
-        for (const Condition& Part : vecParts) {
-            vecNodes.push_back(&Part.Root());
         }
         // The deepest part goes first: there it costs SQLite's parser least.
         const auto itDeepest = std::max_element(
@@ -89,7 +103,7 @@ class ConditionWriter {
 
     // szClose: in parentheses, and with this behind; nullptr: as it needs to be.
     void Write(const Node& What, int nLevel, bool blOpen, const char* szClose) {
-        const bool blHidden = blOpen && nLevel > kOpenLevels && m_nLeaves > kOpenLeaves;
+        const bool blHidden = blOpen && nLevel > m_nOpenLevels;
         const bool blGroup = What.eKind == Kind::kAll || What.eKind == Kind::kAny;
         if (blGroup && szClose == nullptr) {
             szClose = blHidden ? ") IS TRUE" : ")";
@@ -105,7 +119,7 @@ class ConditionWriter {
         } else if (What.vecParts.empty()) {
             Report(m_vecFindings, FindingCode::kEmptyGroup, "/where", "a group holds no condition");
         } else {
-            WriteGroup(What.vecParts, What.eKind, nLevel, blOpen && !blHidden);
+            WriteGroup(NodesOf(What.vecParts), What.eKind, nLevel, blOpen && !blHidden);
         }
         m_strSql += szClose != nullptr ? szClose : "";
     }
@@ -131,7 +145,7 @@ class ConditionWriter {
 
     LeafSql m_Leaf;
     bool m_blChange;
-    size_t m_nLeaves;
+    int m_nOpenLevels;
     std::string& m_strSql;
     FindingList& m_vecFindings;
 };
@@ -141,15 +155,20 @@ class ConditionWriter {
 void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of, JsonCodec& Codec,
                       bool blChange, BoundSql& Out, FindingList& vecFindings) {
     size_t nLeaves = 0;
-    for (const Condition& Each : vecWhere) {
-        nLeaves += Each.Root().nLeaves;
+    std::vector<const Node*> vecNodes;
+    for (const Node* pEach : NodesOf(vecWhere)) {
+        nLeaves += pEach->nLeaves;
+        // All of all is all: one chain, whoever grouped it.
+        const bool blAll = pEach->eKind == Kind::kAll && !pEach->vecParts.empty();
+        const auto vecParts = blAll ? NodesOf(pEach->vecParts) : std::vector<const Node*>{pEach};
+        vecNodes.insert(vecNodes.end(), vecParts.begin(), vecParts.end());
     }
     if (nLeaves > kMaxConditions) {
         Report(vecFindings, FindingCode::kTooManyConditions, "/where",
                "the query has more than 1000 conditions");
     } else if (!vecWhere.empty()) {
         ConditionWriter(Of, Codec, blChange, nLeaves, Out, vecFindings)
-            .WriteGroup(vecWhere, Kind::kAll, 1, true);
+            .WriteGroup(std::move(vecNodes), Kind::kAll, 1, true);
     }
 }
 

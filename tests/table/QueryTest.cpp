@@ -532,8 +532,8 @@ TEST_F(Queries, FindingsOfNamesAndOperands) {
 
 TEST_F(Queries, FindingsOfValuesThatJsonTextCannotHold) {
     const double dNaN = std::numeric_limits<double>::quiet_NaN();
-    EXPECT_EQ("not-a-number /where/rate: member \"rate\": nan is no number",
-              Replaced(Sql(Query().Where("rate", dNaN)), "-nan", "nan"));
+    EXPECT_EQ("not-a-number /where/rate: member \"rate\": NaN is no number",
+              Sql(Query().Where("rate", dNaN)));
     EXPECT_EQ(0U, Sql(Query().Where("json.a", dNaN)).find("not-a-number /where/json.a: "));
     const std::string strLong = "%" + std::string(50000, 'a');
     EXPECT_EQ("bad-pattern /where/name/$like: pattern \"%" + std::string(59, 'a') +
