@@ -29,6 +29,11 @@ std::string WaitedText(int nWaitMs) {
     return " (waited " + std::to_string(nWaitMs) + " ms)";
 }
 
+Status InTransaction(sqlite3* pDb, const Status& Outcome) {
+    const bool blGone = !Outcome.Ok() && sqlite3_get_autocommit(pDb) != 0;
+    return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
+}
+
 int Whole::Begin() {
     m_blSavepoint = sqlite3_get_autocommit(m_pDb) == 0;
     const int nResult = Run(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE");

@@ -30,12 +30,16 @@ class Patience {
 // " (waited 5000 ms)"
 std::string WaitedText(int nWaitMs);
 
+// The failure of a call in a transaction that was open before; says so when SQLite has undone all
+// of it, as for a full disk.
+Status InTransaction(sqlite3* pDb, const Status& Outcome);
+
 // Calls fnOnce until it gives something else than a lock, or the time is over. In a transaction
 // that is open already there is one try: the other side may be waiting for just this transaction.
 template <typename Once>
 Status Attempt(sqlite3* pDb, int nWaitMs, Once&& fnOnce) {
     if (sqlite3_get_autocommit(pDb) == 0) {
-        return fnOnce();
+        return InTransaction(pDb, fnOnce());
     }
     Status Outcome = fnOnce();
     if (!IsLock(Outcome)) {

@@ -76,15 +76,51 @@ TEST_F(TransactionTest, CommitThatAForeignKeyForbidsLeavesTheTransaction) {
     EXPECT_EQ("ok", Text(All.Commit()));
 }
 
-TEST_F(TransactionTest, FullDiskUndoesItAllAndTheFirstReasonIsTold) {
+// SQLite has no other way than to undo all when the disk is full, and reports a ROLLBACK of nothing
+// as the next error: what is told is the first one.
+TEST_F(TransactionTest, FullDiskUndoesTheCallersTransactionAndIsTold) {
     Open();
-    Run("PRAGMA page_size = 512; VACUUM; PRAGMA max_page_count = 8");
-    Transaction All;
-    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    Run("PRAGMA max_page_count = 10");
     Json::Value jRecord;
     jRecord["name"] = std::string(100000, 'x');
+    const std::string strFull =
+        "disk-full: cannot save a record in table \"task\": database or disk is full; the "
+        "transaction is undone";
+    for (Json::Value* pjStored : {static_cast<Json::Value*>(nullptr), &jRecord}) {
+        Run("BEGIN; INSERT INTO task (id) VALUES (1)");
+        const Status Outcome = m_Table.Create(jRecord, pjStored);
+        EXPECT_EQ(strFull, Text(Outcome));
+        EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
+        EXPECT_EQ(SQLITE_FULL, Outcome.SqliteCode());
+        EXPECT_NE(0, sqlite3_get_autocommit(m_pDb));
+    }
+    Create(R"({"id": 1})");
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    EXPECT_EQ(
+        "disk-full: cannot update records of table \"task\": database or disk is full; the "
+        "transaction is undone",
+        Text(m_Table.Update(Query().Where("id", 1), jRecord)));
+    const Status Outcome = All.Commit();
+    EXPECT_EQ("misuse: cannot commit a transaction: an earlier failure has undone it",
+              Text(Outcome));
+    EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
     EXPECT_EQ("disk-full: cannot save a record in table \"task\": database or disk is full",
-              Text(m_Table.Create(jRecord, &jRecord)));
+              Text(m_Table.Create(jRecord)));
+    EXPECT_EQ("1", Rows("SELECT count(*) FROM task"));
+}
+
+// What a constraint refuses is one statement alone.
+TEST_F(TransactionTest, OtherFailuresLeaveTheCallersTransaction) {
+    Open();
+    Run("BEGIN; INSERT INTO task (id) VALUES (1)");
+    EXPECT_EQ(
+        "duplicate: cannot save a record in table \"task\": UNIQUE constraint failed: task.id "
+        "(id = 1)",
+        Create(R"({"id": 1})"));
+    EXPECT_EQ(0, sqlite3_get_autocommit(m_pDb));
+    Run("COMMIT");
+    EXPECT_EQ("1", Rows("SELECT count(*) FROM task"));
 }
 
 }  // namespace
