@@ -20,8 +20,6 @@ using vornjsondb::FailBySqlite;
 using vornjsondb::OwnStatement;
 using vornjsondb::RealTable;
 
-constexpr int kOldestSqlite = 3035000;
-
 const std::vector<std::string>& NoNames() {
     static const std::vector<std::string> s_vecNone;
     return s_vecNone;
@@ -134,10 +132,10 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
     if (pDb == nullptr) {
         return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no connection");
     }
-    if (sqlite3_libversion_number() < kOldestSqlite) {
-        return vornjsondb::Fail(
-            StatusCode::kRefused, What,
-            std::string("SQLite 3.35 or later is needed, and this is ") + sqlite3_libversion());
+    const Status Version =
+        vornjsondb::CheckVersion(sqlite3_libversion_number(), sqlite3_libversion(), What);
+    if (!Version.Ok()) {
+        return Version;
     }
     return vornjsondb::Attempt(pDb, How.nWaitMs, [&]() -> Status {
         Json::Value jMade;
@@ -185,6 +183,14 @@ sqlite3* Table::Connection() const {
 }  // namespace VORN_JSON_DB
 
 namespace vornjsondb {
+
+Status CheckVersion(int nVersion, const char* szVersion, const Doing& What) {
+    constexpr int kOldest = 3035000;
+    return nVersion >= kOldest
+               ? Status()
+               : Fail(StatusCode::kRefused, What,
+                      std::string("SQLite 3.35 or later is needed, and this is ") + szVersion);
+}
 
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
     if (pParts == nullptr) {

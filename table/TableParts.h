@@ -50,6 +50,9 @@ using VORN_JSON_DB::OnDuplicate;
 using VORN_JSON_DB::Written;
 using Table = VORN_JSON_DB::Table;
 
+// A failure when this SQLite, which may be another than the one compiled for, is too old.
+Status CheckVersion(int nVersion, const char* szVersion, const Doing& What);
+
 // A failure when the Table is not open, or is to be changed by a callback that reads from it.
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
 
