@@ -5,6 +5,7 @@
 #include <limits>
 
 #include "../src/base/JsonMember.h"
+#include "../src/base/JsonMemory.h"
 
 namespace vornjsondb {
 
@@ -81,7 +82,7 @@ Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, 
 }
 
 Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
-               JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
+               JsonCodec& Codec, std::string& strJson, BoundValue& Out) try {
     const BoundKind eKind = Type.Bound.eKind;
     const bool blFits = eKind == BoundKind::kJson ||
                         (eKind == BoundKind::kObject && jValue.isObject()) ||
@@ -98,6 +99,7 @@ Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompati
     Out.strBytes = strJson;
     return Readable(Type, blCompatible);
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace
 

@@ -4,6 +4,7 @@
 #include <cmath>
 #include <cstdlib>
 
+#include "../src/base/JsonMemory.h"
 #include "Operand.h"
 #include "QueryPlan.h"
 #include "TableParts.h"
@@ -92,7 +93,7 @@ static Status Try(const Table::Parts& From, const std::string& strCondition,
 
 namespace VORN_JSON_DB {
 
-Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQuery) {
+Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQuery) try {
     constexpr char kDo[] = "write an old query for";
     const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
     if (!State.Ok()) {
@@ -128,5 +129,6 @@ Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQue
     jOldQuery.swapPayload(jMade);
     return Checked;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace VORN_JSON_DB

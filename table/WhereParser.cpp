@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "../src/base/JsonMemory.h"
 #include "ConditionNode.h"
 #include "FindingCodes.h"
 #include "Operators.h"
@@ -214,8 +215,9 @@ class WhereParser {
 
 }  // namespace
 
-Conditions ParseWhere(const Json::Value& jWhere, bool blValuesOnly, FindingList& vecFindings) {
+Conditions ParseWhere(const Json::Value& jWhere, bool blValuesOnly, FindingList& vecFindings) try {
     return WhereParser(blValuesOnly, vecFindings).Read(jWhere, "/where", 0);
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace vornjsondb
