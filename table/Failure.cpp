@@ -78,7 +78,10 @@ Retry RetryOf(int nSqlite, bool blInTransaction) {
 }  // namespace
 
 std::string Doing::Text() const {
-    const std::string strText = std::string("cannot ") + szDo;
+    std::string strText = std::string("cannot ") + szDo;
+    if (nRecord != 0) {
+        strText.replace(strText.find('#'), 1, std::to_string(nRecord));
+    }
     return pstrTable == nullptr ? strText : strText + " table " + Quoted(*pstrTable);
 }
 

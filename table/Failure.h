@@ -5,6 +5,7 @@
 
 #include <VornJsonDbTable.h>
 
+#include <cstdint>
 #include <string>
 
 #include <sqlite3.h>
@@ -32,6 +33,7 @@ using VORN_JSON_DB::StatusCode;
 struct Doing {
     const char* szDo;              // "list records of"
     const std::string* pstrTable;  // nullptr: the words are enough
+    std::int64_t nRecord = 0;      // stands for # in szDo, if not 0: "load record # into"
 
     std::string Text() const;
 };

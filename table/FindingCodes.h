@@ -33,6 +33,7 @@
     X(kTooDeep, "too-deep", kError, "store flatter JSON: its reader stops at this depth")         \
     X(kMissingKey, "missing-key", kError,                                                         \
       "give every member of the key a value that is not null")                                    \
+    X(kRejected, "rejected", kError, "correct the record where it comes from")                    \
     /* queries */                                                                                 \
     X(kNotAQuery, "not-a-query", kError, "pass an object; {} is every record")                    \
     X(kUnknownQueryKey, "unknown-query-key", kError,                                              \

@@ -50,21 +50,12 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
     return vecFindings.empty();
 }
 
-void RecordValues::Set(size_t nMember, const BoundValue& Value) {
-    m_vecValues[nMember] = Value;
-    m_strGiven[nMember] = '1';
-}
-
 void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
     const Member& Into = m_Of.At(nMember);
-    const Misfit eMisfit = FitJson(*Into.pType, jValue, m_blCompatible, m_Codec, m_vecJson[nMember],
-                                   m_vecValues[nMember]);
-    m_strGiven[nMember] = '1';
-    if (eMisfit != Misfit::kNone) {
+    const Misfit eMisfit =
+        FitJson(*Into.pType, jValue, m_blCompatible, m_Codec, m_vecJson[nMember], Give(nMember));
+    if (eMisfit != Misfit::kNone || Into.blGenerated) {
         ReportMisfit(eMisfit, Into, Shown(jValue), Below("", Into.strName), vecFindings);
-    } else if (Into.blGenerated) {
-        Report(vecFindings, FindingCode::kGenerated, Below("", Into.strName),
-               "member " + Into.strQuoted + " is computed by the table");
     }
 }
 
@@ -80,8 +71,7 @@ bool RecordValues::FillDefaults(FindingList& vecFindings) {
 
 bool RecordValues::HasKey(FindingList& vecFindings) const {
     if (m_Of.Key().empty()) {
-        Report(vecFindings, FindingCode::kNoKey, "",
-               "the table has no key that tells records apart");
+        Report(vecFindings, FindingCode::kNoKey, "", kNoKeyText);
     }
     for (const size_t nMember : m_Of.Key()) {
         if (!Has(nMember) || At(nMember).eKind == BoundValue::Kind::kNull) {
@@ -116,12 +106,12 @@ int RecordValues::BindKey(sqlite3_stmt* pStatement, int& nNext) const {
 
 void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShown,
                   std::string strPath, FindingList& vecFindings) {
-    struct Row {
+    struct MisfitRow {
         Misfit eMisfit;
         FindingCode eCode;
         const char* szReason;
     };
-    static constexpr Row kRows[] = {
+    static constexpr MisfitRow kRows[] = {
         {Misfit::kKind, FindingCode::kWrongKind, " is another kind of value: expected is "},
         {Misfit::kRange, FindingCode::kOutOfRange, " is out of range: expected is "},
         {Misfit::kNotANumber, FindingCode::kNotANumber, " is or holds NaN: expected is "},
@@ -130,7 +120,12 @@ void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShow
         {Misfit::kUnreadable, FindingCode::kOldCannotRead,
          " could not be read back by a VornJsonDbApi, although it is "},
     };
-    const Row* pRow = kRows;
+    if (eMisfit == Misfit::kNone) {
+        Report(vecFindings, FindingCode::kGenerated, std::move(strPath),
+               "member " + Into.strQuoted + " is computed by the table");
+        return;
+    }
+    const MisfitRow* pRow = kRows;
     while (pRow->eMisfit != eMisfit) {
         ++pRow;
     }

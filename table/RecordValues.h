@@ -14,6 +14,8 @@
 
 namespace vornjsondb {
 
+constexpr char kNoKeyText[] = "the table has no key that tells records apart";
+
 // Used for one record after the other, so that its memory is made once.
 class RecordValues {
   public:
@@ -25,8 +27,11 @@ class RecordValues {
     // all of it can be stored; if not, vecFindings tells why.
     bool Take(const Json::Value& jRecord, FindingList& vecFindings);
 
-    // One member, as a Fit... function made it.
-    void Set(size_t nMember, const BoundValue& Value);
+    // One member: for a Fit... function to fill, and from JSON.
+    BoundValue& Give(size_t nMember) {
+        m_strGiven[nMember] = '1';
+        return m_vecValues[nMember];
+    }
     void SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
 
     // Gives members that the record lacks the definition's defaults, which must fit like any value.
@@ -35,6 +40,7 @@ class RecordValues {
     // Whether every member of the key has a value; those without are reported.
     bool HasKey(FindingList& vecFindings) const;
 
+    bool IsEmpty() const { return m_strGiven.find('1') == std::string::npos; }
     bool Has(size_t nMember) const { return m_strGiven[nMember] == '1'; }
     const BoundValue& At(size_t nMember) const { return m_vecValues[nMember]; }
 
@@ -58,7 +64,7 @@ class RecordValues {
     std::string m_strGiven;
 };
 
-// What a misfit means to the caller.
+// What a misfit means to the caller; kNone: the table computes the member.
 void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShown,
                   std::string strPath, FindingList& vecFindings);
 

@@ -9,11 +9,6 @@ namespace vornjsondb {
 
 namespace {
 
-using Parts = Table::Parts;
-
-// What INSERT does with a key that is there already.
-enum class Clash { kFail, kNothing, kReplace };
-
 std::string InsertSql(const Members& Of, const RecordValues& Values) {
     std::string strColumns;
     std::string strValues;
@@ -34,21 +29,17 @@ std::string KeyList(const Members& Of) {
     return strList + ")";
 }
 
-std::string InsertSql(const Members& Of, const RecordValues& Values, Clash eClash) {
-    std::string strSql = InsertSql(Of, Values);
-    if (eClash == Clash::kFail) {
-        return strSql;
-    }
-    strSql += " ON CONFLICT " + KeyList(Of) + " DO ";
+// What the INSERT does with a key that is there already: all other members anew, or nothing.
+std::string OnConflict(const Members& Of, bool blReplace) {
     std::string strSet;
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
-        if (!Other.blKey && !Other.blGenerated) {
+        if (blReplace && !Other.blKey && !Other.blGenerated) {
             strSet += (strSet.empty() ? "UPDATE SET " : ", ") + Other.strQuoted + "=excluded." +
                       Other.strQuoted;
         }
     }
-    return strSql + (eClash == Clash::kReplace && !strSet.empty() ? strSet : "NOTHING");
+    return " ON CONFLICT " + KeyList(Of) + " DO " + (strSet.empty() ? "NOTHING" : strSet);
 }
 
 // A record of nothing but its key changes nothing: "id" = "id" finds out whether it is there.
@@ -62,45 +53,6 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
     return "UPDATE " + Of.QuotedTable() + " SET " +
            (strSet.empty() ? strKey + "=" + strKey : strSet) + WhereKey(Of);
-}
-
-// Runs one statement to its end. nChanged: rows that it inserted or changed.
-template <typename MakeSql, typename BindAll>
-int Run(Parts& Into, char cVerb, const RecordValues& Values, MakeSql&& fnSql, BindAll&& fnBind,
-        int& nChanged) {
-    Statement Lent;
-    int nResult = Into.Kept.Take(cVerb + Values.Given(), fnSql, Lent);
-    if (nResult == SQLITE_OK) {
-        nResult = fnBind(Lent.Get());
-    }
-    if (nResult == SQLITE_OK) {
-        nResult = Lent.Finish();
-    }
-    nChanged = nResult == SQLITE_OK ? sqlite3_changes(Into.pDb) : 0;
-    return nResult;
-}
-
-int Insert(Parts& Into, const RecordValues& Values, Clash eClash, int& nChanged) {
-    static constexpr char kVerbs[] = {'I', 'N', 'R'};
-    return Run(
-        Into, kVerbs[static_cast<size_t>(eClash)], Values,
-        [&] { return InsertSql(Into.Of, Values, eClash); },
-        [&](sqlite3_stmt* pStatement) {
-            int nNext = 1;
-            return Values.BindGiven(pStatement, nNext, true);
-        },
-        nChanged);
-}
-
-int Update(Parts& Into, const RecordValues& Values, int& nChanged) {
-    return Run(
-        Into, 'U', Values, [&] { return UpdateSql(Into.Of, Values); },
-        [&](sqlite3_stmt* pStatement) {
-            int nNext = 1;
-            const int nResult = Values.BindGiven(pStatement, nNext, false);
-            return nResult == SQLITE_OK ? Values.BindKey(pStatement, nNext) : nResult;
-        },
-        nChanged);
 }
 
 std::string ShownValue(const BoundValue& Value) {
@@ -118,36 +70,6 @@ std::string ShownValue(const BoundValue& Value) {
     }
 }
 
-// SQLite names the columns, "task.id, task.name"; the values are told beside them.
-Status WithValues(const Parts& Into, const RecordValues& Values, const Status& Failed) {
-    const std::string strBefore = Into.Of.Table() + ".";
-    std::string strMore;
-    const std::string& strMessage = Failed.Message();
-    for (size_t i = 0; i < Into.Of.Size(); ++i) {
-        const std::string strName = strBefore + Into.Of.At(i).strName;
-        const size_t nFound = strMessage.rfind(strName);
-        const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
-        if ((cAfter == '\0' || cAfter == ',') && Values.Has(i)) {
-            strMore += (strMore.empty() ? " (" : ", ") + Into.Of.At(i).strName + " = " +
-                       ShownValue(Values.At(i));
-        }
-    }
-    return strMore.empty() ? Failed : Amended(Failed, Failed.Advice(), strMore + ")");
-}
-
-// The steps for each mode; the result is SQLite's.
-int Write(Parts& Into, RecordValues& Values, OnDuplicate eOnDuplicate, Written& eWritten) {
-    int nChanged = 0;
-    const bool blStop = eOnDuplicate == OnDuplicate::kStop;
-    int nResult = Insert(Into, Values, blStop ? Clash::kFail : Clash::kNothing, nChanged);
-    eWritten = nChanged > 0 || blStop ? Written::kInserted : Written::kSkipped;
-    if (nResult == SQLITE_OK && nChanged == 0 && eOnDuplicate == OnDuplicate::kReplace) {
-        nResult = Insert(Into, Values, Clash::kReplace, nChanged);
-        eWritten = Written::kReplaced;
-    }
-    return nResult;
-}
-
 }  // namespace
 
 std::string WhereKey(const Members& Of) {
@@ -158,29 +80,103 @@ std::string WhereKey(const Members& Of) {
     return strWhere;
 }
 
-// An upsert updates first: an INSERT would ask for all NOT NULL members even of a record that is
-// there and needs none of them.
-Status WriteRecord(Parts& Into, RecordValues& Values, OnDuplicate eOnDuplicate, const Doing& What,
-                   Written& eWritten) {
-    int nResult = SQLITE_OK;
-    int nChanged = 0;
-    if (eOnDuplicate == OnDuplicate::kUpsert) {
-        nResult = Update(Into, Values, nChanged);
-        eWritten = Written::kUpdated;
+std::string RecordWriter::Sql(Verb eVerb) const {
+    switch (eVerb) {
+        case Verb::kInsert:
+            return InsertSql(m_Into.Of, m_Values);
+        case Verb::kInsertNew:
+        case Verb::kReplace:
+            return InsertSql(m_Into.Of, m_Values) + OnConflict(m_Into.Of, eVerb == Verb::kReplace);
+        case Verb::kUpdate:
+            return UpdateSql(m_Into.Of, m_Values);
+        default:
+            return "SELECT 1 FROM " + m_Into.Of.QuotedTable() + WhereKey(m_Into.Of);
     }
-    if (nResult == SQLITE_OK && nChanged == 0) {
+}
+
+int RecordWriter::Bind(Verb eVerb, sqlite3_stmt* pStatement) const {
+    int nNext = 1;
+    int nResult = SQLITE_OK;
+    if (eVerb != Verb::kFind) {
+        nResult = m_Values.BindGiven(pStatement, nNext, eVerb != Verb::kUpdate);
+    }
+    const bool blByKey = eVerb == Verb::kFind || eVerb == Verb::kUpdate;
+    return blByKey && nResult == SQLITE_OK ? m_Values.BindKey(pStatement, nNext) : nResult;
+}
+
+// Runs one statement to its end. nRows: how many it found or changed.
+int RecordWriter::Run(Verb eVerb, int& nRows) {
+    const auto nVerb = static_cast<size_t>(eVerb);
+    Statement& Held = m_aHeld[nVerb];
+    int nResult = SQLITE_OK;
+    if (!Held.IsFor("INRUF"[nVerb], m_Values.Given())) {
+        Held = Statement();
+        nResult = m_Into.Kept.Take(
+            "INRUF"[nVerb] + m_Values.Given(), [&] { return Sql(eVerb); }, Held);
+    }
+    if (nResult == SQLITE_OK) {
+        nResult = Bind(eVerb, Held.Get());
+    }
+    if (nResult == SQLITE_OK) {
+        nRows = 0;
+        nResult = Held.Finish(&nRows);
+    }
+    if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
+        nRows = sqlite3_changes(m_Into.pDb);
+    }
+    return nResult;
+}
+
+// An upsert updates first: an INSERT would ask for all NOT NULL members even of a record that is
+// there and needs none of them. What replaces looks first, to tell which it was.
+Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written& eWritten) {
+    struct Mode {
+        Verb eFirst, eThen;  // kInsert: nothing comes first
+        Written eFound;
+    };
+    static constexpr Mode kModes[] = {{Verb::kInsert, Verb::kInsert, Written::kInserted},
+                                      {Verb::kInsert, Verb::kInsertNew, Written::kSkipped},
+                                      {Verb::kFind, Verb::kReplace, Written::kReplaced},
+                                      {Verb::kUpdate, Verb::kInsert, Written::kUpdated}};
+    const Mode& Now = kModes[static_cast<size_t>(eOnDuplicate)];
+    int nResult = SQLITE_OK;
+    int nFound = 0;
+    if (Now.eFirst != Verb::kInsert) {
+        nResult = Run(Now.eFirst, nFound);
+    }
+    eWritten = nFound > 0 ? Now.eFound : Written::kInserted;
+    if (nResult == SQLITE_OK && eWritten != Written::kUpdated) {
         FindingList vecFindings;
-        if (!Values.FillDefaults(vecFindings)) {
+        if (!m_Values.FillDefaults(vecFindings)) {
             return FromFindings(std::move(vecFindings), What);
         }
-        const bool blUpsert = eOnDuplicate == OnDuplicate::kUpsert;
-        nResult = Write(Into, Values, blUpsert ? OnDuplicate::kStop : eOnDuplicate, eWritten);
+        int nChanged = 0;
+        nResult = Run(Now.eThen, nChanged);
+        const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
+        eWritten = blSkipped ? Now.eFound : eWritten;
     }
     if (nResult == SQLITE_OK) {
         return {};
     }
-    const Status Failed = FailBySqlite(Into.pDb, nResult, What);
-    return Failed.Code() == StatusCode::kDuplicate ? WithValues(Into, Values, Failed) : Failed;
+    const Status Failed = FailBySqlite(m_Into.pDb, nResult, What);
+    return Failed.Code() == StatusCode::kDuplicate ? WithValues(Failed) : Failed;
+}
+
+// SQLite names the columns, "task.id, task.name"; the values are told beside them.
+Status RecordWriter::WithValues(const Status& Failed) const {
+    const Members& Of = m_Into.Of;
+    const std::string& strMessage = Failed.Message();
+    std::string strMore;
+    for (size_t i = 0; i < Of.Size(); ++i) {
+        const std::string strName = Of.Table() + "." + Of.At(i).strName;
+        const size_t nFound = strMessage.rfind(strName);
+        const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
+        if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
+            strMore += (strMore.empty() ? " (" : ", ") + Of.At(i).strName + " = " +
+                       ShownValue(m_Values.At(i));
+        }
+    }
+    return strMore.empty() ? Failed : Amended(Failed, Failed.Advice(), strMore + ")");
 }
 
 }  // namespace vornjsondb

@@ -10,11 +10,32 @@
 
 namespace vornjsondb {
 
-// Runs the statements that it takes, two at most, and fills defaults where the record is new. All
-// modes but kStop need a key, and values for it. Not whole or nothing by itself: where there can be
-// two statements, callers see to that.
-Status WriteRecord(Table::Parts& Into, RecordValues& Values, OnDuplicate eOnDuplicate,
-                   const Doing& What, Written& eWritten);
+// For one record after the other: while their members are the same, so are the statements.
+class RecordWriter {
+  public:
+    // Writes what Values hold. All modes but kStop need a key, and values for it.
+    RecordWriter(Table::Parts& Into, RecordValues& Values) : m_Into(Into), m_Values(Values) {}
+    RecordWriter(const RecordWriter&) = delete;
+    RecordWriter& operator=(const RecordWriter&) = delete;
+    ~RecordWriter() = default;
+
+    // Fills defaults where the record is new. Changes the table by one statement, which is whole or
+    // nothing by itself; what another may change between it and the look before, only a transaction
+    // tells.
+    Status Write(OnDuplicate eOnDuplicate, const Doing& What, Written& eWritten);
+
+  private:
+    enum class Verb { kInsert, kInsertNew, kReplace, kUpdate, kFind };
+
+    int Run(Verb eVerb, int& nRows);
+    int Bind(Verb eVerb, sqlite3_stmt* pStatement) const;
+    std::string Sql(Verb eVerb) const;
+    Status WithValues(const Status& Failed) const;
+
+    Table::Parts& m_Into;
+    RecordValues& m_Values;
+    Statement m_aHeld[5];  // the last one of each verb
+};
 
 // " WHERE "task"."id" = ?": parameters in the key's order.
 std::string WhereKey(const Members& Of);

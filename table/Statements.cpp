@@ -38,10 +38,12 @@ Statement::~Statement() {
     }
 }
 
-int Statement::Finish() const {
-    int nResult = SQLITE_ROW;
-    while (nResult == SQLITE_ROW) {
-        nResult = Step();
+int Statement::Finish(int* pnRows) const {
+    int nResult = Step();
+    for (; nResult == SQLITE_ROW; nResult = Step()) {
+        if (pnRows != nullptr) {
+            ++*pnRows;
+        }
     }
     const int nReset = sqlite3_reset(m_pStatement.get());
     return nResult == SQLITE_DONE ? nReset : nResult;

@@ -35,9 +35,16 @@ class Statement {
     sqlite3_stmt* Get() const { return m_pStatement.get(); }
     int Step() const { return sqlite3_step(m_pStatement.get()); }
 
-    // Steps to the end and resets; the result of whichever failed first, or SQLITE_OK. A statement
-    // has done its work only then: a commit may fail as late as in the reset.
-    int Finish() const;
+    // Steps to the end, counting rows, and resets; the result of whichever failed first, or
+    // SQLITE_OK. A statement has done its work only then: a commit may fail as late as in the
+    // reset.
+    int Finish(int* pnRows = nullptr) const;
+
+    // Whether its shape is the letter and the text.
+    bool IsFor(char cFirst, const std::string& strRest) const {
+        return m_strShape.size() == strRest.size() + 1 && m_strShape[0] == cFirst &&
+               m_strShape.compare(1, std::string::npos, strRest) == 0;
+    }
 
   private:
     friend class Statements;

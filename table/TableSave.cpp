@@ -59,7 +59,8 @@ Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, 
         if (!blFits) {
             return vornjsondb::FromFindings(std::move(vecFindings), What);
         }
-        Status Outcome = WriteRecord(Into, Into.Values, eOnDuplicate, What, eWritten);
+        vornjsondb::RecordWriter Writer(Into, Into.Values);
+        Status Outcome = Writer.Write(eOnDuplicate, What, eWritten);
         if (Outcome.Ok() && pjStored != nullptr) {
             Outcome = ReadBack(Into, eWritten, What, *pjStored);
         }

@@ -146,6 +146,24 @@ TEST_F(LocksTest, CallersBusyHandlerStays) {
     EXPECT_EQ(1, s_nCalls);
 }
 
+TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 2) {
+            Other("COMMIT; BEGIN; SELECT * FROM task");
+        }
+    });
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
+    EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
+    EXPECT_EQ("locked: cannot commit a transaction: database is locked (waited 5000 ms)",
+              Text(Into.Commit()));
+    Other("COMMIT");
+    EXPECT_EQ("ok", Text(Into.Commit()));
+    EXPECT_EQ(1, Into.Counts().nCommitted);
+}
+
 }  // namespace
 
 }  // namespace VORN_JSON_DB

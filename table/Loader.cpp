@@ -1,0 +1,172 @@
+// Many records through statements that stay prepared.
+
+#include <utility>
+
+#include "Attempt.h"
+#include "FindingCodes.h"
+#include "LoaderParts.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+constexpr char kDo[] = "load records into";
+
+Status NotStarted() {
+    return vornjsondb::Fail(StatusCode::kMisuse, {"load records", nullptr},
+                            "the loader is not started");
+}
+
+}  // namespace
+
+Loader::Parts::Parts(Table::Parts& To, const LoadOptions& HowToLoad)
+    : Into(To),
+      How(HowToLoad),
+      Values(To.Of, To.Codec, To.How.blCompatible, To.How.blIgnoreUnknown),
+      vecBytes(To.Of.Size()),
+      Writer(To, Values) {}
+
+Status Loader::Parts::BeginIfNone(const vornjsondb::Doing& What) {
+    if (!All.IsOpen()) {
+        blCallers = sqlite3_get_autocommit(Into.pDb) == 0;
+        return All.Begin(Into.pDb, Transaction::Mode::kImmediate, Into.How.nWaitMs);
+    }
+    return sqlite3_get_autocommit(Into.pDb) == 0
+               ? Status()
+               : vornjsondb::Fail(StatusCode::kMisuse, What, "its transaction was ended by others");
+}
+
+Status Loader::Parts::Write(FindingList vecFindings) {
+    const vornjsondb::Doing What{"load record # into", &Into.Of.Table(), Now.nRecords};
+    if (vecFindings.empty() && Values.IsEmpty()) {
+        Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
+    }
+    const bool blByKey = How.eOnDuplicate != OnDuplicate::kStop;
+    if (!vecFindings.empty() || (blByKey && !Values.HasKey(vecFindings))) {
+        return vornjsondb::FromFindings(std::move(vecFindings), What);
+    }
+    Status Outcome = BeginIfNone(What);
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    Written eWritten = Written::kInserted;
+    Outcome = Writer.Write(How.eOnDuplicate, What, eWritten);
+    if (Outcome.Ok()) {
+        std::int64_t* const apnCounts[] = {&Now.nInserted, &Now.nSkipped, &Now.nReplaced,
+                                           &Now.nReplaced};
+        ++*apnCounts[static_cast<size_t>(eWritten)];
+        return Outcome;
+    }
+    return vornjsondb::InTransaction(Into.pDb, Outcome);
+}
+
+// What is the record's own fault does not touch the others, as long as their transaction is there.
+Status Loader::Parts::Fail(const Status& Outcome) {
+    const StatusCode eCode = Outcome.Code();
+    const bool blBad = eCode == StatusCode::kRefused || eCode == StatusCode::kDuplicate ||
+                       eCode == StatusCode::kConstraint;
+    Now.nFailed += blBad ? 1 : 0;
+    const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
+    return blBad && !blGone && How.blGoOnAfterBad ? Outcome : End(Outcome);
+}
+
+Status Loader::Parts::End(const Status& Outcome) {
+    Ended = Outcome;
+    if (All.IsOpen()) {
+        All.Rollback().Ignore();
+    }
+    Now.nInserted = Kept.nInserted;
+    Now.nReplaced = Kept.nReplaced;
+    Now.nSkipped = Kept.nSkipped;
+    return Ended;
+}
+
+Status Loader::Parts::EndRecord(FindingList vecFindings) {
+    ++Now.nRecords;
+    const Status Outcome = Write(std::move(vecFindings));
+    Values.Clear();
+    if (!Outcome.Ok()) {
+        return Fail(Outcome);
+    }
+    const bool blFull = !blCallers && How.nRowsPerTransaction > 0 &&
+                        Now.nRecords - Now.nCommitted >= How.nRowsPerTransaction;
+    if (!blFull) {
+        return Outcome;
+    }
+    const Status Committed = Commit();
+    return Committed.Ok() || !Ended.Ok() ? Committed : End(Committed);
+}
+
+Status Loader::Parts::Commit() {
+    if (All.IsOpen()) {
+        const Status Outcome = All.Commit();
+        if (!Outcome.Ok()) {
+            const bool blAgain = Outcome.Code() == StatusCode::kLocked && All.IsOpen();
+            return blAgain ? Outcome : End(Outcome);
+        }
+    }
+    Now.nCommitted = Now.nRecords;
+    Kept = Now;
+    return {};
+}
+
+Status Loader::Parts::State() const {
+    return Ended.Ok() ? vornjsondb::CheckState(&Into, kDo, true) : Ended;
+}
+
+Loader::Loader() = default;
+Loader::~Loader() = default;
+
+Status Loader::Start(Table& Into, const LoadOptions& How) {
+    m_pParts.reset();
+    Status Outcome = vornjsondb::CheckState(Into.m_pParts.get(), kDo, true);
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    Table::Parts& To = *Into.m_pParts;
+    if (How.eOnDuplicate != OnDuplicate::kStop && To.Of.Key().empty()) {
+        FindingList vecFindings;
+        Report(vecFindings, vornjsondb::FindingCode::kNoKey, "", vornjsondb::kNoKeyText);
+        return vornjsondb::FromFindings(std::move(vecFindings), To.Do(kDo));
+    }
+    m_pParts = std::make_unique<Parts>(To, How);
+    return Outcome;
+}
+
+Status Loader::Add(const Json::Value& jRecord) {
+    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    FindingList vecFindings;
+    m_pParts->mapWrong.clear();
+    m_pParts->Values.Take(jRecord, vecFindings);
+    return m_pParts->EndRecord(std::move(vecFindings));
+}
+
+Status Loader::EndRecord() {
+    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    FindingList vecFindings;
+    if (!m_pParts->mapWrong.empty()) {
+        for (auto& Each : m_pParts->mapWrong) {
+            vecFindings.push_back(std::move(Each.second));
+        }
+        m_pParts->mapWrong.clear();
+    }
+    return m_pParts->EndRecord(std::move(vecFindings));
+}
+
+Status Loader::Commit() {
+    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
+    return Outcome.Ok() ? m_pParts->Commit() : Outcome;
+}
+
+const LoadCounts& Loader::Counts() const {
+    static constexpr LoadCounts kNone;
+    return m_pParts ? m_pParts->Now : kNone;
+}
+
+}  // namespace VORN_JSON_DB

@@ -1,0 +1,178 @@
+// A record member by member, from a parser that builds no JSON value.
+
+#include <cstring>
+#include <utility>
+
+#include "../src/base/JsonMemory.h"
+#include "FindingCodes.h"
+#include "LoaderParts.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using vornjsondb::FindingCode;
+using vornjsondb::Misfit;
+using Parts = Loader::Parts;
+
+// What is wrong and belongs to no member.
+constexpr size_t kUnknown = vornjsondb::Members::kNone - 1;
+constexpr size_t kWhole = vornjsondb::Members::kNone;
+
+Finding One(FindingCode eCode, std::string strPath, std::string strMessage) {
+    FindingList vecFindings;
+    Report(vecFindings, eCode, std::move(strPath), std::move(strMessage));
+    return std::move(vecFindings[0]);
+}
+
+// Whether there is such a member; what was wrong with its last value counts no more.
+bool IsMember(Parts& Of, int nMember) {
+    if (static_cast<size_t>(nMember) < Of.Into.Of.Size()) {
+        if (!Of.mapWrong.empty()) {
+            Of.mapWrong.erase(static_cast<size_t>(nMember));
+        }
+        return true;
+    }
+    if (!Of.Into.How.blIgnoreUnknown) {
+        Of.mapWrong[kUnknown] = One(FindingCode::kUnknownMember, "",
+                                    "there is no member of number " + std::to_string(nMember));
+    }
+    return false;
+}
+
+// Gives a member what fnFit makes of it. fnShown is the value as messages show it.
+template <typename Fit, typename ShowIt>
+void Set(Parts* pOf, int nMember, Fit&& fnFit, ShowIt&& fnShown) {
+    if (pOf == nullptr || !IsMember(*pOf, nMember)) {
+        return;
+    }
+    const auto nPlace = static_cast<size_t>(nMember);
+    const vornjsondb::Member& Into = pOf->Into.Of.At(nPlace);
+    const Misfit eMisfit = fnFit(*Into.pType, pOf->Values.Give(nPlace));
+    if (eMisfit != Misfit::kNone || Into.blGenerated) {
+        FindingList vecFindings;
+        ReportMisfit(eMisfit, Into, fnShown(), vornjsondb::Below("", Into.strName), vecFindings);
+        pOf->mapWrong[nPlace] = std::move(vecFindings[0]);
+    }
+}
+
+// The member's own copy of what was passed.
+std::string_view Copied(Parts& Of, int nMember, const char* pBytes, size_t nBytes) {
+    return Of.vecBytes[static_cast<size_t>(nMember)].assign(pBytes, nBytes);
+}
+
+// JSON and nothing else: JsonCpp takes comments and what follows unless it is told otherwise. Of
+// names that come twice the last one counts.
+std::unique_ptr<Json::CharReader> StrictReader() {
+    Json::CharReaderBuilder Builder;
+    Json::CharReaderBuilder::strictMode(&Builder.settings_);
+    Builder.settings_["strictRoot"] = false;
+    Builder.settings_["rejectDupKeys"] = false;
+    return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
+}
+
+}  // namespace
+
+int Loader::MemberIndex(std::string_view strMember) const {
+    return m_pParts ? static_cast<int>(m_pParts->Into.Of.Find(strMember)) : -1;
+}
+
+void Loader::SetNull(int nMember) {
+    Set(
+        m_pParts.get(), nMember,
+        [](const auto&, vornjsondb::BoundValue& Out) {
+            Out.eKind = vornjsondb::BoundValue::Kind::kNull;
+            return Misfit::kNone;
+        },
+        [] { return "null"; });
+}
+
+void Loader::SetBoolean(int nMember, bool blValue) {
+    Set(
+        m_pParts.get(), nMember,
+        [blValue](const auto& Type, auto& Out) { return FitBoolean(Type, blValue, Out); },
+        [blValue] { return blValue ? "true" : "false"; });
+}
+
+void Loader::SetInteger(int nMember, std::int64_t nValue) {
+    Set(
+        m_pParts.get(), nMember,
+        [&](const auto& Type, auto& Out) {
+            return FitInteger(Type, nValue, m_pParts->Into.How.blCompatible, Out);
+        },
+        [nValue] { return std::to_string(nValue); });
+}
+
+void Loader::SetReal(int nMember, double dValue) {
+    Set(
+        m_pParts.get(), nMember,
+        [&](const auto& Type, auto& Out) {
+            return FitReal(Type, dValue, m_pParts->Into.How.blCompatible, Out);
+        },
+        [dValue] { return vornjsondb::Shown(Json::Value(dValue)); });
+}
+
+void Loader::SetText(int nMember, std::string_view strText) {
+    Set(
+        m_pParts.get(), nMember,
+        [&](const auto& Type, auto& Out) {
+            return FitText(Type, Copied(*m_pParts, nMember, strText.data(), strText.size()),
+                           m_pParts->Into.How.blCompatible, Out);
+        },
+        [&] { return vornjsondb::ShownText(strText); });
+}
+
+void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
+    Set(
+        m_pParts.get(), nMember,
+        [&](const auto& Type, auto& Out) {
+            return FitBlob(Type,
+                           Copied(*m_pParts, nMember, static_cast<const char*>(pBytes), nBytes),
+                           m_pParts->Into.How.blCompatible, Out);
+        },
+        [] { return "a blob"; });
+}
+
+void Loader::SetJson(int nMember, std::string_view strJson) {
+    if (!m_pParts || !IsMember(*m_pParts, nMember)) {
+        return;
+    }
+    const auto nPlace = static_cast<size_t>(nMember);
+    const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
+    const std::string strPath = vornjsondb::Below("", Into.strName);
+    const char* const pEnd = strJson.data() + strJson.size();
+    FindingList vecFindings;
+    try {
+        if (!m_pParts->pReader) {
+            m_pParts->pReader = StrictReader();
+        }
+        Json::Value jValue;
+        if (!m_pParts->pReader->parse(strJson.data(), pEnd, &jValue, nullptr)) {
+            Report(
+                vecFindings, FindingCode::kWrongKind, strPath,
+                "member " + Into.strQuoted + ": " + vornjsondb::ShownText(strJson) + " is no JSON");
+        } else if (jValue.isString() && !Into.IsJson()) {
+            SetText(nMember, jValue.asString());
+        } else {
+            m_pParts->Values.SetJson(nPlace, jValue, vecFindings);
+        }
+    } catch (const Json::RuntimeError& Error) {
+        // The one exception of JsonCpp's for two things.
+        if (std::strstr(Error.what(), "stackLimit") == nullptr) {
+            vornjsondb::ThrowBadAlloc();
+        }
+        Report(vecFindings, FindingCode::kTooDeep, strPath,
+               "member " + Into.strQuoted + ": the JSON is nested too deeply");
+    }
+    if (!vecFindings.empty()) {
+        m_pParts->mapWrong[nPlace] = std::move(vecFindings[0]);
+    }
+}
+
+void Loader::Reject(std::string strReason) {
+    if (m_pParts) {
+        m_pParts->mapWrong[kWhole] = One(FindingCode::kRejected, "", std::move(strReason));
+    }
+}
+
+}  // namespace VORN_JSON_DB
