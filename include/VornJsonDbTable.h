@@ -29,7 +29,8 @@
 // reported at once, because the other side may be waiting for just this transaction. The caller's
 // busy handler is neither replaced nor removed.
 // A call that changes something is whole or nothing, inside a transaction of the caller's too. Two
-// failures may undo that transaction with it, as SQLite works: a full disk and an interrupt.
+// failures may undo that transaction with it, as SQLite works: a full disk and an interrupt. Then
+// the message ends in "the transaction is undone".
 // Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words
@@ -402,12 +403,14 @@ struct LoadOptions {
     bool blGoOnAfterBad = false;               // a bad record is left out, instead of ending it all
 };
 
+// A failure that ends the load takes back those inserted, replaced and skipped since the last
+// commit: they are undone.
 struct LoadCounts {
     std::int64_t nRecords = 0;  // so far; the number of the last one
     std::int64_t nInserted = 0;
     std::int64_t nReplaced = 0;  // replaced or updated
     std::int64_t nSkipped = 0;
-    std::int64_t nFailed = 0;
+    std::int64_t nFailed = 0;  // bad ones: for what is in them, or by Reject
     std::int64_t nCommitted = 0;  // how many of nRecords a commit has dealt with
 };
 
@@ -420,8 +423,10 @@ class Loader {
     Loader(const Loader&) = delete;
     Loader& operator=(const Loader&) = delete;
 
+    // Also starts anew, and then undoes what was not committed. All modes but kStop need a key.
     Status Start(Table& Into, const LoadOptions& How = LoadOptions());
 
+    // Returns what is wrong with this record; its message has the number, from 1.
     // Nothing of a bad record is stored. Without blGoOnAfterBad it ends the load, as other failures
     // do with it: all later calls return the first failure, and what was not committed is undone.
     Status Add(const Json::Value& jRecord);
@@ -440,7 +445,8 @@ class Loader {
     void Reject(std::string strReason);  // the record is bad for a reason that the caller knows
     Status EndRecord();
 
-    // Needed at the end; useful between, where a stop must not lose what was done.
+    // Needed at the end; useful between, where a stop must not lose what was done. After kLocked
+    // all is still there, and Commit can be called again.
     Status Commit();
 
     const LoadCounts& Counts() const;
