@@ -19,7 +19,8 @@ configure() {
         options+=(-G Ninja)
     fi
     if command -v ccache >/dev/null; then
-        options+=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache)
+        # It finds nothing again that was compiled with precompiled headers.
+        options+=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache -DCMAKE_DISABLE_PRECOMPILE_HEADERS=ON)
     fi
     mkdir -p "$folder"
     if ! cmake -S . -B "$folder" "${options[@]}" "$@" >"$folder/configure.log" 2>&1; then
