@@ -410,7 +410,7 @@ struct LoadCounts {
     std::int64_t nInserted = 0;
     std::int64_t nReplaced = 0;  // replaced or updated
     std::int64_t nSkipped = 0;
-    std::int64_t nFailed = 0;  // bad ones: for what is in them, or by Reject
+    std::int64_t nFailed = 0;     // bad ones: for what is in them, or by Reject
     std::int64_t nCommitted = 0;  // how many of nRecords a commit has dealt with
 };
 

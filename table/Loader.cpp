@@ -12,9 +12,11 @@ namespace {
 
 constexpr char kDo[] = "load records into";
 
-Status NotStarted() {
-    return vornjsondb::Fail(StatusCode::kMisuse, {"load records", nullptr},
-                            "the loader is not started");
+// Why a call of a loader cannot do anything.
+Status NotReady(const Loader::Parts* pParts) {
+    return pParts != nullptr ? pParts->State()
+                             : vornjsondb::Fail(StatusCode::kMisuse, {"load records", nullptr},
+                                                "the loader is not started");
 }
 
 }  // namespace
@@ -36,7 +38,7 @@ Status Loader::Parts::BeginIfNone(const vornjsondb::Doing& What) {
                : vornjsondb::Fail(StatusCode::kMisuse, What, "its transaction was ended by others");
 }
 
-Status Loader::Parts::Write(FindingList vecFindings) {
+Status Loader::Parts::Write(FindingList& vecFindings) {
     const vornjsondb::Doing What{"load record # into", &Into.Of.Table(), Now.nRecords};
     if (vecFindings.empty() && Values.IsEmpty()) {
         Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
@@ -81,9 +83,9 @@ Status Loader::Parts::End(const Status& Outcome) {
     return Ended;
 }
 
-Status Loader::Parts::EndRecord(FindingList vecFindings) {
+Status Loader::Parts::EndRecord(FindingList& vecFindings) {
     ++Now.nRecords;
-    const Status Outcome = Write(std::move(vecFindings));
+    Status Outcome = Write(vecFindings);
     Values.Clear();
     if (!Outcome.Ok()) {
         return Fail(Outcome);
@@ -134,20 +136,18 @@ Status Loader::Start(Table& Into, const LoadOptions& How) {
 }
 
 Status Loader::Add(const Json::Value& jRecord) {
-    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
-    if (!Outcome.Ok()) {
-        return Outcome;
+    if (!m_pParts || !m_pParts->IsReady()) {
+        return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
     m_pParts->mapWrong.clear();
     m_pParts->Values.Take(jRecord, vecFindings);
-    return m_pParts->EndRecord(std::move(vecFindings));
+    return m_pParts->EndRecord(vecFindings);
 }
 
 Status Loader::EndRecord() {
-    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
-    if (!Outcome.Ok()) {
-        return Outcome;
+    if (!m_pParts || !m_pParts->IsReady()) {
+        return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
     if (!m_pParts->mapWrong.empty()) {
@@ -156,12 +156,11 @@ Status Loader::EndRecord() {
         }
         m_pParts->mapWrong.clear();
     }
-    return m_pParts->EndRecord(std::move(vecFindings));
+    return m_pParts->EndRecord(vecFindings);
 }
 
 Status Loader::Commit() {
-    const Status Outcome = m_pParts ? m_pParts->State() : NotStarted();
-    return Outcome.Ok() ? m_pParts->Commit() : Outcome;
+    return m_pParts && m_pParts->IsReady() ? m_pParts->Commit() : NotReady(m_pParts.get());
 }
 
 const LoadCounts& Loader::Counts() const {

@@ -13,11 +13,13 @@
 struct VORN_JSON_DB::Loader::Parts {
     Parts(Table::Parts& To, const LoadOptions& HowToLoad);
 
-    // The failure that ended the load, or one when a callback reads from the table.
+    // Whether a record can be written now; if not, State tells why: the failure that ended the
+    // load, or a callback that reads from the table.
+    bool IsReady() const { return Ended.Ok() && Into.nReading == 0; }
     Status State() const;
 
     // Writes what Values hold, if nothing is wrong with them, and starts the next record.
-    Status EndRecord(FindingList vecFindings);
+    Status EndRecord(FindingList& vecFindings);
     Status Commit();
 
     Table::Parts& Into;
@@ -30,7 +32,7 @@ struct VORN_JSON_DB::Loader::Parts {
 
   private:
     Status BeginIfNone(const vornjsondb::Doing& What);
-    Status Write(FindingList vecFindings);
+    Status Write(FindingList& vecFindings);
     Status Fail(const Status& Outcome);
     Status End(const Status& Outcome);
 

@@ -25,34 +25,40 @@ Finding One(FindingCode eCode, std::string strPath, std::string strMessage) {
     return std::move(vecFindings[0]);
 }
 
-// Whether there is such a member; what was wrong with its last value counts no more.
-bool IsMember(Parts& Of, int nMember) {
-    if (static_cast<size_t>(nMember) < Of.Into.Of.Size()) {
-        if (!Of.mapWrong.empty()) {
-            Of.mapWrong.erase(static_cast<size_t>(nMember));
-        }
-        return true;
-    }
+void SetUnknown(Parts& Of, int nMember) {
     if (!Of.Into.How.blIgnoreUnknown) {
         Of.mapWrong[kUnknown] = One(FindingCode::kUnknownMember, "",
                                     "there is no member of number " + std::to_string(nMember));
     }
-    return false;
 }
 
-// Gives a member what fnFit makes of it. fnShown is the value as messages show it.
+// What was wrong with a member's last value counts no more, but what is wrong with this one.
+void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const std::string& strShown) {
+    const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
+    Of.mapWrong.erase(nPlace);
+    if (eMisfit != Misfit::kNone || Into.blGenerated) {
+        FindingList vecFindings;
+        ReportMisfit(eMisfit, Into, strShown, vornjsondb::Below("", Into.strName), vecFindings);
+        Of.mapWrong[nPlace] = std::move(vecFindings[0]);
+    }
+}
+
+// Gives a member what fnFit makes of it. fnShown is the value as messages show it. As short as it
+// can be where nothing is wrong: this runs for every value of a million records.
 template <typename Fit, typename ShowIt>
 void Set(Parts* pOf, int nMember, Fit&& fnFit, ShowIt&& fnShown) {
-    if (pOf == nullptr || !IsMember(*pOf, nMember)) {
+    if (pOf == nullptr) {
         return;
     }
     const auto nPlace = static_cast<size_t>(nMember);
+    if (nPlace >= pOf->vecBytes.size()) {
+        SetUnknown(*pOf, nMember);
+        return;
+    }
     const vornjsondb::Member& Into = pOf->Into.Of.At(nPlace);
     const Misfit eMisfit = fnFit(*Into.pType, pOf->Values.Give(nPlace));
-    if (eMisfit != Misfit::kNone || Into.blGenerated) {
-        FindingList vecFindings;
-        ReportMisfit(eMisfit, Into, fnShown(), vornjsondb::Below("", Into.strName), vecFindings);
-        pOf->mapWrong[nPlace] = std::move(vecFindings[0]);
+    if (eMisfit != Misfit::kNone || Into.blGenerated || !pOf->mapWrong.empty()) {
+        Judge(*pOf, nPlace, eMisfit, fnShown());
     }
 }
 
@@ -134,10 +140,12 @@ void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
 }
 
 void Loader::SetJson(int nMember, std::string_view strJson) {
-    if (!m_pParts || !IsMember(*m_pParts, nMember)) {
+    const auto nPlace = static_cast<size_t>(nMember);
+    if (!m_pParts || nPlace >= m_pParts->vecBytes.size()) {
+        SetNull(nMember);  // which says what is wrong
         return;
     }
-    const auto nPlace = static_cast<size_t>(nMember);
+    m_pParts->mapWrong.erase(nPlace);
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);
     const char* const pEnd = strJson.data() + strJson.size();

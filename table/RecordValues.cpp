@@ -1,5 +1,6 @@
 #include "RecordValues.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "../src/base/JsonMember.h"
@@ -16,10 +17,16 @@ RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatibl
       m_blIgnoreUnknown(blIgnoreUnknown),
       m_vecValues(Of.Size()),
       m_vecJson(Of.Size()),
-      m_strGiven(Of.Size(), '0') {}
+      m_strGiven(Of.Size(), '0') {
+    for (size_t i = 0; i < Of.Size(); ++i) {
+        if (Of.At(i).pjDefault != nullptr) {
+            m_vecDefaults.push_back(i);
+        }
+    }
+}
 
 void RecordValues::Clear() {
-    m_strGiven.assign(m_strGiven.size(), '0');
+    std::fill(m_strGiven.begin(), m_strGiven.end(), '0');
 }
 
 bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
@@ -60,10 +67,10 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
 }
 
 bool RecordValues::FillDefaults(FindingList& vecFindings) {
-    for (size_t i = 0; i < m_Of.Size(); ++i) {
-        const Member& Lacking = m_Of.At(i);
-        if (!Has(i) && Lacking.pjDefault != nullptr && !Lacking.blGenerated) {
-            SetJson(i, *Lacking.pjDefault, vecFindings);
+    for (const size_t nMember : m_vecDefaults) {
+        // The real table may compute what the definition has a default for.
+        if (!Has(nMember) && !m_Of.At(nMember).blGenerated) {
+            SetJson(nMember, *m_Of.At(nMember).pjDefault, vecFindings);
         }
     }
     return vecFindings.empty();

@@ -59,6 +59,7 @@ class RecordValues {
     JsonCodec& m_Codec;
     bool m_blCompatible;
     bool m_blIgnoreUnknown;
+    std::vector<size_t> m_vecDefaults;  // members that have one
     std::vector<BoundValue> m_vecValues;
     std::vector<std::string> m_vecJson;  // texts of JSON members
     std::string m_strGiven;

@@ -12,19 +12,24 @@ namespace {
 
 using Kind = VORN_JSON_DB::Row::Kind;
 
+// A column's value. SQLite calls it unprotected, for it is safe in one thread only; that is all
+// that a connection may have here, and all else of a column takes its lock once more.
+sqlite3_value* ValueAt(sqlite3_stmt* pStatement, int nColumn) {
+    return sqlite3_column_value(pStatement, nColumn);
+}
+
 // First the pointer, then the length: the other way round SQLite may convert in between. An empty
 // blob has no pointer, and neither has a text for which there is no memory.
-std::string_view TextOf(sqlite3_stmt* pStatement, int nColumn) {
-    const auto* pText = sqlite3_column_text(pStatement, nColumn);
+std::string_view TextOf(sqlite3_stmt* pStatement, sqlite3_value* pValue) {
+    const auto* pText = reinterpret_cast<const char*>(sqlite3_value_text(pValue));
+    const int nBytes = sqlite3_value_bytes(pValue);
     if (pText == nullptr) {
-        if (sqlite3_column_bytes(pStatement, nColumn) != 0 ||
-            sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
+        if (nBytes != 0 || sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
             throw std::bad_alloc();
         }
         return "";
     }
-    return {reinterpret_cast<const char*>(pText),
-            static_cast<size_t>(sqlite3_column_bytes(pStatement, nColumn))};
+    return {pText, static_cast<size_t>(nBytes)};
 }
 
 Json::Value TextValue(std::string_view strText) {
@@ -39,39 +44,12 @@ Json::Value ReadJson(std::string_view strText, JsonCodec& Codec) {
     return jRead;
 }
 
-// What a text member holds in nearly every row, without asking first what kind of value it is.
-bool ReadUsualText(sqlite3_stmt* pStatement, int nColumn, Json::Value& jOut) {
-    const auto* pText = reinterpret_cast<const char*>(sqlite3_column_text(pStatement, nColumn));
-    if (pText == nullptr) {
-        return false;
-    }
-    Json::Value jText(pText, pText + sqlite3_column_bytes(pStatement, nColumn));
-    jOut.swapPayload(jText);
-    return true;
-}
-
-Json::Value ReadColumn(sqlite3_stmt* pStatement, int nColumn, Kind eKind, JsonCodec& Codec) {
-    switch (eKind) {
-        case Kind::kBoolean:
-            return sqlite3_column_int(pStatement, nColumn) == 1;
-        case Kind::kInteger:
-            return static_cast<Json::Int64>(sqlite3_column_int64(pStatement, nColumn));
-        case Kind::kReal:
-            return sqlite3_column_double(pStatement, nColumn);
-        case Kind::kJson:
-            return ReadJson(TextOf(pStatement, nColumn), Codec);
-        default:
-            return TextValue(TextOf(pStatement, nColumn));
-    }
-}
-
-}  // namespace
-
-Kind KindOfColumn(sqlite3_stmt* pStatement, int nColumn, BoundKind eKind) {
-    switch (sqlite3_column_type(pStatement, nColumn)) {
+// What a value is: of its member's kind where it fits it, else of the stored one.
+Kind KindOf(sqlite3_value* pValue, BoundKind eKind) {
+    switch (sqlite3_value_type(pValue)) {
         case SQLITE_INTEGER: {
             if (eKind == BoundKind::kBoolean) {
-                const sqlite3_int64 nValue = sqlite3_column_int64(pStatement, nColumn);
+                const sqlite3_int64 nValue = sqlite3_value_int64(pValue);
                 return nValue == 0 || nValue == 1 ? Kind::kBoolean : Kind::kInteger;
             }
             if (eKind == BoundKind::kReal) {
@@ -93,6 +71,24 @@ Kind KindOfColumn(sqlite3_stmt* pStatement, int nColumn, BoundKind eKind) {
     }
 }
 
+Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, Kind eKind,
+                      JsonCodec& Codec) {
+    switch (eKind) {
+        case Kind::kBoolean:
+            return sqlite3_value_int(pValue) == 1;
+        case Kind::kInteger:
+            return static_cast<Json::Int64>(sqlite3_value_int64(pValue));
+        case Kind::kReal:
+            return sqlite3_value_double(pValue);
+        case Kind::kJson:
+            return ReadJson(TextOf(pStatement, pValue), Codec);
+        default:
+            return TextValue(TextOf(pStatement, pValue));
+    }
+}
+
+}  // namespace
+
 RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
                      VORN_JSON_DB::Nulls eNulls) try
     : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
@@ -112,27 +108,25 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 // The empty record is copied and its values replaced: no search for a name in any row.
-void RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec, Json::Value& jRecord) const try {
-    Json::Value jFilled = m_jEmpty;
-    Json::Value::iterator itMember = jFilled.begin();
+Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const try {
+    Json::Value jRecord = m_jEmpty;
+    Json::Value::iterator itMember = jRecord.begin();
     bool blLeaveOut = false;
     for (const Column& Each : m_vecInKeyOrder) {
         Json::Value& jMember = *itMember;
         ++itMember;
-        if (Each.eKind == BoundKind::kText && ReadUsualText(pStatement, Each.nColumn, jMember)) {
-            continue;
-        }
-        const Kind eKind = KindOfColumn(pStatement, Each.nColumn, Each.eKind);
+        sqlite3_value* const pValue = ValueAt(pStatement, Each.nColumn);
+        const Kind eKind = KindOf(pValue, Each.eKind);
         if (eKind != Kind::kNull) {
-            Json::Value jValue = ReadColumn(pStatement, Each.nColumn, eKind, Codec);
+            Json::Value jValue = ReadValue(pStatement, pValue, eKind, Codec);
             jMember.swapPayload(jValue);
         }
         blLeaveOut = blLeaveOut || (eKind == Kind::kNull && !Each.blKeepNull);
     }
     if (blLeaveOut) {
-        LeaveOutNulls(pStatement, jFilled);
+        LeaveOutNulls(pStatement, jRecord);
     }
-    jRecord.swapPayload(jFilled);
+    return jRecord;
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
@@ -159,7 +153,8 @@ const std::string& Row::Name(int nColumn) const {
 
 Row::Kind Row::KindOf(int nColumn) const {
     const size_t nMember = m_From.vecColumns[static_cast<size_t>(nColumn)];
-    return vornjsondb::KindOfColumn(m_From.pStatement, nColumn, m_From.Of.At(nMember).Kind());
+    return vornjsondb::KindOf(vornjsondb::ValueAt(m_From.pStatement, nColumn),
+                              m_From.Of.At(nMember).Kind());
 }
 
 std::int64_t Row::Integer(int nColumn) const {
@@ -171,7 +166,7 @@ double Row::Real(int nColumn) const {
 }
 
 std::string_view Row::Text(int nColumn) const {
-    return vornjsondb::TextOf(m_From.pStatement, nColumn);
+    return vornjsondb::TextOf(m_From.pStatement, vornjsondb::ValueAt(m_From.pStatement, nColumn));
 }
 
 }  // namespace VORN_JSON_DB

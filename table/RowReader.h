@@ -19,7 +19,7 @@ class RowReader {
     RowReader(const Members& Of, std::vector<size_t> vecColumns, VORN_JSON_DB::Nulls eNulls);
 
     // The statement's row as a record.
-    void Read(sqlite3_stmt* pStatement, JsonCodec& Codec, Json::Value& jRecord) const;
+    Json::Value Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const;
 
     const std::vector<size_t>& Columns() const { return m_vecColumns; }
 
@@ -38,9 +38,6 @@ class RowReader {
     std::vector<Column> m_vecInKeyOrder;
     Json::Value m_jEmpty;  // every member, with null
 };
-
-// What a column holds: its member's kind where the stored value fits it, else the stored one.
-VORN_JSON_DB::Row::Kind KindOfColumn(sqlite3_stmt* pStatement, int nColumn, BoundKind eKind);
 
 }  // namespace vornjsondb
 

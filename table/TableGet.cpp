@@ -67,7 +67,8 @@ Status Table::Get(const Json::Value& jKey, Json::Value& jRecord) {
         },
         Lent, nResult);
     if (Outcome.Ok() && nResult == SQLITE_ROW) {
-        m_pParts->WholeRow.Read(Lent.Get(), m_pParts->Codec, jRecord);
+        Json::Value jFound = m_pParts->WholeRow.Read(Lent.Get(), m_pParts->Codec);
+        jRecord.swapPayload(jFound);
     } else if (Outcome.Ok()) {
         return vornjsondb::Fail(StatusCode::kNotFound, What,
                                 "no record has the key " + vornjsondb::Shown(jKey));

@@ -60,8 +60,7 @@ Status SelectRecords(Parts& From, const Query& Which, const Doing& What, PerReco
         if (!blAll && !pSome) {
             pSome = std::make_unique<vornjsondb::RowReader>(From.Of, vecColumns, From.How.eNulls);
         }
-        Json::Value jRecord;
-        (blAll ? From.WholeRow : *pSome).Read(pStatement, From.Codec, jRecord);
+        Json::Value jRecord = (blAll ? From.WholeRow : *pSome).Read(pStatement, From.Codec);
         return fnRecord(jRecord);
     };
     return Select(From, Which, What, fnRow);

@@ -33,7 +33,7 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
         nResult = Lent.Step();
     }
     if (nResult == SQLITE_ROW) {
-        From.WholeRow.Read(Lent.Get(), From.Codec, jStored);
+        jStored = From.WholeRow.Read(Lent.Get(), From.Codec);
         return {};
     }
     return nResult == SQLITE_DONE
