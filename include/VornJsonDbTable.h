@@ -369,14 +369,14 @@ class Table {
     Status Remove(const Query& Which, std::int64_t* pnRows = nullptr);
     Status RemoveAll(std::int64_t* pnRows = nullptr);
 
-    // Compares the definition with the real table.
+    // Compares the definition with the real table, and replaces what is in vecFindings.
     Status Lint(FindingList& vecFindings);
 
     // Adds columns and unique indexes that the definition has more than the table. Nothing is ever
     // dropped, renamed, rebuilt or retyped; what would need that is a finding.
     Status Sync(SyncMode eMode, SyncReport& Report);
 
-    // Members may be paths. pstrSql receives the statement.
+    // Members may be paths. pstrSql receives the statement; an index that is there is not made again.
     Status CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                        std::string* pstrSql = nullptr);
 
@@ -505,7 +505,8 @@ FindingList LintOldRecord(const std::string& strTable, const Json::Value& jDefin
                           const Json::Value& jRecord);
 
 // What either handle can do with a member. blRead false for the old one means that it cannot read
-// any row in which the member is not NULL.
+// any row in which the member is not NULL; blQuery, that {member: value} finds the rows with this
+// value, lists in a "Json::Value" apart.
 struct Abilities {
     bool blCreate, blRead, blUpdate, blQuery;
 };

@@ -63,6 +63,11 @@ void Report(FindingList& vecFindings, FindingCode eCode, std::string strPath,
     vecFindings.push_back(std::move(Found));
 }
 
+void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings) {
+    Report(vecFindings, FindingCode::kNoDefinition, Below("", strTable),
+           "the definition names no members of table " + Quoted(strTable));
+}
+
 void ReportRefusal(const std::string& strWords, FindingList& vecFindings) {
     for (const RefusalRow& Row : kRefusals) {
         if (strWords.find(Row.szWords) != std::string::npos) {

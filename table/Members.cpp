@@ -49,8 +49,7 @@ Members::Members(const std::string& strTable, const Json::Value& jDefinition,
     : m_strTable(strTable), m_strQuotedTable(Quoted(strTable)) {
     const Json::Value& jMembers = DeclaredMembers(jDefinition, strTable);
     if (!jMembers.isObject() || jMembers.empty()) {
-        Report(vecFindings, FindingCode::kNoDefinition, Below("", strTable),
-               "the definition names no members of table " + m_strQuotedTable);
+        ReportNoDefinition(strTable, vecFindings);
         return;
     }
     m_jDefinition[strTable] = *FindMember(jDefinition, strTable);

@@ -1,0 +1,230 @@
+// What a VornJsonDbApi makes of a query object.
+
+#include <VornJsonDbTable.h>
+
+#include "../src/base/JsonMember.h"
+#include "../src/schema/MemberType.h"
+#include "../src/schema/TableDefinition.h"
+#include "FindingCodes.h"
+#include "Fit.h"
+#include "Nearest.h"
+#include "OldKeys.h"
+
+namespace vornjsondb {
+
+namespace {
+
+bool HoldsNul(const Json::Value& jValue) {
+    const char* pBegin = nullptr;
+    const char* pEnd = nullptr;
+    return jValue.isString() && jValue.getString(&pBegin, &pEnd) &&
+           std::string_view(pBegin, static_cast<size_t>(pEnd - pBegin)).find('\0') !=
+               std::string_view::npos;
+}
+
+// Kinds of values as the type knows them; null is another matter.
+bool IsOfKind(BoundKind eKind, const Json::Value& jValue) {
+    switch (eKind) {
+        case BoundKind::kText:
+            return jValue.isString();
+        case BoundKind::kBoolean:
+            return jValue.isBool();
+        case BoundKind::kInteger:
+        case BoundKind::kReal:
+            return jValue.isNumeric() && !jValue.isBool();
+        case BoundKind::kObject:
+            return jValue.isObject();
+        default:
+            return true;
+    }
+}
+
+class OldQueryLint {
+  public:
+    OldQueryLint(const Json::Value& jMembers, const Json::Value& jQuery, FindingList& vecFindings)
+        : m_jMembers(jMembers), m_jQuery(jQuery), m_vecFindings(vecFindings) {}
+
+    void Run() {
+        if (!m_jQuery.isObject() && !m_jQuery.isNull()) {
+            Report(m_vecFindings, FindingCode::kNotAQuery, "", Shown(m_jQuery) + " is no query");
+            return;
+        }
+        bool blCondition = false;
+        for (const std::string& strName : m_jQuery.getMemberNames()) {
+            blCondition = LintMember(strName, m_jQuery[strName]) || blCondition;
+        }
+        if (!blCondition) {
+            Report(m_vecFindings, FindingCode::kOldSelectsAll, "",
+                   "there is no condition: recList lists all records, recUpdateByFilter and " +
+                       std::string("recDelete refuse"));
+        }
+        LintTail();
+    }
+
+  private:
+    // Whether it is a condition.
+    bool LintMember(const std::string& strName, const Json::Value& jValue) {
+        const std::string strPath = Below("", strName);
+        if (strName == kOldFilter) {
+            LintFilter(jValue, strPath);
+            return true;
+        }
+        const Json::Value* pjMember = FindMember(m_jMembers, strName);
+        if (pjMember == nullptr) {
+            if (!IsOldKey(strName)) {
+                Report(m_vecFindings, FindingCode::kOldIgnoresMember, strPath,
+                       "there is no member " + ShownText(strName) + ", and the query goes " +
+                           "without it" + Suggestion(strName, m_jMembers.getMemberNames()));
+            }
+            return false;
+        }
+        if (IsOldKey(strName)) {
+            Report(m_vecFindings, FindingCode::kHidesQueryKey, strPath,
+                   Quoted(strName) + " is a condition and a key of the query at once");
+        }
+        m_strMember = "member " + ShownText(strName);
+        const MemberType& Type = TypeOfMember(*pjMember);
+        if (jValue.isArray()) {
+            LintList(Type, jValue, strPath);
+        } else {
+            LintValue(Type, Type.eCondition, jValue, strPath);
+        }
+        return true;
+    }
+
+    void LintFilter(const Json::Value& jFilter, const std::string& strPath) {
+        if (!jFilter.isString() || jFilter.asString().empty()) {
+            Report(m_vecFindings, FindingCode::kOldRefuses, strPath,
+                   Shown(jFilter) + " is no condition: expected is a text of SQL");
+        } else {
+            Report(m_vecFindings, FindingCode::kRawSql, strPath,
+                   "the text goes into the statement as SQL");
+        }
+    }
+
+    void LintList(const MemberType& Type, const Json::Value& jList, const std::string& strPath) {
+        if (jList.empty()) {
+            Report(m_vecFindings, FindingCode::kEmptyList, strPath,
+                   m_strMember + ": an empty list makes a statement that SQLite refuses");
+        } else if (jList.size() > 1) {
+            Report(m_vecFindings, FindingCode::kRunTogether, strPath,
+                   m_strMember + ": " + std::to_string(jList.size()) +
+                       " values run together into one");
+        } else if (Type.eCondition == ConditionForm::kQuotedJson) {
+            Report(m_vecFindings, FindingCode::kOldMembership, strPath,
+                   m_strMember + ": asks for records whose value is the list's element");
+        } else {
+            const bool blFlag = Type.eCondition == ConditionForm::kBoolean;
+            LintValue(Type, blFlag ? ConditionForm::kBareText : Type.eCondition, jList[0],
+                      Below(strPath, "0"));
+        }
+    }
+
+    void LintValue(const MemberType& Type, ConditionForm eForm, const Json::Value& jValue,
+                   const std::string& strPath) {
+        if (jValue.isNull()) {
+            Report(m_vecFindings, FindingCode::kOldNull, strPath,
+                   m_strMember + ": null " + OfNull(eForm));
+        } else if (IsRefused(eForm, jValue)) {
+            Report(
+                m_vecFindings, FindingCode::kOldRefuses, strPath,
+                m_strMember + ": " + Shown(jValue) + " cannot be compared with " + Expected(Type));
+        } else if (eForm == ConditionForm::kBareText && jValue.isString()) {
+            Report(m_vecFindings, FindingCode::kBareText, strPath,
+                   m_strMember + ": " + Shown(jValue) + " goes into the statement as SQL");
+        } else if (!IsOfKind(Type.Bound.eKind, jValue)) {
+            Report(m_vecFindings, FindingCode::kOldOtherKind, strPath,
+                   m_strMember + ": " + Shown(jValue) + " is converted: expected is " +
+                       Expected(Type));
+        } else if (eForm == ConditionForm::kQuotedText && HoldsNul(jValue)) {
+            Report(m_vecFindings, FindingCode::kNulCut, strPath,
+                   m_strMember + ": compared is the text before its NUL byte");
+        }
+    }
+
+    static const char* OfNull(ConditionForm eForm) {
+        switch (eForm) {
+            case ConditionForm::kQuotedText:
+                return "asks for the empty text";
+            case ConditionForm::kQuotedJson:
+                return "asks for the text null";
+            case ConditionForm::kBoolean:
+                return "asks for false";
+            default:
+                return "leaves a gap: the statement is refused, or selects nothing";
+        }
+    }
+
+    // Values that JsonCpp does not convert to the form.
+    static bool IsRefused(ConditionForm eForm, const Json::Value& jValue) {
+        if (eForm == ConditionForm::kQuotedJson) {
+            return false;
+        }
+        return !jValue.isConvertibleTo(eForm == ConditionForm::kBoolean ? Json::intValue
+                                                                        : Json::stringValue);
+    }
+
+    void LintTail() {
+        const Json::Value* pjSort = FindMember(m_jQuery, kOldSort);
+        if (pjSort != nullptr && pjSort->isString()) {
+            Report(
+                m_vecFindings, FindingCode::kSortsNothing, Below("", kOldSort),
+                Shown(*pjSort) + " is compared as a constant: the order stays that of the table");
+        } else if (pjSort != nullptr) {
+            Report(m_vecFindings, FindingCode::kOldRefuses, Below("", kOldSort),
+                   Shown(*pjSort) + " is no member's name");
+        }
+        LintPair(kOldDirection, kOldSort);
+        LintPair(kOldOffset, kOldLimit);
+        if (FindMember(m_jQuery, kOldLimit) != nullptr) {
+            LintCount(kOldLimit);
+            LintCount(kOldOffset);
+        }
+    }
+
+    void LintPair(const char* szKey, const char* szNeeded) {
+        if (FindMember(m_jQuery, szKey) != nullptr && FindMember(m_jQuery, szNeeded) == nullptr) {
+            Report(m_vecFindings, FindingCode::kOldIgnoresKey, Below("", szKey),
+                   Quoted(szKey) + " counts only beside " + Quoted(szNeeded));
+        }
+    }
+
+    void LintCount(const char* szKey) {
+        const Json::Value* pjCount = FindMember(m_jQuery, szKey);
+        if (pjCount == nullptr) {
+            return;
+        }
+        if (!pjCount->isInt64() || pjCount->isBool()) {
+            Report(m_vecFindings, FindingCode::kBadCount, Below("", szKey),
+                   Quoted(szKey) + " is " + Shown(*pjCount) + ", no whole number");
+        } else {
+            Report(m_vecFindings, FindingCode::kOldReadingOnly, Below("", szKey),
+                   Quoted(szKey) + " counts for recList and recGetOne alone");
+        }
+    }
+
+    const Json::Value& m_jMembers;
+    const Json::Value& m_jQuery;
+    std::string m_strMember;  // that is being looked at, for messages
+    FindingList& m_vecFindings;
+};
+
+}  // namespace
+
+}  // namespace vornjsondb
+
+namespace VORN_JSON_DB {
+
+FindingList LintOldQuery(const std::string& strTable, const Json::Value& jDefinition,
+                         const Json::Value& jOldQuery) {
+    FindingList vecFindings;
+    const Json::Value& jMembers = vornjsondb::DeclaredMembers(jDefinition, strTable);
+    if (jMembers.empty()) {
+        vornjsondb::ReportNoDefinition(strTable, vecFindings);
+    } else {
+        vornjsondb::OldQueryLint(jMembers, jOldQuery, vecFindings).Run();
+    }
+    return vecFindings;
+}
+
+}  // namespace VORN_JSON_DB
