@@ -1,0 +1,68 @@
+#include "IndexSql.h"
+
+#include <algorithm>
+
+#include "LeafSql.h"
+
+namespace vornjsondb {
+
+namespace {
+
+// As conditions have it, so that SQLite finds the index: the same text for a place in JSON, and
+// texts in the order of their bytes.
+std::string TermSql(const Member& Of, const Place& Where) {
+    if (!Where.strPath.empty()) {
+        return ValueAt(Of.strQuoted, Where.strPath);
+    }
+    return Of.strQuoted + (IsOrderedAsText(Of) ? " COLLATE BINARY" : "");
+}
+
+bool EndsWith(const std::string& strText, const std::string& strEnd) {
+    return strText.size() >= strEnd.size() &&
+           strText.compare(strText.size() - strEnd.size(), strEnd.size(), strEnd) == 0;
+}
+
+int FindFreeName(sqlite3* pDb, const std::string& strBase,
+                 const std::vector<std::string>& vecPlanned, std::string& strName) {
+    bool blTaken = true;
+    for (int i = 1; blTaken; ++i) {
+        strName = i == 1 ? strBase : strBase + "_" + std::to_string(i);
+        const int nResult = IsNameTaken(pDb, strName, blTaken);
+        if (nResult != SQLITE_OK) {
+            return nResult;
+        }
+        blTaken = blTaken || std::count(vecPlanned.begin(), vecPlanned.end(), strName) > 0;
+    }
+    return SQLITE_OK;
+}
+
+}  // namespace
+
+int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vecIndexes,
+              const std::vector<IndexTerm>& vecTerms, bool blUnique,
+              std::vector<std::string>& vecPlanned, IndexPlan& Out) {
+    const std::string strHead = blUnique ? "CREATE UNIQUE INDEX " : "CREATE INDEX ";
+    std::string strBase = Of.Table();
+    std::string strTail = " ON " + Of.QuotedTable();
+    const char* szBefore = " (";
+    for (const IndexTerm& Term : vecTerms) {
+        strBase += "_" + Term.strName;
+        strTail += szBefore + TermSql(Of.At(Term.Where.nMember), Term.Where);
+        szBefore = ", ";
+    }
+    strTail += ')';
+    for (const RealIndex& Index : vecIndexes) {
+        if (Index.strSql.compare(0, strHead.size(), strHead) == 0 &&
+            EndsWith(Index.strSql, strTail)) {
+            Out = IndexPlan{Index.strSql, true};
+            return SQLITE_OK;
+        }
+    }
+    std::string strName;
+    const int nResult = FindFreeName(pDb, strBase, vecPlanned, strName);
+    vecPlanned.push_back(strName);
+    Out = IndexPlan{strHead + Quoted(strName) + strTail, false};
+    return nResult;
+}
+
+}  // namespace vornjsondb

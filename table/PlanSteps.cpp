@@ -1,0 +1,63 @@
+#include "PlanSteps.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "Statements.h"
+
+namespace vornjsondb {
+
+namespace {
+
+// Whether the step is of that kind and of the table. Releases before 3.36 write "SCAN TABLE task".
+bool IsOf(const std::string& strStep, const std::string& strKind, const std::string& strTable) {
+    const size_t nBegin = strStep.find_first_not_of(' ');
+    for (const char* szWord : {" ", " TABLE "}) {
+        const std::string strHead = strKind + szWord + strTable;
+        if (strStep.compare(nBegin, std::string::npos, strHead) == 0 ||
+            strStep.compare(nBegin, strHead.size() + 1, strHead + " ") == 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+}  // namespace
+
+int ReadPlanSteps(sqlite3* pDb, const std::string& strSql, std::vector<std::string>& vecSteps) {
+    OwnStatement pStatement;
+    int nResult = Prepare(pDb, "EXPLAIN QUERY PLAN " + strSql, pStatement);
+    if (nResult != SQLITE_OK) {
+        return nResult;
+    }
+    std::vector<std::pair<int, std::string>> vecOpen{{0, ""}};  // steps by number, with indents
+    while ((nResult = sqlite3_step(pStatement.get())) == SQLITE_ROW) {
+        const int nParent = sqlite3_column_int(pStatement.get(), 1);
+        while (vecOpen.size() > 1 && vecOpen.back().first != nParent) {
+            vecOpen.pop_back();
+        }
+        const std::string strIndent = vecOpen.back().second;
+        const auto* pDetail = sqlite3_column_text(pStatement.get(), 3);
+        if (pDetail == nullptr) {
+            return SQLITE_NOMEM;
+        }
+        vecSteps.push_back(strIndent + reinterpret_cast<const char*>(pDetail));
+        vecOpen.emplace_back(sqlite3_column_int(pStatement.get(), 0), strIndent + "  ");
+    }
+    return nResult == SQLITE_DONE ? SQLITE_OK : nResult;
+}
+
+bool HasScan(const std::vector<std::string>& vecSteps, const std::string& strTable) {
+    return std::any_of(vecSteps.begin(), vecSteps.end(), [&](const std::string& strStep) {
+        return IsOf(strStep, "SCAN", strTable) && strStep.find(" USING ") == std::string::npos;
+    });
+}
+
+bool HasOwnIndex(const std::vector<std::string>& vecSteps, const std::string& strTable) {
+    return std::any_of(vecSteps.begin(), vecSteps.end(), [&](const std::string& strStep) {
+        return IsOf(strStep, "SEARCH", strTable) &&
+               strStep.find(" USING AUTOMATIC ") != std::string::npos;
+    });
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,200 @@
+#include "TableCompare.h"
+
+#include <algorithm>
+
+#include "Affinity.h"
+#include "CreateStatement.h"
+#include "FindingCodes.h"
+#include "IndexSql.h"
+#include "RealTable.h"
+
+namespace vornjsondb {
+
+namespace {
+
+bool SameName(const std::string& strLeft, const std::string& strRight) {
+    return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
+}
+
+// In any order.
+bool SameNames(std::vector<std::string> vecLeft, const std::vector<std::string>& vecRight) {
+    return vecLeft.size() == vecRight.size() &&
+           std::is_permutation(vecLeft.begin(), vecLeft.end(), vecRight.begin(), SameName);
+}
+
+class TableCompare {
+  public:
+    TableCompare(sqlite3* pDb, const Members& Of, std::vector<std::string>* pvecStatements,
+                 FindingList& vecFindings)
+        : m_pDb(pDb),
+          m_Of(Of),
+          m_strPath(Below(Below("", Of.Table()), "member")),
+          m_pvecStatements(pvecStatements),
+          m_vecFindings(vecFindings) {}
+
+    int Run(bool& blFound) {
+        int nResult = ReadRealTable(m_pDb, m_Of.Table(), m_Real);
+        blFound = !m_Real.vecColumns.empty();
+        if (nResult == SQLITE_OK && blFound) {
+            nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_vecIndexes);
+        }
+        if (nResult != SQLITE_OK || !blFound) {
+            return nResult;
+        }
+        for (size_t i = 0; i < m_Of.Size(); ++i) {
+            CompareMember(i);
+        }
+        CompareColumns();
+        for (size_t i = 0; nResult == SQLITE_OK && i < m_Of.Size(); ++i) {
+            if (m_Of.At(i).blUnique) {
+                nResult = CompareUnique({i}, false);
+            }
+        }
+        return nResult == SQLITE_OK ? CompareUnique(m_Of.Key(), true) : nResult;
+    }
+
+  private:
+    std::string PathOf(const Member& Of) const { return Below(m_strPath, Of.strName); }
+
+    void Add(FindingCode eCode, const Member& Of, const std::string& strMessage) {
+        Report(m_vecFindings, eCode, PathOf(Of), "member " + Of.strQuoted + strMessage);
+    }
+
+    const RealColumn* ColumnOf(const Member& Of) const {
+        const auto itFound = std::find_if(
+            m_Real.vecColumns.begin(), m_Real.vecColumns.end(),
+            [&Of](const RealColumn& Column) { return SameName(Column.strName, Of.strName); });
+        return itFound == m_Real.vecColumns.end() ? nullptr : &*itFound;
+    }
+
+    // The column that is the rowid never holds NULL.
+    bool IsRowid(const RealColumn& Column) const {
+        return m_Real.vecKey == std::vector<std::string>{Column.strName} &&
+               !m_Real.strRowid.empty() && SameName(Column.strType, "INTEGER");
+    }
+
+    void CompareMember(size_t nMember) {
+        const Member& Of = m_Of.At(nMember);
+        const RealColumn* pColumn = ColumnOf(Of);
+        if (pColumn == nullptr) {
+            CompareMissing(Of);
+            return;
+        }
+        if (pColumn->strName != Of.strName) {
+            Add(FindingCode::kOtherCase, Of,
+                " is the column " + Quoted(pColumn->strName) +
+                    ", which a VornJsonDbApi does not know by this name");
+        }
+        const Affinity eAffinity = AffinityOf(pColumn->strType);
+        if (!Keeps(eAffinity, Of.Kind())) {
+            Add(FindingCode::kOtherAffinity, Of,
+                " of type " + Quoted(Of.pType->szName) + ": its column, declared as " +
+                    Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
+                    " affinity and changes what is stored");
+        }
+        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn)) {
+            Add(FindingCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
+        }
+    }
+
+    // SQLite adds NOT NULL only beside a default, which the rows that are there get.
+    void CompareMissing(const Member& Of) {
+        if (Of.blKey) {
+            Add(FindingCode::kMissingKeyColumn, Of,
+                " of the key has no column, and the rows that are there would get no key");
+        } else if (m_pvecStatements == nullptr) {
+            Add(FindingCode::kMissingColumn, Of, " has no column");
+        } else {
+            const bool blNotNull = Of.blNotNull && !DefaultClause(Of).empty();
+            m_pvecStatements->push_back("ALTER TABLE " + m_Of.QuotedTable() + " ADD COLUMN " +
+                                        ColumnClause(Of, blNotNull));
+            if (Of.blNotNull && !blNotNull) {
+                Add(FindingCode::kNullableColumn, Of,
+                    " is \"notNull\" without a default, so that its new column takes NULL");
+            }
+        }
+    }
+
+    void CompareColumns() {
+        for (const RealColumn& Column : m_Real.vecColumns) {
+            if (m_Of.FindColumn(Column.strName) == Members::kNone) {
+                const bool blNeeded = Column.blNotNull && Column.strDefault.empty();
+                Report(m_vecFindings, FindingCode::kExtraColumn, m_strPath,
+                       "column " + Quoted(Column.strName) + " is no member: a VornJsonDbApi " +
+                           "cannot read back what it creates" +
+                           (blNeeded ? ", and no record can be created without its value" : ""));
+            }
+        }
+        if (m_Real.strRowid.empty()) {
+            Report(m_vecFindings, FindingCode::kWithoutRowid, Below("", m_Of.Table()),
+                   "the table has no rowid: a VornJsonDbApi cannot read back what it creates");
+        }
+    }
+
+    int CompareUnique(const std::vector<size_t>& vecMembers, bool blKey) {
+        std::vector<std::string> vecNames;
+        std::vector<IndexTerm> vecTerms;
+        for (const size_t nMember : vecMembers) {
+            const Member& Of = m_Of.At(nMember);
+            if (blKey && ColumnOf(Of) == nullptr) {
+                return SQLITE_OK;  // told already
+            }
+            vecNames.push_back(Of.strName);
+            vecTerms.push_back(IndexTerm{Of.strName, Place{nMember, ""}});
+        }
+        if (vecNames.empty() || IsUnique(vecNames)) {
+            return SQLITE_OK;
+        }
+        if (m_pvecStatements == nullptr) {
+            ReportNotUnique(vecMembers[0], blKey);
+            return SQLITE_OK;
+        }
+        IndexPlan Plan;
+        const int nResult =
+            PlanIndex(m_pDb, m_Of, m_vecIndexes, vecTerms, true, m_vecPlanned, Plan);
+        m_vecUniqueByPlan.push_back(vecNames);
+        m_pvecStatements->push_back(Plan.strSql);
+        return nResult;
+    }
+
+    void ReportNotUnique(size_t nMember, bool blKey) {
+        if (blKey) {
+            Report(m_vecFindings, FindingCode::kKeyNotUnique, Below(Below("", m_Of.Table()), "key"),
+                   "the table can hold several rows with one key");
+        } else {
+            Add(FindingCode::kMissingUnique, m_Of.At(nMember),
+                " is \"unique\", and several rows can have one value");
+        }
+    }
+
+    bool IsUnique(const std::vector<std::string>& vecNames) const {
+        const auto fnSame = [&vecNames](const std::vector<std::string>& vecOther) {
+            return SameNames(vecNames, vecOther);
+        };
+        return fnSame(m_Real.vecKey) ||
+               std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame) ||
+               std::any_of(m_vecIndexes.begin(), m_vecIndexes.end(),
+                           [&fnSame](const RealIndex& Index) {
+                               return Index.blUnique && fnSame(Index.vecColumns);
+                           });
+    }
+
+    sqlite3* m_pDb;
+    const Members& m_Of;
+    std::string m_strPath;
+    std::vector<std::string>* m_pvecStatements;
+    FindingList& m_vecFindings;
+    RealTable m_Real;
+    std::vector<RealIndex> m_vecIndexes;
+    std::vector<std::string> m_vecPlanned;                    // names of indexes
+    std::vector<std::vector<std::string>> m_vecUniqueByPlan;  // their columns
+};
+
+}  // namespace
+
+int CompareTable(sqlite3* pDb, const Members& Of, bool& blFound,
+                 std::vector<std::string>* pvecStatements, FindingList& vecFindings) {
+    return TableCompare(pDb, Of, pvecStatements, vecFindings).Run(blFound);
+}
+
+}  // namespace vornjsondb

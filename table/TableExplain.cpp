@@ -1,0 +1,130 @@
+// How SQLite would run a query.
+
+#include <cstring>
+#include <utility>
+
+#include "Attempt.h"
+#include "FindingCodes.h"
+#include "IndexAdvice.h"
+#include "PlanSteps.h"
+#include "QueryPlan.h"
+#include "SelectSql.h"
+#include "SqlWords.h"
+#include "TableParts.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using vornjsondb::Doing;
+using vornjsondb::FindingCode;
+using vornjsondb::OwnStatement;
+using Parts = Table::Parts;
+
+std::string Joined(const std::vector<std::string>& vecNames) {
+    std::string strJoined;
+    for (const std::string& strName : vecNames) {
+        strJoined += (strJoined.empty() ? "" : ", ") + vornjsondb::Quoted(strName);
+    }
+    return strJoined;
+}
+
+Status ReadPlan(Parts& From, const Doing& What, Plan& Found) {
+    return vornjsondb::Attempt(From.pDb, From.How.nWaitMs, [&]() -> Status {
+        Found.vecSteps.clear();
+        const int nResult = vornjsondb::ReadPlanSteps(From.pDb, Found.strSql, Found.vecSteps);
+        return nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(From.pDb, nResult, What);
+    });
+}
+
+// What follows the first statement in the text; nullptr: there is no statement.
+const char* BehindFirst(sqlite3* pDb, const char* szSql, int& nResult) {
+    const char* szTail = nullptr;
+    sqlite3_stmt* pStatement = nullptr;
+    nResult = sqlite3_prepare_v2(pDb, szSql, -1, &pStatement, &szTail);
+    const OwnStatement pOwn(pStatement);
+    return pStatement == nullptr ? nullptr : szTail;
+}
+
+// A comment or blanks may follow the one statement.
+Status CheckOne(Parts& From, const Doing& What, const std::string& strSql) {
+    int nResult = SQLITE_OK;
+    const char* szTail = BehindFirst(From.pDb, strSql.c_str(), nResult);
+    if (nResult != SQLITE_OK) {
+        return vornjsondb::FailBySqlite(From.pDb, nResult, What);
+    }
+    const bool blNul = std::strlen(strSql.c_str()) != strSql.size();
+    int nRest = SQLITE_OK;
+    FindingList vecFindings;
+    if (szTail == nullptr || blNul || BehindFirst(From.pDb, szTail, nRest) != nullptr ||
+        nRest != SQLITE_OK) {
+        vornjsondb::Report(
+            vecFindings, FindingCode::kNotOneStatement, "",
+            szTail == nullptr ? "the text holds no statement" : "more follows the first statement");
+    }
+    return vornjsondb::FromFindings(std::move(vecFindings), What);
+}
+
+}  // namespace
+
+Status Table::Explain(const Query& Which, Plan& Found) {
+    constexpr char kDo[] = "explain a query of";
+    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    if (!State.Ok()) {
+        return State;
+    }
+    Parts& From = *m_pParts;
+    const Doing What = From.Do(kDo);
+    Plan Made;
+    vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
+    Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
+    const Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
+    if (!Checked.Ok()) {
+        return Checked;
+    }
+    Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns());
+    Resolved.AppendWhere(Made.strSql);
+    Resolved.AppendTail(Made.strSql);
+    const Status Outcome = ReadPlan(From, What, Made);
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
+    if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
+        vornjsondb::Report(
+            Made.vecFindings, FindingCode::kFullScan, "/where",
+            "all records are looked at, which an index spares on " + Joined(vecAdvice));
+    }
+    Found = std::move(Made);
+    return Checked;
+}
+
+Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
+    constexpr char kDo[] = "explain a statement on";
+    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    if (!State.Ok()) {
+        return State;
+    }
+    Parts& From = *m_pParts;
+    const Doing What = From.Do(kDo);
+    Plan Made;
+    Made.strSql = strSql;
+    Status Outcome = vornjsondb::Attempt(From.pDb, From.How.nWaitMs,
+                                         [&] { return CheckOne(From, What, strSql); });
+    if (Outcome.Ok()) {
+        Outcome = ReadPlan(From, What, Made);
+    }
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    const bool blSearched =
+        vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
+    if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
+        vornjsondb::Report(Made.vecFindings, FindingCode::kFullScan, "",
+                           "all records are looked at; an index on what is compared may spare it");
+    }
+    Found = std::move(Made);
+    return {};
+}
+
+}  // namespace VORN_JSON_DB

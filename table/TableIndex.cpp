@@ -1,0 +1,82 @@
+// Indexes on members and on places in JSON members.
+
+#include <utility>
+
+#include "Attempt.h"
+#include "FindingCodes.h"
+#include "IndexSql.h"
+#include "TableParts.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+using vornjsondb::Doing;
+using vornjsondb::FindingCode;
+using vornjsondb::IndexPlan;
+using vornjsondb::IndexTerm;
+using Parts = Table::Parts;
+
+std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
+                               const std::vector<std::string>& vecMembers,
+                               FindingList& vecFindings) {
+    if (vecMembers.empty()) {
+        vornjsondb::Report(vecFindings, FindingCode::kBadMembers, "", "the list names no member");
+    }
+    std::vector<IndexTerm> vecTerms;
+    for (size_t i = 0; i < vecMembers.size(); ++i) {
+        IndexTerm Term{vecMembers[i], {}};
+        vornjsondb::Problem Why;
+        if (!vornjsondb::FindPlace(Of, Term.strName, Term.Where, Why)) {
+            vornjsondb::Report(vecFindings, Why.eCode, vornjsondb::Below("", std::to_string(i)),
+                               Why.strMessage);
+        }
+        vecTerms.push_back(std::move(Term));
+    }
+    return vecTerms;
+}
+
+int RunPlan(Parts& Into, const std::vector<IndexTerm>& vecTerms, bool blUnique, IndexPlan& Plan) {
+    std::vector<vornjsondb::RealIndex> vecIndexes;
+    std::vector<std::string> vecPlanned;
+    int nResult = vornjsondb::ReadRealIndexes(Into.pDb, Into.Of.Table(), vecIndexes);
+    if (nResult == SQLITE_OK) {
+        nResult = vornjsondb::PlanIndex(Into.pDb, Into.Of, vecIndexes, vecTerms, blUnique,
+                                        vecPlanned, Plan);
+    }
+    return nResult == SQLITE_OK && !Plan.blThere
+               ? sqlite3_exec(Into.pDb, Plan.strSql.c_str(), nullptr, nullptr, nullptr)
+               : nResult;
+}
+
+}  // namespace
+
+Status Table::CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
+                          std::string* pstrSql) {
+    constexpr char kDo[] = "create an index on";
+    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
+    if (!State.Ok()) {
+        return State;
+    }
+    Parts& Into = *m_pParts;
+    const Doing What = Into.Do(kDo);
+    FindingList vecFindings;
+    const std::vector<IndexTerm> vecTerms = TermsOf(Into.Of, vecMembers, vecFindings);
+    const Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
+    if (!Checked.Ok()) {
+        return Checked;
+    }
+    IndexPlan Plan;
+    const Status Outcome =
+        vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, [&]() -> Status {
+            const int nResult = RunPlan(Into, vecTerms, blUnique, Plan);
+            return nResult == SQLITE_OK ? Status()
+                                        : vornjsondb::FailBySqlite(Into.pDb, nResult, What);
+        });
+    if (Outcome.Ok() && pstrSql != nullptr) {
+        *pstrSql = Plan.strSql;
+    }
+    return Outcome;
+}
+
+}  // namespace VORN_JSON_DB

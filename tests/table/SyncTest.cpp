@@ -1,0 +1,312 @@
+// A definition beside the real table: what Lint tells, and what Sync adds.
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdio>
+
+#include "FakeTime.h"
+#include "QueryFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+class SyncTest : public TableTest {
+  protected:
+    // Makes a real table and opens it by a definition of other members.
+    void Meet(const std::string& strSql, const std::string& strEntry) {
+        Run(strSql);
+        m_Table = Table();
+        Options How;
+        How.blCompatible = false;
+        EXPECT_EQ(Text(m_Table.Open(m_pDb, "item", Parse("{\"item\": " + strEntry + "}"), How)),
+                  "ok");
+    }
+
+    std::string Lint() {
+        FindingList vecFindings;
+        const Status Outcome = m_Table.Lint(vecFindings);
+        return Outcome.Ok() ? Text(vecFindings) : Text(Outcome);
+    }
+
+    // The statements, each on a line, and the findings.
+    std::string Sync(SyncMode eMode = SyncMode::kChange) {
+        SyncReport Report;
+        const Status Outcome = m_Table.Sync(eMode, Report);
+        if (!Outcome.Ok()) {
+            EXPECT_TRUE(Report.vecStatements.empty() && Report.vecFindings.empty());
+            return Text(Outcome);
+        }
+        std::string strText;
+        for (const std::string& strSql : Report.vecStatements) {
+            strText += strSql + "\n";
+        }
+        return strText + Text(Report.vecFindings);
+    }
+
+    std::string Schema() { return Rows("SELECT sql FROM sqlite_schema ORDER BY rowid"); }
+};
+
+}  // namespace
+
+TEST_F(SyncTest, TableMadeFromTheDefinitionFits) {
+    Open(R"({"item": {"key": "id", "member": {"id": {"cpptype": "int", "notNull": true},
+        "b": {"cpptype": "bool", "notNull": true, "cppDefaultValue": true},
+        "r": {"cpptype": "double"}, "j": {"cpptype": "Json::Value"}, "x": {"cpptype": "any"},
+        "u": {"cpptype": "string", "unique": true}}}})");
+    EXPECT_EQ(Lint(), "");
+    EXPECT_EQ(Sync(), "");
+    Run("DROP TABLE item");
+    Meet("CREATE TABLE item (a VARCHAR(5), b TEXT NOT NULL, c INTEGER, d, PRIMARY KEY (b, a))",
+         R"({"key": ["a", "b"], "member": {"a": {"cpptype": "string"},
+             "b": {"cpptype": "string", "notNull": true}, "c": {"cpptype": "bool"},
+             "d": {"cpptype": "double"}}})");
+    EXPECT_EQ(Lint(), "");
+}
+
+TEST_F(SyncTest, LintTellsEveryDifference) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, Name TEXT, size TEXT, rate NUMERIC, any ANY,"
+        " code TEXT, extra INTEGER, needed TEXT NOT NULL, flag INTEGER)",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"}, "name": {"cpptype": "string"},
+             "size": {"cpptype": "int"}, "rate": {"cpptype": "double"}, "any": {"cpptype": "any"},
+             "code": {"cpptype": "string", "notNull": true, "unique": true},
+             "added": {"cpptype": "string"}, "flag": {"cpptype": "bool"}}})");
+    EXPECT_EQ(
+        Lint(),
+        "missing-column /item/member/added: member \"added\" has no column; "
+        "other-affinity /item/member/any: member \"any\" of type \"any\": its column, declared as "
+        "\"ANY\", has numeric affinity and changes what is stored; "
+        "nullable-column /item/member/code: member \"code\" is \"notNull\", and its column takes "
+        "NULL; "
+        "other-case /item/member/name: member \"name\" is the column \"Name\", which a "
+        "VornJsonDbApi does not know by this name; "
+        "other-affinity /item/member/rate: member \"rate\" of type \"double\": its column, "
+        "declared as \"NUMERIC\", has numeric affinity and changes what is stored; "
+        "other-affinity /item/member/size: member \"size\" of type \"int\": its column, declared "
+        "as \"TEXT\", has text affinity and changes what is stored; "
+        "extra-column /item/member: column \"extra\" is no member: a VornJsonDbApi cannot read "
+        "back what it creates; "
+        "extra-column /item/member: column \"needed\" is no member: a VornJsonDbApi cannot read "
+        "back what it creates, and no record can be created without its value; "
+        "missing-unique /item/member/code: member \"code\" is \"unique\", and several rows can "
+        "have one value");
+}
+
+TEST_F(SyncTest, TablesWithoutARowidAndWithoutAKey) {
+    Meet("CREATE TABLE item (id TEXT PRIMARY KEY) WITHOUT ROWID",
+         R"({"key": "id", "member": {"id": {"cpptype": "string"}}})");
+    EXPECT_EQ(Lint(),
+              "without-rowid /item: the table has no rowid: a VornJsonDbApi cannot read "
+              "back what it creates");
+    m_Table = Table();
+    Run("DROP TABLE item");
+    Meet(
+        "CREATE TABLE item (a INTEGER, b TEXT, c TEXT);"
+        "CREATE UNIQUE INDEX part ON item (a, b) WHERE c;"
+        "CREATE UNIQUE INDEX expression ON item (a, c || b);"
+        "CREATE INDEX plain ON item (a, b); INSERT INTO item VALUES (1, 'x', NULL)",
+        R"({"key": ["b", "a"], "member": {"a": {"cpptype": "int"}, "b": {"cpptype": "string"},
+            "c": {"cpptype": "string"}}})");
+    EXPECT_EQ(Lint(), "key-not-unique /item/key: the table can hold several rows with one key");
+    EXPECT_EQ(Create(R"({"a": 1, "b": "x"})"), R"({"a":1,"b":"x"})");
+    EXPECT_EQ(Sync().substr(0, 10), "duplicate:");
+    Run("DELETE FROM item WHERE rowid = 2");
+    EXPECT_EQ(Sync(),
+              "CREATE UNIQUE INDEX \"item_b_a\" ON \"item\" "
+              "(\"b\" COLLATE BINARY, \"a\")\n");
+    EXPECT_EQ(Lint(), "");
+    EXPECT_EQ(Create(R"({"a": 1, "b": "x"})").substr(0, 10), "duplicate:");
+}
+
+TEST_F(SyncTest, AddsColumnsAndUniqueIndexes) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "name": {"cpptype": "string", "cppDefaultValue": "it's", "notNull": true},
+             "mail": {"cpptype": "string", "unique": true},
+             "rate": {"cpptype": "double", "cppDefaultValue": 0.5},
+             "tags": {"cpptype": "Json::arrayValue", "cppDefaultValue": ["a"]},
+             "need": {"cpptype": "int", "notNull": true}}})");
+    const std::string strBefore = Schema();
+    const std::string strExpected =
+        "ALTER TABLE \"item\" ADD COLUMN \"mail\" TEXT\n"
+        "ALTER TABLE \"item\" ADD COLUMN \"name\" TEXT NOT NULL DEFAULT 'it''s'\n"
+        "ALTER TABLE \"item\" ADD COLUMN \"need\" INTEGER\n"
+        "ALTER TABLE \"item\" ADD COLUMN \"rate\" REAL DEFAULT 0.5\n"
+        "ALTER TABLE \"item\" ADD COLUMN \"tags\" TEXT DEFAULT '[\"a\"]'\n"
+        "CREATE UNIQUE INDEX \"item_mail\" ON \"item\" (\"mail\" COLLATE BINARY)\n"
+        "nullable-column /item/member/need: member \"need\" is \"notNull\" without a default, so "
+        "that its new column takes NULL";
+    EXPECT_EQ(Sync(SyncMode::kLook), strExpected);
+    EXPECT_EQ(Schema(), strBefore);
+    EXPECT_EQ(Sync(), strExpected);
+    EXPECT_EQ(Get("1"), R"({"id":1,"name":"it's","rate":0.5,"tags":["a"]})");
+    EXPECT_EQ(Create(R"({"id": 2, "mail": "m", "need": 3})"),
+              R"({"id":2,"mail":"m","name":"it's","need":3,"rate":0.5,"tags":["a"]})");
+    EXPECT_EQ(Create(R"({"id": 3, "mail": "m"})").substr(0, 10), "duplicate:");
+    EXPECT_EQ(Sync(),
+              "nullable-column /item/member/need: member \"need\" is \"notNull\", and its "
+              "column takes NULL");
+}
+
+TEST_F(SyncTest, RowsThatClashChangeNothing) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, a TEXT);"
+        "INSERT INTO item VALUES (1, 'x'), (2, 'x')",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"}, "b": {"cpptype": "int"},
+             "a": {"cpptype": "string", "unique": true}}})");
+    const std::string strBefore = Schema();
+    EXPECT_EQ(Sync(),
+              "duplicate: cannot bring the definition into table \"item\": UNIQUE constraint "
+              "failed: item.a");
+    EXPECT_EQ(Schema(), strBefore);
+    EXPECT_EQ(sqlite3_get_autocommit(m_pDb), 1);
+}
+
+TEST_F(SyncTest, KeyIsNotAdded) {
+    Meet("CREATE TABLE item (a INTEGER); INSERT INTO item VALUES (1)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");
+    const std::string strFinding =
+        "missing-key-column /item/member/id: member \"id\" of the key has no column, and the rows "
+        "that are there would get no key";
+    EXPECT_EQ(Lint(), strFinding);
+    EXPECT_EQ(Sync(), strFinding);
+    EXPECT_EQ(Schema(), "CREATE TABLE item (a INTEGER)");
+}
+
+// An index of the same name is another one, and an index of the same columns is this one.
+TEST_F(SyncTest, NamesOfIndexesAreFree) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, a TEXT, b TEXT, a_b TEXT, c TEXT);"
+        "CREATE TABLE ITEM_a (x); CREATE UNIQUE INDEX other ON item (C);"
+        "INSERT INTO item VALUES (1, 'x', 'y', 'z', 'w')",
+        R"({"key": ["a", "b"], "member": {"id": {"cpptype": "int"}, "b": {"cpptype": "string"},
+             "a": {"cpptype": "string", "unique": true}, "c": {"cpptype": "string", "unique": true},
+             "a_b": {"cpptype": "string", "unique": true}}})");
+    EXPECT_EQ(Sync(),
+              "CREATE UNIQUE INDEX \"item_a_2\" ON \"item\" (\"a\" COLLATE BINARY)\n"
+              "CREATE UNIQUE INDEX \"item_a_b\" ON \"item\" (\"a_b\" COLLATE BINARY)\n"
+              "CREATE UNIQUE INDEX \"item_a_b_2\" ON \"item\" "
+              "(\"a\" COLLATE BINARY, \"b\" COLLATE BINARY)\n");
+    EXPECT_EQ(Lint(), "");
+}
+
+TEST_F(SyncTest, GoesWithTheCallersTransaction) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");
+    Run("BEGIN");
+    EXPECT_EQ(Sync(), "ALTER TABLE \"item\" ADD COLUMN \"a\" INTEGER\n");
+    EXPECT_EQ(Get("1"), R"({"id":1})");
+    Run("ROLLBACK");
+    EXPECT_EQ(Schema(), "CREATE TABLE item (id INTEGER PRIMARY KEY)");
+}
+
+TEST_F(SyncTest, WhatCannotBeDoneAtAll) {
+    EXPECT_EQ(Lint(), "misuse: cannot compare the definition with: the table is not open");
+    EXPECT_EQ(Sync(), "misuse: cannot bring the definition into: the table is not open");
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}}})");
+    EXPECT_EQ(Text(m_Table.ForEach(Query(),
+                                   [&](const Json::Value&) {
+                                       EXPECT_EQ(Sync().substr(0, 7), "misuse:");
+                                       EXPECT_EQ(Sync(SyncMode::kLook), "");
+                                       EXPECT_EQ(Lint(), "");
+                                       return true;
+                                   })),
+              "ok");
+    Run("DROP TABLE item");
+    EXPECT_EQ(Lint(),
+              "not-found: cannot compare the definition with table \"item\": there is no "
+              "such table");
+    EXPECT_EQ(Sync(),
+              "not-found: cannot bring the definition into table \"item\": there is no "
+              "such table");
+}
+
+namespace {
+
+constexpr char kGrown[] = R"({"item": {"key": "id", "member": {"id": {"cpptype": "int"},
+    "a": {"cpptype": "int", "cppDefaultValue": 5, "unique": true}}}})";
+
+class SyncOfFileTest : public testing::Test {
+  protected:
+    SyncOfFileTest() {
+        std::remove(m_strFile.c_str());
+        OpenDb(m_pDb);
+        Run(m_pDb, "CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)");
+    }
+    ~SyncOfFileTest() override {
+        EXPECT_EQ(sqlite3_close(m_pDb), SQLITE_OK);
+        std::remove(m_strFile.c_str());
+        std::remove((m_strFile + "-journal").c_str());
+    }
+    SyncOfFileTest(const SyncOfFileTest&) = delete;
+    SyncOfFileTest& operator=(const SyncOfFileTest&) = delete;
+
+    void OpenDb(sqlite3*& pDb) const {
+        EXPECT_EQ(sqlite3_open(m_strFile.c_str(), &pDb), SQLITE_OK);
+    }
+    static void Run(sqlite3* pDb, const char* szSql) {
+        EXPECT_EQ(sqlite3_exec(pDb, szSql, nullptr, nullptr, nullptr), SQLITE_OK)
+            << sqlite3_errmsg(pDb);
+    }
+
+    // "ok <number of statements>", or what is wrong.
+    static std::string SyncBy(sqlite3* pDb) {
+        Table Of;
+        SyncReport Report;
+        Status Outcome = Of.Open(pDb, "item", Parse(kGrown));
+        if (Outcome.Ok()) {
+            Outcome = Of.Sync(SyncMode::kChange, Report);
+        }
+        return Text(Outcome) + " " + std::to_string(Report.vecStatements.size());
+    }
+
+    std::string m_strFile = testing::TempDir() + "sync-" +
+                            testing::UnitTest::GetInstance()->current_test_info()->name();
+    sqlite3* m_pDb = nullptr;
+};
+
+}  // namespace
+
+// The other one adds the column while this one waits for the lock.
+TEST_F(SyncOfFileTest, ReadsTheTableAgainOnceItHasTheLock) {
+    sqlite3* pOther = nullptr;
+    OpenDb(pOther);
+    Run(pOther, "BEGIN IMMEDIATE; ALTER TABLE item ADD COLUMN A INTEGER DEFAULT 5");
+    const FakeTime Time([&](int nPause) {
+        if (nPause == 2) {
+            Run(pOther, "CREATE UNIQUE INDEX other ON item (a); COMMIT");
+        }
+    });
+    EXPECT_EQ(SyncBy(m_pDb), "ok 0");
+    EXPECT_EQ(sqlite3_close(pOther), SQLITE_OK);
+}
+
+TEST_F(SyncOfFileTest, OfSeveralProcessesOneChangesTheTable) {
+    std::vector<pid_t> vecChildren;
+    for (int i = 0; i < 4; ++i) {
+        const pid_t nChild = fork();
+        ASSERT_GE(nChild, 0);
+        if (nChild == 0) {
+            sqlite3* pOwn = nullptr;
+            OpenDb(pOwn);
+            const std::string strResult = SyncBy(pOwn);
+            _exit(strResult == "ok 2" ? 2 : strResult == "ok 0" ? 0 : 1);
+        }
+        vecChildren.push_back(nChild);
+    }
+    int nStatements = 0;
+    for (const pid_t nChild : vecChildren) {
+        int nStatus = 0;
+        ASSERT_EQ(waitpid(nChild, &nStatus, 0), nChild);
+        ASSERT_TRUE(WIFEXITED(nStatus));
+        EXPECT_NE(WEXITSTATUS(nStatus), 1);
+        nStatements += WEXITSTATUS(nStatus);
+    }
+    EXPECT_EQ(nStatements, 2);
+    EXPECT_EQ(SyncBy(m_pDb), "ok 0");
+}
+
+}  // namespace VORN_JSON_DB
