@@ -13,12 +13,6 @@ namespace {
 
 constexpr double kTwoTo63 = 9223372036854775808.0;
 
-// The numbers of a type; nMostRead is the greatest that an old handle gives back.
-struct Range {
-    std::int64_t nLeast, nMost, nMostRead;
-    double dMost;  // of reals, and its negative the least
-};
-
 // In the order of BoundRange.
 constexpr Range kRanges[] = {
     {0, 0, 0, 0},
@@ -29,10 +23,6 @@ constexpr Range kRanges[] = {
     {0, 0, 0, std::numeric_limits<double>::max()},
     {0, 0, 0, static_cast<double>(std::numeric_limits<float>::max())},
 };
-
-const Range& RangeOf(const MemberType& Type) {
-    return kRanges[static_cast<size_t>(Type.Bound.eRange)];
-}
 
 // Levels that every release of JsonCpp reads; how many more depends on the release.
 constexpr size_t kSureLevels = 128;
@@ -102,6 +92,10 @@ Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompati
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace
+
+const Range& RangeOf(const MemberType& Type) {
+    return kRanges[static_cast<size_t>(Type.Bound.eRange)];
+}
 
 int BoundValue::Bind(sqlite3_stmt* pStatement, int nParameter) const {
     switch (eKind) {

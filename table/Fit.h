@@ -26,6 +26,13 @@ struct BoundValue {
     int Bind(sqlite3_stmt* pStatement, int nParameter) const;  // SQLite's result
 };
 
+// The numbers of a type; nMostRead is the greatest that an old handle gives back.
+struct Range {
+    std::int64_t nLeast, nMost, nMostRead;
+    double dMost;  // of reals, and its negative the least
+};
+const Range& RangeOf(const MemberType& Type);
+
 enum class Misfit {
     kNone,
     kKind,        // another kind of value

@@ -116,8 +116,8 @@ class OldRecordLint {
             Report(
                 m_vecFindings, FindingCode::kOutOfRange, strPath,
                 strMember + ": " + Shown(jValue) + " is beyond 63 bits, which recCreate refuses");
-        } else if (jValue.asInt64() < Type.Bound.nLeast ||
-                   jValue.asInt64() > Type.Bound.nMostRead) {
+        } else if (jValue.asInt64() < RangeOf(Type).nLeast ||
+                   jValue.asInt64() > RangeOf(Type).nMostRead) {
             Report(m_vecFindings, FindingCode::kOldReadsOther, strPath,
                    strMember + ": " + Shown(jValue) +
                        " is stored, and a VornJsonDbApi reads another number: expected is " +
