@@ -376,8 +376,8 @@ class Table {
     // dropped, renamed, rebuilt or retyped; what would need that is a finding.
     Status Sync(SyncMode eMode, SyncReport& Report);
 
-    // Members may be paths. pstrSql receives the statement; an index that is there is not made
-    // again.
+    // Members may be paths. pstrSql receives the statement. An index that is there is not made a
+    // second time.
     Status CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                        std::string* pstrSql = nullptr);
 

@@ -200,13 +200,17 @@ class FindingCodesTest : public TableTest {
         Options How;
         How.blCreateTable = true;
         EXPECT_EQ(Text(NoKey.Open(m_pDb, "n", Parse(strNoKey), How)), "ok");
+        Loader Into;
+        EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
+        Into.Reject("line 11 ends in a quote");
         return {m_Table.Create(jNaN).Findings(),
                 m_Table.Create(jDeep).Findings(),
                 LintOldRecord("d", Parse(kD), jOldNaN),
                 m_Table.List(Query().Where("id", Op::kIn, jMany), jOut).Findings(),
                 m_Table.List(Query().Where(Condition::Any(vecParts)), jOut).Findings(),
                 m_Table.List(Query().Where(Deep), jOut).Findings(),
-                NoKey.Save(Parse(R"({"a": 1})"), OnDuplicate::kUpsert).Findings()};
+                NoKey.Save(Parse(R"({"a": 1})"), OnDuplicate::kUpsert).Findings(),
+                Into.EndRecord().Findings()};
     }
 
   private:
