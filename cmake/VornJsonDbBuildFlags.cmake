@@ -25,7 +25,8 @@ target_compile_options(vornjsondb_build_flags INTERFACE
 set(VORNJSONDB_INSTRUMENT_FLAGS "")
 if(VORNJSONDB_SANITIZE)
     list(APPEND VORNJSONDB_INSTRUMENT_FLAGS
-        -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+        -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer
+        -D_GLIBCXX_ASSERTIONS)
 endif()
 if(VORNJSONDB_COVERAGE)
     # Atomic counters: the tests run side by side and fork.
