@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# The public header compiles by itself, as C++11 and later. A warning is an error where it is one in
-# the build.
+# Each public header compiles by itself, as its oldest language standard and later ones. A warning is
+# an error where it is one in the build.
 set -euo pipefail
 
 read -ra json_flags <<<"$JSONCPP_CFLAGS"
@@ -8,11 +8,20 @@ werror=()
 if [[ $WERROR == ON ]]; then
     werror=(-Werror)
 fi
-unit=$WORK_DIR/header_alone.cpp
-echo '#include <VornJsonDbApi.h>' >"$unit"
 
-for standard in c++11 c++14 c++17 c++2a; do
-    echo "as $standard"
-    "$CXX" "-std=$standard" -Wall -Wextra -Wpedantic "${werror[@]}" -fsyntax-only \
-        "-I$SOURCE_DIR/include" "${json_flags[@]}" "$unit"
-done
+# compiles HEADER STANDARD...
+compiles() {
+    local header=$1 unit=$WORK_DIR/header_alone.cpp standard
+    shift
+    echo "#include <$header>" >"$unit"
+    for standard; do
+        echo "$header as $standard"
+        "$CXX" "-std=$standard" -Wall -Wextra -Wpedantic "${werror[@]}" -fsyntax-only \
+            "-I$SOURCE_DIR/include" "${json_flags[@]}" "$unit"
+    done
+}
+
+compiles VornJsonDbApi.h c++11 c++14 c++17 c++2a
+if [[ -n $TABLE_LIBRARY ]]; then
+    compiles VornJsonDbTable.h c++17 c++2a
+fi

@@ -9,8 +9,8 @@ rm -rf "$STAGE"
 # lib may be lib64 or lib/<triplet>, by the system's custom.
 (cd "$STAGE" && find . -mindepth 1 ! -type d) | sed -E 's|^\./lib[^/]*(/[^/]*-linux-[^/]*)?/|lib/|; s|^\./||' |
     LC_ALL=C sort >"$WORK_DIR/installed.txt"
-diff -u - "$WORK_DIR/installed.txt" <<LIST
-include/VornJsonDbApi.h
+
+expected="include/VornJsonDbApi.h
 lib/cmake/vornjsondb/VornJsonDbJsonCpp.cmake
 lib/cmake/vornjsondb/vornjsondbConfig.cmake
 lib/cmake/vornjsondb/vornjsondbConfigVersion.cmake
@@ -19,8 +19,14 @@ lib/cmake/vornjsondb/vornjsondbTargets.cmake
 lib/libvornjsondb.so
 lib/libvornjsondb.so.6
 lib/libvornjsondb.so.6.0.0
-lib/pkgconfig/vornjsondb.pc
-LIST
+lib/pkgconfig/vornjsondb.pc"
+if [[ -n $TABLE_LIBRARY ]]; then
+    expected+="
+include/VornJsonDbTable.h
+lib/libvornjsondb-table.a
+lib/pkgconfig/vornjsondb-table.pc"
+fi
+diff -u <(LC_ALL=C sort <<<"$expected") "$WORK_DIR/installed.txt"
 
 # A tree that names the folder it was built in breaks when it is moved. Debug information and
 # instrumented code may name sources.

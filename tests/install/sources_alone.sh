@@ -1,10 +1,14 @@
 #!/usr/bin/env bash
-# Every source of the library compiles in any build system: with the include folder, the language
+# Every source of the libraries compiles in any build system: with the include folder, the language
 # level and JsonCpp's flags alone, from another directory, with no generated file.
 set -euo pipefail
 
 read -ra json_flags <<<"$JSONCPP_CFLAGS"
-mapfile -t sources < <(find "$SOURCE_DIR/src" -name '*.cpp' | LC_ALL=C sort)
+folders=("$SOURCE_DIR/src")
+if [[ -n $TABLE_LIBRARY ]]; then
+    folders+=("$SOURCE_DIR/table")
+fi
+mapfile -t sources < <(find "${folders[@]}" -name '*.cpp' | LC_ALL=C sort)
 ((${#sources[@]} > 0))
 
 cd "$WORK_DIR"
