@@ -12,7 +12,8 @@ source scripts/build.sh
 libraries=("$@")
 if ((${#libraries[@]} == 0)); then
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" binutils:readelf
-    configure hardening -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF
+    configure hardening -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF \
+        -DVORNJSONDB_TABLE=OFF
     build_quietly hardening vornjsondb
     libraries=(build/hardening/libvornjsondb.so)
 fi

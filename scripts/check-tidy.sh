@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Fails when clang-tidy finds something in the library or the examples. File names given as arguments
+# Fails when clang-tidy finds something in the libraries or the examples. File names given as arguments
 # limit the look to these.
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -12,7 +12,7 @@ configure tidy -DCMAKE_EXPORT_COMPILE_COMMANDS=ON -DBUILD_TESTING=OFF -DVORNJSON
 
 files=("$@")
 if ((${#files[@]} == 0)); then
-    mapfile -d '' -t files < <(cxx_files src examples | grep -z '\.cpp$')
+    mapfile -d '' -t files < <(cxx_files src table examples | grep -z '\.cpp$')
 fi
 # The counts of warnings in system headers tell nothing.
 printf '%s\0' "${files[@]}" | xargs -0 -n 1 -P "$jobs" clang-tidy --quiet -p build/tidy 2>&1 |

@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Runs the tests with gcc's coverage counters and prints the line and branch coverage of src/.
+# Runs the tests with gcc's coverage counters and prints the line and branch coverage of src/ and
+# table/.
 #
 #    scripts/coverage.sh [--fail-under LINES BRANCHES] [GCOVR-OPTION...]
 #
@@ -25,8 +26,10 @@ build coverage
 
 (cd build/coverage && ctest --output-on-failure --parallel "$jobs" --label-exclude 'install|campaign')
 
-# Counted is what the tests reach by themselves, in the library that has every name visible.
-counted=build/coverage/tests/CMakeFiles/vornjsondb_testable.dir
+# Counted is what the tests reach by themselves: in the shared library with every name visible, and in
+# the static one, which has some of the sources once more.
+counted=(build/coverage/tests/CMakeFiles/vornjsondb_testable.dir
+    build/coverage/table/CMakeFiles/vornjsondb_table.dir)
 
 # Branches that only an exception takes are not counted. First the branches file by file, then the
 # lines with the figures of both.
@@ -36,7 +39,7 @@ counted=build/coverage/tests/CMakeFiles/vornjsondb_testable.dir
 own_branches=('^ *static ' '^VORN_JSON_MEMORY' '^ *} catch' '^ *(\*|.*\()new ' '^ *};$'
     '^ *const LineFormat Format\(' '^ *std::printf\(' '^ *syslog\(' '^ *Name\.pBegin = It'
     '^ *return FindMember\(' '^ *return SqlText\(')
-report=(gcovr --root . --filter src/ --exclude-throw-branches
+report=(gcovr --root . --filter src/ --filter table/ --exclude-throw-branches
     --exclude-branches-by-pattern "$(IFS='|' && echo "${own_branches[*]}")")
-"${report[@]}" --branches "$counted"
-"${report[@]}" --print-summary "${options[@]}" "$@" "$counted"
+"${report[@]}" --branches "${counted[@]}"
+"${report[@]}" --print-summary "${options[@]}" "$@" "${counted[@]}"
