@@ -102,6 +102,13 @@ TEST_F(ReadTest, NullsAreReadAsTold) {
     EXPECT_EQ(R"([{"other":null}])", List(R"({"members": ["other"]})"));
 }
 
+// JSON text that another program wrote is no NULL.
+TEST_F(ReadTest, TextOfANullIsNotLeftOut) {
+    Run("UPDATE task SET tags = 'null', size = NULL WHERE id = 1");
+    EXPECT_EQ(R"([{"id":1,"tags":null}])",
+              List(R"({"where": {"id": 1}, "members": ["id", "size", "tags"]})"));
+}
+
 TEST_F(ReadTest, ForEachGoesOnUntilTheCallbackStops) {
     std::string strSeen;
     const auto fnSeen = [&](const Json::Value& jRecord) {

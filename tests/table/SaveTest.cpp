@@ -151,6 +151,17 @@ TEST_F(SaveTest, DuplicateTellsEveryMemberOfTheKey) {
         Create(strRecord));
 }
 
+TEST_F(SaveTest, TriggersBeforeAnInsertRunOnceForWhatReplaces) {
+    Open();
+    Run("CREATE TABLE log (id); CREATE TRIGGER t BEFORE INSERT ON task "
+        "BEGIN INSERT INTO log VALUES (new.id); END");
+    EXPECT_EQ(R"(inserted {"done":false,"id":1,"name":"a"})",
+              Save(R"({"id": 1, "name": "a"})", OnDuplicate::kReplace));
+    EXPECT_EQ(R"(replaced {"done":false,"id":1,"name":"b"})",
+              Save(R"({"id": 1, "name": "b"})", OnDuplicate::kReplace));
+    EXPECT_EQ("1;1", Rows("SELECT id FROM log"));
+}
+
 TEST_F(SaveTest, TriggersAreSeenInTheStoredRow) {
     Open();
     Run("CREATE TRIGGER t AFTER INSERT ON task BEGIN "
