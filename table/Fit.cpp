@@ -6,6 +6,7 @@
 
 #include "../src/base/JsonMember.h"
 #include "../src/base/JsonMemory.h"
+#include "FindingCodes.h"
 
 namespace vornjsondb {
 
@@ -150,6 +151,8 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
 
 Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out) {
     const BoundForm& Form = Type.Bound;
+    Out.eKind = BoundValue::Kind::kReal;
+    Out.dValue = dValue;
     if (std::isnan(dValue)) {
         return Misfit::kNotANumber;
     }
@@ -165,8 +168,6 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
     if (Form.eKind != BoundKind::kReal && Form.eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }
-    Out.eKind = BoundValue::Kind::kReal;
-    Out.dValue = dValue;
     const bool blBeyond = Form.eKind == BoundKind::kReal && std::isfinite(dValue) &&
                           std::fabs(dValue) > RangeOf(Type).dMost;
     return blBeyond ? Misfit::kRange : Readable(Type, blCompatible);
@@ -175,11 +176,11 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
 Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompatible,
                BoundValue& Out) {
     const BoundKind eKind = Type.Bound.eKind;
+    Out.eKind = BoundValue::Kind::kText;
+    Out.strBytes = strValue;
     if (eKind != BoundKind::kText && eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }
-    Out.eKind = BoundValue::Kind::kText;
-    Out.strBytes = strValue;
     const bool blCut = blCompatible && strValue.find('\0') != std::string_view::npos;
     return blCut ? Misfit::kUnreadable : Readable(Type, blCompatible);
 }
@@ -217,6 +218,21 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
         }
         default:
             return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
+    }
+}
+
+std::string Shown(const BoundValue& Value) {
+    switch (Value.eKind) {
+        case BoundValue::Kind::kInteger:
+            return std::to_string(Value.nValue);
+        case BoundValue::Kind::kReal:
+            return Shown(Json::Value(Value.dValue));
+        case BoundValue::Kind::kText:
+            return ShownText(Value.strBytes);
+        case BoundValue::Kind::kBlob:
+            return "a blob";
+        default:
+            return "null";
     }
 }
 

@@ -42,8 +42,8 @@ enum class Misfit {
     kDepth        // JSON that its reader would refuse
 };
 
-// Each makes Out of a value, for a member of that type. blCompatible: what an old handle could not
-// read back does not fit.
+// Each makes Out of a value, for a member of that type, also where it does not fit. blCompatible:
+// what an old handle could not read back does not fit.
 Misfit FitBoolean(const MemberType& Type, bool blValue, BoundValue& Out);
 Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible, BoundValue& Out);
 Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out);
@@ -55,6 +55,9 @@ Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompati
 // For every kind of value, null included. strJson keeps the text of a JSON member.
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out);
+
+// The value as messages show it.
+std::string Shown(const BoundValue& Value);
 
 // "a text", "a whole number from 0 to 4294967295": what a type takes, for messages.
 std::string Expected(const MemberType& Type);

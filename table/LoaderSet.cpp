@@ -33,20 +33,21 @@ void SetUnknown(Parts& Of, int nMember) {
 }
 
 // What was wrong with a member's last value counts no more, but what is wrong with this one.
-void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const std::string& strShown) {
+void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const char* szShown) {
     const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
     Of.mapWrong.erase(nPlace);
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
         FindingList vecFindings;
-        ReportMisfit(eMisfit, Into, strShown, vornjsondb::Below("", Into.strName), vecFindings);
+        ReportMisfit(eMisfit, Into, szShown != nullptr ? szShown : Shown(Of.Values.At(nPlace)),
+                     vornjsondb::Below("", Into.strName), vecFindings);
         Of.mapWrong[nPlace] = std::move(vecFindings[0]);
     }
 }
 
-// Gives a member what fnFit makes of it. fnShown is the value as messages show it. As short as it
-// can be where nothing is wrong: this runs for every value of a million records.
-template <typename Fit, typename ShowIt>
-void Set(Parts* pOf, int nMember, Fit&& fnFit, ShowIt&& fnShown) {
+// Gives a member what fnFit makes of it; szShown shows it in messages where that does not. As short
+// as it can be where nothing is wrong: this runs for every value of a million records.
+template <typename Fit>
+void Set(Parts* pOf, int nMember, Fit&& fnFit, const char* szShown = nullptr) {
     if (pOf == nullptr) {
         return;
     }
@@ -58,7 +59,7 @@ void Set(Parts* pOf, int nMember, Fit&& fnFit, ShowIt&& fnShown) {
     const vornjsondb::Member& Into = pOf->Into.Of.At(nPlace);
     const Misfit eMisfit = fnFit(*Into.pType, pOf->Values.Give(nPlace));
     if (eMisfit != Misfit::kNone || Into.blGenerated || !pOf->mapWrong.empty()) {
-        Judge(*pOf, nPlace, eMisfit, fnShown());
+        Judge(*pOf, nPlace, eMisfit, szShown);
     }
 }
 
@@ -84,59 +85,43 @@ int Loader::MemberIndex(std::string_view strMember) const {
 }
 
 void Loader::SetNull(int nMember) {
-    Set(
-        m_pParts.get(), nMember,
-        [](const auto&, vornjsondb::BoundValue& Out) {
-            Out.eKind = vornjsondb::BoundValue::Kind::kNull;
-            return Misfit::kNone;
-        },
-        [] { return "null"; });
+    Set(m_pParts.get(), nMember, [](const auto&, vornjsondb::BoundValue& Out) {
+        Out.eKind = vornjsondb::BoundValue::Kind::kNull;
+        return Misfit::kNone;
+    });
 }
 
 void Loader::SetBoolean(int nMember, bool blValue) {
     Set(
         m_pParts.get(), nMember,
         [blValue](const auto& Type, auto& Out) { return FitBoolean(Type, blValue, Out); },
-        [blValue] { return blValue ? "true" : "false"; });
+        blValue ? "true" : "false");
 }
 
 void Loader::SetInteger(int nMember, std::int64_t nValue) {
-    Set(
-        m_pParts.get(), nMember,
-        [&](const auto& Type, auto& Out) {
-            return FitInteger(Type, nValue, m_pParts->Into.How.blCompatible, Out);
-        },
-        [nValue] { return std::to_string(nValue); });
+    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
+        return FitInteger(Type, nValue, m_pParts->Into.How.blCompatible, Out);
+    });
 }
 
 void Loader::SetReal(int nMember, double dValue) {
-    Set(
-        m_pParts.get(), nMember,
-        [&](const auto& Type, auto& Out) {
-            return FitReal(Type, dValue, m_pParts->Into.How.blCompatible, Out);
-        },
-        [dValue] { return vornjsondb::Shown(Json::Value(dValue)); });
+    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
+        return FitReal(Type, dValue, m_pParts->Into.How.blCompatible, Out);
+    });
 }
 
 void Loader::SetText(int nMember, std::string_view strText) {
-    Set(
-        m_pParts.get(), nMember,
-        [&](const auto& Type, auto& Out) {
-            return FitText(Type, Copied(*m_pParts, nMember, strText.data(), strText.size()),
-                           m_pParts->Into.How.blCompatible, Out);
-        },
-        [&] { return vornjsondb::ShownText(strText); });
+    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
+        return FitText(Type, Copied(*m_pParts, nMember, strText.data(), strText.size()),
+                       m_pParts->Into.How.blCompatible, Out);
+    });
 }
 
 void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
-    Set(
-        m_pParts.get(), nMember,
-        [&](const auto& Type, auto& Out) {
-            return FitBlob(Type,
-                           Copied(*m_pParts, nMember, static_cast<const char*>(pBytes), nBytes),
-                           m_pParts->Into.How.blCompatible, Out);
-        },
-        [] { return "a blob"; });
+    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
+        return FitBlob(Type, Copied(*m_pParts, nMember, static_cast<const char*>(pBytes), nBytes),
+                       m_pParts->Into.How.blCompatible, Out);
+    });
 }
 
 void Loader::SetJson(int nMember, std::string_view strJson) {

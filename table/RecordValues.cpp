@@ -49,9 +49,7 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
         if (nNext < vecNames.size() && nOrder == 0) {
             SetJson(nNext++, *it, vecFindings);
         } else if (!m_blIgnoreUnknown) {
-            const std::string strName(Name.pBegin, Name.pEnd);
-            Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
-                   "there is no member " + ShownText(strName) + Suggestion(strName, vecNames));
+            RefuseUnknown(std::string(Name.pBegin, Name.pEnd), vecFindings);
         }
     }
     return vecFindings.empty();
@@ -62,8 +60,18 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
     const Misfit eMisfit =
         FitJson(*Into.pType, jValue, m_blCompatible, m_Codec, m_vecJson[nMember], Give(nMember));
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
-        ReportMisfit(eMisfit, Into, Shown(jValue), Below("", Into.strName), vecFindings);
+        Refuse(Into, eMisfit, jValue, vecFindings);
     }
+}
+
+void RecordValues::Refuse(const Member& Into, Misfit eMisfit, const Json::Value& jValue,
+                          FindingList& vecFindings) const {
+    ReportMisfit(eMisfit, Into, Shown(jValue), Below("", Into.strName), vecFindings);
+}
+
+void RecordValues::RefuseUnknown(const std::string& strName, FindingList& vecFindings) const {
+    Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
+           "there is no member " + ShownText(strName) + Suggestion(strName, m_Of.Names()));
 }
 
 bool RecordValues::FillDefaults(FindingList& vecFindings) {

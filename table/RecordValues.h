@@ -55,6 +55,11 @@ class RecordValues {
     int BindKey(sqlite3_stmt* pStatement, int& nNext) const;
 
   private:
+    // Apart, so that records that fit pass by them.
+    void Refuse(const Member& Into, Misfit eMisfit, const Json::Value& jValue,
+                FindingList& vecFindings) const;
+    void RefuseUnknown(const std::string& strName, FindingList& vecFindings) const;
+
     const Members& m_Of;
     JsonCodec& m_Codec;
     bool m_blCompatible;

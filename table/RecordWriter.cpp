@@ -55,21 +55,6 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
            (strSet.empty() ? strKey + "=" + strKey : strSet) + WhereKey(Of);
 }
 
-std::string ShownValue(const BoundValue& Value) {
-    switch (Value.eKind) {
-        case BoundValue::Kind::kInteger:
-            return std::to_string(Value.nValue);
-        case BoundValue::Kind::kReal:
-            return Shown(Json::Value(Value.dValue));
-        case BoundValue::Kind::kText:
-            return ShownText(Value.strBytes);
-        case BoundValue::Kind::kBlob:
-            return "a blob";
-        default:
-            return "null";
-    }
-}
-
 }  // namespace
 
 std::string WhereKey(const Members& Of) {
@@ -172,8 +157,8 @@ Status RecordWriter::WithValues(const Status& Failed) const {
         const size_t nFound = strMessage.rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
-            strMore += (strMore.empty() ? " (" : ", ") + Of.At(i).strName + " = " +
-                       ShownValue(m_Values.At(i));
+            strMore +=
+                (strMore.empty() ? " (" : ", ") + Of.At(i).strName + " = " + Shown(m_Values.At(i));
         }
     }
     return strMore.empty() ? Failed : Amended(Failed, Failed.Advice(), strMore + ")");
