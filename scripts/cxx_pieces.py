@@ -25,7 +25,7 @@ LOOKS = re.compile(
     r"(?:if|for|while|switch|catch|sizeof|static_cast|const_cast|move|VORN_FAIL_IF\w*|VORN_WARN_IF"
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
-    r"|Length|Is|NameOf|Find|FindMember|Members|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
+    r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
     r"|Joined)$"
 )
 
@@ -174,7 +174,7 @@ class Effect:
         self.names = set(re.findall(r"(?<![.:>\w])[a-z_]\w*\b(?!\s*(?:::|\(|<)|[&*]? \w)", text))
         self.names.update(re.findall(r"\b[A-Z]\w*(?=\.|->|\[)", text), {self.declared} - {None})
         self.leaves = LEAVES.search(text) is not None
-        self.anything = self.leaves
+        self.anything = self.leaves or "VORN_WARN_IF" in text
         self.written = {self.declared} - {None}
         self.written.update(re.findall(r"(\w+)(?:\.\w+|\[[^\]]*\])* (?:[-+|]?=) ", text))
         if "++" in text or "--" in text:
@@ -183,7 +183,18 @@ class Effect:
             self.add_call(start + len(of), of, name)
 
     def add_call(self, start, of, name):
-        """A call may change its object and what it is given; without an object anything else, too."""
+        """A call may change its object and what it is given; without an object anything else, too.
+
+        >>> e = Effect('VORN_LOG_PLAIN("n=%d", n);'); e.anything, e.written
+        (True, set())
+        >>> e = Effect("strText.append(strA).append(strB);"); e.anything, e.written
+        (False, {'strText'})
+        """
+        if self.text.startswith(").", start - 2):
+            return  # of a chain, whose first call it was
+        if name.startswith("VORN_LOG"):
+            self.anything = True
+            return
         begin = self.text.find("(", start)
         given = self.names & set(re.findall(r"\w+", self.text[begin : closing(self.text, begin)]))
         object_name = re.match(r"(\w+)(?:\.|->)", of)
