@@ -5,7 +5,8 @@
 namespace vornjsondb {
 
 void AppendDigits(Json::UInt64 nValue, std::string& strOut) {
-    char szDigits[20];  // of the largest number
+    // mutate(20 to 21): the largest number has twenty; one byte more is not touched.
+    char szDigits[20];
     char* const pEnd = std::end(szDigits);
     char* pFirst = pEnd;
     do {

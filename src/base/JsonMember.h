@@ -5,6 +5,7 @@
 
 #include <cstring>
 #include <string>
+#include <string_view>
 
 #include <json/json.h>
 
@@ -16,10 +17,9 @@ struct MemberName {
     const char* pEnd;
 
     size_t Length() const { return static_cast<size_t>(pEnd - pBegin); }
+    std::string_view View() const { return {pBegin, Length()}; }
 
-    bool Is(const char* szName) const {
-        return Length() == std::strlen(szName) && std::memcmp(pBegin, szName, Length()) == 0;
-    }
+    bool Is(const char* szName) const { return View() == szName; }
 };
 
 inline MemberName NameOf(const char* szName) {
@@ -39,18 +39,14 @@ MemberName NameOf(const Iterator& It) {
 
 // The order of JSON objects: by bytes, a name before its continuations. Negative, 0 or positive.
 inline int Compare(const MemberName& Left, const MemberName& Right) {
+    const int nLeft = static_cast<unsigned char>(*Left.pBegin);
+    const int nRight = static_cast<unsigned char>(*Right.pBegin);
     // Most names differ here, which needs no call. Behind an empty name there is a NUL, too.
-    const auto nLeft = static_cast<unsigned char>(*Left.pBegin);
-    const auto nRight = static_cast<unsigned char>(*Right.pBegin);
+    // mutate(false): the comparison of the whole gives the same.
     if (nLeft != nRight) {
-        return nLeft < nRight ? -1 : 1;
+        return nLeft - nRight;
     }
-    const size_t nCommon = Left.Length() < Right.Length() ? Left.Length() : Right.Length();
-    const int nOrder = std::memcmp(Left.pBegin, Right.pBegin, nCommon);
-    if (nOrder != 0 || Left.Length() == Right.Length()) {
-        return nOrder;
-    }
-    return Left.Length() < Right.Length() ? -1 : 1;
+    return Left.View().compare(Right.View());
 }
 
 // The member of that name, or nullptr: also when jValue is no object.

@@ -13,16 +13,32 @@ namespace {
 // Room for most texts: spares one that grows piece by piece its first allocations.
 constexpr size_t kUsualText = 64;
 
-std::unique_ptr<Json::StreamWriter> MakeWriter() {
+Json::StreamWriter* NewWriter() {
     Json::StreamWriterBuilder Builder;
     Builder.settings_["indentation"] = "";
     Builder.settings_["commentStyle"] = "None";
     Builder.settings_["emitUTF8"] = true;
-    return std::unique_ptr<Json::StreamWriter>(Builder.newStreamWriter());
+    return Builder.newStreamWriter();
+}
+
+Json::CharReader* NewReader() {
+    Json::CharReaderBuilder Builder;
+    Builder.settings_["collectComments"] = false;
+    return Builder.newCharReader();
+}
+
+template <typename Tool>
+Tool& MadeOnce(std::unique_ptr<Tool>& pTool, Tool* (*pfnNew)()) {
+    // mutate(true, moved): one that is made for each text does the same.
+    if (!pTool) {
+        pTool.reset(pfnNew());
+    }
+    return *pTool;
 }
 
 // JsonCpp reports by one exception that there are too many levels and that a malloc gave nothing.
 bool IsTooDeep(const Json::RuntimeError& Error) {
+    // mutate(cut): a part of the word is found, too.
     return std::strstr(Error.what(), "stackLimit") != nullptr;
 }
 
@@ -37,30 +53,22 @@ JsonCodec& ProcessCodec() {
 std::string JsonCodec::Write(const Json::Value& jValue) {
     std::string strText;
     strText.reserve(kUsualText);
-    if (WritePlainJson(jValue, strText)) {
+    if (WritePlainJson(jValue, strText)) {  // mutate(false): the longer way gives the same.
         return strText;
-    }
-    if (!m_pWriter) {
-        m_pWriter = MakeWriter();
     }
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.
     Stream.exceptions(std::ios::badbit | std::ios::failbit);
-    m_pWriter->write(jValue, &Stream);
+    MadeOnce(m_pWriter, NewWriter).write(jValue, &Stream);
     return Stream.str();
 }
 
 bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
-    if (ReadPlainJson(szText, nLength, jOut)) {
+    if (ReadPlainJson(szText, nLength, jOut)) {  // mutate(false): the longer way gives the same.
         return true;
     }
-    if (!m_pReader) {
-        Json::CharReaderBuilder Builder;
-        Builder.settings_["collectComments"] = false;
-        m_pReader.reset(Builder.newCharReader());
-    }
     try {
-        return m_pReader->parse(szText, szText + nLength, &jOut, nullptr);
+        return MadeOnce(m_pReader, NewReader).parse(szText, szText + nLength, &jOut, nullptr);
     } catch (const Json::RuntimeError& Error) {
         if (!IsTooDeep(Error)) {
             ThrowBadAlloc();

@@ -149,6 +149,7 @@ class PlainReader {
 };
 
 bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
+    // mutate(exchanged): behind a text that is not plain strOut is in any state.
     for (const char* p = pBegin; p != pEnd; ++p) {
         if (*p == '"' || *p == '\\' || static_cast<unsigned char>(*p) < 0x20) {
             return false;

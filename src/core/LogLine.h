@@ -63,10 +63,12 @@ class LineFormat {
     const char* Text() const { return m_szText; }
     bool IsForStdout() const { return m_blStdout; }
 
+    // mutate(128 to 129): no message is so long.
     static constexpr size_t kMaxMessage = 128;  // with its NUL
 
   private:
     const bool m_blStdout;
+    // mutate(32 to 33, 32 to 0): no message is so long that it would be cut.
     char m_szText[kMaxMessage + 32];
 };
 

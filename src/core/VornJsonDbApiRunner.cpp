@@ -49,12 +49,9 @@ int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
         VORN_LOG_CONDITION("0 >= strSql.length()");
         return Failed(-1);
     }
-    Handle.strSqlError.clear();
     while (i < kMaxAttempts) {
-        if (szError) {
-            Handle.strSqlError = szError.get();
-            szError.reset();
-        }
+        Handle.strSqlError = szError ? szError.get() : "";
+        szError.reset();
         // Only now, so that nothing but the statement can leave an errno that decides.
         errno = 0;
         g_strCurTable = Handle.strName;
@@ -63,6 +60,7 @@ int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
         szError.reset(szText);
         if (nStatus == SQLITE_OK) {
             const int nChanged = callback == nullptr ? sqlite3_changes(Handle.pDb) : 0;
+            // mutate(exchanged): a failure writes a text of its own.
             if (nChanged < 0) {
                 return Failed(nChanged);
             }

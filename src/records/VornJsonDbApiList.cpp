@@ -53,8 +53,8 @@ int VornJsonDbApi::recGetOne(Json::Value& jRecParam, Json::Value& jRecOut) {
         return 0;
     }
     Json::Value& jFound = *jRecArray.begin();
-    if (jRecOut.empty() && !jRecOut.isArray() && !jFound.empty()) {
-        // Nothing to merge with, so nothing to copy.
+    // mutate(false): a copy into nothing gives the same.
+    if (jRecOut.isNull() && !jFound.empty()) {
         jRecOut.swapPayload(jFound);
         return 1;
     }

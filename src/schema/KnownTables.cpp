@@ -46,6 +46,7 @@ KnownTables::Place KnownTables::PlaceOf(const std::string& strName) {
 }
 
 KnownTable* KnownTables::Find(const std::string& strName) {
+    // mutate(true): the search finds the last one, too.
     if (m_pLast == nullptr || m_pLast->m_strName != strName) {
         const Place itFound = PlaceOf(strName);
         const bool blKnown = itFound != m_vecTables.end() && (*itFound)->m_strName == strName;

@@ -34,6 +34,8 @@ template <typename Number>
 Number ReadNumber(const char* szText, Number (*pfnGeneral)(const char*, char**, int)) {
     Number nValue = 0;
     const char* p = szText;
+    // mutate(dropped, false, >= to >, '0' to 'x', <= to <, < to <=, < to >): where it stops early,
+    // the general function reads all.
     while (*p >= '0' && *p <= '9' && p - szText < kUsualDigits) {
         nValue = nValue * 10 + (*p - '0');
         ++p;
@@ -80,21 +82,21 @@ void AppendJson(const Json::Value& jValue, std::string& strOut) {
     AppendQuoted(ToString(jValue).c_str(), strOut);
 }
 
-// JsonCpp takes the first number beyond a range for the last one in it, which would change sign.
-void RefuseFrom(double dFirstBeyond, const Json::Value& jValue) {
+// The value itself, which must lie below. JsonCpp takes the first number beyond a range for the
+// last one in it, which would change sign.
+const Json::Value& Below(double dFirstBeyond, const Json::Value& jValue) {
     if (jValue.type() == Json::realValue && jValue.asDouble() >= dFirstBeyond) {
         Json::throwLogicError("vornjsondb: the number is out of range");
     }
+    return jValue;
 }
 
 void AppendSigned(const Json::Value& jValue, std::string& strOut) {
-    RefuseFrom(9223372036854775808.0, jValue);
-    AppendDigits(jValue.asInt64(), strOut);
+    AppendDigits(Below(9223372036854775808.0, jValue).asInt64(), strOut);
 }
 
 void AppendUnsigned(const Json::Value& jValue, std::string& strOut) {
-    RefuseFrom(18446744073709551616.0, jValue);
-    AppendDigits(jValue.asUInt64(), strOut);
+    AppendDigits(Below(18446744073709551616.0, jValue).asUInt64(), strOut);
 }
 
 void AppendReal(double dValue, std::string& strOut) {

@@ -55,21 +55,13 @@ bool RowTemplate::Matches(int nColumns, char** szNames) const {
 Json::Value RowTemplate::Record(char** szTexts) const {
     Json::Value jFilled = m_jEmpty;
     Json::Value::iterator itMember = jFilled.begin();
-    bool blAllPresent = true;
     for (const Column& Each : m_vecColumns) {
-        const char* szText = szTexts[Each.nIndex];
-        if (szText == nullptr) {
-            blAllPresent = false;
+        Json::Value& jMember = *itMember;
+        ++itMember;  // now: the member may be about to go
+        if (const char* szText = szTexts[Each.nIndex]) {
+            Each.pType->pfnRead(szText, jMember);
         } else {
-            Each.pType->pfnRead(szText, *itMember);
-        }
-        ++itMember;
-    }
-    if (!blAllPresent) {
-        for (size_t i = 0; i < m_vecNames.size(); ++i) {
-            if (szTexts[i] == nullptr) {
-                jFilled.removeMember(m_vecNames[i]);
-            }
+            jFilled.removeMember(m_vecNames[static_cast<size_t>(Each.nIndex)]);
         }
     }
     return jFilled;

@@ -32,15 +32,9 @@ void FillDefaults(const TableTypes& Types, Json::Value& jRec) {
 
 }  // namespace vornjsondb
 
-int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
-    const vornjsondb::TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
-    if (!blStrict) {
-        // A value of another kind is left for the type check to refuse.
-        if (jParam.isObject() || jParam.type() == Json::nullValue) {
-            vornjsondb::FillDefaults(Types, jParam);
-        }
-        return 0;
-    }
+namespace {
+
+int CheckComplete(const vornjsondb::TableTypes& Types, const Json::Value& jParam) {
     vornjsondb::MemberCursor Record(jParam);
     for (const vornjsondb::TypedMember& Member : Types.Members()) {
         if (Record.Find(Member.Name) == nullptr) {
@@ -48,6 +42,20 @@ int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
             VORN_LOG_DEBUG("jParam=%s", vornjsondb::ToString(jParam).c_str());
             return -1;
         }
+    }
+    return 0;
+}
+
+}  // namespace
+
+int VornJsonDbApi::fillDefaultValue(Json::Value& jParam, bool blStrict) try {
+    const vornjsondb::TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
+    if (blStrict) {
+        return CheckComplete(Types, jParam);
+    }
+    // A value of another kind is left for the type check to refuse.
+    if (jParam.isObject() || jParam.type() == Json::nullValue) {
+        vornjsondb::FillDefaults(Types, jParam);
     }
     return 0;
 }

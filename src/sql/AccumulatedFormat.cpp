@@ -16,7 +16,7 @@ AccumulatedFormat::AccumulatedFormat(const std::string& strText)
 // Each "%%" is passed over. A last "%" joins the one of the value's own specifier to another "%%",
 // or stands before a NUL, where the formatter writes it as it is.
 bool AccumulatedFormat::HoldsConversion() const {
-    if (m_blLiteral) {
+    if (m_blLiteral) {  // mutate(false): there is no percent sign to be found.
         return false;
     }
     const char* p = m_strText.c_str();
@@ -30,7 +30,7 @@ bool AccumulatedFormat::HoldsConversion() const {
 }
 
 void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue) {
-    if (!m_blLiteral) {
+    if (!m_blLiteral) {  // mutate(true): the text stays as it is.
         FormatAgain(Type, jValue);
         return;
     }
@@ -59,7 +59,6 @@ void AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& j
         pNext = pSign + (pSign[1] == '%' ? 2 : 1);
     }
     m_strText += pNext;
-    m_blLiteral = m_strText.find('%') == std::string::npos;
 }
 
 }  // namespace vornjsondb

@@ -20,23 +20,29 @@ using vornjsondb::TypedMember;
 
 constexpr char kFilterKey[] = "vornSqlWhereFilter";
 
+// The value's string form with quotes doubled.
+char* EscapedString(const Json::Value& jValue) {
+    switch (jValue.type()) {
+        case Json::stringValue:
+            return sqlite3_mprintf("%q", jValue.asCString());
+        case Json::intValue:  // the same text as below, made in one step
+            return sqlite3_mprintf("%lld", static_cast<long long>(jValue.asInt64()));
+        default:
+            return sqlite3_mprintf("%q", jValue.asString().c_str());
+    }
+}
+
 // The value as text with quotes doubled; no text when SQLite has no memory or the value has no
 // such form.
 SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
-    if (eForm == ConditionForm::kBoolean) {
-        return SqlText(sqlite3_mprintf("%d", jValue.asInt()));
+    switch (eForm) {
+        case ConditionForm::kBoolean:
+            return SqlText(sqlite3_mprintf("%d", jValue.asInt()));
+        case ConditionForm::kQuotedJson:
+            return SqlText(sqlite3_mprintf("%q", vornjsondb::ToString(jValue).c_str()));
+        default:
+            return SqlText(EscapedString(jValue));
     }
-    if (eForm == ConditionForm::kQuotedJson) {
-        return SqlText(sqlite3_mprintf("%q", vornjsondb::ToString(jValue).c_str()));
-    }
-    if (jValue.isString()) {
-        return SqlText(sqlite3_mprintf("%q", jValue.asCString()));
-    }
-    if (jValue.type() == Json::intValue) {
-        // The same text as below, made in one step.
-        return SqlText(sqlite3_mprintf("%lld", static_cast<long long>(jValue.asInt64())));
-    }
-    return SqlText(sqlite3_mprintf("%q", jValue.asString().c_str()));
 } catch (const Json::Exception&) {
     return nullptr;
 }
@@ -68,8 +74,8 @@ int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::strin
         LogNoText(eForm);
         return -1;
     }
-    const bool blQuoted = IsQuoted(eForm);
     const size_t nValue = std::strlen(szSql.get());
+    const bool blQuoted = IsQuoted(eForm);
     // Room for all of it first: memory that runs out in between must not leave half a condition.
     strSqlOut.reserve(strSqlOut.length() + Member.Name.Length() + nValue + 3);
     strSqlOut.append(Member.Name.pBegin, Member.Name.Length()).append(blQuoted ? "='" : "=");
@@ -151,8 +157,8 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         VORN_LOG_LOCATED("error andType=%d", andType);
         return -1;
     }
-    const JoinMode& Mode = kJoinModes[andType];
     bool blWritten = false;
+    const JoinMode& Mode = kJoinModes[andType];
     TypeCursor NextType(Types);
     const Json::Value::const_iterator itEnd = jRecParam.end();
     for (Json::Value::const_iterator it = jRecParam.begin(); it != itEnd; ++it) {

@@ -30,9 +30,10 @@ int CopyMemberTypes(const Json::Value& jMember, Json::Value& jEntry) {
         VORN_FAIL_IF_TEXT(!pjType->isString(),
                           "!jTableDef[strJsonName][\"member\"][strKey][\"cpptype\"].isString()");
         Json::Value& jOne = MakeMember(jEntry, NameOf(it)) = Json::Value(Json::objectValue);
-        jOne["cpptype"] = *pjType;
-        if (const Json::Value* pjDefault = FindMember(*it, "cppDefaultValue")) {
-            jOne["cppDefaultValue"] = *pjDefault;
+        for (const char* szKept : {"cpptype", "cppDefaultValue"}) {
+            if (const Json::Value* pjKept = FindMember(*it, szKept)) {
+                jOne[szKept] = *pjKept;
+            }
         }
     }
     return 0;
@@ -54,7 +55,7 @@ int Learn(KnownTables& Tables, const Json::Value& jTableDef, const std::string& 
 
     Json::Value jEntry;
     const int nResult = CopyMemberTypes(*pjMember, jEntry);
-    if (!jEntry.empty()) {
+    if (!jEntry.isNull()) {
         Tables.FindOrAdd(strJsonName).jTypes = std::move(jEntry);
     }
     if (0 > nResult) {
@@ -123,6 +124,7 @@ int VORN_JSON_DB::convert2ReadableTime(long now, std::string& strOut, int iType)
     } else {
         VORN_FAIL_IF(NULL == localtime_r(&ullTimeStamp, &sTime));
     }
+    // mutate(moved): the second form is written over the first.
     if ((iType & 2) != 0) {
         VORN_FAIL_IF(0 == strftime(szTime, sizeof(szTime), "%a, %d %b %Y %T GMT", &sTime));
     } else if ((iType & 4) != 0) {
