@@ -1,4 +1,7 @@
 // JSON as the library writes and reads it, seen through stored values, statements and log lines.
+#include <cstring>
+
+#include "../../src/base/JsonText.h"
 #include "../support/TableTest.h"
 
 using namespace testhost;
@@ -150,6 +153,25 @@ TEST_F(JsonTextTest, LimitAndOffsetAreTheirJsonText) {
 TEST_F(JsonTextTest, ReaderDecodesEscapes) {
     Sql(R"(INSERT INTO t VALUES ('["\u00fc\ud83d\ude00\/\n"]'))");
     EXPECT_EQ(Listed()[0]["j"][0].asString(), "\xC3\xBC\xF0\x9F\x98\x80/\n");
+}
+
+TEST_F(JsonTextTest, CommentsOfAStoredTextAreNoPartOfTheValue) {
+    Sql("INSERT INTO t VALUES ('// of the list\n[1.5]')");
+    const Json::Value jRead = Listed()[0]["j"];
+    EXPECT_EQ(Compact(jRead), "[1.5]");
+    EXPECT_FALSE(jRead.hasComment(Json::commentBefore));
+}
+
+TEST_F(JsonTextTest, ReadingSaysWhetherTheTextIsJson) {
+    vornjsondb::JsonCodec Codec;
+    Json::Value jRead;
+    for (const char* szText : {"[1]", "[1.5]", " [1, 2] "}) {
+        EXPECT_TRUE(Codec.Read(szText, std::strlen(szText), jRead)) << szText;
+    }
+    const std::string strDeep(2000, '[');
+    for (const char* szText : {"", "[1", "[1.5", strDeep.c_str()}) {
+        EXPECT_FALSE(Codec.Read(szText, std::strlen(szText), jRead)) << szText;
+    }
 }
 
 TEST_F(JsonTextTest, OneBadTextDoesNotSpoilTheNext) {

@@ -181,8 +181,14 @@ TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
         "1000000000000000000",
         "-1000000000000000000",
         "[[[[[[[[[1]]]]]]]]]",
+        "[[[[[[[[[]]]]]]]]]",
         "{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":1}}}}}}}}}",
+        "{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{\"a\":{}}}}}}}}}",
         "{\"a\\\"\":1}",
+        // A part that is plain again behind one that is not.
+        "[01,[]]",
+        "{\"a\":01,\"b\":{}}",
+        "{\"a\"[]}",
     };
     for (const char* szText : szOthers) {
         Json::Value jRead;

@@ -173,6 +173,17 @@ TEST_F(JsonMemoryTest, JsonTextWithoutMemoryIsRefusedLikeAnyOther) {
     }
 }
 
+TEST_F(JsonMemoryTest, WrittenTextIsWholeOrNotThere) {
+    Json::Value jQuery;
+    jQuery["limit"] = "\t" + m_strLong;
+    EXPECT_GT(ThrowsOutOf([&] {
+                  std::string strSql;
+                  m_pHandle->SqlFilterConditionFromJson(jQuery, strSql);
+                  EXPECT_EQ(strSql, " LIMIT \"\\t" + m_strLong + '"');
+              }),
+              0);
+}
+
 TEST_F(JsonMemoryTest, SortedListAndGetThrowBadAllocOnly) {
     Sql("INSERT INTO t VALUES (1, 'a name that is not short')");
     Json::Value jQuery;

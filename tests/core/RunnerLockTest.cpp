@@ -146,7 +146,7 @@ TEST_F(RunnerLockTest, LockTextIsFoundInsideALongerText) {
 
 TEST_F(RunnerLockTest, TextsThatOnlyResembleTheLockTextAreNotRetried) {
     for (const char* szError : {"database table is locked", "Database is locked",
-                                "database is lock", "database  is locked", ""}) {
+                                "database is locke", "database  is locked", ""}) {
         LockNextExec(1, szError);
         EXPECT_EQ(m_pHandle->runSqlEx("SELECT 1"), -1) << szError;
         EXPECT_EQ(TakeSql().size(), 1U) << szError;

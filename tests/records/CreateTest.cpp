@@ -145,6 +145,15 @@ TEST_F(Create, UniqueColumnOtherThanTheKeyIsADuplicateToo) {
     TakeLog();
 }
 
+TEST_F(Create, TextThatOnlyResemblesThatOfADuplicateIsNone) {
+    for (const char* szError : {"NIQUE constraint failed", "UNIQUE constraint faile"}) {
+        FailNextExec({{SQLITE_CONSTRAINT, szError, 0}});
+        Json::Value jIn = ParseJson(R"({"id":1})");
+        EXPECT_EQ(m_pHandle->recCreate(jIn, jIn), -1) << szError;
+        EXPECT_EQ(m_pHandle->getErrMsg(), "") << szError;
+    }
+}
+
 TEST_F(Create, LaterFailureWithoutSqlReportsTheStaleDuplicateAgain) {
     MakeStaleDuplicate();
     EXPECT_EQ(m_pHandle->getErrMsg(), "");

@@ -112,6 +112,30 @@ TEST(KnownTablesTest, SixteenShapesAreKeptAndStayInUse) {
     }
 }
 
+TEST(KnownTablesTest, TypesAreLookedUpOnceAndTemplatesGoWithThem) {
+    KnownTable Table("t");
+    Table.jTypes = TypesOf({"x"});
+    Shape One({"x"});
+    const auto* pTypes = &Table.Types();
+    EXPECT_EQ(&Table.Types(), pTypes);
+    EXPECT_NE(One.TemplateIn(Table), nullptr);
+    Table.jTypes = "no object";
+    EXPECT_EQ(Table.Types().Members().size(), 0U);
+    EXPECT_EQ(One.TemplateIn(Table), nullptr);
+    Table.jTypes = TypesOf({"x"});
+    EXPECT_NE(One.TemplateIn(Table), nullptr);
+}
+
+TEST(KnownTablesTest, NameIsKeptOnce) {
+    KnownTables Tables;
+    const char* szKept = Tables.KeptName("x");
+    EXPECT_STREQ(szKept, "x");
+    EXPECT_STREQ(Tables.KeptName("y"), "y");
+    EXPECT_EQ(Tables.KeptName(std::string("x").c_str()), szKept);
+    Tables.Forget();
+    EXPECT_EQ(Tables.KeptName("x"), szKept);
+}
+
 TEST(KnownTablesTest, ColumnIsReadOnceItsMemberIsAdded) {
     KnownTable Table("t");
     Table.jTypes = TypesOf({"x"});

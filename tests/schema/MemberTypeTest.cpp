@@ -1,6 +1,7 @@
 // The treatments of the type table, called directly.
 
 #include <string>
+#include <utility>
 
 #include <gtest/gtest.h>
 #include <json/json.h>
@@ -29,6 +30,77 @@ TEST(MemberTypeTest, FirstNumberBeyondARangeLeavesTheTextAsItWas) {
     EXPECT_THROW(TypeNamed("int").pfnAppend(Json::Value(9223372036854775808.0), strText),
                  Json::LogicError);
     EXPECT_EQ(strText, "before");
+}
+
+std::string ExceptionOf(const char* szType, const Json::Value& jValue) {
+    std::string strText;
+    try {
+        TypeNamed(szType).pfnAppend(jValue, strText);
+    } catch (const std::exception& Error) {
+        return Error.what();
+    }
+    return "none";
+}
+
+TEST(MemberTypeTest, ExceptionsSayWhatIsWrong) {
+    EXPECT_EQ(ExceptionOf("int", Json::Value(9223372036854775808.0)),
+              "vornjsondb: the number is out of range");
+    sqlite3_hard_heap_limit64(1);
+    const std::string strNoMemory = ExceptionOf("double", Json::Value(1e300));
+    sqlite3_hard_heap_limit64(0);
+    sqlite3_soft_heap_limit64(0);
+    EXPECT_EQ(strNoMemory, "vornjsondb: the SQL formatter gave no text");
+}
+
+TEST(MemberTypeTest, SpecifiersAreThoseOfTheFormatter) {
+    const std::pair<const char*, const char*> aExpected[] = {
+        {"string", "%Q"},
+        {"int", "%lld"},
+        {"long long", "%lld"},
+        {"bool", "%lld"},
+        {"Json::objectValue", "%Q"},
+        {"Json::arrayValue", "%Q"},
+        {"unsigned int", "%llu"},
+        {"unsigned long long", "%llu"},
+        {"long", "%lld"},
+        {"unsigned long", "%llu"},
+        {"unsigned", "%llu"},
+        {"double", "%lf"},
+        {"float", "%f"},
+    };
+    for (const auto& Each : aExpected) {
+        EXPECT_STREQ(TypeNamed(Each.first).szSpecifier, Each.second) << Each.first;
+    }
+}
+
+TEST(MemberTypeTest, BoundFormOfEachTypeIsComplete) {
+    using vornjsondb::BoundKind;
+    using vornjsondb::BoundRange;
+    const std::pair<const char*, vornjsondb::BoundForm> aExpected[] = {
+        {"string", {BoundKind::kText, BoundRange::kNone}},
+        {"int", {BoundKind::kInteger, BoundRange::kInt32}},
+        {"long long", {BoundKind::kInteger, BoundRange::kInt64}},
+        {"bool", {BoundKind::kBoolean, BoundRange::kNone}},
+        {"Json::objectValue", {BoundKind::kObject, BoundRange::kNone}},
+        {"Json::arrayValue", {BoundKind::kList, BoundRange::kNone}},
+        {"Json::Value", {BoundKind::kJson, BoundRange::kNone}},
+        {"unsigned int", {BoundKind::kInteger, BoundRange::kUInt32}},
+        {"unsigned long long", {BoundKind::kInteger, BoundRange::kUInt63}},
+        {"long", {BoundKind::kInteger, BoundRange::kInt64}},
+        {"unsigned long", {BoundKind::kInteger, BoundRange::kUInt63}},
+        {"unsigned", {BoundKind::kInteger, BoundRange::kUInt32}},
+        {"double", {BoundKind::kReal, BoundRange::kDouble}},
+        {"float", {BoundKind::kReal, BoundRange::kFloat}},
+        {"uid_t", {BoundKind::kInteger, BoundRange::kUInt32}},
+        {"time_t", {BoundKind::kInteger, BoundRange::kInt64}},
+        {"any", {BoundKind::kAny, BoundRange::kNone}},
+        {"no such type", {BoundKind::kNone, BoundRange::kNone}},
+    };
+    for (const auto& Each : aExpected) {
+        const vornjsondb::BoundForm& Bound = TypeNamed(Each.first).Bound;
+        EXPECT_EQ(Bound.eKind, Each.second.eKind) << Each.first;
+        EXPECT_EQ(Bound.eRange, Each.second.eRange) << Each.first;
+    }
 }
 
 TEST(MemberTypeTest, TextsOfSqliteAreFreed) {
