@@ -46,7 +46,7 @@ CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TE
 # Calls that change nothing when they are made twice.
 TWICE_IS_ONCE = re.compile(
     r"(?:clear|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
-    r"|Set|Fill|FillDefaults|pfnRead)$"
+    r"|Set|Fill|FillDefaults|pfnRead|Read)$"
 )
 # Log lines may come of these, and a name that nobody knew is known afterwards.
 LOOK_UP = re.compile(r"(?:\w+(?:\.|->|::))*(?:recType|LookUp|LookUpTable)\(")

@@ -15,8 +15,7 @@ const Json::Value* MemberCursor::Find(const MemberName& Name) {
         if (nOrder > 0) {
             return nullptr;
         }
-        const Json::Value& jMember = *m_it;
-        ++m_it;
+        const Json::Value& jMember = *m_it++;
         if (nOrder == 0) {
             return &jMember;
         }

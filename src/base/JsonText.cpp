@@ -27,15 +27,6 @@ Json::CharReader* NewReader() {
     return Builder.newCharReader();
 }
 
-template <typename Tool>
-Tool& MadeOnce(std::unique_ptr<Tool>& pTool, Tool* (*pfnNew)()) {
-    // mutate(true, moved): one that is made for each text does the same.
-    if (!pTool) {
-        pTool.reset(pfnNew());
-    }
-    return *pTool;
-}
-
 // JsonCpp reports by one exception that there are too many levels and that a malloc gave nothing.
 bool IsTooDeep(const Json::RuntimeError& Error) {
     // mutate(cut): a part of the word is found, too.
@@ -56,10 +47,14 @@ std::string JsonCodec::Write(const Json::Value& jValue) {
     if (WritePlainJson(jValue, strText)) {  // mutate(false): the longer way gives the same.
         return strText;
     }
+    // mutate(true, moved): one that is made for each text writes the same.
+    if (!m_pWriter) {
+        m_pWriter.reset(NewWriter());
+    }
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.
     Stream.exceptions(std::ios::badbit | std::ios::failbit);
-    MadeOnce(m_pWriter, NewWriter).write(jValue, &Stream);
+    m_pWriter->write(jValue, &Stream);
     return Stream.str();
 }
 
@@ -68,7 +63,11 @@ bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
         return true;
     }
     try {
-        return MadeOnce(m_pReader, NewReader).parse(szText, szText + nLength, &jOut, nullptr);
+        // mutate(true, moved): one that is made for each text reads the same.
+        if (!m_pReader) {
+            m_pReader.reset(NewReader());
+        }
+        return m_pReader->parse(szText, szText + nLength, &jOut, nullptr);
     } catch (const Json::RuntimeError& Error) {
         if (!IsTooDeep(Error)) {
             ThrowBadAlloc();

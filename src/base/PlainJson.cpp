@@ -50,7 +50,11 @@ class PlainReader {
     }
 
     // As Skip, for what must be there.
-    void Expect(char c) { m_blPlain = Skip(c) && m_blPlain; }
+    void Expect(char c) {
+        if (!Skip(c)) {
+            m_blPlain = false;
+        }
+    }
 
     Json::Value NotPlain() {
         m_blPlain = false;
@@ -201,6 +205,9 @@ bool WriteObject(const Json::Value& jObject, int nLevel, std::string& strOut) {
 }
 
 bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
+    if (nLevel > kMaxLevels) {
+        return false;
+    }
     switch (jValue.type()) {
         case Json::nullValue:
             strOut += "null";
@@ -218,9 +225,9 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
             return WriteText(pBegin, pEnd, strOut);
         }
         case Json::arrayValue:
-            return nLevel < kMaxLevels && WriteArray(jValue, nLevel + 1, strOut);
+            return WriteArray(jValue, nLevel + 1, strOut);
         case Json::objectValue:
-            return nLevel < kMaxLevels && WriteObject(jValue, nLevel + 1, strOut);
+            return WriteObject(jValue, nLevel + 1, strOut);
         default:
             return false;
     }

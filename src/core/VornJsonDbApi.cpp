@@ -30,7 +30,7 @@ VornJsonDbApi::VornJsonDbApi(sqlite3* pDb, std::string& strName, Json::Value& jT
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 VornJsonDbApi::~VornJsonDbApi() {
-    m_pDb = nullptr;
+    m_pDb = nullptr;  // mutate(dropped): nobody may look into a handle that is gone.
 }
 
 void VornJsonDbApi::setErrMsg(std::string strMsg) {

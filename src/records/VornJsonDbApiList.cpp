@@ -53,7 +53,7 @@ int VornJsonDbApi::recGetOne(Json::Value& jRecParam, Json::Value& jRecOut) {
         return 0;
     }
     Json::Value& jFound = *jRecArray.begin();
-    // mutate(false): a copy into nothing gives the same.
+    // mutate(false, exchanged): a copy into nothing gives the same.
     if (jRecOut.isNull() && !jFound.empty()) {
         jRecOut.swapPayload(jFound);
         return 1;

@@ -41,15 +41,10 @@ bool RowTemplate::Prepare(const TableTypes& Types) {
 }
 
 bool RowTemplate::Matches(int nColumns, char** szNames) const {
-    if (m_vecNames.size() != static_cast<size_t>(nColumns)) {
-        return false;
-    }
-    for (size_t i = 0; i < m_vecNames.size(); ++i) {
-        if (szNames[i] == nullptr || std::strcmp(m_vecNames[i], szNames[i]) != 0) {
-            return false;
-        }
-    }
-    return true;
+    return std::equal(m_vecNames.begin(), m_vecNames.end(), szNames, szNames + nColumns,
+                      [](const char* szOwn, const char* szOther) {
+                          return szOther != nullptr && std::strcmp(szOwn, szOther) == 0;
+                      });
 }
 
 Json::Value RowTemplate::Record(char** szTexts) const {

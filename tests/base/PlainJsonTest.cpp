@@ -191,8 +191,9 @@ TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
         "{\"a\"[]}",
     };
     for (const char* szText : szOthers) {
-        Json::Value jRead;
+        Json::Value jRead = "before";
         EXPECT_FALSE(vornjsondb::ReadPlainJson(szText, std::strlen(szText), jRead)) << szText;
+        EXPECT_EQ(jRead, "before") << szText;
     }
 }
 

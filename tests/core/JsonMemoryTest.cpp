@@ -176,6 +176,8 @@ TEST_F(JsonMemoryTest, JsonTextWithoutMemoryIsRefusedLikeAnyOther) {
 TEST_F(JsonMemoryTest, WrittenTextIsWholeOrNotThere) {
     Json::Value jQuery;
     jQuery["limit"] = "\t" + m_strLong;
+    std::string strFirst;  // The writer is made.
+    EXPECT_EQ(m_pHandle->SqlFilterConditionFromJson(jQuery, strFirst), 0);
     EXPECT_GT(ThrowsOutOf([&] {
                   std::string strSql;
                   m_pHandle->SqlFilterConditionFromJson(jQuery, strSql);
