@@ -47,17 +47,26 @@ bool IsOneStatement(OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
     return blOne && pjStored == nullptr;
 }
 
+Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
+    FindingList vecFindings;
+    bool blFits = Into.Values.Take(jRecord, vecFindings);
+    if (blFits && eOnDuplicate != OnDuplicate::kStop) {
+        blFits = Into.Values.HasKey(vecFindings);
+    }
+    return blFits ? Status() : vornjsondb::FromFindings(std::move(vecFindings), What);
+}
+
 Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What,
              Json::Value* pjStored, Written& eWritten) {
+    Status Fits = Take(Into, jRecord, eOnDuplicate, What);
+    if (!Fits.Ok()) {
+        return Fits;
+    }
+    bool blTaken = true;
     const auto fnSteps = [&]() -> Status {
-        // Once for each try: the first one may have filled defaults.
-        FindingList vecFindings;
-        bool blFits = Into.Values.Take(jRecord, vecFindings);
-        if (blFits && eOnDuplicate != OnDuplicate::kStop) {
-            blFits = Into.Values.HasKey(vecFindings);
-        }
-        if (!blFits) {
-            return vornjsondb::FromFindings(std::move(vecFindings), What);
+        // Anew for each further try: the one before may have filled defaults.
+        if (!std::exchange(blTaken, false)) {
+            Take(Into, jRecord, eOnDuplicate, What).Ignore();
         }
         vornjsondb::RecordWriter Writer(Into, Into.Values);
         Status Outcome = Writer.Write(eOnDuplicate, What, eWritten);
