@@ -14,6 +14,14 @@ int Run(sqlite3* pDb, const char* szSql) {
     return sqlite3_exec(pDb, szSql, nullptr, nullptr, nullptr);
 }
 
+// Takes no memory of its own, so that a destructor may call it.
+int Undo(sqlite3* pDb, bool blSavepoint) {
+    if (sqlite3_get_autocommit(pDb) != 0) {
+        return SQLITE_OK;  // a failure has undone it already, which is what was asked for
+    }
+    return Run(pDb, blSavepoint ? "ROLLBACK TO vornjsondb; RELEASE vornjsondb" : "ROLLBACK");
+}
+
 Status NotOpen(const Doing& What) {
     return vornjsondb::Fail(StatusCode::kMisuse, What, "none was begun");
 }
@@ -22,7 +30,7 @@ Status NotOpen(const Doing& What) {
 
 Transaction::~Transaction() {
     if (IsOpen()) {
-        Rollback().Ignore();
+        Undo(m_pDb, m_blSavepoint);
     }
 }
 
@@ -82,11 +90,7 @@ Status Transaction::Rollback() {
     }
     sqlite3* pDb = m_pDb;
     m_pDb = nullptr;
-    if (sqlite3_get_autocommit(pDb) != 0) {
-        return {};  // a failure has undone it already, which is what was asked for
-    }
-    const int nResult =
-        Run(pDb, m_blSavepoint ? "ROLLBACK TO vornjsondb; RELEASE vornjsondb" : "ROLLBACK");
+    const int nResult = Undo(pDb, m_blSavepoint);
     return nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(pDb, nResult, What);
 }
 
