@@ -12,6 +12,8 @@
 # model   random sequences of all operations beside a model of the library. --count SEQUENCES;
 #         "sequence S" in the output runs alone with --seed S --count 1.
 #
+# memory and io then run with the operations of VORN_JSON_DB::Table as well.
+#
 # --record puts the figures into docs/reliability.md.
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -35,29 +37,35 @@ for option; do
     esac
 done
 
-# run FOLDER CMAKE-OPTION... builds the campaign in one of the folders of scripts/test.sh, and runs it.
+# run PROGRAM FOLDER CMAKE-OPTION... builds one of the campaigns in one of the folders of
+# scripts/test.sh, and runs it.
 run() {
-    local folder=$1
-    shift
-    configure "$folder" "$@" -DBUILD_TESTING=ON
-    build_quietly "$folder" "vornjsondb_campaign_$name"
+    local program=$1 folder=$2
+    shift 2
+    configure "$folder" "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON
+    build_quietly "$folder" "vornjsondb_campaign_$program"
     UBSAN_OPTIONS=print_stacktrace=1 \
-        "build/$folder/tests/campaigns/vornjsondb_campaign_$name" "${options[@]}" | tee build/campaign.txt
+        "build/$folder/tests/campaigns/vornjsondb_campaign_$program" "${options[@]}" | tee build/campaign.txt
 }
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
-if [[ $name == memory ]]; then
-    run asan -DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON
+programs=("$name")
+if [[ $name == memory || $name == io ]]; then
+    programs+=("table_$name")
 fi
-if [[ $name != memory || -n $long ]]; then
-    run "test" -DCMAKE_BUILD_TYPE=Release
-fi
-
-if [[ -n $record ]]; then
-    need_packages python3:python3
-    {
-        printf '```\n%s: %s\n' "$(date +%F)" "scripts/campaign.sh $name ${options[*]}"
-        grep '^  ' build/campaign.txt
-        printf '```\n'
-    } | scripts/figures.py docs/reliability.md "campaign-$name"
-fi
+for program in "${programs[@]}"; do
+    if [[ $name == memory ]]; then
+        run "$program" asan -DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON
+    fi
+    if [[ $name != memory || -n $long ]]; then
+        run "$program" "test" -DCMAKE_BUILD_TYPE=Release
+    fi
+    if [[ -n $record ]]; then
+        need_packages python3:python3
+        {
+            printf '```\n%s: %s\n' "$(date +%F)" "scripts/campaign.sh $name ${options[*]}"
+            grep '^  ' build/campaign.txt
+            printf '```\n'
+        } | scripts/figures.py docs/reliability.md "campaign-$program"
+    fi
+done

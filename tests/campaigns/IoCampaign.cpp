@@ -61,26 +61,27 @@ class Case {
   private:
     void LearnResult() {
         const Database db(m_strPath, kFaultyVfs);
-        const std::unique_ptr<VornJsonDbApi> pHandle = Handle(db);
+        const HandlePtr pHandle = Open(db);
         Subject subject = {m_table, db.Get(), pHandle.get()};
         m_operation.pfnPrepare(m_table, m_argsResult);
         m_nResult = m_operation.pfnRun(subject, m_argsResult);
         m_strAfter = m_table.Content(db);
     }
 
-    std::unique_ptr<VornJsonDbApi> Handle(const Database& db) const {
+    HandlePtr Open(const Database& db) const {
         db.Run("PRAGMA cache_size=2");
         db.Run(std::string("PRAGMA journal_mode=") + m_szMode);
         // The log is written back within the operation.
         db.Run("PRAGMA wal_autocheckpoint=1");
-        return NewHandle(db.Get(), m_table.strName, m_table.jDefinition, m_table.strCreate);
+        return NewHandle(db, m_table);
     }
 
     void RunOnFile() {
         const Database db(m_strPath, kFaultyVfs);
         // A constructor is the connection's first use: the files are not open yet.
-        const bool blFirst = m_operation.szName == std::string("constructor");
-        const std::unique_ptr<VornJsonDbApi> pHandle = blFirst ? nullptr : Handle(db);
+        const std::string strName = m_operation.szName;
+        const bool blFirst = strName == "constructor" || strName == "Open";
+        const HandlePtr pHandle = blFirst ? nullptr : Open(db);
         Subject subject = {m_table, db.Get(), pHandle.get()};
         Arguments argsBefore;
         m_operation.pfnPrepare(m_table, argsBefore);
@@ -95,7 +96,8 @@ class Case {
             DisarmIo();
         }
         m_blAcknowledged = nResult == m_nResult && m_nResult >= 0;
-        Check(nResult == m_nResult || nResult == -1, "returned " + std::to_string(nResult));
+        Check(nResult == m_nResult || IsFileFailure(nResult),
+              "returned " + std::to_string(nResult));
         if (m_blAcknowledged) {
             Check(args == m_argsResult, "a success gave " + ToText(args.AsJson()));
         } else {
@@ -126,12 +128,10 @@ class Case {
     // The handle works on after the fault, on the same connection.
     void CheckHandle(const Database& db, Subject& subject) const {
         const std::string strNow = m_table.Content(db);
-        const std::unique_ptr<VornJsonDbApi> pOther = Handle(db);
+        const HandlePtr pOther = Open(db);
         if (strNow != m_strBefore) {
-            Json::Value jQuery;
-            Json::Value jRows;
-            Check(pOther->recList(jQuery, jRows) == 0, "another handle cannot list");
-            Check(subject.pHandle == nullptr || subject.pHandle->recList(jQuery, jRows) == 0,
+            Check(CanList(*pOther), "another handle cannot list");
+            Check(subject.pHandle == nullptr || CanList(*subject.pHandle),
                   "the handle cannot list any more");
             return;
         }

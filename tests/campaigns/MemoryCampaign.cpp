@@ -35,7 +35,7 @@ class Case {
     void LearnResult() {
         const Json::Value jAll = AskChild([this] {
             const Database db;
-            const std::unique_ptr<VornJsonDbApi> pHandle = Prepare(db, m_table);
+            const HandlePtr pHandle = Prepare(db, m_table);
             Json::Value jBefore = m_table.Content(db);
             Arguments args;
             m_operation.pfnPrepare(m_table, args);
@@ -46,7 +46,7 @@ class Case {
             jResult["args"] = args.AsJson();
             jResult["before"] = jBefore;
             jResult["after"] = m_table.Content(db);
-            jResult["slot"] = pHandle->getErrMsg();
+            jResult["slot"] = MessageSlot(*pHandle);
             return jResult;
         });
         m_nResult = jAll["result"].asInt();
@@ -79,14 +79,12 @@ class Case {
     }
 
   private:
-    std::unique_ptr<VornJsonDbApi> Prepare(const Database& db, const Table& table) const {
+    HandlePtr Prepare(const Database& db, const Table& table) const {
         table.Fill(db);
-        std::string strName = table.strName;
-        Json::Value jDefinition = table.jDefinition;
         if (!m_operation.blFirstUse) {
-            VORN_JSON_DB::recType(jDefinition, strName);
+            KnowTable(table);
         }
-        return NewHandle(db.Get(), strName, jDefinition, table.strCreate);
+        return NewHandle(db, table);
     }
 
     long Kept(bool& blFailed) {
@@ -105,7 +103,7 @@ class Case {
         }
         const Table& table = pFresh ? *pFresh : m_table;
         const Database db;
-        const std::unique_ptr<VornJsonDbApi> pHandle = Prepare(db, table);
+        const HandlePtr pHandle = Prepare(db, table);
         Subject subject = {table, db.Get(), pHandle.get()};
 
         Arguments argsBefore;
@@ -117,14 +115,24 @@ class Case {
         const bool blFailed = Disarm();
 
         CheckResult(eExit, nResult, argsBefore, args);
-        const std::string strSlot = pHandle->getErrMsg();
+        const std::string strSlot = MessageSlot(*pHandle);
         Check(strSlot.empty() || strSlot == m_strSlot, "message slot: " + strSlot);
+        EndTransaction(db);
         const std::string strNow = table.Content(db);
         const bool blDone = eExit == Exit::kReturned && nResult == m_nResult && m_nResult >= 0;
         Check(strNow == m_strAfter || (!blDone && strNow == m_strBefore), "rows: " + strNow);
         Check(db.Rows("PRAGMA integrity_check") == "'ok'\n", "the database is damaged");
         CheckHandle(db, subject, strNow);
         return blFailed;
+    }
+
+    // While SQLite has no memory at all it cannot prepare the ROLLBACK that the handle asks for.
+    void EndTransaction(const Database& db) const {
+        if (sqlite3_get_autocommit(db.Get()) == 0) {
+            Check(m_pFault->blSqlite && m_pFault->blForEver, "a transaction was left open");
+            ++Figure("rollbacks that SQLite had no memory for");
+            db.Run("ROLLBACK");
+        }
     }
 
     Exit Call(Subject& subject, Arguments& args, int& nResult) const {
@@ -145,7 +153,8 @@ class Case {
     void CheckResult(Exit eExit, int nResult, const Arguments& argsBefore,
                      const Arguments& args) const {
         if (eExit == Exit::kReturned) {
-            Check(nResult == m_nResult || nResult == -1, "returned " + std::to_string(nResult));
+            Check(nResult == m_nResult || IsMemoryFailure(nResult),
+                  "returned " + std::to_string(nResult));
         }
         Check(eExit != Exit::kBadAlloc || m_pFault->blNew, "threw bad_alloc without reason");
         Check(eExit != Exit::kLogicError || (m_operation.blLogicError && m_pFault->blSqlite),
@@ -164,9 +173,7 @@ class Case {
         if (strNow == m_strBefore) {
             RunAgain(db, subject);
         }
-        Json::Value jQuery;
-        Json::Value jRows;
-        Check(m_operation.blFirstUse || subject.pHandle->recList(jQuery, jRows) == 0,
+        Check(m_operation.blFirstUse || CanList(*subject.pHandle),
               "the handle cannot list any more");
     }
 
@@ -237,7 +244,8 @@ int RunMemoryCampaign(const Options& options) {
     InstallSqliteAllocator();
     for (const char* szFigure :
          {"operations", "operations passed untouched", "allocations failed",
-          "allocations failed in a fresh process", "most allocations in one operation"}) {
+          "allocations failed in a fresh process", "most allocations in one operation",
+          "rollbacks that SQLite had no memory for"}) {
         Figure(szFigure);
     }
     for (const Operation& operation : kOperations) {
@@ -249,7 +257,8 @@ int RunMemoryCampaign(const Options& options) {
     }
     for (const Operation& operation : kOperations) {
         const std::string strName = operation.szName;
-        if (strName == "recCreate, first use" || strName == "recList, first use") {
+        if (strName == "recCreate, first use" || strName == "recList, first use" ||
+            strName == "Create, first use" || strName == "List, first use") {
             RunFirstUse(options, operation, kFaults[0]);
             RunFirstUse(options, operation, kFaults[1]);
         }

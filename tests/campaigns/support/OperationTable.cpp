@@ -2,6 +2,10 @@
 
 namespace campaign {
 
+struct Handle : VornJsonDbApi {
+    using VornJsonDbApi::VornJsonDbApi;
+};
+
 namespace {
 
 // ---- arguments ----------------------------------------------------------------------------------
@@ -247,5 +251,41 @@ const std::vector<Operation> kOperations = {
     {"time number",               false, false, false, kSame, NoArguments,   TimeNumber},
 };
 // clang-format on
+
+void HandleEnd::operator()(Handle* pHandle) const {
+    delete pHandle;
+}
+
+HandlePtr NewHandle(const Database& db, const Table& table) {
+    // The constructor takes its arguments by reference.
+    std::string strName = table.strName;
+    Json::Value jDefinition = table.jDefinition;
+    std::string strCreate = table.strCreate;
+    return HandlePtr(new Handle(db.Get(), strName, jDefinition, strCreate));
+}
+
+void KnowTable(const Table& table) {
+    std::string strName = table.strName;
+    Json::Value jDefinition = table.jDefinition;
+    VORN_JSON_DB::recType(jDefinition, strName);
+}
+
+bool CanList(Handle& handle) {
+    Json::Value jQuery;
+    Json::Value jRows;
+    return handle.recList(jQuery, jRows) == 0;
+}
+
+std::string MessageSlot(const Handle& handle) {
+    return const_cast<Handle&>(handle).getErrMsg();
+}
+
+bool IsMemoryFailure(int nResult) {
+    return nResult == -1;
+}
+
+bool IsFileFailure(int nResult) {
+    return nResult == -1;
+}
 
 }  // namespace campaign

@@ -1,8 +1,10 @@
 // Every public operation as one row: how its arguments are made, how it is called, and what its
 // arguments may hold after a failure. The fault campaigns run each row with the Nth thing failing.
+// Both handles fill such a list; a campaign is linked with one of them.
 #ifndef VORNJSONDB_TESTS_CAMPAIGNS_SUPPORT_OPERATIONS_H
 #define VORNJSONDB_TESTS_CAMPAIGNS_SUPPORT_OPERATIONS_H
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -37,10 +39,17 @@ struct Arguments {
     static Arguments OfJson(const Json::Value& jAll);
 };
 
+// What is tried: each list of operations has its own.
+struct Handle;
+struct HandleEnd {
+    void operator()(Handle* pHandle) const;
+};
+using HandlePtr = std::unique_ptr<Handle, HandleEnd>;
+
 struct Subject {
     const Table& table;
     sqlite3* pDb;
-    VornJsonDbApi* pHandle;
+    Handle* pHandle;
 };
 
 enum class After {
@@ -55,10 +64,25 @@ struct Operation {
     bool blLogicError;  // std::logic_error may leave it
     After eAfter;
     void (*pfnPrepare)(const Table&, Arguments&);
-    int (*pfnRun)(Subject&, Arguments&);
+    int (*pfnRun)(Subject&, Arguments&);  // negative: failed
 };
 
 extern const std::vector<Operation> kOperations;
+
+// A handle on the table, which must be there.
+HandlePtr NewHandle(const Database& db, const Table& table);
+
+// What the library makes once for a table, without a fault.
+void KnowTable(const Table& table);
+
+bool CanList(Handle& handle);
+
+// The message that failures leave in the handle.
+std::string MessageSlot(const Handle& handle);
+
+// What a call may return when memory ran out, or when the files failed.
+bool IsMemoryFailure(int nResult);
+bool IsFileFailure(int nResult);
 
 // Whether after a failure the arguments are as eAfter says, for a success that gives argsResult.
 bool IsLeftAsDocumented(const Operation& operation, const Arguments& argsBefore,
