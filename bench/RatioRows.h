@@ -34,6 +34,16 @@ Figure NamesListRatio(const Settings& Now);
 Figure OneLongTextRatio(const Settings& Now);
 Figure EightLongTextsRatio(const Settings& Now);
 
+// RatiosTable.cpp: the second handle
+Figure TableCreateRatio(const Settings& Now);
+Figure TableToOldRatio(const Settings& Now);
+Figure TableGetRatio(const Settings& Now);
+Figure TableListRatio(const Settings& Now);
+Figure LoadBySettersRatio(const Settings& Now);
+Figure LoadFromJsonRatio(const Settings& Now);
+Figure QueryShare(const Settings& Now);
+Figure LongInRatio(const Settings& Now);
+
 // RatiosProcess.cpp: memory, start and size
 Figure PeakMemoryRatio(const Settings& Now);
 Figure HandleRatio(const Settings& Now);

@@ -47,6 +47,14 @@ constexpr Row kRows[] = {
     {"handle", "construct and destroy a handle", "sqlite3_exec of its CREATE", 0, HandleRatio},
     {"load", "dlopen, its dependencies loaded", "dlopen of libsqlite3", 0, LoadTimeRatio},
     {"relocations", "relocations of the library", "those of libsqlite3", 0, RelocationRatio},
+    {"table-create", "Table::Create with the stored row", "by hand, prepared once", 1.15, TableCreateRatio},
+    {"table-old", "Table::Create with the stored row", "recCreate", 0.33, TableToOldRatio},
+    {"table-get", "Table::Get in 20,000 rows", "by hand, prepared once", 1.15, TableGetRatio},
+    {"table-list", "Table::List of 20,000 rows, per row", "hand-written typed reader", 0.60, TableListRatio},
+    {"load-set", "Loader, by setters", "hand-written bind loop", 1.10, LoadBySettersRatio},
+    {"load-json", "Loader, from Json::Value", "hand-written bind loop", 1.30, LoadFromJsonRatio},
+    {"query", "making a query and finding its statement", "Table::First with it", 0.10, QueryShare},
+    {"in", "$in with 10,000 values, per value", "per value of 1,000", 1.30, LongInRatio},
     {"size", "stripped library (figure: KiB)", "libsqlite3", 0, StrippedSize},
 };
 // clang-format on

@@ -1,8 +1,10 @@
 // SQLite's C interface by hand, every statement prepared when it is used: the same work for SQLite
 // as for a library that is handed SQL texts.
 
+#include "../support/Capi.h"
+#include "../support/JsonText.h"
 #include "../support/TypedList.h"
-#include "Capi.h"
+#include "Peer.h"
 
 namespace bench {
 

@@ -1,8 +1,10 @@
 // SQLite's C interface by hand, statements prepared once and kept: what is left when SQLite need
 // not parse any text again. Not the same job: the statements must be known beforehand.
 
+#include "../support/Capi.h"
+#include "../support/JsonText.h"
 #include "../support/TypedList.h"
-#include "Capi.h"
+#include "Peer.h"
 
 namespace bench {
 

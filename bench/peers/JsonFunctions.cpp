@@ -1,7 +1,9 @@
 // SQLite's own JSON functions: one JSON text goes in, one comes out, and JsonCpp writes and parses
 // it.
 
-#include "Capi.h"
+#include "../support/Capi.h"
+#include "../support/JsonText.h"
+#include "Peer.h"
 
 namespace bench {
 

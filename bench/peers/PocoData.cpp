@@ -4,7 +4,7 @@
 #include <Poco/Data/Session.h>
 #include <Poco/Data/Statement.h>
 
-#include "JsonText.h"
+#include "../support/JsonText.h"
 #include "Peer.h"
 
 namespace bench {

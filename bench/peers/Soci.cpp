@@ -3,7 +3,7 @@
 
 #include <soci/soci.h>
 
-#include "JsonText.h"
+#include "../support/JsonText.h"
 #include "Peer.h"
 
 namespace bench {

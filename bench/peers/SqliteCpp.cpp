@@ -2,7 +2,7 @@
 
 #include <SQLiteCpp/SQLiteCpp.h>
 
-#include "JsonText.h"
+#include "../support/JsonText.h"
 #include "Peer.h"
 
 namespace bench {

@@ -13,13 +13,21 @@ SqlCapture::~SqlCapture() {
 }
 
 int SqlCapture::OnStatement(unsigned, void* pContext, void* pStatement, void*) {
-    static_cast<SqlCapture*>(pContext)->m_strSql +=
-        sqlite3_sql(static_cast<sqlite3_stmt*>(pStatement));
+    static_cast<SqlCapture*>(pContext)->m_vecSql.emplace_back(
+        sqlite3_sql(static_cast<sqlite3_stmt*>(pStatement)));
     return 0;
 }
 
 std::string SqlCapture::Take() {
-    return std::exchange(m_strSql, std::string());
+    std::string strAll;
+    for (const std::string& strSql : TakeEach()) {
+        strAll += strSql;
+    }
+    return strAll;
+}
+
+std::vector<std::string> SqlCapture::TakeEach() {
+    return std::exchange(m_vecSql, {});
 }
 
 }  // namespace bench

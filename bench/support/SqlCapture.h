@@ -5,6 +5,7 @@
 #define VORN_BENCH_SUPPORT_SQL_CAPTURE_H
 
 #include <string>
+#include <vector>
 
 #include <sqlite3.h>
 
@@ -17,14 +18,15 @@ class SqlCapture {
     SqlCapture(const SqlCapture&) = delete;
     SqlCapture& operator=(const SqlCapture&) = delete;
 
-    // All statements since the last take, one after the other.
+    // All statements since the last take: one after the other, or each for itself.
     std::string Take();
+    std::vector<std::string> TakeEach();
 
   private:
     static int OnStatement(unsigned nEvent, void* pContext, void* pStatement, void* pText);
 
     sqlite3* m_pDb;
-    std::string m_strSql;
+    std::vector<std::string> m_vecSql;
 };
 
 }  // namespace bench

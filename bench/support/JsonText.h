@@ -1,7 +1,7 @@
-// JSON text for the peers that use JsonCpp: one reader and one writer, made once.
+// JSON text by JsonCpp: one reader and one writer, made once.
 
-#ifndef VORN_BENCH_PEERS_JSON_TEXT_H
-#define VORN_BENCH_PEERS_JSON_TEXT_H
+#ifndef VORN_BENCH_SUPPORT_JSON_TEXT_H
+#define VORN_BENCH_SUPPORT_JSON_TEXT_H
 
 #include <memory>
 #include <sstream>
@@ -9,7 +9,7 @@
 
 #include <json/json.h>
 
-#include "../support/Bench.h"
+#include "Bench.h"
 
 namespace bench {
 
@@ -47,4 +47,4 @@ class JsonText {
 
 }  // namespace bench
 
-#endif  // VORN_BENCH_PEERS_JSON_TEXT_H
+#endif  // VORN_BENCH_SUPPORT_JSON_TEXT_H

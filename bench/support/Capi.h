@@ -1,20 +1,19 @@
-// SQLite's C interface by hand, for the two peers that differ in when they prepare.
+// SQLite's C interface by hand.
 
-#ifndef VORN_BENCH_PEERS_CAPI_H
-#define VORN_BENCH_PEERS_CAPI_H
+#ifndef VORN_BENCH_SUPPORT_CAPI_H
+#define VORN_BENCH_SUPPORT_CAPI_H
 
 #include <string>
 
 #include <json/json.h>
 #include <sqlite3.h>
 
-#include "../support/Bench.h"
-#include "JsonText.h"
-#include "Peer.h"
+#include "Bench.h"
 
 namespace bench {
 
-// Binds a record to kPeerInsert. Texts are bound in place: jRecord and strTags outlive the step.
+// Binds a record of the table of eight, columns in key order. Texts are bound in place: jRecord and
+// strTags outlive the step.
 inline void BindRecord(sqlite3_stmt* pInsert, const Json::Value& jRecord,
                        const std::string& strTags) {
     const auto Text = [&](int i, const Json::Value& jText) {
@@ -34,9 +33,10 @@ inline void BindRecord(sqlite3_stmt* pInsert, const Json::Value& jRecord,
                       SQLITE_STATIC);
 }
 
-inline sqlite3_stmt* Prepare(const Database& Db, const char* szSql) {
+inline sqlite3_stmt* Prepare(const Database& Db, const std::string& strSql) {
     sqlite3_stmt* pStatement = nullptr;
-    Require(sqlite3_prepare_v2(Db.Get(), szSql, -1, &pStatement, nullptr) == SQLITE_OK, szSql);
+    Require(sqlite3_prepare_v2(Db.Get(), strSql.c_str(), -1, &pStatement, nullptr) == SQLITE_OK,
+            strSql.c_str());
     return pStatement;
 }
 
@@ -46,4 +46,4 @@ inline void StepTo(sqlite3_stmt* pStatement, int nExpected) {
 
 }  // namespace bench
 
-#endif  // VORN_BENCH_PEERS_CAPI_H
+#endif  // VORN_BENCH_SUPPORT_CAPI_H
