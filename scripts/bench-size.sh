@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Prints the size of the stripped library in bytes: for amd64 and 32-bit ARM, -O2 and -Os.
+# Prints sizes in bytes for amd64 and 32-bit ARM, -O2 and -Os: of the stripped library, and ("-table")
+# of what a small program pulls in from the static one.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -10,14 +11,23 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" \
     g++-arm-linux-gnueabihf:arm-linux-gnueabihf-g++ pkg-config:pkg-config
 make_armhf_sysroot
 
+# stripped STRIP FILE prints how many bytes the stripped file has.
+stripped() {
+    "$1" --strip-all -o "$2.stripped" "$2"
+    stat -c %s "$2.stripped"
+}
+
 # size NAME STRIP [CMAKE-OPTION...]
 size() {
-    local name=$1 strip=$2 stripped=build/$1/stripped.so
+    local name=$1 strip=$2 folder=build/$1 with without
     shift 2
-    configure "$name" -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF "$@"
-    build "$name" vornjsondb >/dev/null
-    "$strip" --strip-all -o "$stripped" "build/$name/libvornjsondb.so"
-    printf '%-10s %s\n' "${name#size-}" "$(stat -c %s "$stripped")"
+    configure "$name" -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF -DVORNJSONDB_TABLE=ON \
+        -DVORNJSONDB_BENCHMARKS=ON "$@"
+    build "$name" vornjsondb vornjsondb_small vornjsondb_small_without >/dev/null
+    with=$(stripped "$strip" "$folder/bench/vornjsondb_small")
+    without=$(stripped "$strip" "$folder/bench/vornjsondb_small_without")
+    printf '%-16s %s\n' "${name#size-}" "$(stripped "$strip" "$folder/libvornjsondb.so")"
+    printf '%-16s %s\n' "${name#size-}-table" $((with - without))
 }
 
 size size-amd64-O2 strip -DCMAKE_BUILD_TYPE=Release

@@ -1,4 +1,5 @@
-// Qt 5 SQL; its records are Qt's own JSON objects, which are converted for the comparison only.
+// Qt 5 SQL, queries prepared when they are used, and queries kept. Records are Qt's own JSON
+// objects, which are converted for the comparison only.
 
 #include <QtCore/QCoreApplication>
 #include <QtCore/QJsonArray>
@@ -15,7 +16,7 @@ namespace bench {
 
 namespace {
 
-class QtSql {
+class QtStore {
   public:
     using Record = QJsonObject;
     using Records = QJsonArray;
@@ -29,49 +30,52 @@ class QtSql {
     static Json::Value ToJson(const QJsonObject& One) { return ToJson(QJsonDocument(One)); }
     static Json::Value ToJson(const QJsonArray& All) { return ToJson(QJsonDocument(All)); }
 
-    QtSql() : m_strConnection(NextName()), m_Db(Open(m_strConnection)) {
-        Run(QString::fromStdString(EightMembers().strSqlCreate));
+  protected:
+    QtStore() : m_strConnection(NextName()), m_Db(Open(m_strConnection)) {
+        QSqlQuery CreateTable(m_Db);
+        Require(CreateTable.exec(QString::fromStdString(EightMembers().strSqlCreate)), "Qt: table");
         Require(m_Db.transaction(), "Qt: transaction");
     }
 
-    ~QtSql() {
+    ~QtStore() {
         m_Db = QSqlDatabase();
         QSqlDatabase::removeDatabase(m_strConnection);
     }
 
-    QtSql(const QtSql&) = delete;
-    QtSql& operator=(const QtSql&) = delete;
+    QtStore(const QtStore&) = delete;
+    QtStore& operator=(const QtStore&) = delete;
 
-    void Create(const QJsonObject& In, QJsonObject& Stored) {
-        QSqlQuery Insert(m_Db);
-        Insert.prepare(kPeerInsert);
-        Insert.addBindValue(In["active"].toBool() ? 1 : 0);
-        Insert.addBindValue(In["amount"].toInt());
-        Insert.addBindValue(In["city"].toString());
-        Insert.addBindValue(In["id"].toInt());
-        Insert.addBindValue(In["level"].toInt());
-        Insert.addBindValue(In["name"].toString());
-        Insert.addBindValue(In["note"].toString());
-        Insert.addBindValue(
-            QString::fromUtf8(QJsonDocument(In["tags"].toArray()).toJson(QJsonDocument::Compact)));
-        Require(Insert.exec(), "Qt: insert");
-        QSqlQuery Select = Run(kPeerSelectStored);
-        Require(Select.next(), "Qt: the stored row");
-        Stored = ReadRow(Select);
+    QSqlQuery Prepared(const char* szSql) const {
+        QSqlQuery Query(m_Db);
+        Query.setForwardOnly(true);
+        Require(Query.prepare(szSql), "Qt: prepare");
+        return Query;
     }
 
-    void Get(int nId, QJsonObject& Found) {
-        QSqlQuery Select(m_Db);
-        Select.setForwardOnly(true);
-        Select.prepare(kPeerSelectByKey);
-        Select.addBindValue(nId);
-        Require(Select.exec() && Select.next(), "Qt: the row with this key");
+    static void Run(QSqlQuery& Query) { Require(Query.exec(), "Qt: exec"); }
+
+    static void Insert(QSqlQuery& Into, const QJsonObject& In) {
+        Into.bindValue(0, In["active"].toBool() ? 1 : 0);
+        Into.bindValue(1, In["amount"].toInt());
+        Into.bindValue(2, In["city"].toString());
+        Into.bindValue(3, In["id"].toInt());
+        Into.bindValue(4, In["level"].toInt());
+        Into.bindValue(5, In["name"].toString());
+        Into.bindValue(6, In["note"].toString());
+        Into.bindValue(7, QString::fromUtf8(
+                              QJsonDocument(In["tags"].toArray()).toJson(QJsonDocument::Compact)));
+        Run(Into);
+    }
+
+    static void SelectOne(QSqlQuery& Select, QJsonObject& Found) {
+        Run(Select);
+        Require(Select.next(), "Qt: the row");
         Found = ReadRow(Select);
     }
 
-    void List(QJsonArray& All) {
+    static void SelectAll(QSqlQuery& Select, QJsonArray& All) {
         All = QJsonArray();
-        QSqlQuery Select = Run(kPeerSelect);
+        Run(Select);
         while (Select.next()) {
             All.append(ReadRow(Select));
         }
@@ -102,13 +106,6 @@ class QtSql {
         return Db;
     }
 
-    QSqlQuery Run(const QString& strSql) {
-        QSqlQuery Query(m_Db);
-        Query.setForwardOnly(true);
-        Require(Query.exec(strSql), "Qt: exec");
-        return Query;
-    }
-
     static QJsonObject ReadRow(const QSqlQuery& Select) {
         QJsonObject One;
         One["active"] = Select.value(0).toInt() == 1;
@@ -126,7 +123,55 @@ class QtSql {
     QSqlDatabase m_Db;
 };
 
+class QtSql : public QtStore {
+  public:
+    void Create(const QJsonObject& In, QJsonObject& Stored) {
+        QSqlQuery Into = Prepared(kPeerInsert);
+        Insert(Into, In);
+        QSqlQuery Select = Prepared(kPeerSelectStored);
+        SelectOne(Select, Stored);
+    }
+
+    void Get(int nId, QJsonObject& Found) {
+        QSqlQuery Select = Prepared(kPeerSelectByKey);
+        Select.bindValue(0, nId);
+        SelectOne(Select, Found);
+    }
+
+    void List(QJsonArray& All) {
+        QSqlQuery Select = Prepared(kPeerSelect);
+        SelectAll(Select, All);
+    }
+};
+
+class QtSqlPreparedOnce : public QtStore {
+  public:
+    void Create(const QJsonObject& In, QJsonObject& Stored) {
+        Insert(m_Insert, In);
+        SelectOne(m_SelectStored, Stored);
+        m_SelectStored.finish();
+    }
+
+    void Get(int nId, QJsonObject& Found) {
+        m_SelectByKey.bindValue(0, nId);
+        SelectOne(m_SelectByKey, Found);
+        m_SelectByKey.finish();
+    }
+
+    void List(QJsonArray& All) {
+        SelectAll(m_Select, All);
+        m_Select.finish();
+    }
+
+  private:
+    QSqlQuery m_Insert = Prepared(kPeerInsert);
+    QSqlQuery m_SelectStored = Prepared(kPeerSelectStored);
+    QSqlQuery m_SelectByKey = Prepared(kPeerSelectByKey);
+    QSqlQuery m_Select = Prepared(kPeerSelect);
+};
+
 VORN_BENCH_PEER(QtSql);
+VORN_BENCH_PEER(QtSqlPreparedOnce);
 
 }  // namespace
 

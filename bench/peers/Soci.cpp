@@ -1,5 +1,6 @@
-// SOCI and JsonCpp. The backend is named as text and loaded at run time: its header puts the
-// declarations of sqlite3.h into a namespace, where nobody else finds them.
+// SOCI and JsonCpp: statements prepared when they are used, and statements kept. The backend is
+// named as text and loaded at run time: its header puts the declarations of sqlite3.h into a
+// namespace, where nobody else finds them.
 
 #include <soci/soci.h>
 
@@ -10,49 +11,53 @@ namespace bench {
 
 namespace {
 
-class Soci : public JsonCppPeer {
-  public:
-    Soci() : m_Session("sqlite3", ":memory:") {
+#define VORN_PEER_SOCI_INSERT              \
+    "INSERT INTO part (" VORN_PEER_COLUMNS \
+    ") VALUES (:active, :amount, :city, :id, :level, :name, :note, :tags)"
+#define VORN_PEER_SOCI_BY_KEY "SELECT " VORN_PEER_COLUMNS " FROM part WHERE id = :id"
+
+class SociStore : public JsonCppPeer {
+  protected:
+    struct Part {
+        int nActive = 0;
+        int nAmount = 0;
+        std::string strCity;
+        int nId = 0;
+        int nLevel = 0;
+        std::string strName;
+        std::string strNote;
+        std::string strTags;
+    };
+
+    SociStore() : m_Session("sqlite3", ":memory:") {
         m_Session << EightMembers().strSqlCreate;
         m_Session.begin();
     }
 
-    void Create(const Json::Value& jIn, Json::Value& jStored) {
-        const int nActive = jIn["active"].asBool() ? 1 : 0;
-        const int nAmount = jIn["amount"].asInt();
-        const std::string strCity = jIn["city"].asString();
-        const int nId = jIn["id"].asInt();
-        const int nLevel = jIn["level"].asInt();
-        const std::string strName = jIn["name"].asString();
-        const std::string strNote = jIn["note"].asString();
-        const std::string strTags = m_Text.Write(jIn["tags"]);
-        m_Session << "INSERT INTO part (" VORN_PEER_COLUMNS
-                     ") VALUES (:active, :amount, :city, :id, :level, :name, :note, :tags)",
-            soci::use(nActive), soci::use(nAmount), soci::use(strCity), soci::use(nId),
-            soci::use(nLevel), soci::use(strName), soci::use(strNote), soci::use(strTags);
-        soci::row Row;
-        m_Session << kPeerSelectStored, soci::into(Row);
-        Require(m_Session.got_data(), "the stored row");
-        jStored = ReadRow(Row);
+    void ToPart(const Json::Value& jIn, Part& To) {
+        To.nActive = jIn["active"].asBool() ? 1 : 0;
+        To.nAmount = jIn["amount"].asInt();
+        To.strCity = jIn["city"].asString();
+        To.nId = jIn["id"].asInt();
+        To.nLevel = jIn["level"].asInt();
+        To.strName = jIn["name"].asString();
+        To.strNote = jIn["note"].asString();
+        To.strTags = m_Text.Write(jIn["tags"]);
     }
 
-    void Get(int nId, Json::Value& jFound) {
-        soci::row Row;
-        m_Session << "SELECT " VORN_PEER_COLUMNS " FROM part WHERE id = :id", soci::use(nId),
-            soci::into(Row);
-        Require(m_Session.got_data(), "the row with this key");
-        jFound = ReadRow(Row);
+    Json::Value ToRecord(const Part& One) {
+        Json::Value jRecord(Json::objectValue);
+        jRecord["active"] = One.nActive == 1;
+        jRecord["amount"] = One.nAmount;
+        jRecord["city"] = One.strCity;
+        jRecord["id"] = One.nId;
+        jRecord["level"] = One.nLevel;
+        jRecord["name"] = One.strName;
+        jRecord["note"] = One.strNote;
+        m_Text.Read(One.strTags, jRecord["tags"]);
+        return jRecord;
     }
 
-    void List(Json::Value& jAll) {
-        jAll = Json::Value(Json::arrayValue);
-        const soci::rowset<soci::row> Rows = (m_Session.prepare << kPeerSelect);
-        for (const soci::row& Row : Rows) {
-            jAll.append(ReadRow(Row));
-        }
-    }
-
-  private:
     Json::Value ReadRow(const soci::row& Row) {
         Json::Value jRecord(Json::objectValue);
         jRecord["active"] = Row.get<int>(0) == 1;
@@ -67,10 +72,91 @@ class Soci : public JsonCppPeer {
     }
 
     soci::session m_Session;
+
+  private:
     JsonText m_Text;
 };
 
+class Soci : public SociStore {
+  public:
+    void Create(const Json::Value& jIn, Json::Value& jStored) {
+        Part In;
+        ToPart(jIn, In);
+        m_Session << VORN_PEER_SOCI_INSERT, soci::use(In.nActive), soci::use(In.nAmount),
+            soci::use(In.strCity), soci::use(In.nId), soci::use(In.nLevel), soci::use(In.strName),
+            soci::use(In.strNote), soci::use(In.strTags);
+        soci::row Row;
+        m_Session << kPeerSelectStored, soci::into(Row);
+        Require(m_Session.got_data(), "the stored row");
+        jStored = ReadRow(Row);
+    }
+
+    void Get(int nId, Json::Value& jFound) {
+        soci::row Row;
+        m_Session << VORN_PEER_SOCI_BY_KEY, soci::use(nId), soci::into(Row);
+        Require(m_Session.got_data(), "the row with this key");
+        jFound = ReadRow(Row);
+    }
+
+    void List(Json::Value& jAll) {
+        jAll = Json::Value(Json::arrayValue);
+        const soci::rowset<soci::row> Rows = (m_Session.prepare << kPeerSelect);
+        for (const soci::row& Row : Rows) {
+            jAll.append(ReadRow(Row));
+        }
+    }
+};
+
+class SociPreparedOnce : public SociStore {
+  public:
+    void Create(const Json::Value& jIn, Json::Value& jStored) {
+        ToPart(jIn, m_In);
+        m_Insert.execute(true);
+        Require(m_SelectStored.execute(true), "the stored row");
+        jStored = ToRecord(m_Out);
+    }
+
+    void Get(int nId, Json::Value& jFound) {
+        m_nId = nId;
+        Require(m_SelectByKey.execute(true), "the row with this key");
+        jFound = ToRecord(m_Out);
+    }
+
+    void List(Json::Value& jAll) {
+        jAll = Json::Value(Json::arrayValue);
+        m_Select.execute();
+        while (m_Select.fetch()) {
+            jAll.append(ToRecord(m_Out));
+        }
+    }
+
+  private:
+    soci::statement Select(const char* szSql) {
+        return (m_Session.prepare << szSql, soci::into(m_Out.nActive), soci::into(m_Out.nAmount),
+                soci::into(m_Out.strCity), soci::into(m_Out.nId), soci::into(m_Out.nLevel),
+                soci::into(m_Out.strName), soci::into(m_Out.strNote), soci::into(m_Out.strTags));
+    }
+
+    // What the statements are bound to.
+    Part m_In;
+    Part m_Out;
+    int m_nId = 0;
+    soci::statement m_Insert =
+        (m_Session.prepare << VORN_PEER_SOCI_INSERT, soci::use(m_In.nActive),
+         soci::use(m_In.nAmount), soci::use(m_In.strCity), soci::use(m_In.nId),
+         soci::use(m_In.nLevel), soci::use(m_In.strName), soci::use(m_In.strNote),
+         soci::use(m_In.strTags));
+    soci::statement m_SelectStored = Select(kPeerSelectStored);
+    soci::statement m_SelectByKey =
+        (m_Session.prepare << VORN_PEER_SOCI_BY_KEY, soci::use(m_nId), soci::into(m_Out.nActive),
+         soci::into(m_Out.nAmount), soci::into(m_Out.strCity), soci::into(m_Out.nId),
+         soci::into(m_Out.nLevel), soci::into(m_Out.strName), soci::into(m_Out.strNote),
+         soci::into(m_Out.strTags));
+    soci::statement m_Select = Select(kPeerSelect);
+};
+
 VORN_BENCH_PEER(Soci);
+VORN_BENCH_PEER(SociPreparedOnce);
 
 }  // namespace
 

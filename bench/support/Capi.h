@@ -3,6 +3,7 @@
 #ifndef VORN_BENCH_SUPPORT_CAPI_H
 #define VORN_BENCH_SUPPORT_CAPI_H
 
+#include <memory>
 #include <string>
 
 #include <json/json.h>
@@ -32,6 +33,11 @@ inline void BindRecord(sqlite3_stmt* pInsert, const Json::Value& jRecord,
     sqlite3_bind_text(pInsert, 8, strTags.data(), static_cast<int>(strTags.length()),
                       SQLITE_STATIC);
 }
+
+struct FinalizeStatement {
+    void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }
+};
+using KeptStatement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 
 inline sqlite3_stmt* Prepare(const Database& Db, const std::string& strSql) {
     sqlite3_stmt* pStatement = nullptr;

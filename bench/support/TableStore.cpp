@@ -1,9 +1,7 @@
 #include "TableStore.h"
 
-#include <string_view>
 #include <vector>
 
-#include "Capi.h"
 #include "Records.h"
 #include "SqlCapture.h"
 

@@ -6,13 +6,13 @@
 #include <VornJsonDbTable.h>
 
 #include <array>
-#include <memory>
 #include <string>
 
 #include <json/json.h>
 #include <sqlite3.h>
 
 #include "Bench.h"
+#include "Capi.h"
 #include "JsonText.h"
 #include "TypedList.h"
 
@@ -58,14 +58,9 @@ class ByHand {
     void Load(const Part& One) const;
 
   private:
-    struct Finalize {
-        void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }
-    };
-    using Kept = std::unique_ptr<sqlite3_stmt, Finalize>;
-
-    std::array<Kept, 4> m_aCreate;  // a savepoint, INSERT, SELECT of the row, its release
-    Kept m_pGet;
-    Kept m_pList;
+    std::array<KeptStatement, 4> m_aCreate;  // a savepoint, INSERT, SELECT of the row, its release
+    KeptStatement m_pGet;
+    KeptStatement m_pList;
     TypedList m_Reader;
     JsonText m_Text;
 };
