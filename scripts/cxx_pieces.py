@@ -19,6 +19,8 @@ LEAVES = re.compile(r"\b(?:return|break|continue|throw|VORN_FAIL_IF\w*)\b")
 # What stands before the brace of a block of statements; any other brace is of a class or a value.
 BEFORE_BLOCK = re.compile(r"(?:\)|\belse|\bdo|\btry|\bconst|\bnoexcept|-> [\w:*& ]+|\)\s*:[^{};]*)$")
 DECLARATION = re.compile(r"(?:static |constexpr |const )*[\w:]+(?:<[^;=]*>)?(?: const)?[ &*]+(\w+)(?=[ ;({\[])")
+# Neighbours that set members of one value; each of another name, so in any order.
+SETS_MEMBER = re.compile(r'[\w.]+\[" +"\] = [^();]*;$')
 CALL = re.compile(r"((?:\w+(?:\.|->|::))*)(\w+)\(")
 # Calls that only look, the library's own in the last lines; macros and casts are no calls.
 LOOKS = re.compile(
@@ -210,6 +212,8 @@ class Effect:
 
     def order_matters(self, other, local):
         """Whether exchanging the two may show; local: the names that nobody sees after leaving."""
+        if SETS_MEMBER.match(self.text) and SETS_MEMBER.match(other.text):
+            return False
         return (
             (self.anything and other.anything)
             or bool(self.written & other.names or other.written & self.names)

@@ -47,19 +47,20 @@ std::string JsonCodec::Write(const Json::Value& jValue) {
     if (WritePlainJson(jValue, strText)) {  // mutate(false): the longer way gives the same.
         return strText;
     }
+    std::ostringstream Stream;
+    // Without this a stream swallows std::bad_alloc and the text is silently cut.
+    Stream.exceptions(std::ios::badbit | std::ios::failbit);
     // mutate(true, moved): one that is made for each text writes the same.
     if (!m_pWriter) {
         m_pWriter.reset(NewWriter());
     }
-    std::ostringstream Stream;
-    // Without this a stream swallows std::bad_alloc and the text is silently cut.
-    Stream.exceptions(std::ios::badbit | std::ios::failbit);
     m_pWriter->write(jValue, &Stream);
     return Stream.str();
 }
 
 bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
-    if (ReadPlainJson(szText, nLength, jOut)) {  // mutate(false): the longer way gives the same.
+    // mutate(false, exchanged): the longer way gives the same.
+    if (ReadPlainJson(szText, nLength, jOut)) {
         return true;
     }
     try {

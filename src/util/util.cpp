@@ -124,7 +124,6 @@ int VORN_JSON_DB::convert2ReadableTime(long now, std::string& strOut, int iType)
     } else {
         VORN_FAIL_IF(NULL == localtime_r(&ullTimeStamp, &sTime));
     }
-    // mutate(moved): the second form is written over the first.
     if ((iType & 2) != 0) {
         VORN_FAIL_IF(0 == strftime(szTime, sizeof(szTime), "%a, %d %b %Y %T GMT", &sTime));
     } else if ((iType & 4) != 0) {
