@@ -2,9 +2,11 @@
 # Builds the library and runs all its tests.
 #
 #    scripts/test.sh [--asan] [CTEST-OPTION...]
+#    scripts/test.sh --tsan
 #
 # --asan builds with AddressSanitizer and UndefinedBehaviorSanitizer. What else is given goes to
-# ctest: scripts/test.sh -R Runner
+# ctest: scripts/test.sh -R Runner. --tsan builds VORN_JSON_DB::Table alone with ThreadSanitizer, and
+# runs the one test that has threads.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -16,6 +18,15 @@ if [[ ${1:-} == --asan ]]; then
     shift
     name=asan
     options=(-DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON)
+fi
+
+if [[ ${1:-} == --tsan ]]; then
+    need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
+    configure tsan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS="-fsanitize=thread -O1" \
+        -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON
+    build_quietly tsan vornjsondb_table_threads
+    TSAN_OPTIONS=halt_on_error=1 build/tsan/tests/table/vornjsondb_table_threads
+    exit
 fi
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"

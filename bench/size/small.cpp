@@ -1,6 +1,6 @@
-// A small program on a small device, twice: built plainly, and with VORN_BENCH_WITHOUT, which leaves
-// the calls of VORN_JSON_DB::Table out and keeps the rest. The difference in size is what the calls
-// pull in. See scripts/bench-size.sh.
+// A small program on a small device, twice: built plainly, and with VORN_BENCH_WITHOUT, which
+// leaves the calls of VORN_JSON_DB::Table out and keeps the rest. The difference in size is what
+// the calls pull in. See scripts/bench-size.sh.
 
 #ifndef VORN_BENCH_WITHOUT
 #include <VornJsonDbTable.h>
