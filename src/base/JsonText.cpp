@@ -50,7 +50,6 @@ std::string JsonCodec::Write(const Json::Value& jValue) {
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.
     Stream.exceptions(std::ios::badbit | std::ios::failbit);
-    // mutate(true, moved): one that is made for each text writes the same.
     if (!m_pWriter) {
         m_pWriter.reset(NewWriter());
     }
