@@ -2,7 +2,8 @@
 // runs it under callgrind, which collects only inside MeasuredWork. Prints how many units (calls,
 // or cells of a list) the count is to be divided by.
 //
-// WORK is one of: create, get, update, delete, list.
+// WORK is one of the names in kWorks. Those that begin with "table-" are calls of the second
+// handle, and those with "hand-" the same work by hand, with the same statements prepared once.
 
 #include <cstdio>
 #include <cstring>
@@ -11,6 +12,7 @@
 
 #include "support/Bench.h"
 #include "support/Records.h"
+#include "support/TableStore.h"
 
 namespace {
 
@@ -21,19 +23,32 @@ constexpr int kColumns = 8;
 constexpr int kCalls = 200;
 constexpr int kFirstCall = 20;  // calls before it, unmeasured, fill caches
 
+// Which tables have rows: the old handle's, or the second one's and the one by hand.
+enum Tables { kOld, kTable };
+
 // Everything that a work needs, made before it is measured.
 struct Stage {
-    Stage() : pHandle(EightMembers().Open(Db.Get())), vecRecords(EightMemberRecords(2 * kRows)) {
+    explicit Stage(Tables eNeeded)
+        : pHandle(EightMembers().Open(Db.Get())),
+          vecRecords(EightMemberRecords(2 * kRows)),
+          Second(eNeeded == kTable ? kRows : 0),
+          Third(eNeeded == kTable ? kRows : 0) {
         Db.Exec("BEGIN");
         for (int i = 0; i < kRows; ++i) {
+            vecQueries.push_back(ById(i * 7 % kRows));
+        }
+        for (int i = 0; i < kRows && eNeeded == kOld; ++i) {
             Json::Value jStored;
             Require(pHandle->recCreate(vecRecords[static_cast<size_t>(i)], jStored) == 0, "fill");
-            vecQueries.push_back(ById(i * 7 % kRows));
         }
         vecResults.resize(kCalls);
         jChange["city"] = "Depot 100";
         jChange["level"] = 12;
         jChange["note"] = "moved to the yard";
+        RequireOk(Into.Start(Second.Own));
+        for (int i = 0; i < kCalls; ++i) {
+            vecParts.push_back(EightMemberPart(kRows + i));
+        }
     }
 
     Database Db;
@@ -43,6 +58,13 @@ struct Stage {
     Json::Value jChange;
     Json::Value jNoCondition;
     std::vector<Json::Value> vecResults;
+
+    // For the second handle, and for the work by hand.
+    TableStore Second;
+    TableStore Third;
+    ByHand Hand{Third.Db};
+    VORN_JSON_DB::Loader Into;
+    std::vector<Part> vecParts;
 };
 
 void Create(Stage& On, size_t i) {
@@ -66,8 +88,52 @@ void List(Stage& On, size_t i) {
     Require(On.vecResults[i].size() == kRows, "all rows are listed");
 }
 
+void TableCreate(Stage& On, size_t i) {
+    RequireOk(On.Second.Own.Create(On.vecRecords[kRows + i], &On.vecResults[i]));
+}
+
+void HandCreate(Stage& On, size_t i) {
+    On.Hand.Create(On.vecRecords[kRows + i], On.vecResults[i]);
+}
+
+void TableGet(Stage& On, size_t i) {
+    RequireOk(On.Second.Own.Get(On.vecQueries[i]["id"], On.vecResults[i]));
+}
+
+void HandGet(Stage& On, size_t i) {
+    On.Hand.Get(On.vecQueries[i]["id"].asInt(), On.vecResults[i]);
+}
+
+void TableFirst(Stage& On, size_t i) {
+    const auto Which = VORN_JSON_DB::Query().Where("id", On.vecQueries[i]["id"]).Limit(1);
+    RequireOk(On.Second.Own.First(Which, On.vecResults[i]));
+}
+
+void TableList(Stage& On, size_t i) {
+    RequireOk(On.Second.Own.List({}, On.vecResults[i]));
+    Require(On.vecResults[i].size() == kRows, "all rows are listed");
+}
+
+void HandList(Stage& On, size_t i) {
+    On.Hand.List(On.vecResults[i]);
+    Require(On.vecResults[i].size() == kRows, "all rows are listed");
+}
+
+void TableLoad(Stage& On, size_t i) {
+    Load(On.Into, On.vecParts[i]);
+}
+
+void TableLoadJson(Stage& On, size_t i) {
+    RequireOk(On.Into.Add(On.vecRecords[kRows + i]));
+}
+
+void HandLoad(Stage& On, size_t i) {
+    On.Hand.Load(On.vecParts[i]);
+}
+
 struct Work {
     const char* szName;
+    Tables eNeeded;
     void (*pfnCall)(Stage& On, size_t i);
     int nFirst;
     int nLast;
@@ -75,11 +141,21 @@ struct Work {
 };
 
 constexpr Work kWorks[] = {
-    {"create", Create, kFirstCall, kCalls, kCalls - kFirstCall},
-    {"get", Get, kFirstCall, kCalls, kCalls - kFirstCall},
-    {"update", Update, kFirstCall, kCalls, kCalls - kFirstCall},
-    {"delete", Delete, kFirstCall, kCalls, kCalls - kFirstCall},
-    {"list", List, 1, 3, 2 * kRows* kColumns},
+    {"create", kOld, Create, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"get", kOld, Get, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"update", kOld, Update, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"delete", kOld, Delete, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"list", kOld, List, 1, 3, 2 * kRows* kColumns},
+    {"table-create", kTable, TableCreate, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"hand-create", kTable, HandCreate, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"table-get", kTable, TableGet, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"table-first", kTable, TableFirst, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"hand-get", kTable, HandGet, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"table-list", kTable, TableList, 1, 3, 2 * kRows* kColumns},
+    {"hand-list", kTable, HandList, 1, 3, 2 * kRows* kColumns},
+    {"table-load", kTable, TableLoad, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"table-json", kTable, TableLoadJson, kFirstCall, kCalls, kCalls - kFirstCall},
+    {"hand-load", kTable, HandLoad, kFirstCall, kCalls, kCalls - kFirstCall},
 };
 
 // The counting goes by this function's name.
@@ -94,7 +170,7 @@ __attribute__((noinline, noclone)) void MeasuredWork(Stage& On, const Work& One)
 int main(int argc, char** argv) {
     for (const Work& One : kWorks) {
         if (argc == 2 && std::strcmp(One.szName, argv[1]) == 0) {
-            Stage On;
+            Stage On(One.eNeeded);
             for (int i = 0; i < One.nFirst; ++i) {
                 One.pfnCall(On, static_cast<size_t>(i));
             }
@@ -103,6 +179,6 @@ int main(int argc, char** argv) {
             return 0;
         }
     }
-    std::fprintf(stderr, "usage: vornjsondb_instructions create|get|update|delete|list\n");
+    std::fprintf(stderr, "usage: vornjsondb_instructions WORK\n");
     return 2;
 }

@@ -3,7 +3,7 @@
 import subprocess
 
 from results import series
-from tables import PEERS, peer_times
+from tables import peer_times
 
 HEAD = """
 set terminal svg size 760,420 font 'sans-serif,13' background '#ffffff'
@@ -68,11 +68,11 @@ def texts(entries, file):
           "'256 KiB' 262144, '1 MiB' 1048576)")
 
 
-def peers(entries, file):
-    """Bars of time in multiples of ours."""
+def peers(entries, titles, file):
+    """Bars of time in multiples of the first one of titles, {benchmark: title}."""
     works = ["Create", "Get", "List"]
-    times = {work: peer_times(entries, work) for work in works}
-    names = [name for name in PEERS if name in times["Create"]]
+    times = {work: peer_times(entries, work, titles) for work in works}
+    names = [name for name in titles if name in times["Create"]]
     script = HEAD.format(file=file, title="Time in multiples of this library (less is better)", x="", y="")
     script += """
 set terminal svg size 760,560 font 'sans-serif,13' background '#ffffff'
@@ -85,18 +85,18 @@ set ytics out scale 0
 set arrow from 1, graph 0 to 1, graph 1 nohead lc rgb '#444444' front
 """
     colours = ["#1f5fa8", "#7fb0dd", "#c8641b"]
-    titles = ["create", "fetch", "list"]
+    legend = ["create", "fetch", "list"]
     plots = []
     for i, work in enumerate(works):
-        rows = [(n + (i - 1) * 0.25, times[work][name] / times[work]["VornJsonDb"])
+        rows = [(n + (i - 1) * 0.25, times[work][name] / times[work][names[0]])
                 for n, name in enumerate(names)]
         script += block(f"data{i}", rows)
         plots.append(f"$data{i} using (0.5*$2):1:(0.5*$2):(0.11) with boxxyerror lc rgb '{colours[i]}' "
-                     f"title '{titles[i]}'")
-    ticks = ", ".join(f"'{label(name)}' {n}" for n, name in enumerate(names))
+                     f"title '{legend[i]}'")
+    ticks = ", ".join(f"'{label(titles[name])}' {n}" for n, name in enumerate(names))
     draw(script + f"set ytics ({ticks})\nplot " + ", ".join(plots) + "\n")
 
 
-def label(name):
+def label(title):
     """One quote would end gnuplot's text."""
-    return PEERS[name].replace("*", "").replace("'", "''").replace("sqlite3 C interface", "C interface")
+    return title.replace("*", "").replace("'", "''")

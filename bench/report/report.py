@@ -26,13 +26,16 @@ def main(results, docs):
         "machine": machine.describe(results),
         "ratios": tables.ratios(ratios),
         "sizes": tables.sizes(os.path.join(results, "sizes.txt")),
-        "peers": tables.peers(peers),
+        "peers": tables.peers(peers, tables.PEERS),
+        "peers-prepared-once": tables.peers(peers, tables.PEERS_PREPARED_ONCE),
         "rows": tables.scale_rows(scale) + "\n\n" + tables.flatness(scale),
         "columns": tables.scale_columns(scale),
         "texts": tables.scale_texts(scale),
         "tables": tables.scale_tables(scale),
         "contention": tables.contention(scale),
         "instructions": tables.instructions(os.path.join(results, "instructions.txt")),
+        "instructions-to-hand": tables.instructions_to_hand(
+            os.path.join(results, "instructions.txt")),
     }
     report = os.path.join(docs, "performance.md")
     figures.write(report, contents)
@@ -42,7 +45,9 @@ def main(results, docs):
     plots.columns(scale, os.path.join(folder, "columns.svg"))
     plots.rows(scale, os.path.join(folder, "rows.svg"))
     plots.texts(scale, os.path.join(folder, "texts.svg"))
-    plots.peers(peers, os.path.join(folder, "peers.svg"))
+    plots.peers(peers, tables.PEERS, os.path.join(folder, "peers.svg"))
+    plots.peers(peers, tables.PEERS_PREPARED_ONCE,
+                os.path.join(folder, "peers-prepared-once.svg"))
     print(f"wrote {report}")
 
 

@@ -2,15 +2,24 @@
 
 from results import columns, series
 
+# Both begin with this library.
 PEERS = {
     "VornJsonDb": "**vornjsondb**",
-    "CapiPreparedEachTime": "sqlite3 C interface, prepared each time",
-    "CapiPreparedOnce": "sqlite3 C interface, prepared once",
+    "CapiPreparedEachTime": "sqlite3 C interface",
     "JsonFunctions": "SQLite's JSON functions + JsonCpp",
     "SqliteCpp": "SQLiteCpp + JsonCpp",
     "Soci": "SOCI + JsonCpp",
     "PocoData": "Poco::Data::SQLite + JsonCpp",
     "QtSql": "Qt 5 SQL + QJson",
+}
+PEERS_PREPARED_ONCE = {
+    "VornJsonDbTable": "**vornjsondb, Table**",
+    "CapiPreparedOnce": "sqlite3 C interface",
+    "JsonFunctionsPreparedOnce": "SQLite's JSON functions + JsonCpp",
+    "SqliteCppPreparedOnce": "SQLiteCpp + JsonCpp",
+    "SociPreparedOnce": "SOCI + JsonCpp",
+    "PocoDataPreparedOnce": "Poco::Data::SQLite + JsonCpp",
+    "QtSqlPreparedOnce": "Qt 5 SQL + QJson",
 }
 PEER_ROWS = 20000
 
@@ -55,19 +64,22 @@ def ratios(rows):
 
 
 def sizes(path):
-    goals = {"armhf-O2": 60, "armhf-Os": 50}  # others are printed only
+    goals = {"armhf-O2": 60, "armhf-Os": 50, "armhf-O2-table": 96, "armhf-Os-table": 96}
+    titles = {"": "stripped library", "table": "small program, Table's part"}
     body = []
     for build, size in columns(path):
-        machine, level = build.split("-")
+        machine, level, part = (build + "-").split("-")[:3]
         kib = int(size) / 1024
-        body.append([f"{machine}, -{level}", f"{kib:.1f} KiB"] + goal_cells(kib, goals.get(build, 0)))
-    return markdown(["stripped library", "size", "goal (KiB)", ""], body)
+        body.append([titles[part], f"{machine}, -{level}", f"{kib:.1f} KiB"]
+                    + goal_cells(kib, goals.get(build, 0)))
+    return markdown(["", "built for", "size", "goal (KiB)", ""], sorted(body, key=lambda row: row[0],
+                                                                       reverse=True))
 
 
-def peer_times(entries, work):
+def peer_times(entries, work, names):
     """Median time of a call (of a row, for a list) of each peer, in nanoseconds."""
     found = {}
-    for name in PEERS:
+    for name in names:
         entry = entries.get((f"{work}<{name}>", None))
         if entry is not None:
             scale = {"ns": 1.0, "us": 1e3, "ms": 1e6}[entry["time_unit"]]
@@ -75,16 +87,18 @@ def peer_times(entries, work):
     return found
 
 
-def peers(entries):
+def peers(entries, names):
+    """names: {benchmark: title}, the one that all are compared with first."""
     works = ["Create", "Get", "List"]
-    times = {work: peer_times(entries, work) for work in works}
+    times = {work: peer_times(entries, work, names) for work in works}
+    ours = next(iter(names))
     body = []
-    for name, title in PEERS.items():
+    for name, title in names.items():
         if name not in times["Create"]:
             continue
         row = [title]
         for work in works:
-            ratio = times[work][name] / times[work]["VornJsonDb"]
+            ratio = times[work][name] / times[work][ours]
             row += [amount(times[work][name], "ns"), f"{ratio:.2f}"]
         body.append(row)
     return markdown(["", "create", "to ours", "fetch", "to ours", "list, per row", "to ours"], body)
@@ -149,6 +163,25 @@ def contention(entries):
 def instructions(path):
     header = ["", "in all", "vornjsondb", "JsonCpp", "SQLite", "C and C++ libraries"]
     titles = {"create": "recCreate", "get": "recGetOne", "update": "recUpdateByFilter",
-              "delete": "recDelete", "list": "recList, one cell"}
+              "delete": "recDelete", "list": "recList, one cell",
+              "table-create": "Table::Create with the stored row", "table-get": "Table::Get",
+              "table-first": "Table::First by key", "table-list": "Table::List, one cell",
+              "table-load": "Loader, by setters", "table-json": "Loader, from Json::Value",
+              "hand-create": "by hand: create with the stored row", "hand-get": "by hand: get",
+              "hand-list": "by hand: list, one cell", "hand-load": "by hand: bind loop"}
     body = [[titles[row[0]]] + [f"{int(cell):,}" for cell in row[1:]] for row in columns(path)]
     return markdown(header, body)
+
+
+def instructions_to_hand(path):
+    """The second handle's counts in multiples of the same work by hand."""
+    totals = {row[0]: int(row[1]) for row in columns(path)}
+    pairs = [("Table::Create with the stored row", "table-create", "hand-create"),
+             ("Table::Get", "table-get", "hand-get"),
+             ("Table::First by key", "table-first", "hand-get"),
+             ("Table::List, one cell", "table-list", "hand-list"),
+             ("Loader, by setters", "table-load", "hand-load"),
+             ("Loader, from Json::Value", "table-json", "hand-load")]
+    body = [[title, f"{totals[ours]:,}", f"{totals[hand]:,}", f"{totals[ours] / totals[hand]:.2f}"]
+            for title, ours, hand in pairs]
+    return markdown(["", "instructions", "by hand", "ratio"], body)
