@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "../src/base/JsonMemory.h"
+#include "../src/base/PlainJson.h"
 #include "FindingCodes.h"
 #include "LoaderParts.h"
 
@@ -78,6 +79,18 @@ std::unique_ptr<Json::CharReader> StrictReader() {
     return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
 }
 
+// Most lists and objects are plain, and the short way reads them: it wants a NUL behind the text.
+bool Parse(Parts& Of, int nMember, std::string_view strJson, Json::Value& jOut) {
+    const std::string_view strCopy = Copied(Of, nMember, strJson.data(), strJson.size());
+    if (vornjsondb::ReadPlainJson(strCopy.data(), strCopy.size(), jOut)) {
+        return true;
+    }
+    if (!Of.pReader) {
+        Of.pReader = StrictReader();
+    }
+    return Of.pReader->parse(strCopy.data(), strCopy.data() + strCopy.size(), &jOut, nullptr);
+}
+
 }  // namespace
 
 int Loader::MemberIndex(std::string_view strMember) const {
@@ -133,14 +146,10 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
     m_pParts->mapWrong.erase(nPlace);
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);
-    const char* const pEnd = strJson.data() + strJson.size();
     FindingList vecFindings;
     try {
-        if (!m_pParts->pReader) {
-            m_pParts->pReader = StrictReader();
-        }
         Json::Value jValue;
-        if (!m_pParts->pReader->parse(strJson.data(), pEnd, &jValue, nullptr)) {
+        if (!Parse(*m_pParts, nMember, strJson, jValue)) {
             Report(
                 vecFindings, FindingCode::kWrongKind, strPath,
                 "member " + Into.strQuoted + ": " + vornjsondb::ShownText(strJson) + " is no JSON");
