@@ -485,7 +485,12 @@ class Transaction {
     bool IsOpen() const { return m_pDb != nullptr; }
 
   private:
+    int Undo();
+    void Close();
+
     sqlite3* m_pDb = nullptr;
+    sqlite3_stmt* m_pUndo = nullptr;
+    sqlite3_stmt* m_pEnd = nullptr;
     bool m_blSavepoint = false;
     int m_nWaitMs = 0;
 };

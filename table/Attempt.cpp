@@ -34,15 +34,26 @@ Status InTransaction(sqlite3* pDb, const Status& Outcome) {
     return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
 }
 
+// How it ends is prepared before it begins: undoing must not need memory.
 int Whole::Begin() {
     m_blSavepoint = sqlite3_get_autocommit(m_pDb) == 0;
-    const int nResult = Run(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE");
+    int nResult = Take(m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", m_Undo);
+    if (nResult == SQLITE_OK) {
+        nResult = Take(m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", m_End);
+    }
+    Statement First;
+    if (nResult == SQLITE_OK) {
+        nResult = Take(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE", First);
+    }
+    if (nResult == SQLITE_OK) {
+        nResult = First.Finish();
+    }
     m_blOpen = nResult == SQLITE_OK;
     return nResult;
 }
 
 int Whole::Keep() {
-    const int nResult = Run(m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT");
+    const int nResult = m_End.Finish();
     m_blOpen = nResult != SQLITE_OK;
     return nResult;
 }
@@ -53,15 +64,15 @@ Whole::~Whole() {
     if (!m_blOpen || sqlite3_get_autocommit(m_pDb) != 0) {
         return;
     }
-    const char* szSql = m_blSavepoint ? "ROLLBACK TO vornjsondb; RELEASE vornjsondb" : "ROLLBACK";
-    sqlite3_exec(m_pDb, szSql, nullptr, nullptr, nullptr);
+    m_Undo.Finish();
+    if (m_blSavepoint) {
+        m_End.Finish();
+    }
 }
 
-int Whole::Run(const char* szSql) {
-    Statement Lent;
-    const int nResult = m_Kept.Take(
+int Whole::Take(const char* szSql, Statement& Lent) {
+    return m_Kept.Take(
         szSql, [szSql] { return std::string(szSql); }, Lent);
-    return nResult == SQLITE_OK ? Lent.Finish() : nResult;
 }
 
 }  // namespace vornjsondb

@@ -69,10 +69,11 @@ class Whole {
     int Keep();
 
   private:
-    int Run(const char* szSql);
+    int Take(const char* szSql, Statement& Lent);
 
     sqlite3* m_pDb;
     Statements& m_Kept;
+    Statement m_Undo, m_End;
     bool m_blOpen = false;
     bool m_blSavepoint = false;
 };

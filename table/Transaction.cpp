@@ -10,16 +10,10 @@ namespace {
 
 using vornjsondb::Doing;
 
-int Run(sqlite3* pDb, const char* szSql) {
-    return sqlite3_exec(pDb, szSql, nullptr, nullptr, nullptr);
-}
-
 // Takes no memory of its own, so that a destructor may call it.
-int Undo(sqlite3* pDb, bool blSavepoint) {
-    if (sqlite3_get_autocommit(pDb) != 0) {
-        return SQLITE_OK;  // a failure has undone it already, which is what was asked for
-    }
-    return Run(pDb, blSavepoint ? "ROLLBACK TO vornjsondb; RELEASE vornjsondb" : "ROLLBACK");
+int Finish(sqlite3_stmt* pStatement) {
+    sqlite3_step(pStatement);
+    return sqlite3_reset(pStatement);
 }
 
 Status NotOpen(const Doing& What) {
@@ -30,10 +24,12 @@ Status NotOpen(const Doing& What) {
 
 Transaction::~Transaction() {
     if (IsOpen()) {
-        Undo(m_pDb, m_blSavepoint);
+        Undo();
+        Close();
     }
 }
 
+// How it ends is prepared before it begins: undoing must not need memory.
 Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     const Doing What{"begin a transaction", nullptr};
     if (IsOpen() || pDb == nullptr) {
@@ -42,16 +38,44 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     }
     m_nWaitMs = nWaitMs;
     m_blSavepoint = sqlite3_get_autocommit(pDb) == 0;
+    vornjsondb::OwnStatement pUndo, pEnd, pFirst;
     const char* szBegin = eMode == Mode::kImmediate ? "BEGIN IMMEDIATE" : "BEGIN";
-    const char* szSql = m_blSavepoint ? "SAVEPOINT vornjsondb" : szBegin;
+    int nPrepared =
+        vornjsondb::Prepare(pDb, m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", pUndo);
+    if (nPrepared == SQLITE_OK) {
+        nPrepared = vornjsondb::Prepare(pDb, m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", pEnd);
+    }
+    if (nPrepared == SQLITE_OK) {
+        nPrepared =
+            vornjsondb::Prepare(pDb, m_blSavepoint ? "SAVEPOINT vornjsondb" : szBegin, pFirst);
+    }
+    if (nPrepared != SQLITE_OK) {
+        return vornjsondb::FailBySqlite(pDb, nPrepared, What);
+    }
     return vornjsondb::Attempt(pDb, nWaitMs, [&]() -> Status {
-        const int nResult = Run(pDb, szSql);
+        const int nResult = Finish(pFirst.get());
         if (nResult != SQLITE_OK) {
             return vornjsondb::FailBySqlite(pDb, nResult, What);
         }
         m_pDb = pDb;
+        m_pUndo = pUndo.release();
+        m_pEnd = pEnd.release();
         return {};
     });
+}
+
+int Transaction::Undo() {
+    if (sqlite3_get_autocommit(m_pDb) != 0) {
+        return SQLITE_OK;  // a failure has undone it already, which is what was asked for
+    }
+    const int nResult = Finish(m_pUndo);
+    return nResult == SQLITE_OK && m_blSavepoint ? Finish(m_pEnd) : nResult;
+}
+
+void Transaction::Close() {
+    sqlite3_finalize(m_pUndo);
+    sqlite3_finalize(m_pEnd);
+    m_pDb = nullptr;
 }
 
 // A reader that stands in the way of a COMMIT goes away by itself, so waiting helps although a
@@ -62,19 +86,18 @@ Status Transaction::Commit() {
         return NotOpen(What);
     }
     if (sqlite3_get_autocommit(m_pDb) != 0) {
-        m_pDb = nullptr;
+        Close();
         const Status Gone =
             vornjsondb::Fail(StatusCode::kMisuse, What, "an earlier failure has undone it");
         return vornjsondb::Amended(Gone, Retry::kTransaction, "");
     }
-    const char* szSql = m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT";
-    int nResult = Run(m_pDb, szSql);
+    int nResult = Finish(m_pEnd);
     vornjsondb::Patience Left(m_nWaitMs);
     while (nResult == SQLITE_BUSY && !m_blSavepoint && Left.Wait()) {
-        nResult = Run(m_pDb, szSql);
+        nResult = Finish(m_pEnd);
     }
     if (nResult == SQLITE_OK) {
-        m_pDb = nullptr;
+        Close();
         return {};
     }
     const Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
@@ -88,10 +111,11 @@ Status Transaction::Rollback() {
     if (!IsOpen()) {
         return NotOpen(What);
     }
-    sqlite3* pDb = m_pDb;
-    m_pDb = nullptr;
-    const int nResult = Undo(pDb, m_blSavepoint);
-    return nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(pDb, nResult, What);
+    const int nResult = Undo();
+    const Status Outcome =
+        nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(m_pDb, nResult, What);
+    Close();
+    return Outcome;
 }
 
 }  // namespace VORN_JSON_DB
