@@ -32,6 +32,7 @@ constexpr size_t kChain = 8;
 
 std::vector<const Node*> NodesOf(const std::vector<Condition>& vecParts) {
     std::vector<const Node*> vecNodes;
+    vecNodes.reserve(vecParts.size());
     for (const Condition& Part : vecParts) {
         vecNodes.push_back(&Part.Root());
     }

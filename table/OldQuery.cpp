@@ -95,7 +95,7 @@ namespace VORN_JSON_DB {
 
 Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQuery) try {
     constexpr char kDo[] = "write an old query for";
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
     if (!State.Ok()) {
         return State;
     }
@@ -106,14 +106,14 @@ Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQue
     const auto eUse =
         eCall == OldCall::kRead ? vornjsondb::QueryUse::kRead : vornjsondb::QueryUse::kChange;
     Plan.Resolve(Which, eUse, vecFindings);
-    const Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
+    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
     if (!Checked.Ok()) {
         return Checked;
     }
     std::string strCondition(Plan.Condition());
     std::string strTail;
     Plan.AppendTail(strTail);
-    const Status Tried = vornjsondb::Try(From, strCondition, strTail, What);
+    Status Tried = vornjsondb::Try(From, strCondition, strTail, What);
     if (!Tried.Ok()) {
         return Tried;
     }

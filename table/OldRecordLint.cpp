@@ -41,7 +41,7 @@ std::string TextOf(const Json::Value& jText) {
     const char* pBegin = nullptr;
     const char* pEnd = nullptr;
     jText.getString(&pBegin, &pEnd);
-    return std::string(pBegin, pEnd);
+    return {pBegin, pEnd};
 }
 
 class OldRecordLint {
@@ -127,12 +127,13 @@ class OldRecordLint {
 
     void LintText(const std::string& strMember, const std::string& strText,
                   const std::string& strPath, size_t nLater) {
-        if (strText.find('\0') != std::string::npos) {
+        const std::string strStored = strText.substr(0, strText.find('\0'));
+        if (strStored.size() < strText.size()) {
             Report(m_vecFindings, FindingCode::kNulCut, strPath,
-                   strMember + ": " + ShownText(strText.c_str()) +
+                   strMember + ": " + ShownText(strStored) +
                        " is stored, and what follows the NUL byte is not");
         }
-        LintPercents(strMember, strText.c_str(), strPath, nLater);
+        LintPercents(strMember, strStored, strPath, nLater);
     }
 
     void LintJson(const std::string& strMember, const MemberType& Type, const Json::Value& jValue,

@@ -32,7 +32,7 @@ Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& j
 std::string_view TextOf(const Json::Value& jText) {
     MemberName Text = {};
     jText.getString(&Text.pBegin, &Text.pEnd);
-    return std::string_view(Text.pBegin, Text.Length());
+    return Text.View();
 }
 
 ValueKind KindOf(const BoundValue& Value) {

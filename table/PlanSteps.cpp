@@ -11,15 +11,12 @@ namespace {
 
 // Whether the step is of that kind and of the table. Releases before 3.36 write "SCAN TABLE task".
 bool IsOf(const std::string& strStep, const std::string& strKind, const std::string& strTable) {
-    const size_t nBegin = strStep.find_first_not_of(' ');
-    for (const char* szWord : {" ", " TABLE "}) {
-        const std::string strHead = strKind + szWord + strTable;
-        if (strStep.compare(nBegin, std::string::npos, strHead) == 0 ||
-            strStep.compare(nBegin, strHead.size() + 1, strHead + " ") == 0) {
-            return true;
-        }
-    }
-    return false;
+    const std::string strFound = strStep.substr(strStep.find_first_not_of(' ')) + " ";
+    const auto BeginsWith = [&strFound](const std::string& strHead) {
+        return strFound.compare(0, strHead.size(), strHead) == 0;
+    };
+    return BeginsWith(strKind + " " + strTable + " ") ||
+           BeginsWith(strKind + " TABLE " + strTable + " ");
 }
 
 }  // namespace

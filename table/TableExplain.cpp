@@ -69,7 +69,7 @@ Status CheckOne(Parts& From, const Doing& What, const std::string& strSql) {
 
 Status Table::Explain(const Query& Which, Plan& Found) {
     constexpr char kDo[] = "explain a query of";
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
     if (!State.Ok()) {
         return State;
     }
@@ -78,14 +78,14 @@ Status Table::Explain(const Query& Which, Plan& Found) {
     Plan Made;
     vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
     Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
-    const Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
+    Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
     if (!Checked.Ok()) {
         return Checked;
     }
     Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns());
     Resolved.AppendWhere(Made.strSql);
     Resolved.AppendTail(Made.strSql);
-    const Status Outcome = ReadPlan(From, What, Made);
+    Status Outcome = ReadPlan(From, What, Made);
     if (!Outcome.Ok()) {
         return Outcome;
     }
@@ -101,7 +101,7 @@ Status Table::Explain(const Query& Which, Plan& Found) {
 
 Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
     constexpr char kDo[] = "explain a statement on";
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
     if (!State.Ok()) {
         return State;
     }

@@ -54,7 +54,7 @@ int RunPlan(Parts& Into, const std::vector<IndexTerm>& vecTerms, bool blUnique, 
 Status Table::CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                           std::string* pstrSql) {
     constexpr char kDo[] = "create an index on";
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
     if (!State.Ok()) {
         return State;
     }
@@ -62,12 +62,12 @@ Status Table::CreateIndex(const std::vector<std::string>& vecMembers, bool blUni
     const Doing What = Into.Do(kDo);
     FindingList vecFindings;
     const std::vector<IndexTerm> vecTerms = TermsOf(Into.Of, vecMembers, vecFindings);
-    const Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
+    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
     if (!Checked.Ok()) {
         return Checked;
     }
     IndexPlan Plan;
-    const Status Outcome =
+    Status Outcome =
         vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, [&]() -> Status {
             const int nResult = RunPlan(Into, vecTerms, blUnique, Plan);
             return nResult == SQLITE_OK ? Status()

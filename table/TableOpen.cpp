@@ -132,7 +132,7 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
     if (pDb == nullptr) {
         return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no connection");
     }
-    const Status Version =
+    Status Version =
         vornjsondb::CheckVersion(sqlite3_libversion_number(), sqlite3_libversion(), What);
     if (!Version.Ok()) {
         return Version;

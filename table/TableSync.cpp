@@ -40,12 +40,12 @@ Status RunAll(Parts& Into, const Doing& What, const std::vector<std::string>& ve
 
 Status Table::Lint(FindingList& vecFindings) {
     constexpr char kDo[] = "compare the definition with";
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
     if (!State.Ok()) {
         return State;
     }
     FindingList vecFound;
-    const Status Outcome = vornjsondb::Attempt(m_pParts->pDb, m_pParts->How.nWaitMs, [&] {
+    Status Outcome = vornjsondb::Attempt(m_pParts->pDb, m_pParts->How.nWaitMs, [&] {
         vecFound.clear();
         return Compare(*m_pParts, m_pParts->Do(kDo), nullptr, vecFound);
     });
@@ -60,7 +60,7 @@ Status Table::Lint(FindingList& vecFindings) {
 Status Table::Sync(SyncMode eMode, SyncReport& Report) {
     constexpr char kDo[] = "bring the definition into";
     const bool blChange = eMode == SyncMode::kChange;
-    const Status State = vornjsondb::CheckState(m_pParts.get(), kDo, blChange);
+    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, blChange);
     if (!State.Ok()) {
         return State;
     }
@@ -72,7 +72,7 @@ Status Table::Sync(SyncMode eMode, SyncReport& Report) {
         const Status Outcome = Compare(Into, What, &Found.vecStatements, Found.vecFindings);
         return Outcome.Ok() && blChange ? RunAll(Into, What, Found.vecStatements) : Outcome;
     };
-    const Status Outcome =
+    Status Outcome =
         blChange ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnSteps)
                  : vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, fnSteps);
     if (Outcome.Ok()) {

@@ -112,7 +112,7 @@ Status Transaction::Rollback() {
         return NotOpen(What);
     }
     const int nResult = Undo();
-    const Status Outcome =
+    Status Outcome =
         nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(m_pDb, nResult, What);
     Close();
     return Outcome;
