@@ -1,5 +1,6 @@
 #include "HostileTexts.h"
 
+#include <cstdlib>
 #include <iterator>
 
 namespace VORN_JSON_DB {
@@ -472,7 +473,14 @@ std::vector<std::string> HostileTexts() {
     vecTexts.push_back(std::string(70000, '%'));
     vecTexts.push_back(std::string(70000, '('));
     vecTexts.push_back(std::string(1000, '[') + std::string(1000, ']'));
-    return vecTexts;
+    // An emulated machine takes every Nth.
+    const char* szStep = std::getenv("VORNJSONDB_TEXT_STEP");
+    const size_t nStep = szStep != nullptr ? std::strtoul(szStep, nullptr, 10) : 1;
+    std::vector<std::string> vecTaken;
+    for (size_t i = 0; i < vecTexts.size(); i += nStep) {
+        vecTaken.push_back(std::move(vecTexts[i]));
+    }
+    return vecTaken;
 }
 
 }  // namespace VORN_JSON_DB
