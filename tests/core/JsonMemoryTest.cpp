@@ -110,6 +110,8 @@ TEST_F(JsonMemoryTest, MemberCopyThrowsBadAllocOnly) {
 TEST_F(JsonMemoryTest, DefaultsThrowBadAllocOnly) {
     m_jDefinition["t"]["member"]["name"]["cppDefaultValue"] = m_strLong;
     OpenDefinition(m_jDefinition, kCreateItem);
+    Json::Value jFirst;  // The types are looked up, so that only the defaults ask for memory.
+    EXPECT_EQ(m_pHandle->fillDefaultValue(jFirst, false), 0);
     EXPECT_GT(ThrowsOutOf([&] {
                   Json::Value jRecord;
                   m_pHandle->fillDefaultValue(jRecord, false);
