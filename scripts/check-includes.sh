@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Fails when an include of src/ or table/ points against the order of the layers. Prints the
+# Fails when an include of src/, table/ or cli/ points against the order of the layers. Prints the
 # offenders.
 #
 #    scripts/check-includes.sh [ROOT-FOLDER]
@@ -8,7 +8,7 @@ cd "${1:-"$(dirname "$0")/.."}"
 root=$(pwd -P)
 
 # What each layer may include beside itself, the log line and the public headers: the folders of
-# src/, and table/ beside them.
+# src/, and table/ and cli/ beside them.
 declare -A allowed=(
     [base]=""
     [schema]="base"
@@ -17,6 +17,7 @@ declare -A allowed=(
     [core]="schema base"
     [records]="sql core schema base"
     [table]="schema base"
+    [cli]="table schema base"
 )
 # For all of src/; the second handle logs nothing.
 log_line=src/core/LogLine.h
@@ -59,7 +60,7 @@ while IFS=: read -r file line text; do
     elif [[ $text =~ \"([^\"]+)\" ]]; then
         check_include "$file" "$line" "${BASH_REMATCH[1]}"
     fi
-done < <(find src table -type f \( -name '*.cpp' -o -name '*.h' \) -print0 | sort -z |
+done < <(find src table cli -type f \( -name '*.cpp' -o -name '*.h' \) -print0 | sort -z |
     xargs -0 grep -nH -E '^[[:space:]]*#[[:space:]]*include')
 
 if ((offenders > 0)); then

@@ -1,0 +1,154 @@
+#include "Command.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <charconv>
+#include <cstdio>
+#include <cstring>
+#include <system_error>
+
+#include "../table/Nearest.h"
+#include "JsonCells.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+struct ExitRow {
+    StatusCode eCode;
+    int nExit;
+};
+
+// kRefused is the caller's to say. What is not here is unexpected.
+constexpr ExitRow kExits[] = {
+    {StatusCode::kNotFound, kExitNotFound},  {StatusCode::kDuplicate, kExitDuplicate},
+    {StatusCode::kConstraint, kExitBadData}, {StatusCode::kLocked, kExitLocked},
+    {StatusCode::kReadOnly, kExitIo},        {StatusCode::kDiskFull, kExitIo},
+    {StatusCode::kIoError, kExitIo},         {StatusCode::kCorrupt, kExitIo},
+    {StatusCode::kNotADatabase, kExitIo},    {StatusCode::kInterrupted, kExitInterrupted},
+};
+
+void CheckOutput(bool blWritten) {
+    if (!blWritten) {
+        Fail(kExitIo, std::string("standard output: cannot write: ") + std::strerror(errno) +
+                          "; what was written so far is not all");
+    }
+}
+
+}  // namespace
+
+void Fail(int nExit, std::string strLine) {
+    for (char& c : strLine) {
+        c = c == '\n' || c == '\r' ? ' ' : c;
+    }
+    throw Error{nExit, std::move(strLine)};
+}
+
+int ExitOf(StatusCode eCode, int nRefused) {
+    if (eCode == StatusCode::kRefused) {
+        return nRefused;
+    }
+    for (const ExitRow& Row : kExits) {
+        if (Row.eCode == eCode) {
+            return Row.nExit;
+        }
+    }
+    return kExitUnexpected;
+}
+
+std::string LineOf(const Status& Outcome) {
+    for (const Finding& Found : Outcome.Findings()) {
+        if (Found.eSeverity == Severity::kError && !Found.strRemedy.empty()) {
+            return Outcome.Message() + "; " + Found.strRemedy;
+        }
+    }
+    return Outcome.Message();
+}
+
+void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
+    if (!Outcome.Ok()) {
+        Fail(ExitOf(Outcome.Code(), nRefused), strWhere + ": " + LineOf(Outcome));
+    }
+}
+
+std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames) {
+    const std::string strNearest = vornjsondb::Nearest(strWord, vecNames);
+    return strNearest.empty() ? "" : "; did you mean \"" + strNearest + "\"?";
+}
+
+std::vector<std::string> Context::WordsFrom(std::size_t nFirst) const {
+    if (nFirst >= vecWords.size()) {
+        return {};
+    }
+    return {vecWords.begin() + static_cast<std::ptrdiff_t>(nFirst), vecWords.end()};
+}
+
+std::string Context::Text(const char* szOption, const std::string& strDefault) const {
+    const auto itOption = mapOptions.find(szOption);
+    return itOption == mapOptions.end() ? strDefault : itOption->second.back();
+}
+
+std::vector<std::string> Context::List(const char* szOption) const {
+    const auto itOption = mapOptions.find(szOption);
+    return itOption == mapOptions.end() ? std::vector<std::string>() : itOption->second;
+}
+
+std::vector<std::string> Context::Names(const char* szOption) const {
+    std::vector<std::string> vecNames;
+    for (const std::string& strList : List(szOption)) {
+        std::size_t nBegin = 0;
+        while (nBegin <= strList.size()) {
+            const std::size_t nEnd = std::min(strList.find(',', nBegin), strList.size());
+            vecNames.push_back(strList.substr(nBegin, nEnd - nBegin));
+            nBegin = nEnd + 1;
+        }
+    }
+    return vecNames;
+}
+
+std::int64_t Context::Whole(const char* szOption, std::int64_t nDefault) const {
+    if (!Has(szOption)) {
+        return nDefault;
+    }
+    const std::string strText = Text(szOption);
+    std::int64_t nValue = 0;
+    const auto Read = std::from_chars(strText.data(), strText.data() + strText.size(), nValue);
+    if (Read.ec != std::errc() || Read.ptr != strText.data() + strText.size() || nValue < 0) {
+        Fail(kExitUsage,
+             std::string(szOption) + ": \"" + strText + "\" is no whole number; give one from 0");
+    }
+    return nValue;
+}
+
+int Context::WaitMs() const {
+    constexpr std::int64_t kLongestMs = 24LL * 60 * 60 * 1000;
+    return static_cast<int>(std::min(Whole("--wait", 5000), kLongestMs));
+}
+
+void Context::Say(const std::string& strLine) const {
+    if (!Quiet()) {
+        std::fprintf(stderr, "%s\n", strLine.c_str());
+    }
+}
+
+void Context::Report(const std::string& strLine, const Json::Value& jResult) const {
+    if (Json()) {
+        Put(CompactJson(jResult) + "\n");
+    } else {
+        Say(strLine);
+    }
+}
+
+void Put(const char* pBytes, std::size_t nBytes) {
+    CheckOutput(std::fwrite(pBytes, 1, nBytes, stdout) == nBytes);
+}
+
+void Put(const std::string& strText) {
+    Put(strText.data(), strText.size());
+}
+
+void FlushOutput() {
+    CheckOutput(std::fflush(stdout) == 0);
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,148 @@
+#include "Conditions.h"
+
+#include <algorithm>
+
+#include "Database.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+std::string TypeOf(const Table& Of, const std::string& strMember) {
+    const Json::Value& jMembers = Of.Definition()[Of.Name()]["member"];
+    return jMembers.isMember(strMember) ? jMembers[strMember]["cpptype"].asString() : "";
+}
+
+bool IsMember(const Table& Of, const std::string& strMember) {
+    return std::binary_search(Of.Members().begin(), Of.Members().end(), strMember);
+}
+
+// A path begins with a member's name.
+std::string BaseOf(const Table& Of, const std::string& strPath) {
+    return IsMember(Of, strPath) ? strPath : strPath.substr(0, strPath.find_first_of(".["));
+}
+
+void CheckMember(const Table& Of, const std::string& strMember) {
+    if (!IsMember(Of, BaseOf(Of, strMember))) {
+        const std::string strHint = NearestHint(strMember, Of.Members());
+        Fail(kExitUsage, "table \"" + Of.Name() + "\" has no member \"" + strMember + "\"" +
+                             (strHint.empty() ? "; see vornjsondb schema" : strHint));
+    }
+}
+
+// A word such as 5, true, null or {"a":1}; all else is text that came without its quotes.
+bool LooksLikeJson(const std::string& strWord) {
+    if (strWord == "true" || strWord == "false" || strWord == "null") {
+        return true;
+    }
+    const std::size_t nDigit = strWord.compare(0, 1, "-") == 0 ? 1 : 0;
+    const bool blDigit =
+        strWord.size() > nDigit && strWord[nDigit] >= '0' && strWord[nDigit] <= '9';
+    const bool blNumber =
+        blDigit && strWord.find_first_not_of("0123456789+-.eE") == std::string::npos &&
+        (strWord[nDigit] != '0' || strWord.size() == nDigit + 1 || strWord[nDigit + 1] == '.');
+    return blNumber || strWord.find_first_of("{[\"") == 0;
+}
+
+Json::Value TypedValue(const Table& Of, const std::string& strMember, const std::string& strText) {
+    const std::string strType = TypeOf(Of, strMember);
+    if (strType == "string") {
+        return strText;
+    }
+    if (strType == "bool" && (strText == "0" || strText == "1")) {
+        return strText == "1";
+    }
+    return LooksLikeJson(strText) ? ParseJson(strText, strMember) : Json::Value(strText);
+}
+
+}  // namespace
+
+bool IsAssignment(const std::string& strWord) {
+    return strWord.find('=') != std::string::npos;
+}
+
+Assignment ParseAssignment(const Table& Of, const std::string& strWord) {
+    // The first "=" that ends a member's name; a name may hold one itself.
+    std::size_t nEquals = strWord.find('=');
+    for (std::size_t nAt = nEquals; nAt != std::string::npos; nAt = strWord.find('=', nAt + 1)) {
+        if (IsMember(Of, strWord.substr(0, nAt))) {
+            nEquals = nAt;
+            break;
+        }
+    }
+    if (nEquals == std::string::npos) {
+        Fail(kExitUsage, "\"" + strWord + "\" sets no member; write member=value");
+    }
+    const std::string strMember = strWord.substr(0, nEquals);
+    const std::string strText = strWord.substr(nEquals + 1);
+    const bool blJson = !strMember.empty() && strMember.back() == ':' && !IsMember(Of, strMember);
+    if (blJson) {
+        const std::string strName = strMember.substr(0, strMember.size() - 1);
+        CheckMember(Of, strName);
+        return {strName, ParseJson(strText, strName)};
+    }
+    CheckMember(Of, strMember);
+    return {strMember, TypedValue(Of, strMember, strText)};
+}
+
+Json::Value ParseAssignments(const Table& Of, const std::vector<std::string>& vecWords) {
+    Json::Value jMembers(Json::objectValue);
+    for (const std::string& strWord : vecWords) {
+        Assignment Parsed = ParseAssignment(Of, strWord);
+        if (!IsMember(Of, Parsed.strMember)) {
+            Fail(kExitUsage, "\"" + Parsed.strMember + "\" is part of a member; set it whole");
+        }
+        jMembers[Parsed.strMember] = std::move(Parsed.jValue);
+    }
+    return jMembers;
+}
+
+Json::Value ParseKey(const Table& Of, const std::string& strWord) {
+    const std::vector<std::string>& vecKey = Of.KeyMembers();
+    if (vecKey.empty()) {
+        Fail(kExitUsage, "table \"" + Of.Name() + "\" has no key; select by --where");
+    }
+    if (vecKey.size() == 1) {
+        return TypedValue(Of, vecKey[0], strWord);
+    }
+    const Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"");
+    for (const std::string& strMember : vecKey) {
+        if (!jKey.isObject() || !jKey.isMember(strMember) || jKey.size() != vecKey.size()) {
+            Fail(kExitUsage, "key \"" + strWord + "\": it must be an object with just " +
+                                 std::to_string(vecKey.size()) + " members, one of them \"" +
+                                 strMember + "\"");
+        }
+    }
+    return jKey;
+}
+
+Query KeyQuery(const Table& Of, const Json::Value& jKey) {
+    Query Which;
+    for (const std::string& strMember : Of.KeyMembers()) {
+        Which.Where(strMember, Op::kEqual, Of.KeyMembers().size() == 1 ? jKey : jKey[strMember]);
+    }
+    return Which;
+}
+
+Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::string>& vecWords) {
+    Json::Value jQuery(Json::objectValue);
+    if (Call.Has("--where")) {
+        jQuery["where"] = ParseJson(Call.Text("--where"), "--where");
+    }
+    Query Which(jQuery);
+    for (const std::string& strWord : vecWords) {
+        Assignment Parsed = ParseAssignment(Of, strWord);
+        Which.Where(std::move(Parsed.strMember), Op::kEqual, std::move(Parsed.jValue));
+    }
+    for (std::string& strTerm : Call.Names("--sort")) {
+        Which.Sort(std::move(strTerm));
+    }
+    Which.Limit(Call.Whole("--limit", -1));
+    Which.Offset(Call.Whole("--offset", 0));
+    if (Call.Has("--members")) {
+        Which.Members(Call.Names("--members"));
+    }
+    return Which;
+}
+
+}  // namespace VORN_JSON_DB::Cli

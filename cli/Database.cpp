@@ -1,0 +1,248 @@
+#include "Database.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
+#include <sstream>
+
+#include "JsonCells.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+const char kKeptTable[] = "vornjsondb_definition";
+
+constexpr int kFlags[] = {SQLITE_OPEN_READONLY, SQLITE_OPEN_READWRITE,
+                          SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE};
+
+StatusCode CodeOf(int nSqlite) {
+    switch (nSqlite & 255) {
+        case SQLITE_BUSY:
+        case SQLITE_LOCKED:
+            return StatusCode::kLocked;
+        case SQLITE_CONSTRAINT:
+            return StatusCode::kConstraint;
+        case SQLITE_INTERRUPT:
+            return StatusCode::kInterrupted;
+        case SQLITE_CANTOPEN:
+        case SQLITE_CORRUPT:
+        case SQLITE_FULL:
+        case SQLITE_IOERR:
+        case SQLITE_NOTADB:
+        case SQLITE_PERM:
+        case SQLITE_READONLY:
+            return StatusCode::kIoError;
+        default:
+            return StatusCode::kMisuse;
+    }
+}
+
+std::string FileOf(sqlite3* pDb) {
+    const char* const szFile = sqlite3_db_filename(pDb, "main");
+    return szFile == nullptr || *szFile == '\0' ? "database" : szFile;
+}
+
+[[noreturn]] void FailBySqlite(sqlite3* pDb, const std::string& strWhere) {
+    std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
+    const StatusCode eCode = CodeOf(sqlite3_extended_errcode(pDb));
+    if (eCode == StatusCode::kLocked) {
+        strLine += "; try again, or wait longer with --wait MS";
+    }
+    Fail(ExitOf(eCode), strLine);
+}
+
+void CheckFile(const std::string& strFile, Access eAccess) {
+    if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
+        return;
+    }
+    if (access(strFile.c_str(), eAccess == Access::kRead ? R_OK : R_OK | W_OK) != 0) {
+        const int nError = errno;
+        Fail(kExitIo, strFile + ": " + std::strerror(nError) +
+                          (nError == ENOENT ? "; check the name, or make it with init or insert"
+                                            : "; check its permissions"));
+    }
+}
+
+}  // namespace
+
+Database OpenDatabase(const Context& Call, Access eAccess) {
+    const std::string& strFile = Call.Db();
+    CheckFile(strFile, eAccess);
+    sqlite3* pDb = nullptr;
+    const int nResult =
+        sqlite3_open_v2(strFile.c_str(), &pDb, kFlags[static_cast<int>(eAccess)], nullptr);
+    Database pOwner(pDb);
+    if (nResult != SQLITE_OK) {
+        Fail(kExitIo, strFile + ": " + sqlite3_errstr(nResult) + "; is it a file?");
+    }
+    sqlite3_extended_result_codes(pDb, 1);
+    sqlite3_busy_timeout(pDb, Call.WaitMs());
+    // SQLite looks into the file no sooner than now.
+    if (sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr) !=
+        SQLITE_OK) {
+        if (sqlite3_errcode(pDb) == SQLITE_NOTADB) {
+            Fail(kExitIo, strFile + ": " + sqlite3_errmsg(pDb) + "; name an SQLite database first");
+        }
+        if (CodeOf(sqlite3_errcode(pDb)) == StatusCode::kLocked) {
+            Fail(kExitLocked, strFile + ": " + sqlite3_errmsg(pDb) + " (waited " +
+                                  std::to_string(Call.WaitMs()) +
+                                  " ms); try again, or wait longer with --wait MS");
+        }
+        FailBySqlite(pDb, strFile);
+    }
+    return pOwner;
+}
+
+std::string ReadFile(const std::string& strFile) {
+    const bool blStandard = strFile == "-";
+    const int nFile = blStandard ? STDIN_FILENO : open(strFile.c_str(), O_RDONLY | O_CLOEXEC);
+    std::string strText;
+    char szBlock[16384];
+    ssize_t nRead = nFile < 0 ? -1 : 1;
+    while (nRead > 0) {
+        nRead = read(nFile, szBlock, sizeof szBlock);
+        strText.append(szBlock, nRead > 0 ? static_cast<std::size_t>(nRead) : 0);
+    }
+    const int nError = errno;
+    if (nFile > STDIN_FILENO) {
+        close(nFile);
+    }
+    if (nRead < 0) {
+        Fail(kExitIo, strFile + ": " + std::strerror(nError) + "; check the name");
+    }
+    return strText;
+}
+
+Json::Value ParseJson(const std::string& strText, const std::string& strWhere) {
+    Json::CharReaderBuilder Builder;
+    Json::CharReaderBuilder::strictMode(&Builder.settings_);
+    Builder["strictRoot"] = false;
+    Json::Value jValue;
+    std::string strErrors;
+    bool blParsed = false;
+    try {
+        const std::unique_ptr<Json::CharReader> pReader(Builder.newCharReader());
+        blParsed =
+            pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, &strErrors);
+    } catch (const Json::Exception& Failed) {
+        strErrors = Failed.what();
+    }
+    if (!blParsed) {
+        // "* Line 1, Column 2\n  Missing ...\n"
+        std::istringstream Lines(strErrors.substr(strErrors.compare(0, 2, "* ") == 0 ? 2 : 0));
+        std::string strPlace;
+        std::string strReason;
+        std::getline(Lines, strPlace);
+        std::getline(Lines, strReason);
+        strReason.erase(0, strReason.find_first_not_of(' '));
+        Fail(kExitBadData, strWhere + ": " + strPlace +
+                               (strReason.empty() ? "" : ": " + strReason) + "; it must be JSON");
+    }
+    return jValue;
+}
+
+Statement Prepare(sqlite3* pDb, const std::string& strSql) {
+    sqlite3_stmt* pStatement = nullptr;
+    if (sqlite3_prepare_v2(pDb, strSql.c_str(), static_cast<int>(strSql.size()) + 1, &pStatement,
+                           nullptr) != SQLITE_OK) {
+        FailBySqlite(pDb, FileOf(pDb));
+    }
+    return Statement(pStatement);
+}
+
+bool Step(sqlite3_stmt* pStatement) {
+    const int nResult = sqlite3_step(pStatement);
+    if (nResult != SQLITE_ROW && nResult != SQLITE_DONE) {
+        FailBySqlite(sqlite3_db_handle(pStatement), FileOf(sqlite3_db_handle(pStatement)));
+    }
+    return nResult == SQLITE_ROW;
+}
+
+void Run(sqlite3* pDb, const std::string& strSql) {
+    const Statement pStatement = Prepare(pDb, strSql);
+    while (Step(pStatement.get())) {
+    }
+}
+
+std::string ColumnText(sqlite3_stmt* pStatement, int nColumn) {
+    const void* const pBytes = sqlite3_column_blob(pStatement, nColumn);
+    const auto nBytes = static_cast<std::size_t>(sqlite3_column_bytes(pStatement, nColumn));
+    return pBytes == nullptr ? "" : std::string(static_cast<const char*>(pBytes), nBytes);
+}
+
+std::string Quoted(const std::string& strName) {
+    std::string strQuoted = "\"";
+    for (const char c : strName) {
+        strQuoted += c == '"' ? "\"\"" : std::string(1, c);
+    }
+    return strQuoted + "\"";
+}
+
+bool TableExists(sqlite3* pDb, const std::string& strTable) {
+    const Statement pLook = Prepare(
+        pDb,
+        "SELECT 1 FROM sqlite_master WHERE type IN ('table', 'view') AND name = ?1 COLLATE NOCASE");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    return Step(pLook.get());
+}
+
+Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable) {
+    const std::string strFile = Call.Text("--def");
+    if (!strFile.empty()) {
+        Json::Value jDefinition = ParseJson(ReadFile(strFile), strFile);
+        if (!jDefinition.isObject() || !jDefinition.isMember(strTable)) {
+            Fail(kExitBadData, strFile + ": it holds no definition of \"" + strTable +
+                                   "\"; it must be an object with that member");
+        }
+        return jDefinition;
+    }
+    if (!TableExists(pDb, kKeptTable)) {
+        return {};
+    }
+    const Statement pLook = Prepare(pDb, std::string("SELECT definition FROM ") + kKeptTable +
+                                             " WHERE name = ?1 COLLATE NOCASE");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    if (!Step(pLook.get())) {
+        return {};
+    }
+    return ParseJson(ColumnText(pLook.get(), 0),
+                     Call.Db() + ": the kept definition of \"" + strTable + "\"");
+}
+
+void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition) {
+    Run(pDb, std::string("CREATE TABLE IF NOT EXISTS ") + kKeptTable +
+                 " (name TEXT PRIMARY KEY NOT NULL, definition TEXT NOT NULL)");
+    const Statement pWrite =
+        Prepare(pDb, std::string("INSERT OR REPLACE INTO ") + kKeptTable + " VALUES (?1, ?2)");
+    Json::Value jKept;
+    jKept[strTable] = jDefinition[strTable];
+    const std::string strText = CompactJson(jKept);
+    sqlite3_bind_text(pWrite.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    sqlite3_bind_text(pWrite.get(), 2, strText.c_str(), -1, SQLITE_TRANSIENT);
+    Step(pWrite.get());
+}
+
+OpenTable::OpenTable(const Context& Call, Access eAccess) : pDb(OpenDatabase(Call, eAccess)) {
+    Options How;
+    How.blCompatible = false;
+    How.nWaitMs = Call.WaitMs();
+    const Json::Value jDefinition = KnownDefinition(Call, pDb.get(), Call.TableName());
+    const Status Opened = Records.Open(pDb.get(), Call.TableName(), jDefinition, How);
+    if (Opened.Code() == StatusCode::kNotFound) {
+        std::vector<std::string> vecTables;
+        const Statement pLook =
+            Prepare(pDb.get(), "SELECT name FROM sqlite_master WHERE type IN ('table', 'view')");
+        while (Step(pLook.get())) {
+            vecTables.push_back(ColumnText(pLook.get(), 0));
+        }
+        const std::string strHint = NearestHint(Call.TableName(), vecTables);
+        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
+                                (strHint.empty() ? "; see vornjsondb tables" : strHint));
+    }
+    Check(Opened, Call.Db(), kExitBadData);
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,57 @@
+// The database of a call, and where the definition of a table comes from.
+
+#ifndef VORNJSONDB_CLI_DATABASE_H
+#define VORNJSONDB_CLI_DATABASE_H
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "Command.h"
+
+namespace VORN_JSON_DB::Cli {
+
+enum class Access { kRead, kChange, kCreate };  // kCreate makes the file, if there is none
+
+struct CloseDatabase {
+    void operator()(sqlite3* pDb) const { sqlite3_close_v2(pDb); }
+};
+using Database = std::unique_ptr<sqlite3, CloseDatabase>;
+
+// Opens Call.Db(). A file that is missing, no database or not readable is an Error at once.
+Database OpenDatabase(const Context& Call, Access eAccess);
+
+// Reads a whole file, "-" being standard input.
+std::string ReadFile(const std::string& strFile);
+// Strict JSON; strWhere begins the Error.
+Json::Value ParseJson(const std::string& strText, const std::string& strWhere);
+
+// The definition of a table: from --def, else what the database keeps, else null.
+Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable);
+// Keeps it in the database, in the table vornjsondb_definition. For a transaction of the caller's.
+void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition);
+
+bool TableExists(sqlite3* pDb, const std::string& strTable);
+
+// A statement of the command's own.
+struct FinalizeStatement {
+    void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }
+};
+using Statement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
+Statement Prepare(sqlite3* pDb, const std::string& strSql);
+bool Step(sqlite3_stmt* pStatement);  // false after the last row; a failure is an Error
+void Run(sqlite3* pDb, const std::string& strSql);
+std::string ColumnText(sqlite3_stmt* pStatement, int nColumn);
+std::string Quoted(const std::string& strName);  // as an SQL name
+
+// A database with one table open, which is what most subcommands work on.
+struct OpenTable {
+    OpenTable(const Context& Call, Access eAccess);
+
+    Database pDb;
+    Table Records;
+};
+
+}  // namespace VORN_JSON_DB::Cli
+
+#endif  // VORNJSONDB_CLI_DATABASE_H

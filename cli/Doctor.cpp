@@ -1,0 +1,104 @@
+// doctor: is the database sound, and who holds it.
+
+#include <sys/stat.h>
+
+#include <fstream>
+#include <sstream>
+
+#include "Commands.h"
+#include "Database.h"
+#include "Output.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+std::string Pragma(sqlite3* pDb, const std::string& strPragma) {
+    const Statement pLook = Prepare(pDb, "PRAGMA " + strPragma);
+    return Step(pLook.get()) ? ColumnText(pLook.get(), 0) : "";
+}
+
+// The bytes that SQLite locks: in the database file, and in the -shm file beside it.
+struct LockRow {
+    const char* szFile;
+    long long nFirst, nLast;
+    const char* szMeaning;
+};
+constexpr LockRow kLocks[] = {
+    {"", 1073741824, 1073741824, "is about to write"},
+    {"", 1073741825, 1073741825, "writes"},
+    {"", 1073741826, 1073742335, "reads"},
+    {"-shm", 120, 120, "writes"},
+    {"-shm", 121, 121, "makes a checkpoint"},
+    {"-shm", 122, 122, "recovers"},
+    {"-shm", 123, 127, "reads"},
+};
+
+std::string ProcessName(const std::string& strPid) {
+    std::ifstream File("/proc/" + strPid + "/comm");
+    std::string strName;
+    std::getline(File, strName);
+    return strName.empty() ? "unknown" : strName;
+}
+
+// "1: POSIX  ADVISORY  WRITE 123 08:01:4567 1073741825 1073741825". The own look at the file is
+// over, so that this process is not among them.
+void AppendLocks(const std::string& strFile, const char* szSuffix, Json::Value& jRows) {
+    struct stat Is {};
+    if (stat((strFile + szSuffix).c_str(), &Is) != 0) {
+        return;
+    }
+    std::ifstream Locks("/proc/locks");
+    for (std::string strLine; std::getline(Locks, strLine);) {
+        std::istringstream Words(strLine);
+        std::string strNumber, strClass, strKind, strMode, strPid, strPlace;
+        long long nFirst = -1;
+        Words >> strNumber >> strClass >> strKind >> strMode >> strPid >> strPlace >> nFirst;
+        const std::size_t nColon = strPlace.rfind(':');
+        if (nColon == std::string::npos ||
+            strPlace.substr(nColon + 1) != std::to_string(Is.st_ino)) {
+            continue;
+        }
+        for (const LockRow& Row : kLocks) {
+            if (std::string(Row.szFile) == szSuffix && nFirst >= Row.nFirst &&
+                nFirst <= Row.nLast) {
+                Json::Value jRow;
+                jRow["check"] = "lock";
+                jRow["result"] =
+                    "process " + strPid + " (" + ProcessName(strPid) + ") " + Row.szMeaning;
+                jRows.append(std::move(jRow));
+            }
+        }
+    }
+}
+
+}  // namespace
+
+int RunDoctor(Context& Call) {
+    Json::Value jRows(Json::arrayValue);
+    const auto Add = [&jRows](const char* szCheck, const std::string& strResult) {
+        Json::Value jRow;
+        jRow["check"] = szCheck;
+        jRow["result"] = strResult;
+        jRows.append(std::move(jRow));
+    };
+    bool blSound = false;
+    {
+        const Database pDb = OpenDatabase(Call, Access::kRead);
+        const std::string strIntegrity = Pragma(pDb.get(), "integrity_check(1)");
+        const std::string strForeign = Pragma(pDb.get(), "foreign_key_check");
+        blSound = strIntegrity == "ok" && strForeign.empty();
+        Add("integrity", strIntegrity);
+        Add("foreign keys", strForeign.empty() ? "ok" : "broken in table \"" + strForeign + "\"");
+        Add("journal mode", Pragma(pDb.get(), "journal_mode"));
+        Add("encoding", Pragma(pDb.get(), "encoding"));
+        Add("pages", Pragma(pDb.get(), "page_count"));
+        Add("free pages", Pragma(pDb.get(), "freelist_count"));
+    }
+    AppendLocks(Call.Db(), "", jRows);
+    AppendLocks(Call.Db(), "-shm", jRows);
+    WriteObjects(Call, jRows, {"check", "result"});
+    return blSound ? kExitFine : kExitBadData;
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,351 @@
+// dump and load: one table as JSON Lines, exact. The first line describes the table, each further
+// one is a row as a list, and the last one has a count and a checksum, so that a cut file is found.
+
+#include <cmath>
+#include <cstdio>
+#include <fstream>
+#include <iostream>
+#include <limits>
+
+#include "Commands.h"
+#include "Database.h"
+#include "JsonCells.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+const char kFormat[] = "vornjsondb-dump";
+constexpr int kVersion = 1;
+
+// FNV-1a: against accidents, not against people.
+class Checksum {
+  public:
+    void Add(const std::string& strLine) {
+        for (const char c : strLine) {
+            m_nHash = (m_nHash ^ static_cast<unsigned char>(c)) * 1099511628211U;
+        }
+    }
+    std::string Text() const {
+        char szHex[17];
+        std::snprintf(szHex, sizeof szHex, "%016llx", static_cast<unsigned long long>(m_nHash));
+        return szHex;
+    }
+
+  private:
+    std::uint64_t m_nHash = 14695981039346656037U;
+};
+
+std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
+                               const std::string& strTable) {
+    const Statement pLook = Prepare(pDb, strSql);
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    std::vector<std::string> vecTexts;
+    while (Step(pLook.get())) {
+        vecTexts.push_back(ColumnText(pLook.get(), 0));
+    }
+    return vecTexts;
+}
+
+// A name by which the table's rowid can be read; empty when there is none.
+std::string RowidName(sqlite3* pDb, const std::string& strTable) {
+    for (const char* const szName : {"rowid", "_rowid_", "oid"}) {
+        const std::vector<std::string> vecShadows =
+            Texts(pDb,
+                  "SELECT name FROM pragma_table_xinfo(?1) WHERE name = '" + std::string(szName) +
+                      "' COLLATE NOCASE",
+                  strTable);
+        const std::string strSql = "SELECT " + std::string(szName) + " FROM " + Quoted(strTable);
+        sqlite3_stmt* pStatement = nullptr;
+        sqlite3_prepare_v2(pDb, strSql.c_str(), -1, &pStatement, nullptr);
+        const Statement pOwner(pStatement);
+        if (vecShadows.empty() && pStatement != nullptr) {
+            return szName;
+        }
+    }
+    return "";
+}
+
+void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
+    const auto Bytes = [&] {
+        const void* const pBytes = sqlite3_column_blob(pRow, nColumn);
+        const auto nBytes = static_cast<std::size_t>(sqlite3_column_bytes(pRow, nColumn));
+        return std::string_view(static_cast<const char*>(pBytes), nBytes);
+    };
+    switch (sqlite3_column_type(pRow, nColumn)) {
+        case SQLITE_INTEGER:
+            return AppendInteger(strOut, sqlite3_column_int64(pRow, nColumn));
+        case SQLITE_FLOAT:
+            // No reader of JSON has to take 1e999.
+            if (std::isinf(sqlite3_column_double(pRow, nColumn))) {
+                strOut += sqlite3_column_double(pRow, nColumn) > 0 ? "{\"$real\":\"inf\"}"
+                                                                   : "{\"$real\":\"-inf\"}";
+                return;
+            }
+            return AppendReal(strOut, sqlite3_column_double(pRow, nColumn));
+        case SQLITE_TEXT:
+            if (IsUtf8(Bytes())) {
+                return AppendJsonString(strOut, Bytes());
+            }
+            strOut += "{\"$text\":true,\"encoded\":\"";
+            AppendBase64(strOut, Bytes());
+            strOut += "\"}";
+            return;
+        case SQLITE_BLOB:
+            return AppendBlob(strOut, Bytes());
+        default:
+            strOut += "null";
+    }
+}
+
+struct Described {
+    Json::Value jHeader;
+    std::string strSelect;
+};
+
+Described Describe(const Context& Call, sqlite3* pDb) {
+    const std::string strTable = Call.TableName();
+    const std::vector<std::string> vecCreate =
+        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
+    if (vecCreate.empty() || vecCreate[0].compare(0, 15, "CREATE VIRTUAL ") == 0) {
+        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + strTable +
+                                "\" that can be dumped; see vornjsondb tables");
+    }
+    Described Found;
+    Json::Value& jHeader = Found.jHeader;
+    jHeader["format"] = kFormat;
+    jHeader["version"] = kVersion;
+    jHeader["table"] = strTable;
+    const Json::Value jDefinition = KnownDefinition(Call, pDb, strTable);
+    if (!jDefinition.isNull()) {
+        jHeader["definition"] = jDefinition;
+    }
+    jHeader["statements"].append(vecCreate[0]);
+    for (const std::string& strSql :
+         Texts(pDb,
+               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND type IN ('index', 'trigger') "
+               "AND sql IS NOT NULL ORDER BY type, name",
+               strTable)) {
+        jHeader["statements"].append(strSql);
+    }
+    std::vector<std::string> vecColumns = Texts(
+        pDb, "SELECT name FROM pragma_table_xinfo(?1) WHERE hidden = 0 ORDER BY cid", strTable);
+    const std::string strRowid = RowidName(pDb, strTable);
+    if (!strRowid.empty()) {
+        vecColumns.insert(vecColumns.begin(), strRowid);
+    }
+    for (const std::string& strColumn : vecColumns) {
+        jHeader["columns"].append(strColumn);
+        Found.strSelect += (Found.strSelect.empty() ? "SELECT " : ", ") + Quoted(strColumn);
+    }
+    if (TableExists(pDb, "sqlite_sequence")) {
+        const Statement pCounter = Prepare(pDb, "SELECT seq FROM sqlite_sequence WHERE name = ?1");
+        sqlite3_bind_text(pCounter.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+        if (Step(pCounter.get())) {
+            jHeader["sequence"] = Json::Int64(sqlite3_column_int64(pCounter.get(), 0));
+        }
+    }
+    Found.strSelect += " FROM " + Quoted(strTable);
+    return Found;
+}
+
+// Lines with their numbers, from a file or standard input.
+class LineReader {
+  public:
+    explicit LineReader(std::string strFile) : m_strFile(std::move(strFile)) {
+        if (m_strFile != "-") {
+            m_File.open(m_strFile, std::ios::binary);
+            if (!m_File) {
+                Fail(kExitIo, m_strFile + ": cannot be opened; check the name");
+            }
+        }
+    }
+
+    bool Next() {
+        ++m_nLine;
+        return static_cast<bool>(std::getline(m_strFile == "-" ? std::cin : m_File, m_strLine));
+    }
+
+    const std::string& Line() const { return m_strLine; }
+    std::string Place() const { return m_strFile + ":" + std::to_string(m_nLine); }
+    Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
+
+    [[noreturn]] void FailHere(const std::string& strWhat) const {
+        Fail(kExitBadData, Place() + ": " + strWhat + "; dump the table again");
+    }
+
+  private:
+    std::string m_strFile;
+    std::ifstream m_File;
+    std::string m_strLine;
+    std::int64_t m_nLine = 0;
+};
+
+void BindMarked(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue,
+                const LineReader& From) {
+    if (jValue.isMember("$real")) {
+        const double dInfinity = std::numeric_limits<double>::infinity();
+        sqlite3_bind_double(pRow, nColumn, jValue["$real"] == "inf" ? dInfinity : -dInfinity);
+        return;
+    }
+    bool blRight = jValue.isMember("encoded") && jValue["encoded"].isString();
+    const std::string strBytes = blRight ? FromBase64(jValue["encoded"].asString(), blRight) : "";
+    if (!blRight) {
+        From.FailHere("a value has an unknown form");
+    }
+    const int nBytes = static_cast<int>(strBytes.size());
+    if (jValue.isMember("$text")) {
+        sqlite3_bind_text(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
+    } else {
+        sqlite3_bind_blob(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
+    }
+}
+
+void Bind(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue, const LineReader& From) {
+    if (jValue.isNull()) {
+        sqlite3_bind_null(pRow, nColumn);
+    } else if (jValue.type() == Json::realValue) {
+        sqlite3_bind_double(pRow, nColumn, jValue.asDouble());
+    } else if (jValue.isInt64()) {
+        sqlite3_bind_int64(pRow, nColumn, jValue.asInt64());
+    } else if (jValue.isString()) {
+        const std::string strText = jValue.asString();
+        sqlite3_bind_text(pRow, nColumn, strText.data(), static_cast<int>(strText.size()),
+                          SQLITE_TRANSIENT);
+    } else if (jValue.isObject()) {
+        BindMarked(pRow, nColumn, jValue, From);
+    } else {
+        From.FailHere("a value is of a kind that no dump has");
+    }
+}
+
+Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
+    std::string strNames;
+    std::string strMarks;
+    for (const Json::Value& jColumn : jHeader["columns"]) {
+        strNames += (strNames.empty() ? "" : ", ") + Quoted(jColumn.asString());
+        strMarks += strMarks.empty() ? "?" : ", ?";
+    }
+    return Prepare(pDb, "INSERT INTO " + Quoted(jHeader["table"].asString()) + " (" + strNames +
+                            ") VALUES (" + strMarks + ")");
+}
+
+void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
+    const bool blDump = jHeader.isObject() && jHeader["format"] == kFormat &&
+                        jHeader["table"].isString() && jHeader["columns"].isArray() &&
+                        jHeader["statements"].isArray() && !jHeader["statements"].empty();
+    if (!blDump) {
+        From.FailHere("this is no dump");
+    }
+    if (jHeader["version"] != kVersion) {
+        From.FailHere("version " + CompactJson(jHeader["version"]) + " is not known here");
+    }
+    for (const Json::Value& jSql : jHeader["statements"]) {
+        if (!jSql.isString() || jSql.asString().compare(0, 7, "CREATE ") != 0) {
+            From.FailHere("a statement creates nothing");
+        }
+    }
+}
+
+std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
+    const Statement pInsert = PrepareInsert(pDb, jHeader);
+    Checksum Sum;
+    std::int64_t nRows = 0;
+    while (From.Next()) {
+        const Json::Value jRow = From.Parsed();
+        if (jRow.isObject()) {
+            if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
+                From.FailHere("count or checksum differ from the rows");
+            }
+            return nRows;
+        }
+        if (!jRow.isArray() || jRow.size() != jHeader["columns"].size()) {
+            From.FailHere("a row has not " + std::to_string(jHeader["columns"].size()) + " values");
+        }
+        for (Json::ArrayIndex nAt = 0; nAt < jRow.size(); ++nAt) {
+            Bind(pInsert.get(), static_cast<int>(nAt) + 1, jRow[nAt], From);
+        }
+        Step(pInsert.get());
+        sqlite3_reset(pInsert.get());
+        Sum.Add(From.Line());
+        ++nRows;
+    }
+    From.FailHere("the end is missing");
+}
+
+// The counter of AUTOINCREMENT may be ahead of the greatest rowid.
+void SetSequence(sqlite3* pDb, const Json::Value& jHeader) {
+    const Statement pDelete = Prepare(pDb, "DELETE FROM sqlite_sequence WHERE name = ?1");
+    const Statement pInsert = Prepare(pDb, "INSERT INTO sqlite_sequence VALUES (?1, ?2)");
+    const std::string strTable = jHeader["table"].asString();
+    for (sqlite3_stmt* const pStatement : {pDelete.get(), pInsert.get()}) {
+        sqlite3_bind_text(pStatement, 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    }
+    sqlite3_bind_int64(pInsert.get(), 2, jHeader["sequence"].asInt64());
+    Step(pDelete.get());
+    Step(pInsert.get());
+}
+
+}  // namespace
+
+int RunDump(Context& Call) {
+    const Database pDb = OpenDatabase(Call, Access::kRead);
+    // Description and rows are of one moment.
+    Transaction All;
+    Check(All.Begin(pDb.get(), Transaction::Mode::kDeferred, Call.WaitMs()), Call.Db());
+    const Described Found = Describe(Call, pDb.get());
+    Put(CompactJson(Found.jHeader) + "\n");
+    const Statement pRow = Prepare(pDb.get(), Found.strSelect);
+    Checksum Sum;
+    std::int64_t nRows = 0;
+    std::string strLine;
+    while (Step(pRow.get())) {
+        strLine = '[';
+        for (int nColumn = 0; nColumn < sqlite3_column_count(pRow.get()); ++nColumn) {
+            strLine += nColumn == 0 ? "" : ",";
+            AppendColumn(strLine, pRow.get(), nColumn);
+        }
+        strLine += ']';
+        Sum.Add(strLine);
+        Put(strLine + "\n");
+        ++nRows;
+    }
+    Put("{\"rows\":" + std::to_string(nRows) + ",\"checksum\":\"" + Sum.Text() + "\"}\n");
+    return kExitFine;
+}
+
+int RunLoad(Context& Call) {
+    LineReader From(Call.vecWords.size() > 1 ? Call.vecWords[1] : "-");
+    if (!From.Next()) {
+        From.FailHere("it is empty");
+    }
+    const Json::Value jHeader = From.Parsed();
+    CheckHeader(From, jHeader);
+    const std::string strTable = jHeader["table"].asString();
+    const Database pDb = OpenDatabase(Call, Access::kCreate);
+    Transaction All;
+    Check(All.Begin(pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    if (TableExists(pDb.get(), strTable)) {
+        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + strTable +
+                                 "\" already; load into another database");
+    }
+    Run(pDb.get(), jHeader["statements"][0].asString());
+    const std::int64_t nRows = LoadRows(From, pDb.get(), jHeader);
+    for (Json::ArrayIndex nAt = 1; nAt < jHeader["statements"].size(); ++nAt) {
+        Run(pDb.get(), jHeader["statements"][nAt].asString());
+    }
+    if (jHeader.isMember("sequence")) {
+        SetSequence(pDb.get(), jHeader);
+    }
+    if (jHeader.isMember("definition")) {
+        KeepDefinition(pDb.get(), strTable, jHeader["definition"]);
+    }
+    Check(All.Commit(), Call.Db());
+    Json::Value jResult;
+    jResult["loaded"] = Json::Int64(nRows);
+    Call.Report("loaded " + std::to_string(nRows) + " rows into table \"" + strTable + "\"",
+                jResult);
+    return kExitFine;
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,196 @@
+#include "JsonCells.h"
+
+#include <utf8proc.h>
+
+#include <charconv>
+#include <cmath>
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+const char kBase64[] = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
+
+// The length of the character that begins at nAt, or 0 where the bytes are not UTF-8.
+std::size_t CharacterAt(std::string_view strText, std::size_t nAt) {
+    utf8proc_int32_t nCode = 0;
+    const auto* pBytes = reinterpret_cast<const utf8proc_uint8_t*>(strText.data());
+    const utf8proc_ssize_t nLength =
+        utf8proc_iterate(pBytes + nAt, static_cast<utf8proc_ssize_t>(strText.size() - nAt), &nCode);
+    return nLength > 0 ? static_cast<std::size_t>(nLength) : 0;
+}
+
+void AppendEscape(std::string& strOut, unsigned char c) {
+    const char* const szShort = "\"\"\\\\\bb\ff\nn\rr\tt";
+    for (const char* pPair = szShort; *pPair != '\0'; pPair += 2) {
+        if (static_cast<unsigned char>(*pPair) == c) {
+            strOut += '\\';
+            strOut += pPair[1];
+            return;
+        }
+    }
+    const char* const szHex = "0123456789abcdef";
+    strOut += "\\u00";
+    strOut += szHex[c >> 4];
+    strOut += szHex[c & 15];
+}
+
+bool IsPlain(unsigned char c) {
+    return c >= 0x20 && c < 0x80 && c != '"' && c != '\\';
+}
+
+}  // namespace
+
+void AppendInteger(std::string& strOut, std::int64_t nValue) {
+    char szDigits[24];
+    strOut.append(szDigits, std::to_chars(szDigits, szDigits + sizeof szDigits, nValue).ptr);
+}
+
+void AppendReal(std::string& strOut, double dValue) {
+    if (std::isinf(dValue)) {
+        strOut += dValue > 0 ? "1e999" : "-1e999";
+        return;
+    }
+    char szDigits[32];
+    const char* const pEnd = std::to_chars(szDigits, szDigits + sizeof szDigits, dValue).ptr;
+    const std::string_view strDigits(szDigits, static_cast<std::size_t>(pEnd - szDigits));
+    strOut += strDigits;
+    if (strDigits.find_first_of(".en") == std::string_view::npos) {
+        strOut += ".0";
+    }
+}
+
+void AppendJsonString(std::string& strOut, std::string_view strText) {
+    strOut += '"';
+    std::size_t nDone = 0;
+    for (std::size_t nAt = 0; nAt < strText.size();) {
+        const auto c = static_cast<unsigned char>(strText[nAt]);
+        const std::size_t nLength = c < 0x80 ? 1 : CharacterAt(strText, nAt);
+        if (IsPlain(c) || (c >= 0x80 && nLength != 0)) {
+            nAt += nLength;
+            continue;
+        }
+        strOut += strText.substr(nDone, nAt - nDone);
+        if (c < 0x80) {
+            AppendEscape(strOut, c);
+        } else {
+            strOut += "\xEF\xBF\xBD";
+        }
+        nDone = ++nAt;
+    }
+    strOut += strText.substr(nDone);
+    strOut += '"';
+}
+
+void AppendJson(std::string& strOut, std::string_view strJson) {
+    bool blInText = false;
+    for (std::size_t nAt = 0; nAt < strJson.size(); ++nAt) {
+        const char c = strJson[nAt];
+        if (c == '\n' || c == '\r') {
+            strOut += ' ';
+            continue;
+        }
+        strOut += c;
+        if (c == '"') {
+            blInText = !blInText;
+        } else if (blInText && c == '\\' && nAt + 1 < strJson.size()) {
+            strOut += strJson[++nAt];
+        }
+    }
+}
+
+void AppendBase64(std::string& strOut, std::string_view strBytes) {
+    for (std::size_t nAt = 0; nAt < strBytes.size(); nAt += 3) {
+        std::uint32_t nBits = 0;
+        for (std::size_t nByte = nAt; nByte < nAt + 3; ++nByte) {
+            const bool blThere = nByte < strBytes.size();
+            nBits = nBits << 8 | (blThere ? static_cast<unsigned char>(strBytes[nByte]) : 0U);
+        }
+        const std::size_t nThere = strBytes.size() - nAt;
+        strOut += kBase64[nBits >> 18];
+        strOut += kBase64[nBits >> 12 & 63];
+        strOut += nThere > 1 ? kBase64[nBits >> 6 & 63] : '=';
+        strOut += nThere > 2 ? kBase64[nBits & 63] : '=';
+    }
+}
+
+std::string FromBase64(const std::string& strText, bool& blRight) {
+    std::string strBytes;
+    std::uint32_t nBits = 0;
+    int nCount = 0;
+    const std::size_t nDigits = strText.find_last_not_of('=') + 1;
+    blRight = strText.size() % 4 == 0 && strText.size() - nDigits <= 2;
+    for (std::size_t nAt = 0; nAt < nDigits && blRight; ++nAt) {
+        const std::size_t nDigit = std::string_view(kBase64).find(strText[nAt]);
+        blRight = nDigit != std::string_view::npos;
+        nBits = nBits << 6 | static_cast<std::uint32_t>(nDigit & 63);
+        nCount += 6;
+        if (nCount >= 8) {
+            nCount -= 8;
+            strBytes += static_cast<char>(nBits >> nCount & 255);
+        }
+    }
+    return strBytes;
+}
+
+void AppendBlob(std::string& strOut, std::string_view strBytes) {
+    strOut += "{\"$base64\":true,\"encoded\":\"";
+    AppendBase64(strOut, strBytes);
+    strOut += "\"}";
+}
+
+bool IsUtf8(std::string_view strText) {
+    for (std::size_t nAt = 0; nAt < strText.size();) {
+        const auto c = static_cast<unsigned char>(strText[nAt]);
+        const std::size_t nLength = c < 0x80 ? 1 : CharacterAt(strText, nAt);
+        if (nLength == 0) {
+            return false;
+        }
+        nAt += nLength;
+    }
+    return true;
+}
+
+namespace {
+
+void AppendValue(std::string& strOut, const Json::Value& jValue) {
+    const char* szBetween = "";
+    switch (jValue.type()) {
+        case Json::realValue:
+            return AppendReal(strOut, jValue.asDouble());
+        case Json::stringValue:
+            return AppendJsonString(strOut, jValue.asString());
+        case Json::arrayValue:
+            strOut += '[';
+            for (const Json::Value& jItem : jValue) {
+                strOut += szBetween;
+                AppendValue(strOut, jItem);
+                szBetween = ",";
+            }
+            strOut += ']';
+            return;
+        case Json::objectValue:
+            strOut += '{';
+            for (auto it = jValue.begin(); it != jValue.end(); ++it) {
+                strOut += szBetween;
+                AppendJsonString(strOut, it.name());
+                strOut += ':';
+                AppendValue(strOut, *it);
+                szBetween = ",";
+            }
+            strOut += '}';
+            return;
+        default:
+            strOut += jValue.isNull() ? "null" : jValue.asString();
+    }
+}
+
+}  // namespace
+
+std::string CompactJson(const Json::Value& jValue) {
+    std::string strOut;
+    AppendValue(strOut, jValue);
+    return strOut;
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,64 @@
+// vornjsondb: the command.
+
+#include <signal.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <exception>
+#include <new>
+
+#include "Command.h"
+#include "Parse.h"
+#include "Terminal.h"
+
+namespace {
+
+using namespace VORN_JSON_DB::Cli;  // NOLINT(google-build-using-namespace): main belongs to it
+
+int Report(int nExit, const std::string& strLine) {
+    const bool blColour = HasColour(stderr);
+    std::fprintf(stderr, "%serror:%s %s\n", blColour ? "\033[1;31m" : "", blColour ? "\033[0m" : "",
+                 strLine.c_str());
+    return nExit;
+}
+
+int Run(int nArguments, char** pszArguments) {
+    Context Call;
+    if (!Parse(nArguments, pszArguments, Call)) {
+        return kExitFine;
+    }
+    return Call.pCommand->pfnRun(Call);
+}
+
+int RunGuarded(int nArguments, char** pszArguments) {
+    int nExit = kExitUnexpected;
+    try {
+        nExit = Run(nArguments, pszArguments);
+        FlushOutput();
+    } catch (const Error& Failed) {
+        nExit = Report(Failed.nExit, Failed.strLine);
+    } catch (const std::bad_alloc&) {
+        nExit = Report(kExitUnexpected, "out of memory; free some, or ask for fewer records");
+    } catch (const std::exception& Failed) {
+        nExit =
+            Report(kExitUnexpected, std::string(Failed.what()) + "; this is a fault of vornjsondb");
+    }
+    return nExit;
+}
+
+}  // namespace
+
+int main(int nArguments, char** pszArguments) {
+    // A reader that goes away ends the command without a word, whatever the parent made of it; a
+    // file that hits the limit of the shell is a write error like others.
+    signal(SIGPIPE, SIG_DFL);
+    signal(SIGXFSZ, SIG_IGN);
+    const int nExit = RunGuarded(nArguments, pszArguments);
+    // Some file systems report a failed write no sooner than here.
+    if (std::fclose(stdout) != 0 && nExit == kExitFine) {
+        return Report(kExitIo,
+                      std::string("standard output: cannot write: ") + std::strerror(errno));
+    }
+    return nExit;
+}

@@ -1,0 +1,308 @@
+// What a database holds and how: tables, schema, init, index, explain, lint, sync.
+
+#include "Commands.h"
+#include "Conditions.h"
+#include "Database.h"
+#include "JsonCells.h"
+#include "Output.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+constexpr const char* kSeverities[] = {"note", "warning", "error"};
+
+Json::Value Strings(const std::vector<std::string>& vecTexts) {
+    Json::Value jTexts(Json::arrayValue);
+    for (const std::string& strText : vecTexts) {
+        jTexts.append(strText);
+    }
+    return jTexts;
+}
+
+void AppendFindings(const FindingList& vecFindings, const std::string& strTable,
+                    Json::Value& jFindings) {
+    for (const Finding& Found : vecFindings) {
+        Json::Value jFinding;
+        jFinding["table"] = strTable;
+        jFinding["severity"] = kSeverities[static_cast<int>(Found.eSeverity)];
+        jFinding["code"] = Found.szCode;
+        jFinding["path"] = Found.strPath;
+        jFinding["message"] = Found.strMessage;
+        jFinding["remedy"] = Found.strRemedy;
+        jFindings.append(std::move(jFinding));
+    }
+}
+
+void PutFindings(const FindingList& vecFindings) {
+    for (const Finding& Found : vecFindings) {
+        Put(std::string(kSeverities[static_cast<int>(Found.eSeverity)]) + ": " + Found.strMessage +
+            (Found.strRemedy.empty() ? "" : "; " + Found.strRemedy) + "\n");
+    }
+}
+
+std::vector<std::string> TableNames(sqlite3* pDb) {
+    std::vector<std::string> vecNames;
+    const Statement pLook = Prepare(pDb,
+                                    "SELECT name FROM sqlite_master WHERE type = 'table' AND name "
+                                    "NOT LIKE 'sqlite\\_%' ESCAPE '\\' AND name <> "
+                                    "'vornjsondb_definition' ORDER BY name");
+    while (Step(pLook.get())) {
+        vecNames.push_back(ColumnText(pLook.get(), 0));
+    }
+    return vecNames;
+}
+
+// All statements of one table, or of the database.
+std::vector<std::string> CreateStatements(sqlite3* pDb, const std::string& strTable) {
+    const Statement pLook = Prepare(pDb,
+                                    "SELECT sql FROM sqlite_master WHERE sql IS NOT NULL AND "
+                                    "(?1 = '' OR tbl_name = ?1 COLLATE NOCASE) ORDER BY tbl_name, "
+                                    "type <> 'table', name");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    std::vector<std::string> vecStatements;
+    while (Step(pLook.get())) {
+        vecStatements.push_back(ColumnText(pLook.get(), 0));
+    }
+    return vecStatements;
+}
+
+// "size:int", with --key, --not-null, --unique and --default beside it.
+Json::Value DefinitionFromWords(const Context& Call) {
+    Json::Value jTable(Json::objectValue);
+    Json::Value& jMembers = jTable["member"] = Json::Value(Json::objectValue);
+    for (const std::string& strWord : Call.WordsFrom(2)) {
+        const std::size_t nColon = strWord.find(':');
+        if (nColon == std::string::npos || nColon == 0) {
+            Fail(kExitUsage, "\"" + strWord + "\" is no member; write member:type");
+        }
+        jMembers[strWord.substr(0, nColon)]["cpptype"] = strWord.substr(nColon + 1);
+    }
+    const auto Member = [&jMembers](const std::string& strName) -> Json::Value& {
+        if (!jMembers.isMember(strName)) {
+            Fail(kExitUsage, "there is no member \"" + strName + "\"" +
+                                 NearestHint(strName, jMembers.getMemberNames()));
+        }
+        return jMembers[strName];
+    };
+    for (const std::string& strName : Call.Names("--not-null")) {
+        Member(strName)["notNull"] = true;
+    }
+    for (const std::string& strName : Call.Names("--unique")) {
+        Member(strName)["unique"] = true;
+    }
+    for (const std::string& strName : Call.Names("--key")) {
+        Member(strName);
+        jTable["key"].append(strName);
+    }
+    for (const std::string& strWord : Call.List("--default")) {
+        const std::size_t nEquals = std::min(strWord.find('='), strWord.size());
+        Json::Value& jMember = Member(strWord.substr(0, nEquals));
+        const std::string strText = nEquals < strWord.size() ? strWord.substr(nEquals + 1) : "";
+        jMember["cppDefaultValue"] =
+            jMember["cpptype"] == "string" ? Json::Value(strText) : ParseJson(strText, strWord);
+    }
+    Json::Value jDefinition;
+    jDefinition[Call.TableName()] = jTable;
+    return jDefinition;
+}
+
+}  // namespace
+
+int RunTables(Context& Call) {
+    const Database pDb = OpenDatabase(Call, Access::kRead);
+    Json::Value jTables(Json::arrayValue);
+    for (const std::string& strName : TableNames(pDb.get())) {
+        Json::Value jTable;
+        jTable["table"] = strName;
+        if (Call.Has("--counts")) {
+            const Statement pCount = Prepare(pDb.get(), "SELECT count(*) FROM " + Quoted(strName));
+            Step(pCount.get());
+            jTable["records"] = Json::Int64(sqlite3_column_int64(pCount.get(), 0));
+        }
+        jTables.append(std::move(jTable));
+    }
+    if (Call.Has("--counts")) {
+        WriteObjects(Call, jTables, {"table", "records"});
+    } else {
+        WriteObjects(Call, jTables, {"table"});
+    }
+    return kExitFine;
+}
+
+int RunSchema(Context& Call) {
+    const bool blOne = Call.vecWords.size() > 1;
+    if (blOne) {
+        OpenTable Open(Call, Access::kRead);
+        if (Call.Json()) {
+            Put(CompactJson(Open.Records.Definition()) + "\n");
+            return kExitFine;
+        }
+    }
+    const Database pDb = OpenDatabase(Call, Access::kRead);
+    const std::vector<std::string> vecStatements =
+        CreateStatements(pDb.get(), blOne ? Call.TableName() : "");
+    if (Call.Json()) {
+        Put(CompactJson(Strings(vecStatements)) + "\n");
+        return kExitFine;
+    }
+    for (const std::string& strStatement : vecStatements) {
+        Put(strStatement + ";\n");
+    }
+    return kExitFine;
+}
+
+int RunInit(Context& Call) {
+    const bool blFile = Call.Has("--def");
+    if (blFile == (Call.vecWords.size() > 2)) {
+        Fail(kExitUsage, "init takes member:type words or --def FILE; give one of them");
+    }
+    Json::Value jDefinition;
+    if (!blFile) {
+        jDefinition = DefinitionFromWords(Call);
+    } else {
+        jDefinition = KnownDefinition(Call, nullptr, Call.TableName());
+    }
+    std::string strSql;
+    Check(CreateStatement(Call.TableName(), jDefinition, strSql), Call.Db(), kExitBadData);
+    if (Call.Has("--dry-run")) {
+        Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
+        return kExitFine;
+    }
+    const Database pDb = OpenDatabase(Call, Access::kCreate);
+    Transaction All;
+    Check(All.Begin(pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    if (TableExists(pDb.get(), Call.TableName())) {
+        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + Call.TableName() +
+                                 "\" already; extend it with vornjsondb sync");
+    }
+    Run(pDb.get(), strSql);
+    KeepDefinition(pDb.get(), Call.TableName(), jDefinition);
+    Check(All.Commit(), Call.Db());
+    Json::Value jResult;
+    jResult["created"] = Call.TableName();
+    Call.Report("created table \"" + Call.TableName() + "\"", jResult);
+    return kExitFine;
+}
+
+int RunIndex(Context& Call) {
+    const std::vector<std::string> vecMembers = Call.WordsFrom(2);
+    OpenTable Open(Call, vecMembers.empty() ? Access::kRead : Access::kChange);
+    if (!vecMembers.empty()) {
+        std::string strSql;
+        Check(Open.Records.CreateIndex(vecMembers, Call.Has("--unique"), &strSql), Call.Db());
+        Json::Value jResult;
+        jResult["sql"] = strSql;
+        Call.Report(strSql, jResult);
+        return kExitFine;
+    }
+    const Statement pLook = Prepare(
+        Open.pDb.get(),
+        "SELECT l.name, l.\"unique\", (SELECT group_concat(coalesce(i.name, '(expression)'), ', ') "
+        "FROM pragma_index_info(l.name) i) FROM pragma_index_list(?1) l ORDER BY l.name");
+    sqlite3_bind_text(pLook.get(), 1, Call.TableName().c_str(), -1, SQLITE_TRANSIENT);
+    Json::Value jIndexes(Json::arrayValue);
+    while (Step(pLook.get())) {
+        Json::Value jIndex;
+        jIndex["index"] = ColumnText(pLook.get(), 0);
+        jIndex["unique"] = sqlite3_column_int(pLook.get(), 1) != 0;
+        jIndex["members"] = ColumnText(pLook.get(), 2);
+        jIndexes.append(std::move(jIndex));
+    }
+    WriteObjects(Call, jIndexes, {"index", "unique", "members"});
+    return kExitFine;
+}
+
+int RunExplain(Context& Call) {
+    OpenTable Open(Call, Access::kRead);
+    const Query Which = ParseQuery(Call, Open.Records, Call.WordsFrom(2));
+    if (Call.Has("--old")) {
+        Json::Value jOldQuery;
+        Check(Open.Records.ToOldQuery(Which, OldCall::kRead, jOldQuery), Call.Db());
+        Put(CompactJson(jOldQuery) + "\n");
+        return kExitFine;
+    }
+    Plan Found;
+    if (Call.Has("--sql")) {
+        Check(Open.Records.ExplainSql(Call.Text("--sql"), Found), Call.Db());
+    } else {
+        Check(Open.Records.Explain(Which, Found), Call.Db());
+    }
+    if (Call.Json()) {
+        Json::Value jPlan;
+        jPlan["sql"] = Found.strSql;
+        jPlan["steps"] = Strings(Found.vecSteps);
+        jPlan["findings"] = Json::Value(Json::arrayValue);
+        AppendFindings(Found.vecFindings, Call.TableName(), jPlan["findings"]);
+        Put(CompactJson(jPlan) + "\n");
+        return kExitFine;
+    }
+    Put(Found.strSql + "\n");
+    for (const std::string& strStep : Found.vecSteps) {
+        Put("  " + strStep + "\n");
+    }
+    PutFindings(Found.vecFindings);
+    return kExitFine;
+}
+
+int RunLint(Context& Call) {
+    std::vector<std::string> vecTables = Call.WordsFrom(1);
+    if (vecTables.empty()) {
+        vecTables = TableNames(OpenDatabase(Call, Access::kRead).get());
+    }
+    Json::Value jFindings(Json::arrayValue);
+    for (const std::string& strTable : vecTables) {
+        Call.vecWords.resize(1);
+        Call.vecWords.push_back(strTable);
+        OpenTable Open(Call, Access::kRead);
+        FindingList vecFindings;
+        Check(Open.Records.Lint(vecFindings), Call.Db());
+        AppendFindings(vecFindings, strTable, jFindings);
+    }
+    bool blError = false;
+    for (const Json::Value& jFinding : jFindings) {
+        blError = blError || jFinding["severity"] == "error";
+    }
+    if (jFindings.empty() && !Call.Json()) {
+        Call.Say("no findings");
+    } else {
+        WriteObjects(Call, jFindings, {"table", "severity", "code", "path", "message", "remedy"});
+    }
+    return blError ? kExitBadData : kExitFine;
+}
+
+int RunSync(Context& Call) {
+    const bool blLook = Call.Has("--dry-run");
+    OpenTable Open(Call, blLook ? Access::kRead : Access::kChange);
+    SyncReport Done;
+    Transaction All;
+    if (!blLook) {
+        Check(All.Begin(Open.pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    }
+    Check(Open.Records.Sync(blLook ? SyncMode::kLook : SyncMode::kChange, Done), Call.Db(),
+          kExitBadData);
+    if (!blLook) {
+        if (Call.Has("--def")) {
+            KeepDefinition(Open.pDb.get(), Call.TableName(), Open.Records.Definition());
+        }
+        Check(All.Commit(), Call.Db());
+    }
+    if (Call.Json()) {
+        Json::Value jDone;
+        jDone["statements"] = Strings(Done.vecStatements);
+        jDone["findings"] = Json::Value(Json::arrayValue);
+        AppendFindings(Done.vecFindings, Call.TableName(), jDone["findings"]);
+        Put(CompactJson(jDone) + "\n");
+        return kExitFine;
+    }
+    for (const std::string& strStatement : Done.vecStatements) {
+        Put(strStatement + ";\n");
+    }
+    PutFindings(Done.vecFindings);
+    if (Done.vecStatements.empty() && Done.vecFindings.empty()) {
+        Call.Say("nothing to do");
+    }
+    return kExitFine;
+}
+
+}  // namespace VORN_JSON_DB::Cli

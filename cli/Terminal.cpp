@@ -1,0 +1,33 @@
+#include "Terminal.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <cstring>
+
+namespace VORN_JSON_DB::Cli {
+
+bool IsTerminal(std::FILE* pStream) {
+    return isatty(fileno(pStream)) != 0;
+}
+
+bool HasColour(std::FILE* pStream) {
+    const char* const szNoColour = std::getenv("NO_COLOR");
+    const char* const szTerm = std::getenv("TERM");
+    const bool blRefused = szNoColour != nullptr && *szNoColour != '\0';
+    const bool blDumb = szTerm == nullptr || std::strcmp(szTerm, "dumb") == 0;
+    return IsTerminal(pStream) && !blRefused && !blDumb;
+}
+
+int TerminalWidth() {
+    winsize Size{};
+    if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &Size) == 0 && Size.ws_col > 0) {
+        return Size.ws_col;
+    }
+    const char* const szColumns = std::getenv("COLUMNS");
+    const int nColumns = szColumns == nullptr ? 0 : std::atoi(szColumns);
+    return nColumns > 0 ? nColumns : 80;
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,116 @@
+// update, delete, upsert: records by key and by query.
+
+#include "Commands.h"
+#include "Conditions.h"
+#include "Database.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+std::string Records(std::int64_t nRecords) {
+    return std::to_string(nRecords) + (nRecords == 1 ? " record" : " records");
+}
+
+int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords) {
+    Json::Value jResult;
+    jResult[szDone] = Json::Int64(nRecords);
+    Call.Report(std::string(szDone) + " " + Records(nRecords), jResult);
+    return kExitFine;
+}
+
+// Runs a change for each key; a key that is not there undoes them all.
+template <typename Change>
+std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std::string>& vecKeys,
+                     const Change& fnChange) {
+    Transaction All;
+    Check(All.Begin(Open.pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    std::int64_t nRecords = 0;
+    for (const std::string& strKey : vecKeys) {
+        std::int64_t nChanged = 0;
+        const Query Which = KeyQuery(Open.Records, ParseKey(Open.Records, strKey));
+        Check(fnChange(Which, nChanged), Call.Db());
+        if (nChanged == 0) {
+            Fail(kExitNotFound, Call.Db() + ": table \"" + Call.TableName() +
+                                    "\" has no record with the key \"" + strKey +
+                                    "\"; nothing was changed");
+        }
+        nRecords += nChanged;
+    }
+    Check(All.Commit(), Call.Db());
+    return nRecords;
+}
+
+void SplitWords(const Context& Call, std::vector<std::string>& vecKeys,
+                std::vector<std::string>& vecAssignments) {
+    for (const std::string& strWord : Call.WordsFrom(2)) {
+        const bool blObject = strWord.compare(0, 1, "{") == 0;
+        (IsAssignment(strWord) && !blObject ? vecAssignments : vecKeys).push_back(strWord);
+    }
+}
+
+}  // namespace
+
+int RunUpdate(Context& Call) {
+    std::vector<std::string> vecKeys;
+    std::vector<std::string> vecAssignments;
+    SplitWords(Call, vecKeys, vecAssignments);
+    if (vecKeys.empty() != Call.Has("--where")) {
+        Fail(kExitUsage, "update takes keys or --where; give one of them");
+    }
+    if (vecAssignments.empty()) {
+        Fail(kExitUsage, "update sets nothing; add member=value");
+    }
+    OpenTable Open(Call, Access::kChange);
+    const Json::Value jMembers = ParseAssignments(Open.Records, vecAssignments);
+    const auto Change = [&](const Query& Which, std::int64_t& nRows) {
+        return Open.Records.Update(Which, jMembers, &nRows);
+    };
+    std::int64_t nRecords = 0;
+    if (vecKeys.empty()) {
+        Check(Change(ParseQuery(Call, Open.Records, {}), nRecords), Call.Db());
+    } else {
+        nRecords = ForKeys(Call, Open, vecKeys, Change);
+    }
+    return ReportCount(Call, "updated", nRecords);
+}
+
+int RunDelete(Context& Call) {
+    const std::vector<std::string> vecKeys = Call.WordsFrom(2);
+    const int nWays =
+        (vecKeys.empty() ? 0 : 1) + (Call.Has("--where") ? 1 : 0) + (Call.Has("--all") ? 1 : 0);
+    if (nWays != 1) {
+        Fail(kExitUsage, "delete takes keys, --where or --all; give one of them");
+    }
+    if (Call.Has("--all") && !Call.Has("--yes")) {
+        Fail(kExitUsage, "delete --all removes every record; add --yes if that is meant");
+    }
+    OpenTable Open(Call, Access::kChange);
+    std::int64_t nRecords = 0;
+    if (Call.Has("--all")) {
+        Check(Open.Records.RemoveAll(&nRecords), Call.Db());
+    } else if (Call.Has("--where")) {
+        Check(Open.Records.Remove(ParseQuery(Call, Open.Records, {}), &nRecords), Call.Db());
+    } else {
+        nRecords = ForKeys(Call, Open, vecKeys, [&Open](const Query& Which, std::int64_t& nRows) {
+            return Open.Records.Remove(Which, &nRows);
+        });
+    }
+    return ReportCount(Call, "deleted", nRecords);
+}
+
+int RunUpsert(Context& Call) {
+    OpenTable Open(Call, Access::kChange);
+    Json::Value jRecord;
+    if (Call.vecWords.size() == 3 && Call.vecWords[2].compare(0, 1, "{") == 0) {
+        jRecord = ParseJson(Call.vecWords[2], "record");
+    } else {
+        jRecord = ParseAssignments(Open.Records, Call.WordsFrom(2));
+    }
+    Written eWritten{};
+    Check(Open.Records.Save(jRecord, OnDuplicate::kUpsert, nullptr, &eWritten), Call.Db(),
+          kExitBadData);
+    return ReportCount(Call, eWritten == Written::kInserted ? "inserted" : "updated", 1);
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,145 @@
+#include "Inference.h"
+
+#include "Numbers.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+constexpr unsigned kNull = 1;
+constexpr unsigned kBoolean = 2;
+constexpr unsigned kInteger = 4;
+constexpr unsigned kReal = 8;
+constexpr unsigned kWide = 16;
+constexpr unsigned kText = 32;
+constexpr unsigned kObject = 64;
+constexpr unsigned kList = 128;
+constexpr unsigned kInexact = 256;  // an integer that no double equals for sure
+
+unsigned OfInteger(std::int64_t nValue) {
+    return nValue > kMostExact || nValue < -kMostExact ? kInteger | kInexact : kInteger;
+}
+
+unsigned KindsOf(const Value& Given) {
+    switch (Given.eKind) {
+        case Value::Kind::kNull:
+            return kNull;
+        case Value::Kind::kBoolean:
+            return kBoolean;
+        case Value::Kind::kInteger:
+            return OfInteger(Given.nInteger);
+        case Value::Kind::kReal:
+            return kReal;
+        case Value::Kind::kWide:
+            return kWide;
+        case Value::Kind::kText:
+            return kText;
+        default:
+            return Given.strText[0] == '{' ? kObject : kList;
+    }
+}
+
+struct TypeRow {
+    unsigned nMost;  // the kinds that the type has room for
+    const char* szType;
+};
+
+// The first that fits. A list, an object or a boolean beside something else is kept as JSON text,
+// so that 5, "5" and true stay apart.
+constexpr unsigned kTextsAndNumbers = kText | kWide | kInteger | kInexact | kReal;
+constexpr TypeRow kTypes[] = {
+    {0, "string"},
+    {kText | kWide, "string"},
+    {kBoolean, "bool"},
+    {kInteger | kInexact, "long long"},
+    {kInteger | kReal, "double"},
+    {kObject, "Json::objectValue"},
+    {kList, "Json::arrayValue"},
+    {kTextsAndNumbers, "any"},
+};
+
+const char* TypeFor(unsigned nKinds, bool blCells) {
+    const unsigned nValues = nKinds & ~kNull;
+    for (const TypeRow& Row : kTypes) {
+        if ((nValues & ~Row.nMost) == 0) {
+            // A cell of CSV is a text as long as not all of its column are numbers.
+            const bool blText = blCells && Row.nMost == kTextsAndNumbers;
+            return blText ? "string" : Row.szType;
+        }
+    }
+    return "Json::Value";
+}
+
+}  // namespace
+
+void Inference::BeginInput(bool blCells) {
+    m_vecInput.clear();
+    m_vecNow.clear();
+    m_blCells = blCells;
+    m_blOnlyCells = m_blOnlyCells && blCells;
+}
+
+void Inference::NewMember(std::string_view strName) {
+    auto itFound = m_mapSeen.find(strName);
+    if (itFound == m_mapSeen.end()) {
+        itFound = m_mapSeen.emplace(strName, m_vecSeen.size()).first;
+        m_vecSeen.emplace_back();
+        m_vecSeen.back().strName = strName;
+    }
+    m_vecInput.push_back(itFound->second);
+}
+
+void Inference::Take(size_t nMember, const Value& Given) {
+    const bool blCell = m_blCells && Given.eKind == Value::Kind::kText;
+    m_vecNow.emplace_back(m_vecInput[nMember], KindsOf(blCell ? CellNumber(Given.strText) : Given));
+}
+
+bool Inference::EndRecord(const Place&) {
+    ++m_nRecords;
+    for (const auto& Each : m_vecNow) {
+        m_vecSeen[Each.first].nKinds |= Each.second;
+        ++m_vecSeen[Each.first].nValues;
+    }
+    m_vecNow.clear();
+    return true;
+}
+
+bool Inference::BadRecord(const Place&, const std::string&) {
+    m_vecNow.clear();
+    return true;
+}
+
+Json::Value Inference::Members() const {
+    Json::Value jMembers(Json::objectValue);
+    for (const Seen& Each : m_vecSeen) {
+        if (Each.nValues > 0) {
+            Json::Value& jMember = jMembers[Each.strName];
+            jMember["cpptype"] = TypeFor(Each.nKinds, m_blOnlyCells);
+            if ((Each.nKinds & kNull) != 0) {
+                jMember["nullSeen"] = true;
+            }
+        }
+    }
+    return jMembers;
+}
+
+std::vector<std::string> Inference::Notes() const {
+    std::vector<std::string> vecNotes;
+    for (const Seen& Each : m_vecSeen) {
+        const std::string strMember = "member \"" + Each.strName + "\": ";
+        const std::string strType = TypeFor(Each.nKinds, m_blOnlyCells);
+        if ((Each.nKinds & kWide) != 0) {
+            vecNotes.push_back(strMember + "numbers beyond 64 bits are kept as texts");
+        }
+        if (strType == "any" || strType == "Json::Value") {
+            vecNotes.push_back(strMember + "values of several kinds");
+        }
+        if (Each.nValues > 0 && Each.nValues < m_nRecords && (Each.nKinds & kNull) != 0) {
+            vecNotes.push_back(strMember +
+                               "null in some records and missing in others; all come back as null");
+        }
+    }
+    return vecNotes;
+}
+
+}  // namespace VORN_JSON_DB::Cli

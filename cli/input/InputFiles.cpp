@@ -1,0 +1,132 @@
+#include "InputFiles.h"
+
+#include <cstring>
+
+#include "Interrupt.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+struct FormatRow {
+    const char* szName;
+    Format eFormat;
+    char cDelimiter;
+};
+
+constexpr FormatRow kFormats[] = {{"json", Format::kJson, ','},
+                                  {"jsonl", Format::kJsonLines, ','},
+                                  {"csv", Format::kSeparated, ','},
+                                  {"tsv", Format::kSeparated, '\t'}};
+
+ReadOptions Named(const std::string& strFormat) {
+    ReadOptions How;
+    for (const FormatRow& Row : kFormats) {
+        if (strFormat == Row.szName) {
+            How.eFormat = Row.eFormat;
+            How.cDelimiter = Row.cDelimiter;
+            return How;
+        }
+    }
+    Fail(kExitUsage, "--format: there is no \"" + strFormat + "\"; json, jsonl, csv and tsv are");
+}
+
+[[noreturn]] void FailBySystem(const ByteSource& Of) {
+    if (Interrupt::Came()) {
+        Fail(kExitInterrupted, "interrupted");
+    }
+    Fail(kExitIo, Of.Name() + ": " + std::strerror(Of.Error()) + "; check name and permissions");
+}
+
+ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
+    // A pipe is not waited for, when it is known what comes.
+    ReadOptions Found = How.strFormat.empty() ? GuessFormat(From.Look()) : Named(How.strFormat);
+    if (!How.strDelimiter.empty()) {
+        if (How.strDelimiter.size() != 1 || How.strDelimiter.find_first_of("\"\r\n") == 0) {
+            Fail(kExitUsage,
+                 "--delimiter: it must be one ASCII character, and no quote or newline");
+        }
+        Found.eFormat = Format::kSeparated;
+        Found.cDelimiter = How.strDelimiter[0];
+    }
+    Found.blQuotes = How.blQuotes;
+    Found.blHeader = How.blHeader;
+    Found.blEmptyIsText = How.blEmptyIsText;
+    Found.blKeepText = !How.strErrors.empty();
+    return Found;
+}
+
+}  // namespace
+
+InputFiles::InputFiles(const InsertOptions& How) {
+    for (const std::string& strPath : How.vecFiles) {
+        m_vecInputs.push_back(std::make_unique<Input>());
+        Input& Now = *m_vecInputs.back();
+        if (!Now.From.Open(strPath)) {
+            FailBySystem(Now.From);
+        }
+        Now.How = OptionsFor(Now.From, How);
+    }
+}
+
+bool InputFiles::ReadOne(Input& Now, Sink& To) {
+    const ReadOutcome Result = ReadRecords(Now.From, Now.How, To);
+    if (Now.From.Error() != 0) {
+        FailBySystem(Now.From);
+    }
+    if (Result.eEnd == ReadOutcome::End::kFailed) {
+        Fail(kExitBadData,
+             Now.From.Name() + ":" + std::to_string(Result.nLine) + ": " + Result.strReason);
+    }
+    Now.strListName = Result.strListName;
+    return Result.eEnd == ReadOutcome::End::kDone;
+}
+
+bool InputFiles::Read(Sink& To, const Begin& fnBegin, bool blAgain) {
+    for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        const bool blReady = m_blReadBefore ? pNow->From.Rewind() : !blAgain || pNow->From.Spool();
+        if (!blReady) {
+            FailBySystem(pNow->From);
+        }
+    }
+    m_blReadBefore = true;
+    for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        fnBegin(pNow->From.Name(), pNow->How.eFormat == Format::kSeparated);
+        if (!ReadOne(*pNow, To)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+std::int64_t InputFiles::AllBytes() const {
+    std::int64_t nAll = 0;
+    for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        if (pNow->From.Size() < 0) {
+            return -1;
+        }
+        nAll += pNow->From.Size();
+    }
+    return nAll;
+}
+
+std::int64_t InputFiles::BytesRead() const {
+    std::int64_t nAll = 0;
+    for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        nAll += pNow->From.Taken();
+    }
+    return nAll;
+}
+
+std::string InputFiles::Formats() const {
+    std::string strAll;
+    for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        strAll += (strAll.empty() ? "" : ", ") + pNow->From.Name() + ": " + FormatText(pNow->How);
+        if (!pNow->strListName.empty()) {
+            strAll += ", the list \"" + pNow->strListName + "\"";
+        }
+    }
+    return strAll;
+}
+
+}  // namespace VORN_JSON_DB::Cli

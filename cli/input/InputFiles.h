@@ -1,0 +1,46 @@
+// The inputs of one call, which may be read twice.
+
+#ifndef VORNJSONDB_CLI_INPUT_INPUT_FILES_H
+#define VORNJSONDB_CLI_INPUT_INPUT_FILES_H
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "ByteSource.h"
+#include "Insert.h"
+#include "Readers.h"
+
+namespace VORN_JSON_DB::Cli {
+
+class InputFiles {
+  public:
+    // Opens all of them, and finds out their formats; an Error, if one cannot be opened.
+    explicit InputFiles(const InsertOptions& How);
+
+    // Reads one after the other; fnBegin comes before each. Returns false where the sink wanted no
+    // more; what else ends it early is an Error. blAgain: they will be read once more.
+    using Begin = std::function<void(const std::string& strName, bool blCells)>;
+    bool Read(Sink& To, const Begin& fnBegin, bool blAgain);
+
+    std::int64_t AllBytes() const;   // -1: unknown
+    std::int64_t BytesRead() const;  // of this reading
+    std::string Formats() const;     // "a.json is JSON, b.csv is CSV"
+
+  private:
+    struct Input {
+        ByteSource From;
+        ReadOptions How;
+        std::string strListName;
+    };
+
+    bool ReadOne(Input& Now, Sink& To);
+
+    std::vector<std::unique_ptr<Input>> m_vecInputs;
+    bool m_blReadBefore = false;
+};
+
+}  // namespace VORN_JSON_DB::Cli
+
+#endif  // VORNJSONDB_CLI_INPUT_INPUT_FILES_H

@@ -1,0 +1,349 @@
+#include "Insert.h"
+
+#include <unistd.h>
+
+#include <algorithm>
+#include <memory>
+
+#include "../Database.h"
+#include "InputFiles.h"
+#include "Interrupt.h"
+#include "LoaderSink.h"
+#include "NewDefinition.h"
+#include "Progress.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+// More than this is not undone as one: the undoing takes as long as the work.
+constexpr std::int64_t kMostAtOnce = std::int64_t{1} << 30;
+constexpr std::int64_t kLargeBatch = 100000;
+
+std::string Pretty(const Json::Value& jValue) {
+    Json::StreamWriterBuilder Builder;
+    Builder["indentation"] = "  ";
+    return Json::writeString(Builder, jValue);
+}
+
+// The first look at all records. Bad ones are an Error unless they are to be left out later.
+class TypesSink : public Inference {
+  public:
+    TypesSink(bool blGoOn, std::function<bool(std::int64_t)> fnAfter)
+        : m_blGoOn(blGoOn), m_fnAfter(std::move(fnAfter)) {}
+
+    void Begin(const std::string& strName, bool blCells) {
+        m_strInput = strName;
+        BeginInput(blCells);
+    }
+
+    bool EndRecord(const Place& Where) override {
+        return Inference::EndRecord(Where) && m_fnAfter(Records());
+    }
+
+    bool BadRecord(const Place& Where, const std::string& strReason) override {
+        if (!m_blGoOn) {
+            Fail(kExitBadData, m_strInput + ":" + std::to_string(Where.nLine) + ": " + strReason);
+        }
+        return Inference::BadRecord(Where, strReason);
+    }
+
+  private:
+    const bool m_blGoOn;
+    const std::function<bool(std::int64_t)> m_fnAfter;
+    std::string m_strInput;
+};
+
+class Import {
+  public:
+    Import(Context& Call, const InsertOptions& How)
+        : m_Call(Call), m_How(How), m_Files(How), m_strTable(Call.TableName()) {}
+
+    int Run();
+
+  private:
+    void OpenFile();
+    void FindDefinition();
+    void LearnTypes();
+    int ShowDryRun();
+    void CheckColumns() const;
+    void Prepare();
+    void Load();
+    bool AfterRecord();
+    void Begin();
+    void CommitBatch();
+    void NoteNulls();
+    int Finish();
+    [[noreturn]] void StopForInterrupt();
+    std::string WhatIsStored() const;
+
+    Context& m_Call;
+    const InsertOptions& m_How;
+    const Interrupt m_Guard;
+    InputFiles m_Files;
+    const std::string m_strTable;
+    Database m_pDb;
+    bool m_blNewFile = false;
+    bool m_blTableThere = false;
+    bool m_blKept = false;    // the database keeps the definition, or will
+    bool m_blToKeep = false;  // it is not there yet as it is
+    bool m_blAdded = false;   // the table lacks members of the definition
+    Json::Value m_jDefinition;
+    std::vector<std::string> m_vecNotes;
+    std::int64_t m_nBatch = 0;
+    std::int64_t m_nStored = 0;  // records that a commit has dealt with
+    // In this order: each works on what is above it.
+    Transaction m_All;
+    Table m_Table;
+    Loader m_Into;
+    std::unique_ptr<Progress> m_pProgress;
+    std::unique_ptr<LoaderSink> m_pSink;
+};
+
+int Import::Run() {
+    OpenFile();
+    try {
+        FindDefinition();
+        if (m_How.blDryRun) {
+            return ShowDryRun();
+        }
+        Load();
+        return Finish();
+    } catch (Error& Failed) {
+        m_pProgress.reset();
+        if (m_blNewFile && m_nStored == 0) {
+            unlink(m_Call.Db().c_str());
+        }
+        if (!m_How.blDryRun) {
+            Failed.strLine += WhatIsStored();
+        }
+        throw;
+    }
+}
+
+std::string Import::WhatIsStored() const {
+    return m_nStored == 0 ? " (nothing is stored)"
+                          : " (the first " + std::to_string(m_nStored) +
+                                " records are dealt with "
+                                "and stay)";
+}
+
+void Import::StopForInterrupt() {
+    Fail(kExitInterrupted, "interrupted");
+}
+
+// What only looks makes no file.
+void Import::OpenFile() {
+    m_blNewFile = access(m_Call.Db().c_str(), F_OK) != 0;
+    if (m_How.blDryRun && m_blNewFile) {
+        sqlite3* pDb = nullptr;
+        sqlite3_open(":memory:", &pDb);
+        m_pDb.reset(pDb);
+        return;
+    }
+    m_pDb = OpenDatabase(m_Call, m_How.blDryRun ? Access::kRead : Access::kCreate);
+}
+
+void Import::FindDefinition() {
+    m_blTableThere = TableExists(m_pDb.get(), m_strTable);
+    m_jDefinition = KnownDefinition(m_Call, m_pDb.get(), m_strTable);
+    m_blKept = !m_jDefinition.isNull();
+    m_blToKeep = m_Call.Has("--def");
+    if (m_blTableThere && !m_blKept) {
+        Check(DefinitionOf(m_pDb.get(), m_strTable, m_jDefinition), m_Call.Db());
+    }
+    const bool blForNew =
+        !m_How.vecNotNull.empty() || !m_How.vecDefaults.empty() || !m_How.vecTypes.empty();
+    if (m_blTableThere && blForNew) {
+        Fail(kExitUsage, "--not-null, --default and --type are for tables that are made, and \"" +
+                             m_strTable + "\" is there");
+    }
+    if (!m_How.vecKey.empty() && !m_jDefinition.isNull()) {
+        Json::Value& jKey = m_jDefinition[m_strTable]["key"];
+        jKey = Json::Value(Json::arrayValue);
+        for (const std::string& strName : m_How.vecKey) {
+            jKey.append(strName);
+        }
+    }
+    if (m_jDefinition.isNull() || m_How.blAddMembers) {
+        LearnTypes();
+    }
+    CheckColumns();
+}
+
+void Import::LearnTypes() {
+    TypesSink Seen(!m_How.strErrors.empty(), [this](std::int64_t nRecords) {
+        m_pProgress->Tick(nRecords, m_Files.BytesRead());
+        return !Interrupt::Came();
+    });
+    m_pProgress = std::make_unique<Progress>("reading types", m_Files.AllBytes(), m_Call.Quiet());
+    const bool blDone = m_Files.Read(
+        Seen, [&](const std::string& strName, bool blCells) { Seen.Begin(strName, blCells); },
+        true);
+    m_pProgress.reset();
+    if (!blDone) {
+        StopForInterrupt();
+    }
+    m_vecNotes = Seen.Notes();
+    if (!m_jDefinition.isNull()) {
+        m_blAdded = AddSeenMembers(m_strTable, Seen, m_jDefinition);
+        m_blToKeep = m_blToKeep || m_blAdded;
+        return;
+    }
+    if (Seen.Records() == 0) {
+        Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
+    }
+    m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    m_blToKeep = true;
+}
+
+void Import::CheckColumns() const {
+    const Json::ArrayIndex nMembers = m_jDefinition[m_strTable]["member"].size();
+    const int nMost = sqlite3_limit(m_pDb.get(), SQLITE_LIMIT_COLUMN, -1);
+    if (nMembers > static_cast<unsigned>(nMost)) {
+        Fail(kExitBadData, "the records have " + std::to_string(nMembers) +
+                               " different members, and a table has at most " +
+                               std::to_string(nMost) + " columns");
+    }
+}
+
+int Import::ShowDryRun() {
+    std::string strSql;
+    Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable);
+    if (m_Call.Json()) {
+        Json::Value jShown;
+        jShown["definition"] = m_jDefinition;
+        jShown["create"] = strSql;
+        Put(Pretty(jShown) + "\n");
+    } else {
+        Put(Pretty(m_jDefinition) + "\n" + strSql + ";\n");
+    }
+    for (const std::string& strNote : m_vecNotes) {
+        m_Call.Say(strNote);
+    }
+    return kExitFine;
+}
+
+void Import::Begin() {
+    Check(m_All.Begin(m_pDb.get(), Transaction::Mode::kImmediate, m_Call.WaitMs()), m_Call.Db());
+}
+
+// The table, its definition and the first records come to be at once.
+void Import::Prepare() {
+    Options How;
+    How.blCompatible = false;
+    How.blCreateTable = true;
+    How.nWaitMs = m_Call.WaitMs();
+    Begin();
+    Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db());
+    if (m_blAdded) {
+        SyncReport Report;
+        Check(m_Table.Sync(SyncMode::kChange, Report), m_Call.Db());
+        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db());
+    }
+    if (m_How.eOnDuplicate != OnDuplicate::kStop && m_Table.KeyMembers().empty()) {
+        Fail(kExitUsage, m_Call.Db() + ": --skip, --replace and --upsert need a key, and table \"" +
+                             m_strTable + "\" has none; name it with --key MEMBER");
+    }
+    if (m_blToKeep) {
+        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+        m_blKept = true;
+    }
+    LoadOptions HowToLoad;
+    HowToLoad.eOnDuplicate = m_How.eOnDuplicate;
+    HowToLoad.nRowsPerTransaction = 0;
+    HowToLoad.blGoOnAfterBad = !m_How.strErrors.empty();
+    Check(m_Into.Start(m_Table, HowToLoad), m_Call.Db());
+}
+
+void Import::Load() {
+    const std::int64_t nBytes = m_Files.AllBytes();
+    const bool blLarge = m_How.nBatch < 0 && nBytes > kMostAtOnce;
+    m_nBatch = blLarge ? kLargeBatch : std::max<std::int64_t>(0, m_How.nBatch);
+    if (blLarge) {
+        m_Call.Say("more than 1 GiB: committing after each " + std::to_string(kLargeBatch) +
+                   " records; --batch 0 makes it all or nothing");
+    }
+    std::unique_ptr<ErrorFile> pErrors;
+    if (!m_How.strErrors.empty()) {
+        pErrors = std::make_unique<ErrorFile>(m_How.strErrors);
+    }
+    Prepare();
+    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(),
+                                           [this] { return AfterRecord(); });
+    m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
+    const auto fnBegin = [this](const std::string& strName, bool blCells) {
+        m_pSink->BeginInput(strName, blCells);
+    };
+    if (!m_Files.Read(*m_pSink, fnBegin, false)) {
+        StopForInterrupt();
+    }
+    CommitBatch();
+    m_pProgress.reset();
+    if (pErrors) {
+        pErrors->Close();
+    }
+}
+
+bool Import::AfterRecord() {
+    const std::int64_t nRecords = m_Into.Counts().nRecords;
+    m_pProgress->Tick(nRecords, m_Files.BytesRead());
+    if (m_nBatch > 0 && nRecords - m_nStored >= m_nBatch) {
+        CommitBatch();
+        Begin();
+    }
+    return !Interrupt::Came();
+}
+
+void Import::CommitBatch() {
+    NoteNulls();
+    Check(m_Into.Commit(), m_Call.Db());
+    Check(m_All.Commit(), m_Call.Db());
+    m_nStored = m_Into.Counts().nRecords;
+}
+
+// Nulls that came into a table that was there are to come back as null.
+void Import::NoteNulls() {
+    bool blNew = false;
+    Json::Value& jMembers = m_jDefinition[m_strTable]["member"];
+    for (size_t i = 0; i < m_Table.Members().size(); ++i) {
+        Json::Value& jMember = jMembers[m_Table.Members()[i]];
+        if (m_pSink->NullsGiven()[i] && !jMember.isMember("nullSeen")) {
+            jMember["nullSeen"] = true;
+            blNew = true;
+        }
+    }
+    if (blNew && m_blKept) {
+        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+    }
+}
+
+int Import::Finish() {
+    const LoadCounts& Counts = m_Into.Counts();
+    const struct {
+        const char* szName;
+        std::int64_t nCount;
+    } aCounts[] = {{"inserted", Counts.nInserted},
+                   {"replaced", Counts.nReplaced},
+                   {"skipped", Counts.nSkipped},
+                   {"failed", Counts.nFailed}};
+    std::string strLine;
+    Json::Value jCounts;
+    for (const auto& Each : aCounts) {
+        strLine += (strLine.empty() ? "" : ", ") + std::to_string(Each.nCount) + " " + Each.szName;
+        jCounts[Each.szName] = Json::Int64{Each.nCount};
+    }
+    for (const std::string& strNote : m_vecNotes) {
+        m_Call.Say(strNote);
+    }
+    m_Call.Report(strLine + " (" + m_Files.Formats() + ")", jCounts);
+    return Counts.nFailed > 0 ? kExitBadData : kExitFine;
+}
+
+}  // namespace
+
+int RunInsert(Context& Call, const InsertOptions& How) {
+    return Import(Call, How).Run();
+}
+
+}  // namespace VORN_JSON_DB::Cli

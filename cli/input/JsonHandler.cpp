@@ -1,0 +1,277 @@
+#include "JsonHandler.h"
+
+#include <utility>
+
+#include "JsonQuote.h"
+#include "Numbers.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+constexpr const char* kErrorTexts[] = {
+    "nothing is wrong",
+    "there is no value",
+    "something follows the value",
+    "no value can begin like this",
+    "a member's name in quotes is missing",
+    "a colon is missing after a member's name",
+    "a comma or } is missing after a member",
+    "a comma or ] is missing after an element",
+    "\\u needs four hexadecimal digits",
+    "\\u gives half of a surrogate pair",
+    "there is no such escape in a text",
+    "a text has no end quote, or a control character that must be escaped",
+    "a text is no UTF-8; convert the input with iconv",
+    "a number is greater than any double",
+    "a number has no digit after the point",
+    "a number has no digit in the exponent",
+    "reading was ended",
+    "this is no JSON",
+};
+
+// U+D800 to U+DFFF, which RapidJSON lets pass when they come as a lone low escape.
+bool HasSurrogate(std::string_view strText) {
+    for (size_t i = strText.find('\xED'); i != std::string_view::npos;
+         i = strText.find('\xED', i + 1)) {
+        if (i + 1 < strText.size() && static_cast<unsigned char>(strText[i + 1]) >= 0xA0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+}  // namespace
+
+const char* JsonErrorText(rapidjson::ParseErrorCode eCode) {
+    return kErrorTexts[eCode];
+}
+
+JsonHandler::JsonHandler(Sink& To, JsonPosition& At, bool blLists)
+    : m_To(To), m_At(At), m_Names(To), m_eList(blLists ? List::kMayBe : List::kNone) {}
+
+// The first thing that is wrong counts.
+void JsonHandler::Blame(std::string strReason) {
+    if (m_strReason.empty()) {
+        m_strReason = std::move(strReason);
+    }
+}
+
+void JsonHandler::BeginRecord() {
+    m_blInRecord = true;
+    ++m_nRecord;
+    m_strReason.clear();
+    m_Names.BeginRecord();
+    m_At.BeginRecord();
+}
+
+bool JsonHandler::EndRecord() {
+    m_blInRecord = false;
+    const Place Where{m_nRecord, m_At.RecordLine(), m_At.RecordText()};
+    const bool blGoOn =
+        m_strReason.empty() ? m_To.EndRecord(Where) : m_To.BadRecord(Where, m_strReason);
+    m_blStopped = !blGoOn;
+    m_strReason.clear();
+    return blGoOn;
+}
+
+bool JsonHandler::Broken(const std::string& strReason) {
+    if (!m_blInRecord) {
+        BeginRecord();
+    }
+    Blame(strReason);
+    m_nLevel = m_nRecordLevel;
+    m_strJson.clear();
+    return EndRecord();
+}
+
+// A value stands where a record should.
+bool JsonHandler::NoRecord(const char* szKind) {
+    BeginRecord();
+    Blame(std::string("the record is ") + szKind + ", not an object");
+    return EndRecord();
+}
+
+void JsonHandler::CheckText(std::string_view strText) {
+    if (HasSurrogate(strText)) {
+        Blame("\\u gives half of a surrogate pair");
+    }
+}
+
+void JsonHandler::AppendToJson(std::string_view strText) {
+    m_eList = List::kNone;
+    const char cLast = m_strJson.back();
+    if (cLast != '[' && cLast != '{' && cLast != ':') {
+        m_strJson += ',';
+    }
+    m_strJson += strText;
+}
+
+void JsonHandler::AppendTextToJson(std::string_view strText) {
+    AppendToJson("");
+    AppendQuoted(strText, m_strJson);
+}
+
+bool JsonHandler::Scalar(const Value& Given, const char* szKind) {
+    if (m_nLevel == m_nRecordLevel) {
+        return NoRecord(szKind);
+    }
+    if (m_strReason.empty()) {
+        m_To.Take(m_nMember, Given);
+    }
+    return true;
+}
+
+bool JsonHandler::Null() {
+    if (m_nLevel > m_nRecordLevel + 1) {
+        AppendToJson("null");
+        return true;
+    }
+    return Scalar(Value(), "null");
+}
+
+bool JsonHandler::Bool(bool blValue) {
+    if (m_nLevel > m_nRecordLevel + 1) {
+        AppendToJson(blValue ? "true" : "false");
+        return true;
+    }
+    Value Given;
+    Given.eKind = Value::Kind::kBoolean;
+    Given.nInteger = blValue ? 1 : 0;
+    return Scalar(Given, blValue ? "true" : "false");
+}
+
+bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) {
+    const std::string_view strText(pText, nText);
+    if (m_nLevel > m_nRecordLevel + 1) {
+        AppendToJson(strText);
+        return true;
+    }
+    return Scalar(JsonNumber(strText), "a number");
+}
+
+bool JsonHandler::String(const char* pText, rapidjson::SizeType nText, bool) {
+    const std::string_view strText(pText, nText);
+    CheckText(strText);
+    if (m_nLevel > m_nRecordLevel + 1) {
+        AppendTextToJson(strText);
+        return true;
+    }
+    Value Given;
+    Given.eKind = Value::Kind::kText;
+    Given.strText = strText;
+    return Scalar(Given, "a text");
+}
+
+bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
+    const std::string_view strName(pText, nText);
+    CheckText(strName);
+    if (m_nLevel > m_nRecordLevel + 1) {
+        AppendTextToJson(strName);
+        m_strJson += ':';
+        return true;
+    }
+    if (m_nLevel < m_nRecordLevel) {
+        Blame("the object has the member \"" + std::string(strName) + "\" beside the list \"" +
+              m_strListName + "\"; take the list out of it, or use --format jsonl");
+        return false;
+    }
+    if (m_eList == List::kMayBe) {
+        m_eList = List::kNamed;
+        m_strListName = strName;
+    } else if (m_eList == List::kNamed) {
+        m_eList = List::kNone;
+    }
+    bool blTwice = false;
+    m_nMember = m_Names.Find(strName, blTwice);
+    if (m_nMember == MemberNames::kTooMany) {
+        Blame("the records have more different members than the " +
+              std::to_string(MemberNames::kMost) + " that a table can have columns");
+        return false;
+    }
+    if (blTwice) {
+        Blame("the member \"" + std::string(strName) + "\" is there twice");
+    }
+    return true;
+}
+
+// Whether the bracket makes records of what follows, instead of being a part of one.
+bool JsonHandler::IsWrappedList(char cBracket) {
+    if (m_eList == List::kMayBe && m_nLevel == 0 && cBracket == '[') {
+        m_eList = List::kNone;
+        m_nRecordLevel = 1;
+        return true;
+    }
+    if (m_eList == List::kNamed && m_nLevel == 1 && cBracket == '[') {
+        m_eList = List::kBegun;
+    } else if (m_eList == List::kBegun && m_nLevel == 2 && cBracket == '{') {
+        // What was taken for a record was the object around the list.
+        m_eList = List::kNone;
+        m_nRecordLevel = 2;
+        m_nRecord = 0;
+        m_strJson.clear();
+    } else if (m_nLevel > 0) {
+        m_eList = List::kNone;
+    }
+    return false;
+}
+
+bool JsonHandler::Open(char cBracket) {
+    const bool blList = IsWrappedList(cBracket);
+    if (m_nLevel == kMostLevels) {
+        m_strReason = "lists and objects are nested more than " + std::to_string(kMostLevels) +
+                      " levels deep";
+        return false;
+    }
+    if (!blList && m_nLevel == m_nRecordLevel) {
+        BeginRecord();
+        if (cBracket == '[') {
+            Blame("the record is a list, not an object");
+            m_strJson = "[";
+        }
+    } else if (!blList && OfMember()) {
+        m_strJson = cBracket;
+    } else if (!blList) {
+        AppendToJson(std::string_view(&cBracket, 1));
+    }
+    ++m_nLevel;
+    return true;
+}
+
+bool JsonHandler::Close(char cBracket) {
+    --m_nLevel;
+    if (m_nLevel < m_nRecordLevel) {
+        return true;  // of the list, or of the object around it
+    }
+    if (m_nLevel == m_nRecordLevel) {
+        m_strJson.clear();
+        m_eList = List::kNone;
+        return EndRecord();
+    }
+    m_strJson += cBracket;
+    if (OfMember() && m_strReason.empty()) {
+        Value Given;
+        Given.eKind = Value::Kind::kJson;
+        Given.strText = m_strJson;
+        m_To.Take(m_nMember, Given);
+    }
+    return true;
+}
+
+bool JsonHandler::StartObject() {
+    return Open('{');
+}
+
+bool JsonHandler::EndObject(rapidjson::SizeType) {
+    return Close('}');
+}
+
+bool JsonHandler::StartArray() {
+    return Open('[');
+}
+
+bool JsonHandler::EndArray(rapidjson::SizeType) {
+    return Close(']');
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,118 @@
+// JSON Lines: each line is read where it lies in memory, and a bad one harms no other.
+
+#include <cstring>
+
+#include "JsonHandler.h"
+#include "LineBuffer.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+class LinePosition : public JsonPosition {
+  public:
+    LinePosition(LineBuffer& Lines, bool blKeepText) : m_Lines(Lines), m_blKeepText(blKeepText) {}
+
+    // Before the line is read, which overwrites it.
+    void BeginLine() {
+        if (m_blKeepText) {
+            m_strText.assign(m_Lines.Begin(), m_Lines.Size());
+        }
+    }
+
+    void BeginRecord() override {}
+    std::int64_t RecordLine() override { return m_Lines.Number(); }
+    std::string_view RecordText() override { return m_strText; }
+
+  private:
+    LineBuffer& m_Lines;
+    const bool m_blKeepText;
+    std::string m_strText;
+};
+
+// Zeros after the line, as the reader needs them, and what was there afterwards.
+class Padding {
+  public:
+    explicit Padding(char* pEnd) : m_pEnd(pEnd) {
+        std::memcpy(m_acSaved, pEnd, sizeof m_acSaved);
+        std::memset(pEnd, 0, sizeof m_acSaved);
+    }
+    ~Padding() { std::memcpy(m_pEnd, m_acSaved, sizeof m_acSaved); }
+    Padding(const Padding&) = delete;
+    Padding& operator=(const Padding&) = delete;
+
+  private:
+    char* const m_pEnd;
+    char m_acSaved[LineBuffer::kPad];
+};
+
+class LinesReader {
+  public:
+    LinesReader(ByteSource& From, const ReadOptions& How, Sink& To)
+        : m_Lines(From, kMostRecordBytes),
+          m_At(m_Lines, How.blKeepText),
+          m_Handler(To, m_At, false) {}
+
+    // False: the sink wants no more.
+    bool Run() {
+        while (m_Lines.Next()) {
+            m_At.BeginLine();
+            if (!ReadLine()) {
+                return false;
+            }
+        }
+        return true;
+    }
+
+  private:
+    bool ReadLine() {
+        char* const pBegin = m_Lines.Begin();
+        const Padding Zeros(pBegin + m_Lines.Size());
+        if (m_Lines.IsTooLong()) {
+            return m_Handler.Broken("the line is longer than " + std::to_string(kMostRecordBytes) +
+                                    " bytes");
+        }
+        if (std::memchr(pBegin, '\0', m_Lines.Size()) != nullptr) {
+            return m_Handler.Broken("there is a NUL byte");
+        }
+        rapidjson::InsituStringStream Stream(pBegin);
+        rapidjson::SkipWhitespace(Stream);
+        while (Stream.Peek() != '\0') {
+            constexpr unsigned kFlags = kJsonFlags | rapidjson::kParseInsituFlag;
+            const rapidjson::ParseResult Parsed = m_Reader.Parse<kFlags>(Stream, m_Handler);
+            if (m_Handler.WasStopped()) {
+                return false;
+            }
+            if (Parsed.IsError()) {
+                return m_Handler.Broken(Problem(Parsed));
+            }
+            rapidjson::SkipWhitespace(Stream);
+        }
+        return true;
+    }
+
+    std::string Problem(const rapidjson::ParseResult& Parsed) const {
+        if (Parsed.Code() == rapidjson::kParseErrorTermination) {
+            return m_Handler.Reason();
+        }
+        return Parsed.Offset() >= m_Lines.Size() ? "the line ends inside of the record"
+                                                 : JsonErrorText(Parsed.Code());
+    }
+
+    LineBuffer m_Lines;
+    LinePosition m_At;
+    JsonHandler m_Handler;
+    rapidjson::Reader m_Reader;
+};
+
+}  // namespace
+
+ReadOutcome ReadJsonLines(ByteSource& From, const ReadOptions& How, Sink& To) {
+    ReadOutcome Result;
+    if (!LinesReader(From, How, To).Run()) {
+        Result.eEnd = ReadOutcome::End::kStopped;
+    }
+    return Result;
+}
+
+}  // namespace VORN_JSON_DB::Cli

@@ -1,0 +1,211 @@
+#include "LoaderSink.h"
+
+#include <cerrno>
+#include <cstring>
+#include <utility>
+
+#include "../Command.h"
+#include "JsonQuote.h"
+#include "Numbers.h"
+#include "Utf8.h"
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+using vornjsondb::BoundKind;
+
+bool IsJson(BoundKind eKind) {
+    return eKind == BoundKind::kObject || eKind == BoundKind::kList || eKind == BoundKind::kJson;
+}
+
+// The record's own fault, which harms no other.
+bool IsOfRecord(const Status& Outcome) {
+    return Outcome.Code() == StatusCode::kRefused || Outcome.Code() == StatusCode::kDuplicate ||
+           Outcome.Code() == StatusCode::kConstraint;
+}
+
+// JSON holds nothing but UTF-8.
+std::string WithoutBadBytes(std::string_view strBytes) {
+    std::string strText(strBytes);
+    for (size_t i = FindNoUtf8(strText); i != std::string::npos; i = FindNoUtf8(strText)) {
+        strText.replace(i, 1, "\xEF\xBF\xBD");
+    }
+    return strText;
+}
+
+std::string At(const std::string& strInput, const Place& Where) {
+    return strInput + ":" + std::to_string(Where.nLine);
+}
+
+}  // namespace
+
+ErrorFile::ErrorFile(const std::string& strPath)
+    : m_strPath(strPath), m_pFile(std::fopen(strPath.c_str(), "we")) {
+    if (m_pFile == nullptr) {
+        Fail(kExitIo, strPath + ": " + std::strerror(errno) + "; name another file for --errors");
+    }
+}
+
+void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::string& strReason) {
+    std::string strLine = "{\"file\":";
+    AppendQuoted(strInput, strLine);
+    strLine += ",\"line\":" + std::to_string(Where.nLine) +
+               ",\"record\":" + std::to_string(Where.nRecord) + ",\"reason\":";
+    AppendQuoted(strReason, strLine);
+    strLine += ",\"text\":";
+    AppendQuoted(WithoutBadBytes(Where.strText), strLine);
+    strLine += "}\n";
+    std::fwrite(strLine.data(), 1, strLine.size(), m_pFile.get());
+}
+
+void ErrorFile::Close() {
+    const bool blWritten = std::ferror(m_pFile.get()) == 0;
+    if (std::fclose(m_pFile.release()) != 0 || !blWritten) {
+        Fail(kExitIo, m_strPath + ": cannot write: " + std::strerror(errno));
+    }
+}
+
+LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors,
+                       std::function<bool()> fnAfter)
+    : m_Of(Of),
+      m_Into(Into),
+      m_pErrors(pErrors),
+      m_fnAfter(std::move(fnAfter)),
+      m_vecNulls(Of.Members().size()) {}
+
+void LoaderSink::BeginInput(const std::string& strName, bool blCells) {
+    m_strInput = strName;
+    m_blCells = blCells;
+    m_vecColumns.clear();
+}
+
+void LoaderSink::NewMember(std::string_view strName) {
+    Column Added{std::string(strName), m_Into.MemberIndex(strName), BoundKind::kNone};
+    if (Added.nLoader >= 0) {
+        const Json::Value& jMembers = m_Of.Definition()[m_Of.Name()]["member"];
+        Added.eKind = vornjsondb::TypeOfMember(jMembers[Added.strName]).Bound.eKind;
+    }
+    m_vecColumns.push_back(std::move(Added));
+}
+
+void LoaderSink::Take(size_t nMember, const Value& Given) {
+    const Column& Into = m_vecColumns[nMember];
+    if (Into.nLoader < 0) {
+        if (!m_blUnknown) {
+            m_strUnknown = Into.strName;
+        }
+        m_blUnknown = true;
+    } else if (Given.eKind == Value::Kind::kNull) {
+        m_vecNulls[static_cast<size_t>(Into.nLoader)] = true;
+        m_Into.SetNull(Into.nLoader);
+    } else if (m_blCells) {
+        SetCell(Into, Given.strText);
+    } else if (IsJson(Into.eKind)) {
+        SetAsJson(Into, Given);
+    } else {
+        Set(Into, Given);
+    }
+}
+
+void LoaderSink::Set(const Column& Into, const Value& Given) {
+    switch (Given.eKind) {
+        case Value::Kind::kBoolean:
+            return m_Into.SetBoolean(Into.nLoader, Given.nInteger != 0);
+        case Value::Kind::kInteger:
+            return m_Into.SetInteger(Into.nLoader, Given.nInteger);
+        case Value::Kind::kReal:
+            return m_Into.SetReal(Into.nLoader, Given.dReal);
+        case Value::Kind::kWide:
+            return SetWide(Into, Given.strText);
+        case Value::Kind::kJson:
+            return m_Into.SetJson(Into.nLoader, Given.strText);
+        default:
+            return m_Into.SetText(Into.nLoader, Given.strText);
+    }
+}
+
+// Into a real column the nearest double; else the digits.
+void LoaderSink::SetWide(const Column& Into, std::string_view strNumber) {
+    double dReal = 0;
+    if (Into.eKind == BoundKind::kReal && ToReal(strNumber, dReal)) {
+        m_Into.SetReal(Into.nLoader, dReal);
+    } else {
+        m_Into.SetText(Into.nLoader, strNumber);
+    }
+}
+
+// A member that holds any JSON keeps each value as its text.
+void LoaderSink::SetAsJson(const Column& Into, const Value& Given) {
+    m_strJson.clear();
+    switch (Given.eKind) {
+        case Value::Kind::kBoolean:
+            return m_Into.SetJson(Into.nLoader, Given.nInteger != 0 ? "true" : "false");
+        case Value::Kind::kText:
+        case Value::Kind::kWide:  // whose digits no reader of JSON would give back
+            AppendQuoted(Given.strText, m_strJson);
+            return m_Into.SetJson(Into.nLoader, m_strJson);
+        default:
+            return m_Into.SetJson(Into.nLoader, Given.strText);
+    }
+}
+
+// What does not look like the member's type is passed as a text, which the loader then refuses.
+void LoaderSink::SetCell(const Column& Into, std::string_view strCell) {
+    const Value Number = CellNumber(strCell);
+    double dReal = 0;
+    switch (Into.eKind) {
+        case BoundKind::kReal:
+            return ToReal(strCell, dReal) ? m_Into.SetReal(Into.nLoader, dReal)
+                                          : m_Into.SetText(Into.nLoader, strCell);
+        case BoundKind::kInteger:
+        case BoundKind::kAny:
+            return Set(Into, Number);
+        case BoundKind::kBoolean:
+            if (strCell == "1" || strCell == "true" || strCell == "0" || strCell == "false") {
+                return m_Into.SetBoolean(Into.nLoader, strCell == "1" || strCell == "true");
+            }
+            return m_Into.SetText(Into.nLoader, strCell);
+        case BoundKind::kText:
+            return m_Into.SetText(Into.nLoader, strCell);
+        default:
+            return m_Into.SetJson(Into.nLoader, strCell);
+    }
+}
+
+void LoaderSink::NotStored(const Place& Where, const std::string& strReason) {
+    if (m_pErrors == nullptr) {
+        Fail(kExitBadData, At(m_strInput, Where) + ": " + strReason);
+    }
+    m_pErrors->Add(m_strInput, Where, strReason);
+}
+
+bool LoaderSink::EndRecord(const Place& Where) {
+    if (m_blUnknown) {
+        m_blUnknown = false;
+        return BadRecord(Where,
+                         "the table has no member \"" + m_strUnknown + "\"; --add-members adds it");
+    }
+    const Status Outcome = m_Into.EndRecord();
+    if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome))) {
+        const bool blDuplicate = Outcome.Code() == StatusCode::kDuplicate;
+        const std::string strHint =
+            blDuplicate ? "; --skip, --replace or --upsert tells what to do with it" : "";
+        Fail(ExitOf(Outcome.Code(), kExitBadData),
+             At(m_strInput, Where) + ": " + LineOf(Outcome) + strHint);
+    }
+    if (!Outcome.Ok()) {
+        NotStored(Where, Outcome.Message());
+    }
+    return m_fnAfter();
+}
+
+bool LoaderSink::BadRecord(const Place& Where, const std::string& strReason) {
+    m_blUnknown = false;
+    m_Into.Reject(strReason);
+    m_Into.EndRecord().Ignore();  // counts it
+    NotStored(Where, strReason);
+    return m_fnAfter();
+}
+
+}  // namespace VORN_JSON_DB::Cli

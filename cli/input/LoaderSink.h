@@ -1,0 +1,78 @@
+// Records from a reader into a table.
+
+#ifndef VORNJSONDB_CLI_INPUT_LOADER_SINK_H
+#define VORNJSONDB_CLI_INPUT_LOADER_SINK_H
+
+#include <VornJsonDbTable.h>
+
+#include <cstdio>
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "../../src/schema/MemberType.h"
+#include "Sink.h"
+
+namespace VORN_JSON_DB::Cli {
+
+// The file of bad records: JSON Lines with file, line, record, reason and text.
+class ErrorFile {
+  public:
+    explicit ErrorFile(const std::string& strPath);  // an Error, if it cannot be written
+    void Add(const std::string& strInput, const Place& Where, const std::string& strReason);
+    void Close();
+
+  private:
+    struct CloseFile {
+        void operator()(std::FILE* pFile) const { std::fclose(pFile); }
+    };
+    std::string m_strPath;
+    std::unique_ptr<std::FILE, CloseFile> m_pFile;
+};
+
+class LoaderSink : public Sink {
+  public:
+    // The first bad record is an Error, unless pErrors takes it. fnAfter is called after each
+    // record and says whether to go on.
+    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, std::function<bool()> fnAfter);
+
+    void BeginInput(const std::string& strName, bool blCells);
+
+    void NewMember(std::string_view strName) override;
+    void Take(size_t nMember, const Value& Given) override;
+    bool EndRecord(const Place& Where) override;
+    bool BadRecord(const Place& Where, const std::string& strReason) override;
+
+    // By member of the table: whether a null came.
+    const std::vector<bool>& NullsGiven() const { return m_vecNulls; }
+
+  private:
+    struct Column {
+        std::string strName;
+        int nLoader;  // -1: the table lacks it
+        vornjsondb::BoundKind eKind;
+    };
+
+    void Set(const Column& Into, const Value& Given);
+    void SetCell(const Column& Into, std::string_view strCell);
+    void SetAsJson(const Column& Into, const Value& Given);
+    void SetWide(const Column& Into, std::string_view strNumber);
+    void NotStored(const Place& Where, const std::string& strReason);
+
+    const Table& m_Of;
+    Loader& m_Into;
+    ErrorFile* const m_pErrors;
+    const std::function<bool()> m_fnAfter;
+    std::string m_strInput;
+    bool m_blCells = false;
+    std::vector<Column> m_vecColumns;  // of the input
+    std::vector<bool> m_vecNulls;
+    std::string m_strUnknown;  // a member that the table lacks
+    bool m_blUnknown = false;
+    std::string m_strJson;
+};
+
+}  // namespace VORN_JSON_DB::Cli
+
+#endif  // VORNJSONDB_CLI_INPUT_LOADER_SINK_H

@@ -1,0 +1,87 @@
+#include "Numbers.h"
+
+#include <charconv>
+
+namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+template <typename Number>
+bool Converts(std::string_view strNumber, Number& Into) {
+    const char* const pEnd = strNumber.data() + strNumber.size();
+    const auto Result = std::from_chars(strNumber.data(), pEnd, Into);
+    return Result.ec == std::errc() && Result.ptr == pEnd;
+}
+
+bool IsDigit(char c) {
+    return c >= '0' && c <= '9';
+}
+
+size_t SkipDigits(std::string_view strText, size_t i) {
+    while (i < strText.size() && IsDigit(strText[i])) {
+        ++i;
+    }
+    return i;
+}
+
+// The length of -?(0|[1-9][0-9]*) at the text's begin; 0: there is none.
+size_t IntegerLength(std::string_view strText) {
+    const size_t nSign = strText.substr(0, 1) == "-" ? 1 : 0;
+    const size_t nEnd = SkipDigits(strText, nSign);
+    const bool blZeroFirst = nEnd > nSign + 1 && strText[nSign] == '0';
+    return nEnd == nSign || blZeroFirst ? 0 : nEnd;
+}
+
+// Whether the rest is \.[0-9]+([eE][+-]?[0-9]+)?
+bool IsFraction(std::string_view strText) {
+    const size_t nEnd = SkipDigits(strText, 1);
+    if (strText.substr(0, 1) != "." || nEnd == 1 || nEnd == strText.size()) {
+        return strText.substr(0, 1) == "." && nEnd > 1;
+    }
+    if (strText[nEnd] != 'e' && strText[nEnd] != 'E') {
+        return false;
+    }
+    const bool blSign =
+        nEnd + 1 < strText.size() && (strText[nEnd + 1] == '+' || strText[nEnd + 1] == '-');
+    const size_t nPower = nEnd + (blSign ? 2 : 1);
+    return nPower < strText.size() && SkipDigits(strText, nPower) == strText.size();
+}
+
+}  // namespace
+
+bool ToReal(std::string_view strNumber, double& dReal) {
+    return Converts(strNumber, dReal);
+}
+
+Value JsonNumber(std::string_view strNumber) {
+    Value Found;
+    Found.strText = strNumber;
+    const bool blWhole =
+        strNumber != "-0" && strNumber.find_first_of(".eE") == std::string_view::npos;
+    if (blWhole) {
+        const bool blFits = Converts(strNumber, Found.nInteger);
+        Found.eKind = blFits ? Value::Kind::kInteger : Value::Kind::kWide;
+    } else {
+        Found.eKind = ToReal(strNumber, Found.dReal) ? Value::Kind::kReal : Value::Kind::kWide;
+    }
+    return Found;
+}
+
+Value CellNumber(std::string_view strCell) {
+    Value Found;
+    Found.eKind = Value::Kind::kText;
+    Found.strText = strCell;
+    const size_t nInteger = IntegerLength(strCell);
+    if (nInteger == 0 || strCell == "-0") {
+        return Found;
+    }
+    if (nInteger == strCell.size()) {
+        const bool blFits = Converts(strCell, Found.nInteger);
+        Found.eKind = blFits ? Value::Kind::kInteger : Value::Kind::kWide;
+    } else if (IsFraction(strCell.substr(nInteger)) && ToReal(strCell, Found.dReal)) {
+        Found.eKind = Value::Kind::kReal;
+    }
+    return Found;
+}
+
+}  // namespace VORN_JSON_DB::Cli

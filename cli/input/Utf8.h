@@ -1,0 +1,20 @@
+// Whether bytes are text.
+
+#ifndef VORNJSONDB_CLI_INPUT_UTF8_H
+#define VORNJSONDB_CLI_INPUT_UTF8_H
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+namespace VORN_JSON_DB::Cli {
+
+// The offset of the first byte that is no part of UTF-8; npos where all are.
+size_t FindNoUtf8(std::string_view strBytes);
+
+// "byte 0xE9 is no UTF-8; ..."
+std::string NoUtf8Text(std::string_view strBytes, size_t nOffset);
+
+}  // namespace VORN_JSON_DB::Cli
+
+#endif  // VORNJSONDB_CLI_INPUT_UTF8_H

@@ -1,0 +1,47 @@
+#!/usr/bin/env bash
+# tables, schema, index, lint, sync, doctor, dump and load.
+source "$(dirname "$0")/Check.sh"
+make_shop
+
+expect 0 'table    records
+-------  -------
+product        3' '' -- tables shop.db --counts
+expect 0 '[{"table":"product"}]' '' -- tables shop.db --json
+expect 0 'CREATE TABLE "product" ("id" INTEGER PRIMARY KEY, "name" TEXT NOT NULL, "on" INTEGER, "price" REAL DEFAULT 0.5, "tags" TEXT);' \
+    '' -- schema shop.db product
+expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
+    index shop.db product name
+expect 0 '[{"index":"product_name","unique":false,"members":"name"}]' '' -- \
+    index shop.db product --json
+expect 0 '' 'no findings' -- lint shop.db
+expect 0 '' 'nothing to do' -- sync shop.db product
+expect 0 'check         result
+------------  ------
+integrity     ok
+foreign keys  ok
+journal mode  delete
+encoding      UTF-8
+pages         5
+free pages    0' '' -- doctor shop.db
+
+# Every value comes back with its type and bits.
+sqlite3 shop.db "CREATE TABLE odd (a, b);
+    INSERT INTO odd VALUES (1, 1.0), (-0.0, 5e-324), (9e999, -9e999), (x'00ff', ''), (NULL, 0.1),
+        (-9223372036854775808, 1.7976931348623157e308), ('a' || char(0) || 'b', cast(x'ff41' AS TEXT));
+    DELETE FROM odd WHERE rowid = 5;"
+for table in product odd; do
+    "$VORNJSONDB" dump shop.db $table >dump
+    expect 0 '' "loaded $([[ $table == odd ]] && echo 6 || echo 3) rows into table \"$table\"" -- load other.db dump
+    "$VORNJSONDB" dump other.db $table >again
+    same "dump of $table" "$(cmp dump again 2>&1)" ''
+done
+all="SELECT rowid, typeof(a), hex(a), quote(a), typeof(b), hex(b), b FROM odd"
+same 'odd values' "$(sqlite3 other.db "$all")" "$(sqlite3 shop.db "$all")"
+same 'indexes' "$(sqlite3 other.db .schema\ product)" "$(sqlite3 shop.db .schema\ product)"
+
+head -n 2 dump >cut
+expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
+sed 's/,1\.0\]/,2.0]/' dump >changed
+expect 3 '' 'error: changed:8: count or checksum differ from the rows; dump the table again' -- \
+    load fourth.db changed
+finish

@@ -1,0 +1,23 @@
+#!/usr/bin/env bash
+# What only a terminal gets: a table, cut to its width, and colours.
+source "$(dirname "$0")/Check.sh"
+make_shop
+"$VORNJSONDB" update shop.db product 1 'name=漢字漢字漢字漢字漢字' --quiet
+"$VORNJSONDB" update shop.db product 2 $'name=a\tb\e[31m' --quiet
+
+on_terminal() {
+    script -qec "stty cols $1; $2" /dev/null </dev/null | tr -d '\r'
+}
+same 'cut at 30 columns' "$(on_terminal 30 "NO_COLOR=1 '$VORNJSONDB' list shop.db product")" \
+'id  name   on    price  tags
+--  -----  ----  -----  -----
+-3  漢字           0.5
+ 1  漢字…  true    5.0  ["a"…
+ 2  a\tb…          0.1'
+same 'a bold header' "$(on_terminal 80 "'$VORNJSONDB' tables shop.db" | head -n 1)" \
+    $'\e[1mtable'
+same 'a red error' "$(on_terminal 80 "'$VORNJSONDB' lst")" \
+    $'\e[1;31merror:\e[0m unknown subcommand "lst"; did you mean "list"?'
+same 'a dumb terminal' "$(on_terminal 80 "TERM=dumb '$VORNJSONDB' lst")" \
+    'error: unknown subcommand "lst"; did you mean "list"?'
+finish

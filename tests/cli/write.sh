@@ -1,0 +1,29 @@
+#!/usr/bin/env bash
+# init, upsert, update, delete.
+source "$(dirname "$0")/Check.sh"
+make_shop
+
+expect 4 '' 'error: shop.db: there is a table "product" already; extend it with vornjsondb sync' -- \
+    init shop.db product id:int
+expect 2 '' 'error: there is no member "idd"; did you mean "id"?' -- init shop.db b id:int --key idd
+expect 0 '' 'updated 1 record' -- upsert shop.db product id=2 name=cup
+expect 0 '{"id":2,"name":"cup","price":0.1}' '' -- get shop.db product 2
+expect 3 '' 'error: shop.db: cannot save a record in table "product": NOT NULL constraint failed: product.name' \
+    -- upsert shop.db product id=7
+
+expect 0 '{"updated":2}' '' -- update shop.db product 1 2 price=9.75 --json
+expect 5 '' 'error: shop.db: table "product" has no record with the key "99"; nothing was changed' \
+    -- update shop.db product 1 99 price=1
+expect 0 2 '' -- count shop.db product price=9.75
+expect 0 '' 'updated 1 record' -- update shop.db product --where '{"id": 2}' price:=null
+expect 0 '{"id":2,"name":"cup"}' '' -- get shop.db product 2
+expect 2 '' 'error: update takes keys or --where; give one of them' -- \
+    update shop.db product price=1
+
+expect 2 '' 'error: delete --all removes every record; add --yes if that is meant' -- \
+    delete shop.db product --all
+expect 0 '' '' -- delete shop.db product 2 --quiet
+expect 0 '' 'deleted 1 record' -- delete shop.db product --where '{"id": {"$lt": 0}}'
+expect 0 '' 'deleted 1 record' -- delete shop.db product --all --yes
+expect 0 0 '' -- count shop.db product
+finish
