@@ -28,7 +28,7 @@ class Maker {
   public:
     explicit Maker(unsigned long nSeed) : m_Random(nSeed) {}
 
-    size_t Below(size_t nEnd) { return m_Random() % nEnd; }
+    size_t Below(size_t nEnd) { return static_cast<size_t>(m_Random() % nEnd); }
     bool OneIn(size_t nTimes) { return Below(nTimes) == 0; }
 
     template <typename Value>
