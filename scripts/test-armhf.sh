@@ -19,7 +19,7 @@ configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON \
     -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot" -DVORNJSONDB_CAMPAIGN_SCALE=20
 build armhf
 
-# Emulated, each of these tests would take minutes.
+# Emulated, each of these tests would take minutes, and the second handle's campaigns ten.
 export VORNJSONDB_QUERY_ROUNDS=10 VORNJSONDB_TEXT_STEP=20
 cd build/armhf
-ctest --output-on-failure --parallel "$jobs" "$@"
+ctest --output-on-failure --parallel "$jobs" --exclude-regex '^campaign_table' "$@"
