@@ -1,6 +1,7 @@
 // The SQL of queries, and what SQLite makes of it.
 
 #include <algorithm>
+#include <regex>
 
 #include "QueryFixture.h"
 
@@ -434,12 +435,14 @@ TEST_F(ConditionSql, IndexesServeWhatTheyCan) {
          "SEARCH doc USING INDEX by_size (size=?)"},
         {R"({"sort": ["name"]})", "SCAN doc USING INDEX by_name"},
         {R"({"sort": ["-name"], "limit": 5})",
-         "SCAN doc USING INDEX by_name; "
-         "USE TEMP B-TREE FOR RIGHT PART OF ORDER BY"},
+         "SCAN doc USING INDEX by_name; USE TEMP B-TREE FOR LAST TERM OF ORDER BY"},
         {R"({"sort": ["map.city"]})", "SCAN doc USING INDEX by_city"},
     };
     for (const Case& Each : kCases) {
-        EXPECT_EQ(Each.szSteps, Steps(Each.szQuery)) << Each.szQuery;
+        // SQLite 3.40 has other words for the last term.
+        const std::string strSteps =
+            std::regex_replace(Steps(Each.szQuery), std::regex("RIGHT PART OF"), "LAST TERM OF");
+        EXPECT_EQ(Each.szSteps, strSteps) << Each.szQuery;
     }
 }
 
