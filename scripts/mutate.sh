@@ -20,6 +20,7 @@ source scripts/build.sh
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" python3:python3
 configure mutate -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
+    -DVORNJSONDB_COMMAND=OFF \
     -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
 build_quietly mutate vornjsondb_tests
 

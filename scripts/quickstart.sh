@@ -7,8 +7,9 @@ cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
 
-need_packages "${compiler_packages[@]}" "${library_packages[@]}" iso-codes
-configure quickstart -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}" iso-codes
+configure quickstart -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON \
+    -DVORNJSONDB_COMMAND=ON
 if ! output=$(build quickstart vornjsondb_quickstart 2>&1); then
     printf '%s\n' "$output" >&2
     exit 1
