@@ -26,6 +26,12 @@ enum Exit : int {
     kExitInterrupted = 130
 };
 
+struct ExitMeaning {
+    Exit nExit;
+    const char* szMeaning;
+};
+const std::vector<ExitMeaning>& AllExits();
+
 // Thrown to end a subcommand; main prints "error: " and the line, which says what is wrong, where,
 // and after a semicolon what to do.
 struct Error {
@@ -66,6 +72,7 @@ struct Command {
 };
 
 const std::vector<Command>& AllCommands();
+extern const char kOverviewExamples[];  // of the command as a whole
 const std::vector<Option>& SharedOptions();
 
 // One call. The words follow Command::szWords; options are found by their long names.
