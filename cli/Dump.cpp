@@ -15,7 +15,7 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-const char kFormat[] = "vornjsondb-dump";
+const char kStreamFormat[] = "vornjsondb-dump";
 constexpr int kVersion = 1;
 
 // FNV-1a: against accidents, not against people.
@@ -113,7 +113,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     }
     Described Found;
     Json::Value& jHeader = Found.jHeader;
-    jHeader["format"] = kFormat;
+    jHeader["format"] = kStreamFormat;
     jHeader["version"] = kVersion;
     jHeader["table"] = strTable;
     const Json::Value jDefinition = KnownDefinition(Call, pDb, strTable);
@@ -231,7 +231,7 @@ Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
 }
 
 void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
-    const bool blDump = jHeader.isObject() && jHeader["format"] == kFormat &&
+    const bool blDump = jHeader.isObject() && jHeader["format"] == kStreamFormat &&
                         jHeader["table"].isString() && jHeader["columns"].isArray() &&
                         jHeader["statements"].isArray() && !jHeader["statements"].empty();
     if (!blDump) {

@@ -20,7 +20,7 @@ std::string Lines(const std::string& strText) {
     return ReadAll(strText, How);
 }
 
-struct Case {
+struct ReaderCase {
     std::string strText;
     std::string strRead;
 };
@@ -84,7 +84,7 @@ TEST(JsonReader, WhatIsWrongWithOneRecordHarmsNoOther) {
 TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
     const std::string strDeep(100000, '[');
     const std::string strUtf8 = "a text is no UTF-8; convert the input with iconv";
-    const Case aCases[] = {
+    const ReaderCase aCases[] = {
         {"[{\"a\":1},\n{\"a\" 2}]",
          "1@1: a=1\nfailed in line 2: a colon is missing after a member's name\n"},
         {"[{\"a\":1}\n{\"a\":2}]",
@@ -124,7 +124,7 @@ TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
         {"[{\"a\":" + strDeep,
          "failed in line 1: lists and objects are nested more than 1000 levels deep\n"},
     };
-    for (const Case& Each : aCases) {
+    for (const ReaderCase& Each : aCases) {
         EXPECT_EQ(Json(Each.strText), Each.strRead) << Each.strText.substr(0, 100);
     }
 }
