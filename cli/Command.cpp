@@ -28,6 +28,24 @@ constexpr ExitRow kExits[] = {
     {StatusCode::kNotADatabase, kExitIo},    {StatusCode::kInterrupted, kExitInterrupted},
 };
 
+// What a finding advises is a call of the library: here is what to type instead.
+struct RemedyRow {
+    const char* szCode;
+    const char* szRemedy;
+};
+
+constexpr RemedyRow kRemedies[] = {
+    {"full-scan", "create one by vornjsondb index, where the table is or gets large"},
+    {"key-not-unique", "vornjsondb sync adds a unique index"},
+    {"missing-column", "vornjsondb sync adds it"},
+    {"missing-unique", "vornjsondb sync adds a unique index"},
+    {"no-condition", "give a condition; delete --all removes all records"},
+    {"unknown-member", "correct the name, or add the member by insert --add-members"},
+    {"unknown-operator", "see vornjsondb list --help"},
+    {"unknown-type", "see vornjsondb init --help"},
+    {"wrong-operator", "$like and $prefix are for texts, $contains is for lists"},
+};
+
 void CheckOutput(bool blWritten) {
     if (!blWritten) {
         Fail(kExitIo, std::string("standard output: cannot write: ") + std::strerror(errno) +
@@ -56,10 +74,19 @@ int ExitOf(StatusCode eCode, int nRefused) {
     return kExitUnexpected;
 }
 
+std::string RemedyOf(const Finding& Found) {
+    for (const RemedyRow& Row : kRemedies) {
+        if (std::strcmp(Row.szCode, Found.szCode) == 0) {
+            return Row.szRemedy;
+        }
+    }
+    return Found.strRemedy;
+}
+
 std::string LineOf(const Status& Outcome) {
     for (const Finding& Found : Outcome.Findings()) {
         if (Found.eSeverity == Severity::kError && !Found.strRemedy.empty()) {
-            return Outcome.Message() + "; " + Found.strRemedy;
+            return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
     return Outcome.Message();
@@ -67,7 +94,9 @@ std::string LineOf(const Status& Outcome) {
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     if (!Outcome.Ok()) {
-        Fail(ExitOf(Outcome.Code(), nRefused), strWhere + ": " + LineOf(Outcome));
+        const bool blLocked = Outcome.Code() == StatusCode::kLocked;
+        Fail(ExitOf(Outcome.Code(), nRefused),
+             strWhere + ": " + LineOf(Outcome) + (blLocked ? kLockedRemedy : ""));
     }
 }
 

@@ -21,7 +21,9 @@ const Option kDryRun{"--dry-run", "-n", "", "show what would be done, and change
 
 const char kConditionText[] =
     "member=value means equal; the value is text for a text member, else JSON. member:=JSON is\n"
-    "JSON for every member: name:=null. All conditions must hold.\n";
+    "JSON for every member: name:=null. All conditions must hold.\n"
+    "Operators of --where: $eq $ne $lt $lte $gt $gte $between $in $nin $null, for texts $like\n"
+    "$prefix, for lists $contains; $and $or $not combine conditions.\n";
 
 const std::vector<Command>& Rows() {
     static const std::vector<Command> vecRows = {

@@ -49,7 +49,7 @@ std::string FileOf(sqlite3* pDb) {
     std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
     const StatusCode eCode = CodeOf(sqlite3_extended_errcode(pDb));
     if (eCode == StatusCode::kLocked) {
-        strLine += "; try again, or wait longer with --wait MS";
+        strLine += kLockedRemedy;
     }
     Fail(ExitOf(eCode), strLine);
 }
@@ -88,8 +88,7 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
         }
         if (CodeOf(sqlite3_errcode(pDb)) == StatusCode::kLocked) {
             Fail(kExitLocked, strFile + ": " + sqlite3_errmsg(pDb) + " (waited " +
-                                  std::to_string(Call.WaitMs()) +
-                                  " ms); try again, or wait longer with --wait MS");
+                                  std::to_string(Call.WaitMs()) + " ms)" + kLockedRemedy);
         }
         FailBySqlite(pDb, strFile);
     }
@@ -116,7 +115,7 @@ std::string ReadFile(const std::string& strFile) {
     return strText;
 }
 
-Json::Value ParseJson(const std::string& strText, const std::string& strWhere) {
+Json::Value ParseJson(const std::string& strText, const std::string& strWhere, int nExit) {
     Json::CharReaderBuilder Builder;
     Json::CharReaderBuilder::strictMode(&Builder.settings_);
     Builder["strictRoot"] = false;
@@ -138,8 +137,8 @@ Json::Value ParseJson(const std::string& strText, const std::string& strWhere) {
         std::getline(Lines, strPlace);
         std::getline(Lines, strReason);
         strReason.erase(0, strReason.find_first_not_of(' '));
-        Fail(kExitBadData, strWhere + ": " + strPlace +
-                               (strReason.empty() ? "" : ": " + strReason) + "; it must be JSON");
+        Fail(nExit, strWhere + ": " + strPlace + (strReason.empty() ? "" : ": " + strReason) +
+                        "; it must be JSON");
     }
     return jValue;
 }
