@@ -55,6 +55,14 @@ same 'zsh: options' "$(in_zsh 'vornjsondb list shop.db price --no')" 'vornjsondb
 same 'zsh: choices' "$(in_zsh 'vornjsondb list shop.db price --format ts')" 'vornjsondb list shop.db price --format tsv '
 same 'zsh: shells' "$(in_zsh 'vornjsondb completion z')" 'vornjsondb completion zsh '
 
+# The table of exit codes: in the sources, in the manual and on the page.
+root=$(dirname "$0")/../..
+codes=$(sed -n 's/^    kExit[A-Za-z]* = \([0-9]*\),*$/\1/p' "$root/cli/Command.h")
+documented=$(sed -n 's/^| \([0-9]*\) | \(.*\) |$/\1 \2/p' "$root/docs/command.md")
+same 'exit codes: page' "$(cut -d ' ' -f 1 <<<"$documented")" "$codes"
+same 'exit codes: manual' "$(sed -n '/^\.Sh EXIT/,/^\.El/p' script.man | sed 's/\\-/-/g' |
+    sed -n '/^\.It/{N;s/^\.It //;s/\n/ /;p}')" "$documented"
+
 same 'the manual is clean' \
     "$(mandoc -T lint -W style script.man 2>&1 | grep -v 'outdated mandoc.db')" ''
 
@@ -63,6 +71,7 @@ same 'number of subcommands' "$(($(wc -w <<<"$names") >= 17))" 1
 for name in $names; do
     "$VORNJSONDB" "$name" --help >help
     same "$name: examples first" "$(head -n 1 help)" Examples
+    same "$name: on the page" "$(($(grep -cE "vornjsondb $name\b" "$root/docs/command.md") > 0))" 1
     same "$name: in the manual" "$(grep -c "^\.Ss $name\$" script.man)" 1
     options=$(sed -n '/^Options/,$s/^  \(-., \|    \)\(--[a-z-]*\).*/\2/p' help)
     for option in $options; do
@@ -71,7 +80,7 @@ for name in $names; do
         same "$name $option: fish" \
             "$(grep -cE -- "from $name' -l ${option#--}( |\$)" script.fish)" 1
         same "$name $option: zsh" \
-            "$(sed -n "/^        $name) _arguments/,/;;/p" script.zsh | grep -cE -- "[',*]$option[}['=]")" 1
+            "$(sed -n "/^        $name) _arguments/,/;;/p" script.zsh | grep -cE -- "[',*]${option}[}['=]")" 1
         same "$name $option: manual" \
             "$(($(grep -cF -- "Fl \\-${option#--}" <(sed 's/\\-/-/g; s/Fl -/Fl \\-/g' script.man)) > 0))" 1
     done

@@ -42,3 +42,4 @@ check() {
 }
 
 check README.md
+check docs/command.md
