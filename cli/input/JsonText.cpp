@@ -9,8 +9,7 @@ namespace {
 
 // Numbers stay texts: one that no double holds is JSON as well.
 constexpr unsigned kFlags = rapidjson::kParseValidateEncodingFlag |
-                            rapidjson::kParseNumbersAsStringsFlag |
-                            rapidjson::kParseIterativeFlag;
+                            rapidjson::kParseNumbersAsStringsFlag | rapidjson::kParseIterativeFlag;
 
 }  // namespace
 

@@ -105,7 +105,9 @@ TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
          "failed in line 1: a number is greater than any double\n"},
         {"[{\"a\":NaN}]", "failed in line 1: no value can begin like this\n"},
         {"[{\"a\":'x'}]", "failed in line 1: no value can begin like this\n"},
-        {"[{\"a\":\"\\x\"}]", "failed in line 1: there is no such escape in a text\n"},
+        {"[{\"a\":\"\\x\"}]",
+         "failed in line 1: a text has an escape that JSON has not, or a "
+         "control character that must be escaped\n"},
         {"[{\"a\":\"\\u12G4\"}]", "failed in line 1: \\u needs four hexadecimal digits\n"},
         {"[{\"a\":\"\\ud800\"}]", "failed in line 1: \\u gives half of a surrogate pair\n"},
         {"[{\"a\":\"\xC0\xAF\"}]", "failed in line 1: " + strUtf8 + "\n"},
