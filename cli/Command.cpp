@@ -17,15 +17,21 @@ namespace {
 struct ExitRow {
     StatusCode eCode;
     int nExit;
+    const char* szHint;  // what to do, where no finding tells
 };
 
 // kRefused is the caller's to say. What is not here is unexpected.
 constexpr ExitRow kExits[] = {
-    {StatusCode::kNotFound, kExitNotFound},  {StatusCode::kDuplicate, kExitDuplicate},
-    {StatusCode::kConstraint, kExitBadData}, {StatusCode::kLocked, kExitLocked},
-    {StatusCode::kReadOnly, kExitIo},        {StatusCode::kDiskFull, kExitIo},
-    {StatusCode::kIoError, kExitIo},         {StatusCode::kCorrupt, kExitIo},
-    {StatusCode::kNotADatabase, kExitIo},    {StatusCode::kInterrupted, kExitInterrupted},
+    {StatusCode::kNotFound, kExitNotFound, ""},
+    {StatusCode::kDuplicate, kExitDuplicate, ""},
+    {StatusCode::kConstraint, kExitBadData, ""},
+    {StatusCode::kLocked, kExitLocked, "; try again, or wait longer with --wait MS"},
+    {StatusCode::kReadOnly, kExitIo, "; check the permissions of the file and of its folder"},
+    {StatusCode::kDiskFull, kExitIo, "; free some space"},
+    {StatusCode::kIoError, kExitIo, "; check the disk and the shell's limits"},
+    {StatusCode::kCorrupt, kExitIo, "; restore it from a copy"},
+    {StatusCode::kNotADatabase, kExitIo, "; name an SQLite database first"},
+    {StatusCode::kInterrupted, kExitInterrupted, ""},
 };
 
 // What a finding advises is a call of the library: here is what to type instead.
@@ -83,20 +89,27 @@ std::string RemedyOf(const Finding& Found) {
     return Found.strRemedy;
 }
 
+const char* HintFor(StatusCode eCode) {
+    for (const ExitRow& Row : kExits) {
+        if (Row.eCode == eCode) {
+            return Row.szHint;
+        }
+    }
+    return "";
+}
+
 std::string LineOf(const Status& Outcome) {
     for (const Finding& Found : Outcome.Findings()) {
         if (Found.eSeverity == Severity::kError && !Found.strRemedy.empty()) {
             return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
-    return Outcome.Message();
+    return Outcome.Message() + HintFor(Outcome.Code());
 }
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     if (!Outcome.Ok()) {
-        const bool blLocked = Outcome.Code() == StatusCode::kLocked;
-        Fail(ExitOf(Outcome.Code(), nRefused),
-             strWhere + ": " + LineOf(Outcome) + (blLocked ? kLockedRemedy : ""));
+        Fail(ExitOf(Outcome.Code(), nRefused), strWhere + ": " + LineOf(Outcome));
     }
 }
 

@@ -41,15 +41,13 @@ struct Error {
 
 [[noreturn]] void Fail(int nExit, std::string strLine);
 
-// Behind every message that tells of a locked database.
-constexpr char kLockedRemedy[] = "; try again, or wait longer with --wait MS";
-
 // Throws what a failed Status stands for: "WHERE: message; remedy". What kRefused is depends on who
 // wrote the arguments: a person at the shell (usage) or the data (kExitBadData).
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused = kExitUsage);
 int ExitOf(StatusCode eCode, int nRefused = kExitUsage);
 std::string LineOf(const Status& Outcome);
 std::string RemedyOf(const Finding& Found);
+const char* HintFor(StatusCode eCode);  // "; what to do", or nothing
 
 // "; did you mean "NAME"?" for the nearest of vecNames, or nothing where none is near.
 std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames);
