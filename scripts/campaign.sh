@@ -12,7 +12,7 @@
 # model   random sequences of all operations beside a model of the library. --count SEQUENCES;
 #         "sequence S" in the output runs alone with --seed S --count 1.
 #
-# memory and io then run with the operations of VORN_JSON_DB::Table as well.
+# All but model then run with the operations of VORN_JSON_DB::Table as well.
 #
 # --record puts the figures into docs/reliability.md.
 set -euo pipefail
@@ -50,7 +50,7 @@ run() {
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
 programs=("$name")
-if [[ $name == memory || $name == io ]]; then
+if [[ $name != model ]]; then
     programs+=("table_$name")
 fi
 for program in "${programs[@]}"; do
