@@ -59,13 +59,31 @@ void CheckOutput(bool blWritten) {
     }
 }
 
+// Names and values in a message may come from anywhere, and must not steer the terminal. U+0080 to
+// U+009F do so, too; in UTF-8 they begin with the byte C2.
+std::string OneLine(const std::string& strText) {
+    std::string strLine;
+    bool blAfterC2 = false;
+    for (const char c : strText) {
+        const auto nByte = static_cast<unsigned char>(c);
+        if (nByte == '\n' || nByte == '\r') {
+            strLine += ' ';
+        } else if (nByte < ' ' || nByte == 0x7F || (blAfterC2 && nByte < 0xA0)) {
+            constexpr char kDigits[] = "0123456789abcdef";
+            strLine.resize(strLine.size() - (blAfterC2 && nByte >= 0x80 ? 1 : 0));
+            strLine += std::string("\\x") + kDigits[nByte >> 4U] + kDigits[nByte & 15U];
+        } else {
+            strLine += c;
+        }
+        blAfterC2 = nByte == 0xC2;
+    }
+    return strLine;
+}
+
 }  // namespace
 
-void Fail(int nExit, std::string strLine) {
-    for (char& c : strLine) {
-        c = c == '\n' || c == '\r' ? ' ' : c;
-    }
-    throw Error{nExit, std::move(strLine)};
+void Fail(int nExit, const std::string& strLine) {
+    throw Error{nExit, OneLine(strLine)};
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
@@ -169,7 +187,7 @@ int Context::WaitMs() const {
 
 void Context::Say(const std::string& strLine) const {
     if (!Quiet()) {
-        std::fprintf(stderr, "%s\n", strLine.c_str());
+        static_cast<void>(std::fprintf(stderr, "%s\n", OneLine(strLine).c_str()));
     }
 }
 

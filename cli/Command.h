@@ -39,7 +39,7 @@ struct Error {
     std::string strLine;
 };
 
-[[noreturn]] void Fail(int nExit, std::string strLine);
+[[noreturn]] void Fail(int nExit, const std::string& strLine);
 
 // Throws what a failed Status stands for: "WHERE: message; remedy". What kRefused is depends on who
 // wrote the arguments: a person at the shell (usage) or the data (kExitBadData).

@@ -47,8 +47,8 @@ expect 6 '' 'error: shop.db: database is locked (waited 10 ms); try again, or wa
 wait
 rm go
 mkfifo go
-(echo 'BEGIN IMMEDIATE; SELECT 1;'; cat go) | sqlite3 shop.db >held &
-until [[ -s held ]]; do sleep 0.05; done
+(echo 'BEGIN IMMEDIATE; SELECT 1;'; cat go) | sqlite3 shop.db >held_again &
+until [[ -s held_again ]]; do sleep 0.05; done
 expect 6 '' 'error: shop.db: cannot begin a transaction: database is locked (waited 10 ms); try again, or wait longer with --wait MS' \
     -- delete shop.db product 1 --wait 10
 : >go
@@ -66,4 +66,11 @@ expect 3 '' 'error: shop.db: cannot make a statement for table "shelf": member "
     -- init shop.db shelf a:txt
 expect 2 '' 'error: shop.db: cannot remove records from table "product": the query has no condition and would reach every record; give a condition; delete --all removes all records' \
     -- delete shop.db product --where '{}'
+
+# What a message quotes does not steer the terminal.
+expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \
+    list shop.db $'a\e[31m\u009b0m\nb'
+echo '[{"id": 9, "name": "x"}]' >$'a\e[31m.json'
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (a\x1b[31m.json: JSON)' -- \
+    insert shop.db product $'a\e[31m.json'
 finish
