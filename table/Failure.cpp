@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -82,13 +83,13 @@ std::string Doing::Text() const {
     if (nRecord != 0) {
         strText.replace(strText.find('#'), 1, std::to_string(nRecord));
     }
-    return pstrTable == nullptr ? strText : strText + " table " + Quoted(*pstrTable);
+    return pstrTable == nullptr ? strText : Concat({strText, " table ", Quoted(*pstrTable)});
 }
 
 Status Fail(StatusCode eCode, const Doing& What, const std::string& strReason) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = eCode;
-    pDetails->strMessage = What.Text() + ": " + strReason;
+    pDetails->strMessage = Concat({What.Text(), ": ", strReason});
     return Status(std::move(pDetails));
 }
 
@@ -101,7 +102,7 @@ Status FailBySqlite(sqlite3* pDb, int nResult, const Doing& What) {
     pDetails->eCode = CodeOf(pDetails->nSqliteCode, pDetails->nSystemError);
     pDetails->eRetry = RetryOf(pDetails->nSqliteCode, sqlite3_get_autocommit(pDb) == 0);
     pDetails->strMessage =
-        What.Text() + ": " + (blLast ? sqlite3_errmsg(pDb) : sqlite3_errstr(nResult));
+        Concat({What.Text(), ": ", blLast ? sqlite3_errmsg(pDb) : sqlite3_errstr(nResult)});
     ReportRefusal(pDetails->strMessage, pDetails->vecFindings);
     return Status(std::move(pDetails));
 }
@@ -114,7 +115,7 @@ Status FromFindings(FindingList vecFindings, const Doing& What) {
     for (const Finding& Found : vecFindings) {
         if (Found.eSeverity == Severity::kError) {
             pDetails->eCode = StatusCode::kRefused;
-            pDetails->strMessage = What.Text() + ": " + Found.strMessage;
+            pDetails->strMessage = Concat({What.Text(), ": ", Found.strMessage});
             break;
         }
     }
@@ -133,7 +134,7 @@ Status Amended(const Status& Outcome, Retry eRetry, const std::string& strMore) 
     pDetails->eRetry = eRetry;
     pDetails->nSqliteCode = Outcome.SqliteCode();
     pDetails->nSystemError = Outcome.SystemError();
-    pDetails->strMessage = Outcome.Message() + strMore;
+    pDetails->strMessage = Concat({Outcome.Message(), strMore});
     pDetails->vecFindings = Outcome.Findings();
     return Status(std::move(pDetails));
 }

@@ -3,6 +3,7 @@
 #include <cstring>
 #include <utility>
 
+#include "Concat.h"
 #include "LeafSql.h"
 
 namespace vornjsondb {
@@ -55,7 +56,7 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
         return false;
     }
     if (const char* szFault = PatternFault(Pattern.Value.strBytes)) {
-        Why = {FindingCode::kBadPattern, "pattern " + Shown(jPattern) + " " + szFault};
+        Why = {FindingCode::kBadPattern, Concat({"pattern ", Shown(jPattern), " ", szFault})};
         return false;
     }
     m_strSql += '(';

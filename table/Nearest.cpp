@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -62,7 +63,7 @@ std::string Nearest(std::string_view strTyped, const std::vector<std::string>& v
 
 std::string Suggestion(std::string_view strTyped, const std::vector<std::string>& vecCandidates) {
     const std::string strNearest = Nearest(strTyped, vecCandidates);
-    return strNearest.empty() ? strNearest : " (did you mean " + Quoted(strNearest) + "?)";
+    return strNearest.empty() ? strNearest : Concat({" (did you mean ", Quoted(strNearest), "?)"});
 }
 
 }  // namespace vornjsondb

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "Concat.h"
 
 namespace vornjsondb {
 
@@ -26,7 +27,7 @@ Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& j
     while (pRow->eMisfit != eMisfit && pRow + 1 != std::end(kMisfits)) {
         ++pRow;
     }
-    return {pRow->eCode, strOf + ": " + Shown(jValue) + " " + pRow->szReason};
+    return {pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason})};
 }
 
 std::string_view TextOf(const Json::Value& jText) {
@@ -65,13 +66,13 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
         Out.eKind = KindOf(Out.Value);
         return true;
     }
-    const std::string strMember = "member " + Quoted(Of.strName);
+    const std::string strMember = Concat({"member ", Quoted(Of.strName)});
     if (eMisfit == Misfit::kKind && Of.Kind() == BoundKind::kList) {
         Why = {FindingCode::kListMember,
-               strMember + " is a list, and " + Shown(jValue) + " is none"};
+               Concat({strMember, " is a list, and ", Shown(jValue), " is none"})};
     } else if (eMisfit == Misfit::kKind) {
         Why = {FindingCode::kWrongKind,
-               strMember + " is " + Expected(*Of.pType) + ", not " + Shown(jValue)};
+               Concat({strMember, " is ", Expected(*Of.pType), ", not ", Shown(jValue)})};
     } else {
         Why = ProblemOf(eMisfit, strMember, jValue);
     }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Concat.h"
 #include "Nearest.h"
 
 namespace vornjsondb {
@@ -30,12 +31,14 @@ bool IsReachable(std::string_view strName) {
 bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const std::string_view strName = strSteps.substr(1, strSteps.find_first_of(".[", 1) - 1);
     if (strName.empty() || !IsReachable(strName)) {
-        Why = {FindingCode::kBadPath, strName.empty() ? "a name is missing in it"
-                                                      : "no path leads to " + ShownText(strName)};
+        Why = {FindingCode::kBadPath, strName.empty()
+                                          ? "a name is missing in it"
+                                          : Concat({"no path leads to ", ShownText(strName)})};
         return false;
     }
     if (IsNumber(strName)) {
-        Why = {FindingCode::kNumberInPath, ShownText(strName) + " would be a name, not an index"};
+        Why = {FindingCode::kNumberInPath,
+               Concat({ShownText(strName), " would be a name, not an index"})};
         return false;
     }
     strOut.append(".\"");
@@ -77,8 +80,8 @@ bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
 
 std::string Guarded(const char* szFunction, const std::string& strColumn,
                     const std::string& strPath) {
-    return "CASE WHEN json_valid(" + strColumn + ") THEN " + szFunction + "(" + strColumn +
-           (strPath.empty() ? "" : ", ") + strPath + ") END";
+    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN ", szFunction, "(", strColumn,
+                   strPath.empty() ? "" : ", ", strPath, ") END"});
 }
 
 }  // namespace
@@ -96,9 +99,9 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     }
     if (Out.nMember == Members::kNone) {
         const std::string_view strFirst = strName.substr(0, strName.find_first_of(".["));
-        Why = {FindingCode::kUnknownMember, "table " + Of.QuotedTable() + " has no member " +
-                                                ShownText(strFirst) +
-                                                Suggestion(strFirst, Of.Names())};
+        Why = {FindingCode::kUnknownMember,
+               Concat({"table ", Of.QuotedTable(), " has no member ", ShownText(strFirst),
+                       Suggestion(strFirst, Of.Names())})};
         return false;
     }
     if (nEnd == strName.size()) {
@@ -106,8 +109,9 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     }
     const Member& Base = Of.At(Out.nMember);
     if (!Base.IsJson()) {
-        Why = {FindingCode::kNoJsonMember, "member " + ShownText(Base.strName) + " of type \"" +
-                                               Base.pType->szName + "\" has nothing inside"};
+        Why = {FindingCode::kNoJsonMember,
+               Concat({"member ", ShownText(Base.strName), " of type \"", Base.pType->szName,
+                       "\" has nothing inside"})};
         return false;
     }
     const bool blTooLong = strName.size() > kMostPathBytes;
@@ -115,7 +119,7 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
         Why = {FindingCode::kBadPath, "it is too long"};
     }
     if (blTooLong || !TakeSteps(strName.substr(nEnd), Out.strPath, Why)) {
-        Why.strMessage = "path " + ShownText(strName) + ": " + Why.strMessage;
+        Why.strMessage = Concat({"path ", ShownText(strName), ": ", Why.strMessage});
         return false;
     }
     return true;
@@ -131,9 +135,9 @@ std::string KindAt(const std::string& strColumn, const std::string& strPath) {
 
 // One CASE in the other: SQLite does not promise to look at the left side of an AND first.
 std::string ElementsAt(const std::string& strColumn, const std::string& strPath) {
-    const std::string strTail = (strPath.empty() ? "" : ", ") + strPath;
-    return "CASE WHEN json_valid(" + strColumn + ") THEN CASE json_type(" + strColumn + strTail +
-           ") WHEN 'array' THEN " + strColumn + " END END" + strTail;
+    const std::string strTail = Concat({strPath.empty() ? "" : ", ", strPath});
+    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN CASE json_type(", strColumn, strTail,
+                   ") WHEN 'array' THEN ", strColumn, " END END", strTail});
 }
 
 }  // namespace vornjsondb

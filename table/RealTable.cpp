@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Statements.h"
 
@@ -44,7 +45,7 @@ bool IsColumn(const RealTable& Real, const char* szName) {
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
         OwnStatement pStatement;
-        const std::string strSql = std::string("SELECT ") + szName + " FROM " + Quoted(strTable);
+        const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
         if (!IsColumn(Real, szName) && Prepare(pDb, strSql, pStatement) == SQLITE_OK) {
             return szName;
         }

@@ -3,6 +3,7 @@
 #include <string_view>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -14,17 +15,17 @@ std::string InsertSql(const Members& Of, const RecordValues& Values) {
     std::string strValues;
     for (size_t i = 0; i < Of.Size(); ++i) {
         if (Values.Has(i)) {
-            strColumns += (strColumns.empty() ? " (" : ", ") + Of.At(i).strQuoted;
+            Append(strColumns, {strColumns.empty() ? " (" : ", ", Of.At(i).strQuoted});
             strValues += strValues.empty() ? ") VALUES (?" : ", ?";
         }
     }
-    return "INSERT INTO " + Of.QuotedTable() + strColumns + strValues + ")";
+    return Concat({"INSERT INTO ", Of.QuotedTable(), strColumns, strValues, ")"});
 }
 
 std::string KeyList(const Members& Of) {
     std::string strList;
     for (const size_t nMember : Of.Key()) {
-        strList += (strList.empty() ? "(" : ", ") + Of.At(nMember).strQuoted;
+        Append(strList, {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted});
     }
     return strList + ")";
 }
@@ -35,11 +36,11 @@ std::string OnConflict(const Members& Of, bool blReplace) {
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
         if (blReplace && !Other.blKey && !Other.blGenerated) {
-            strSet += (strSet.empty() ? "UPDATE SET " : ", ") + Other.strQuoted + "=excluded." +
-                      Other.strQuoted;
+            Append(strSet, {strSet.empty() ? "UPDATE SET " : ", ", Other.strQuoted, "=excluded.",
+                            Other.strQuoted});
         }
     }
-    return " ON CONFLICT " + KeyList(Of) + " DO " + (strSet.empty() ? "NOTHING" : strSet);
+    return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet.empty() ? "NOTHING" : strSet});
 }
 
 // A record of nothing but its key changes nothing: "id" = "id" finds out whether it is there.
@@ -47,12 +48,12 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     std::string strSet;
     for (size_t i = 0; i < Of.Size(); ++i) {
         if (Values.Has(i) && !Of.At(i).blKey) {
-            strSet += (strSet.empty() ? "" : ", ") + Of.At(i).strQuoted + "=?";
+            Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
     const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
-    return "UPDATE " + Of.QuotedTable() + " SET " +
-           (strSet.empty() ? strKey + "=" + strKey : strSet) + WhereKey(Of);
+    return Concat({"UPDATE ", Of.QuotedTable(), " SET ",
+                   strSet.empty() ? strKey + "=" + strKey : strSet, WhereKey(Of)});
 }
 
 }  // namespace
@@ -60,7 +61,8 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
-        strWhere += (strWhere.empty() ? " WHERE " : " AND ") + Of.At(nMember).strColumn + " = ?";
+        Append(strWhere,
+               {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn, " = ?"});
     }
     return strWhere;
 }
@@ -75,7 +77,7 @@ std::string RecordWriter::Sql(Verb eVerb) const {
         case Verb::kUpdate:
             return UpdateSql(m_Into.Of, m_Values);
         default:
-            return "SELECT 1 FROM " + m_Into.Of.QuotedTable() + WhereKey(m_Into.Of);
+            return Concat({"SELECT 1 FROM ", m_Into.Of.QuotedTable(), WhereKey(m_Into.Of)});
     }
 }
 
@@ -153,12 +155,12 @@ Status RecordWriter::WithValues(const Status& Failed) const {
     const std::string& strMessage = Failed.Message();
     std::string strMore;
     for (size_t i = 0; i < Of.Size(); ++i) {
-        const std::string strName = Of.Table() + "." + Of.At(i).strName;
+        const std::string strName = Concat({Of.Table(), ".", Of.At(i).strName});
         const size_t nFound = strMessage.rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
-            strMore +=
-                (strMore.empty() ? " (" : ", ") + Of.At(i).strName + " = " + Shown(m_Values.At(i));
+            Append(strMore,
+                   {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
         }
     }
     return strMore.empty() ? Failed : Amended(Failed, Failed.Advice(), strMore + ")");

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "Attempt.h"
+#include "Concat.h"
 #include "CreateStatement.h"
 #include "FindingCodes.h"
 #include "RealTable.h"
@@ -46,8 +47,9 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     const auto* pEncoding = sqlite3_column_text(pStatement.get(), 0);
     const char* szEncoding = reinterpret_cast<const char*>(pEncoding);
     if (szEncoding != nullptr && std::strcmp(szEncoding, "UTF-8") != 0) {
-        return vornjsondb::Fail(StatusCode::kRefused, What,
-                                std::string("the database is ") + szEncoding + ", not UTF-8");
+        return vornjsondb::Fail(
+            StatusCode::kRefused, What,
+            vornjsondb::Concat({"the database is ", szEncoding, ", not UTF-8"}));
     }
     return {};
 }
@@ -189,7 +191,8 @@ Status CheckVersion(int nVersion, const char* szVersion, const Doing& What) {
     return nVersion >= kOldest
                ? Status()
                : Fail(StatusCode::kRefused, What,
-                      std::string("SQLite 3.35 or later is needed, and this is ") + szVersion);
+                      vornjsondb::Concat(
+                          {"SQLite 3.35 or later is needed, and this is ", szVersion}));
 }
 
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
