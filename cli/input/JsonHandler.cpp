@@ -93,7 +93,7 @@ bool JsonHandler::NoRecord(const char* szKind) {
 }
 
 void JsonHandler::CheckText(std::string_view strText) {
-    if (HasSurrogate(strText)) {
+    if (m_blEscapes && HasSurrogate(strText)) {
         Blame("\\u gives half of a surrogate pair");
     }
 }
