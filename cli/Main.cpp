@@ -61,5 +61,11 @@ int main(int nArguments, char** pszArguments) {
         return Report(kExitIo,
                       std::string("standard output: cannot write: ") + std::strerror(errno));
     }
+    if (nExit == kExitInterrupted) {
+        // A loop in a shell goes on unless the signal itself ended the command; the shell shows
+        // 130.
+        signal(SIGINT, SIG_DFL);
+        raise(SIGINT);
+    }
     return nExit;
 }
