@@ -28,6 +28,14 @@ struct RealTable {
 // Returns SQLite's result. A table that is not there is no failure.
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 
+// Whether the name is that of a view. Returns SQLite's result.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
+
+// Whether two SQL expressions without names have one value; as JSON, where both are JSON. What
+// SQLite cannot compute counts as the same. Returns SQLite's result.
+int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& strRight, bool blJson,
+                 bool& blSame);
+
 }  // namespace vornjsondb
 
 #endif  // VORN_TABLE_REAL_TABLE_H
