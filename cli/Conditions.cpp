@@ -120,7 +120,7 @@ Json::Value ParseKey(const Table& Of, const std::string& strWord) {
                                   std::to_string(vecKey.size()) + " members, one of them ";
     for (const std::string& strMember : vecKey) {
         if (!jKey.isObject() || !jKey.isMember(strMember) || jKey.size() != vecKey.size()) {
-            Fail(kExitUsage, strWanted + '"' + strMember + '"');
+            Fail(kExitUsage, strWanted + Quoted(strMember));
         }
     }
     return jKey;
