@@ -22,7 +22,7 @@ int OpenNameless() {
     const char* const szFolder = std::getenv("TMPDIR");
     std::string strPath = szFolder != nullptr && *szFolder != '\0' ? szFolder : "/tmp";
     strPath += "/vornjsondb-XXXXXX";
-    const int nFile = mkostemp(&strPath[0], O_CLOEXEC);
+    const int nFile = mkostemp(strPath.data(), O_CLOEXEC);
     if (nFile >= 0) {
         unlink(strPath.c_str());
     }

@@ -17,7 +17,8 @@ inline void AppendQuoted(std::string_view strText, std::string& strInto) {
             strInto += c;
         } else if (static_cast<unsigned char>(c) < 0x20) {
             char szEscape[8];
-            std::snprintf(szEscape, sizeof szEscape, "\\u%04x", static_cast<unsigned>(c));
+            static_cast<void>(
+                std::snprintf(szEscape, sizeof szEscape, "\\u%04x", static_cast<unsigned>(c)));
             strInto += szEscape;
         } else {
             strInto += c;

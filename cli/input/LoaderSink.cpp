@@ -56,7 +56,8 @@ void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::
     strLine += ",\"text\":";
     AppendQuoted(WithoutBadBytes(Where.strText), strLine);
     strLine += "}\n";
-    std::fwrite(strLine.data(), 1, strLine.size(), m_pFile.get());
+    // Close looks at what became of it.
+    static_cast<void>(std::fwrite(strLine.data(), 1, strLine.size(), m_pFile.get()));
 }
 
 void ErrorFile::Close() {

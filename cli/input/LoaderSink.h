@@ -25,7 +25,7 @@ class ErrorFile {
 
   private:
     struct CloseFile {
-        void operator()(std::FILE* pFile) const { std::fclose(pFile); }
+        void operator()(std::FILE* pFile) const { static_cast<void>(std::fclose(pFile)); }
     };
     std::string m_strPath;
     std::unique_ptr<std::FILE, CloseFile> m_pFile;

@@ -38,8 +38,9 @@ std::string Grouped(double dNumber) {
 std::string Remaining(double dSeconds) {
     const auto nSeconds = static_cast<std::int64_t>(std::ceil(dSeconds));
     char szText[48];
-    std::snprintf(szText, sizeof szText, "%lld:%02lld left", static_cast<long long>(nSeconds / 60),
-                  static_cast<long long>(nSeconds % 60));
+    static_cast<void>(std::snprintf(szText, sizeof szText, "%lld:%02lld left",
+                                    static_cast<long long>(nSeconds / 60),
+                                    static_cast<long long>(nSeconds % 60)));
     return szText;
 }
 
@@ -51,8 +52,8 @@ std::string Bar(double dPart) {
 }
 
 void Write(const std::string& strText) {
-    std::fwrite(strText.data(), 1, strText.size(), stderr);
-    std::fflush(stderr);
+    static_cast<void>(std::fwrite(strText.data(), 1, strText.size(), stderr));
+    static_cast<void>(std::fflush(stderr));
 }
 
 }  // namespace

@@ -96,8 +96,9 @@ size_t FindNoUtf8(std::string_view strBytes) {
 
 std::string NoUtf8Text(std::string_view strBytes, size_t nOffset) {
     char szText[64];
-    std::snprintf(szText, sizeof szText, "byte 0x%02X is no UTF-8; convert the input with iconv",
-                  static_cast<unsigned>(At(strBytes, nOffset)));
+    static_cast<void>(std::snprintf(szText, sizeof szText,
+                                    "byte 0x%02X is no UTF-8; convert the input with iconv",
+                                    static_cast<unsigned>(At(strBytes, nOffset))));
     return szText;
 }
 
