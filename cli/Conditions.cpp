@@ -116,12 +116,16 @@ Json::Value ParseKey(const Table& Of, const std::string& strWord) {
         return TypedValue(Of, vecKey[0], strWord);
     }
     Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
-    const std::string strWanted = "key \"" + strWord + "\": it must be an object with just " +
-                                  std::to_string(vecKey.size()) + " members, one of them ";
+    bool blFits = jKey.isObject() && jKey.size() == vecKey.size();
+    std::string strNames;
     for (const std::string& strMember : vecKey) {
-        if (!jKey.isObject() || !jKey.isMember(strMember) || jKey.size() != vecKey.size()) {
-            Fail(kExitUsage, strWanted + Quoted(strMember));
-        }
+        blFits = blFits && jKey.isMember(strMember);
+        strNames += strNames.empty() ? "" : ", ";
+        strNames += strMember;
+    }
+    if (!blFits) {
+        Fail(kExitUsage,
+             "key \"" + strWord + "\": it must be an object with just these members: " + strNames);
     }
     return jKey;
 }

@@ -67,6 +67,10 @@ expect 3 '' 'error: shop.db: cannot make a statement for table "shelf": member "
 expect 2 '' 'error: shop.db: cannot remove records from table "product": the query has no condition and would reach every record; give a condition; delete --all removes all records' \
     -- delete shop.db product --where '{}'
 
+"$VORNJSONDB" init shop.db price product:int country:string --key product,country --quiet
+expect 2 '' 'error: key "{"product": 1}": it must be an object with just these members: product, country' -- \
+    get shop.db price '{"product": 1}'
+
 # What a message quotes does not steer the terminal.
 expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \
     list shop.db $'a\e[31m\u009b0m\nb'
