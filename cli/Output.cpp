@@ -164,8 +164,10 @@ void WriteObjects(const Context& Call, const Json::Value& jObjects,
         vecShown.push_back({strName, false});
     }
     // Read by people, unless a format is asked for.
-    const bool blAsked = Call.Json() || Call.Has("--format");
-    const std::unique_ptr<RecordOutput> pTo = blAsked ? ChooseOutput(Call) : TableOutput(true);
+    std::unique_ptr<RecordOutput> pTo = TableOutput(true);
+    if (Call.Json() || Call.Has("--format")) {
+        pTo = ChooseOutput(Call);
+    }
     pTo->Begin(vecShown);
     for (const Json::Value& jObject : jObjects) {
         std::vector<std::string> vecTexts(vecColumns.size());
