@@ -57,12 +57,12 @@ void JsonHandler::Blame(std::string strReason) {
     }
 }
 
-void JsonHandler::BeginRecord() {
+void JsonHandler::BeginRecord(std::string_view strTaken) {
     m_blInRecord = true;
     ++m_nRecord;
     m_strReason.clear();
     m_Names.BeginRecord();
-    m_At.BeginRecord();
+    m_At.BeginRecord(strTaken);
 }
 
 bool JsonHandler::EndRecord() {
@@ -77,7 +77,7 @@ bool JsonHandler::EndRecord() {
 
 bool JsonHandler::Broken(const std::string& strReason) {
     if (!m_blInRecord) {
-        BeginRecord();
+        BeginRecord("");
     }
     Blame(strReason);
     m_nLevel = m_nRecordLevel;
@@ -86,8 +86,15 @@ bool JsonHandler::Broken(const std::string& strReason) {
 }
 
 // A value stands where a record should.
-bool JsonHandler::NoRecord(const char* szKind) {
-    BeginRecord();
+bool JsonHandler::NoRecord(const Value& Given, const char* szKind) {
+    std::string strTaken(Given.strText);
+    if (Given.eKind == Value::Kind::kText) {
+        strTaken.clear();
+        AppendQuoted(Given.strText, strTaken);
+    } else if (strTaken.empty()) {
+        strTaken = szKind;  // null, true, false
+    }
+    BeginRecord(strTaken);
     Blame(std::string("the record is ") + szKind + ", not an object");
     return EndRecord();
 }
@@ -116,7 +123,7 @@ void JsonHandler::AppendTextToJson(std::string_view strText) {
 
 bool JsonHandler::Scalar(const Value& Given, const char* szKind) {
     if (m_nLevel == m_nRecordLevel) {
-        return NoRecord(szKind);
+        return NoRecord(Given, szKind);
     }
     if (m_strReason.empty()) {
         m_To.Take(m_nMember, Given);
@@ -230,7 +237,7 @@ bool JsonHandler::Open(char cBracket) {
         return false;
     }
     if (!blList && m_nLevel == m_nRecordLevel) {
-        BeginRecord();
+        BeginRecord(std::string_view(&cBracket, 1));
         if (cBracket == '[') {
             Blame("the record is a list, not an object");
             m_strJson = "[";

@@ -27,7 +27,7 @@ class JsonPosition {
     JsonPosition(const JsonPosition&) = delete;
     JsonPosition& operator=(const JsonPosition&) = delete;
 
-    virtual void BeginRecord() = 0;  // its first character was taken just now
+    virtual void BeginRecord(std::string_view strTaken) = 0;  // what was read of it just now
     virtual std::int64_t RecordLine() = 0;
     virtual std::string_view RecordText() = 0;  // up to here
 };
@@ -68,8 +68,8 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool Open(char cBracket);
     bool Close(char cBracket);
     bool IsWrappedList(char cBracket);
-    bool NoRecord(const char* szKind);
-    void BeginRecord();
+    bool NoRecord(const Value& Given, const char* szKind);
+    void BeginRecord(std::string_view strTaken);
     bool EndRecord();
     void Blame(std::string strReason);
     bool CheckText(std::string_view strText);

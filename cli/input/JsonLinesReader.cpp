@@ -21,7 +21,7 @@ class LinePosition : public JsonPosition {
         }
     }
 
-    void BeginRecord() override {}
+    void BeginRecord(std::string_view) override {}
     std::int64_t RecordLine() override { return m_Lines.Number(); }
     std::string_view RecordText() override { return m_strText; }
 

@@ -39,7 +39,7 @@ class BlockStream : public JsonPosition {
     std::int64_t Line();
     void BetweenRecords() { m_nRecordBegin = Tell(); }
 
-    void BeginRecord() override;
+    void BeginRecord(std::string_view strTaken) override;
     std::int64_t RecordLine() override { return m_nRecordLine; }
     std::string_view RecordText() override;
 
@@ -71,12 +71,11 @@ std::int64_t BlockStream::Line() {
     return m_nLine;
 }
 
-void BlockStream::BeginRecord() {
+void BlockStream::BeginRecord(std::string_view strTaken) {
     m_nRecordLine = Line();
-    m_nRecordBegin = Tell() - 1;
-    m_strKept.clear();
-    if (m_blKeepText && m_pNext == m_acBlock.data()) {
-        m_strKept = "{";  // it was the last byte of the block before
+    m_nRecordBegin = Tell();
+    if (m_blKeepText) {
+        m_strKept = strTaken;
     }
 }
 

@@ -161,6 +161,13 @@ same 'bad records' "$(cat errors)" \
 {"file":"in","line":4,"record":4,"reason":"no value can begin like this","text":"�"}
 {"file":"in","line":6,"record":7,"reason":"the line ends inside of the record","text":"{\"a\": 2"}'
 
+printf '[123, "x\\"y", null, [1, 2], {"a": 1}]' >in
+expect 3 '' '1 inserted, 0 replaced, 0 skipped, 4 failed (in: JSON)' -- insert list.db t in --errors errors
+same 'texts of bad records' "$(sed 's/.*"text"://' errors)" '"123"}
+"\"x\\\"y\""}
+"null"}
+"[1, 2]"}'
+
 # A column declared JSON holds whatever its maker put there.
 sqlite3 other.db "CREATE TABLE t (j JSON);
     INSERT INTO t VALUES ('no json'), (' [1,
