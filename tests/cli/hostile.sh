@@ -88,7 +88,11 @@ bad 1 "$deep" "$(repeat '[' 100000)"
 bad 1 "$deep" "$(repeat '{"a":' 100000)"
 bad 1 "$deep" "[{\"a\": $(repeat '[' 100000)$(repeat ']' 100000)}]"
 good "{\"a\":$(repeat '[' 999)$(repeat ']' 999)}" "{\"a\": $(repeat '[' 999)$(repeat ']' 999)}"
-bad 1 'record 1 is longer than 16777216 bytes' "[{\"a\": \"$(repeat x 17000000)\"}]"
+(
+    printf '[{"a": "'
+    head -c 17000000 /dev/zero | tr '\0' x
+) >in
+expect 3 '' 'error: in:1: record 1 is longer than 16777216 bytes (nothing is stored)' -- insert bad.db t in
 for text in '' '  \n ' '[]'; do
     printf '%b' "$text" >in
     "$VORNJSONDB" insert bad.db t in 2>err
@@ -112,7 +116,12 @@ bad 1 'columns 1 and 2 have the same name "A"; letter case makes no difference' 
 bad 1 'column 2 has no name; --no-header is for input without names' 'a,,b\n1,2,3\n'
 bad 2 'member "a": byte 0xE9 is no UTF-8; convert the input with iconv' 'a,b\n\0351,2\n'
 bad 1 'the name of column 1: byte 0xE9 is no UTF-8; convert the input with iconv' '\0351,b\n1,2\n'
-bad 2 'a cell is longer than 16777216 bytes; do its quotes end?' "a,b\n\"$(repeat x 17000000)"
+(
+    printf 'a,b\n"'
+    head -c 17000000 /dev/zero | tr '\0' x
+) >in
+expect 3 '' 'error: in:2: a cell is longer than 16777216 bytes; do its quotes end? (nothing is stored)' -- \
+    insert bad.db t in
 good '{"a":"1\u0000x","b":2}' 'a,b\n1\0000x,2\n'
 good '{"a":"l1\nl2","b":"c\r\nd"}' 'a,b\n"l1\nl2","c\r\nd"\n'
 good '{"a":" 1","b":" x "}' '\0357\0273\0277"a",b\n 1, x \n'
