@@ -31,9 +31,10 @@ results=build/bench
 
 if [[ $measure == yes ]]; then
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" libbenchmark-dev \
-        "${peer_packages[@]}"
+        "${peer_packages[@]}" "${command_packages[@]}" iso-codes sqlite3:sqlite3 \
+        sqlite-utils:sqlite-utils
     configure bench -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF \
-        -DVORNJSONDB_TABLE=ON -DVORNJSONDB_COMMAND=OFF -DVORNJSONDB_BENCHMARKS=ON
+        -DVORNJSONDB_TABLE=ON -DVORNJSONDB_COMMAND=ON -DVORNJSONDB_BENCHMARKS=ON
     build bench
     dpkg-query -W -f '${Package} ${Version}\n' "${library_packages[@]}" "${peer_packages[@]}" \
         libc6 >"$results/packages.txt"
@@ -47,6 +48,7 @@ if [[ $measure == yes ]]; then
     "$results/bench/vornjsondb_scale" "${median[@]}" --benchmark_repetitions=7 \
         --benchmark_min_time=0.05 --benchmark_filter="-$largest" \
         --benchmark_out="$results/scale.json"
+    python3 -B bench/command/command.py "$results/cli/vornjsondb" "$results/command.json"
     scripts/bench-size.sh | tee "$results/sizes.txt"
     scripts/bench-instructions.sh || true
     cp build/release/bench/instructions.txt "$results/instructions.txt"

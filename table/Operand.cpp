@@ -31,7 +31,7 @@ Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& j
     return {pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason})};
 }
 
-std::string_view TextOf(const Json::Value& jText) {
+std::string_view ViewOf(const Json::Value& jText) {
     MemberName Text = {};
     jText.getString(&Text.pBegin, &Text.pEnd);
     return Text.View();
@@ -94,7 +94,7 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     if (jValue.isString()) {
         Out.eKind = ValueKind::kText;
         Out.Value.eKind = BoundValue::Kind::kText;
-        Out.Value.strBytes = TextOf(jValue);
+        Out.Value.strBytes = ViewOf(jValue);
         if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
             Why = {FindingCode::kNulInJson,
                    "JSON: " + Shown(jValue) + " holds a NUL byte, where SQLite may end it"};

@@ -20,11 +20,14 @@ from results import medians
 def main(results, docs):
     with open(os.path.join(results, "ratios.json")) as file:
         ratios = json.load(file)
+    with open(os.path.join(results, "command.json")) as file:
+        command = json.load(file)
     scale = medians(os.path.join(results, "scale.json"))
     peers = medians(os.path.join(results, "peers.json"))
     contents = {
         "machine": machine.describe(results),
         "ratios": tables.ratios(ratios),
+        "command": tables.ratios(command),
         "sizes": tables.sizes(os.path.join(results, "sizes.txt")),
         "peers": tables.peers(peers, tables.PEERS),
         "peers-prepared-once": tables.peers(peers, tables.PEERS_PREPARED_ONCE),

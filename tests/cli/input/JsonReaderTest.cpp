@@ -218,6 +218,40 @@ TEST(JsonLinesReader, BadLinesHarmNoOther) {
               "1@1: bad: lists and objects are nested more than 1000 levels deep\n2@2: a=3\n");
 }
 
+// Texts are read in steps of several bytes: what is wrong is found at each place of a step.
+TEST(JsonLinesReader, ABadByteIsFoundAtEachPlaceOfAText) {
+    const std::string strControl =
+        "a text has an escape that JSON has not, or a control character that must be escaped";
+    const std::string strUtf8 = "a text is no UTF-8; convert the input with iconv";
+    for (size_t nPlace = 0; nPlace < 40; ++nPlace) {
+        for (int nByte = 1; nByte < 256; ++nByte) {
+            const std::string strText =
+                std::string(nPlace, 'x') + static_cast<char>(nByte) + std::string(20, 'y');
+            const std::string strWrong = nByte < ' ' ? strControl : strUtf8;
+            const bool blWrong = nByte < ' ' || nByte >= 0x80;
+            if (nByte != '\n' && nByte != '"' && nByte != '\\') {
+                ASSERT_EQ(Lines("{\"a\":\"" + strText + "\"}"),
+                          blWrong ? "1@1: bad: " + strWrong + "\n" : "1@1: a='" + strText + "'\n")
+                    << nPlace << " " << nByte;
+            }
+        }
+    }
+}
+
+TEST(JsonLinesReader, EscapesAndCharactersOfSeveralBytesAtEachPlaceOfAText) {
+    for (size_t nPlace = 0; nPlace < 40; ++nPlace) {
+        const std::string strBefore(nPlace, 'x');
+        const auto fnRead = [&](const std::string& strInside) {
+            return Lines("{\"a\":\"" + strBefore + strInside + "y\"}\n{\"b\":1}");
+        };
+        const std::string strRead = "1@1: a='" + strBefore;
+        EXPECT_EQ(fnRead("\\u0041\\n\\\""), strRead + "A\n\"y'\n2@2: b=1\n");
+        EXPECT_EQ(fnRead("\xC3\xA9\xE2\x82\xAC"), strRead + "\xC3\xA9\xE2\x82\xACy'\n2@2: b=1\n");
+        EXPECT_EQ(fnRead("\\ud83d\\ude00"), strRead + "\xF0\x9F\x98\x80y'\n2@2: b=1\n");
+        EXPECT_EQ(fnRead("\\udc00"), "1@1: bad: \\u gives half of a surrogate pair\n2@2: b=1\n");
+    }
+}
+
 TEST(JsonLinesReader, CutLinesSayThatTheyEnd) {
     const std::string strLine = "{\"a\":\"x\xF0\x9F\x98\x80\",\"b\":[true]}";
     for (size_t nCut = 1; nCut < strLine.size(); ++nCut) {
