@@ -33,7 +33,6 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_pack
     "${test_packages[@]}" "${command_test_packages[@]}"
 configure "$name" "${options[@]}" -DBUILD_TESTING=ON "${together[@]}" -DVORNJSONDB_COMMAND=ON
 build "$name"
-scripts/real-files.sh
 
 export UBSAN_OPTIONS=print_stacktrace=1
 cd "build/$name"

@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # Every subcommand at work on a real file, step by step.
-source "$(dirname "$0")/Check.sh"
+source "$(dirname "$0")/../Check.sh"
 ln -s "$VORNJSONDB_REAL_FILES/iso-codes/usr/share/iso-codes/json/iso_3166-1.json" countries.json
 ln -s "$VORNJSONDB_REAL_FILES/ieee-data/usr/share/ieee-data/oui.csv" oui.csv
 
