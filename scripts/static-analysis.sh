@@ -18,8 +18,8 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_package
     clang-14:clang++-14 cppcheck:cppcheck
 
 mkdir -p build/analysis
-mapfile -t sources < <(find src table -name '*.cpp' | LC_ALL=C sort)
-flags=(-std=c++17 -Iinclude -I/usr/include/jsoncpp)
+mapfile -t sources < <(find src table cli -name '*.cpp' | LC_ALL=C sort)
+flags=(-std=c++17 -Iinclude -I/usr/include/jsoncpp '-DVORNJSONDB_VERSION="0"')
 
 # each COMMAND... runs the command with every source, side by side, and keeps all messages.
 each() {
@@ -27,7 +27,7 @@ each() {
 }
 
 run_clang() {
-    each clang++-14 --analyze --analyzer-output text "${flags[@]}" -Werror \
+    each clang++-14 --analyze --analyzer-output text "${flags[@]}" -Werror -Xclang -analyzer-werror \
         -Xclang -analyzer-config -Xclang aggressive-binary-operation-simplification=true \
         -Xclang -analyzer-checker=core,cplusplus,deadcode,nullability,security,unix,optin.cplusplus,optin.portability
 }
