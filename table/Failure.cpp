@@ -144,7 +144,8 @@ Status Retold(const Status& Outcome, Retry eRetry, std::string strMessage) {
 }  // namespace
 
 Status Within(const Doing& What, const Status& Step) {
-    return Step.Ok() ? Step : Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
+    return Step.Ok() ? Step
+                     : Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
 }
 
 Status Amended(const Status& Outcome, Retry eRetry, const std::string& strMore) {

@@ -113,7 +113,7 @@ TEST_F(DeleteByList, OnlyTheTypeStringIsAccepted) {
     for (const char* szType :
          {"int", "unsigned int", "long long", "unsigned long long", "Json::Value",
           "Json::objectValue", "Json::arrayValue", "bool", "long", "unsigned long", "unsigned",
-          "double", "float", "uid_t", "time_t", "String", "string ", ""}) {
+          "double", "float", "uid_t", "time_t", "any", "String", "string ", ""}) {
         SCOPED_TRACE(szType);
         Open(std::string("name:") + szType);
         ByArray({"a"}, "name", -1, {Check(kType), ArrayTail("name", "a")});
