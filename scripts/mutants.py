@@ -253,7 +253,7 @@ def changed_text(literal):
         yield literal[:begin] + literal[end:], "cut"
 
 
-def sources(only=""):
-    """All files of src/ whose name holds the text."""
-    paths = sorted(path for path in pathlib.Path("src").rglob("*") if path.suffix in (".cpp", ".h"))
+def sources(folder, only=""):
+    """All files of the folder whose name holds the text."""
+    paths = sorted(path for path in pathlib.Path(folder).rglob("*") if path.suffix in (".cpp", ".h"))
     return [Source(path) for path in paths if only in str(path)]

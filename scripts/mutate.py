@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Tries changed forms of src/ against the tests; scripts/mutate.sh prepares what it needs."""
+"""Tries changed forms of src/ or table/ against the tests; scripts/mutate.sh prepares what it needs."""
 
 import argparse
 import collections
@@ -22,8 +22,6 @@ import mutants
 
 # In one process a test may hide behind what an earlier one left.
 ORDERS = ([], ["--gtest_shuffle", "--gtest_random_seed=7"])
-# What the tests are linked with: the library with every name visible.
-LIBRARY = "libvornjsondb_testable.so"
 # A change that grows without end.
 MEMORY_LIMIT = 4 << 30
 OUTCOMES = ("killed", "marked", "same program", "not compiled", "survived")
@@ -32,20 +30,22 @@ OUTCOMES = ("killed", "marked", "same program", "not compiled", "survived")
 class Library:
     """Objects of the unchanged sources, and libraries in which some of them are others."""
 
+    # What the tests are linked with: the library with every name visible.
+    NAME, HEADER = "libvornjsondb_testable.so", "VornJsonDbApi.h"
+
     def __init__(self, folder, pool):
         self.folder = folder
-        self.sources = sorted(pathlib.Path("src").rglob("*.cpp"))
+        self.sources = self.find_sources()
         json = subprocess.run(["pkg-config", "--cflags", "jsoncpp"], capture_output=True, text=True, check=True)
         self.flags = ["-std=c++17", "-fPIC", "-w"]
         self.flags += [f"-I{folder}/header", "-Iinclude"] + json.stdout.split()
         # Compiled once, together with the headers that it includes.
         (folder / "header").mkdir(exist_ok=True)
-        header = str(shutil.copy("include/VornJsonDbApi.h", folder / "header"))
+        header = str(shutil.copy(f"include/{self.HEADER}", folder / "header"))
         subprocess.run(["g++", *self.flags, "-O0", "-x", "c++-header", header, "-o", header + ".gch"], check=True)
-        # Whoever works on src/ meanwhile shall not change what is tried.
+        # Whoever works on the sources meanwhile shall not change what is tried.
         self.original = folder / "original"
-        shutil.rmtree(self.original, ignore_errors=True)
-        shutil.copytree("src", self.original / "src")
+        copy_sources(self.original)
         shutil.rmtree(folder / "objects", ignore_errors=True)
         (folder / "objects").mkdir()
         for compiled in pool.map(lambda s: self.compile(s, self.object_of(s)), self.sources):
@@ -53,8 +53,15 @@ class Library:
                 sys.exit(compiled.stderr)
         self.users = self.find_users()
 
+    def find_sources(self):
+        return sorted(pathlib.Path("src").rglob("*.cpp"))
+
+    def make_tests(self):
+        """The program of all tests, which takes the library from LD_LIBRARY_PATH."""
+        return self.folder / "tests" / "vornjsondb_tests"
+
     def compile(self, source, output, options=("-O0",)):
-        command = ["g++", *self.flags, *options, "-include", "VornJsonDbApi.h", "-c", str(source), "-o", str(output)]
+        command = ["g++", *self.flags, *options, "-include", self.HEADER, "-c", str(source), "-o", str(output)]
         return subprocess.run(command, capture_output=True, text=True)
 
     def object_of(self, source, kind=""):
@@ -73,8 +80,8 @@ class Library:
 
     def link(self, worker, replaced):
         objects = [str(replaced.get(source, self.object_of(source))) for source in self.sources]
-        subprocess.run(["g++", "-shared", "-Wl,-Bsymbolic-functions", f"-Wl,-soname,{LIBRARY}",
-                        "-o", str(worker / LIBRARY), *objects, "-ljsoncpp", "-lsqlite3"], check=True)  # fmt: skip
+        subprocess.run(["g++", "-shared", "-Wl,-Bsymbolic-functions", f"-Wl,-soname,{self.NAME}",
+                        "-o", str(worker / self.NAME), *objects, "-ljsoncpp", "-lsqlite3"], check=True)  # fmt: skip
 
     def is_same_program(self, worker, replaced):
         """Whether the optimised code of the changed sources is that of the unchanged ones."""
@@ -88,31 +95,56 @@ class Library:
         return True
 
 
+class TableLibrary(Library):
+    """The second handle, shared instead of static."""
+
+    NAME, HEADER = "libvornjsondb_table_changed.so", "VornJsonDbTable.h"
+
+    def find_sources(self):
+        shared = re.findall(r"PROJECT_SOURCE_DIR}/(src/\S+\.cpp)", pathlib.Path("table/CMakeLists.txt").read_text())
+        return sorted([*pathlib.Path("table").glob("*.cpp"), *map(pathlib.Path, shared)])
+
+    def make_tests(self):
+        self.link(self.folder, {})
+        program = self.folder / "table_tests"
+        objects = (self.folder / "tests/table/CMakeFiles/vornjsondb_table_tests.dir").glob("*.cpp.o")
+        # nanosleep and clock_gettime of the tests must be found before the real ones.
+        subprocess.run(["g++", "-rdynamic", "-o", str(program), *map(str, sorted(objects)), f"-L{self.folder}",
+                        f"-l:{self.NAME}", "-lvornjsondb", f"-Wl,-rpath,{self.folder.resolve()},--enable-new-dtags",
+                        "-lgtest_main", "-lgmock", "-lgtest", "-ljsoncpp", "-lsqlite3"], check=True)  # fmt: skip
+        return program
+
+
+def copy_sources(folder):
+    shutil.rmtree(folder, ignore_errors=True)
+    for name in ("src", "table"):
+        shutil.copytree(name, folder / name)
+
+
 class Check:
     """Builds changed libraries and runs the tests against them."""
 
-    def __init__(self, folder, jobs):
+    def __init__(self, folder, jobs, library):
         self.folder = folder
         self.pool = concurrent.futures.ThreadPoolExecutor(jobs)
-        self.library = Library(folder, self.pool)
+        self.library = library(folder, self.pool)
+        self.tests = self.library.make_tests()
         self.workers = queue.Queue()
         for number in range(jobs):
             worker = (folder / f"worker{number}").resolve()
-            shutil.rmtree(worker, ignore_errors=True)
-            shutil.copytree("src", worker / "src")
+            copy_sources(worker)
             self.workers.put(worker)
         self.seconds, self.filter = 300, "*"
         self.leave_out_failing()
 
     def run_tests(self, worker, options):
         """Whether the tests pass against the worker's library, in bounded time of the processor."""
-        tests = self.folder / "tests" / "vornjsondb_tests"
         shutil.rmtree(worker / "tmp", ignore_errors=True)
         (worker / "tmp").mkdir()
         environment = dict(os.environ, LD_LIBRARY_PATH=str(worker), TMPDIR=str(worker / "tmp"))
         with open(worker / "tests.log", "w") as log:
             limits = ["prlimit", f"--cpu={self.seconds}", f"--as={MEMORY_LIMIT}"]
-            process = subprocess.Popen([*limits, str(tests), "--gtest_brief=1", *options], env=environment,
+            process = subprocess.Popen([*limits, str(self.tests), "--gtest_brief=1", *options], env=environment,
                                        stdout=log, stderr=subprocess.STDOUT, start_new_session=True)  # fmt: skip
             try:
                 return process.wait(600) == 0
@@ -145,7 +177,7 @@ class Check:
         return chosen + self.filter[1:] if chosen else self.filter
 
     def passes(self, worker, path):
-        runs = [[f"--gtest_filter={self.own_suites(path)}"]]
+        runs = [[f"--gtest_filter={self.own_suites(path)}"]] if path.parent.name != "table" else []
         runs += [[f"--gtest_filter={self.filter}", *order] for order in ORDERS]
         return all(self.run_tests(worker, ["--gtest_fail_fast", *options]) for options in runs)
 
@@ -237,6 +269,7 @@ def arguments():
     parser.add_argument("--all", action="store_true")
     parser.add_argument("--seconds", type=float, default=None)
     parser.add_argument("--seed", type=int, default=1)
+    parser.add_argument("--table", action="store_true")
     parser.add_argument("--only", default="")
     parser.add_argument("--kind", choices=("structure", "text", "other"))
     parser.add_argument("--lines", action="store_true")
@@ -251,7 +284,7 @@ def arguments():
 
 def main():
     given = arguments()
-    files = mutants.sources(given.only)
+    files = mutants.sources("table" if given.table else "src", given.only)
     changes = [change for file in files for change in file.changes if given.kind in (None, kind_of(change))]
     idle = [f"{mark.path}:{mark.line}: no change for the mark: {', '.join(sorted(mark.unused))}"
             for file in files for mark in file.marks if mark.unused]  # fmt: skip
@@ -260,13 +293,13 @@ def main():
         print("\n".join(map(str, changes)))
         return 1 if idle else 0
     started = time.monotonic()
-    check = Check(given.folder, given.jobs)
+    check = Check(given.folder, given.jobs, TableLibrary if given.table else Library)
     counts, wrong = try_all(check, Draw(changes, given.seed, given.count, given.seconds), given.jobs)
     print(table(counts))
     print(f"{len(changes)} changes possible, seed {given.seed}, {time.monotonic() - started:.0f} s")
     if given.record:
         content = f"```\n{datetime.date.today()}, {sum(counts.values())} of {len(changes)} changes\n{table(counts)}\n```"
-        figures.write("docs/reliability.md", {"mutation": content})
+        figures.write("docs/reliability.md", {"table_mutation" if given.table else "mutation": content})
     return 1 if idle or wrong or check.filter != "*" else 0
 
 

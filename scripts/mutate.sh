@@ -2,13 +2,14 @@
 # Changes one thing in src/ at a time, and runs the tests against each changed library: a change that
 # no test notices is a survivor, and fails the check. Nothing in src/ is touched.
 #
-#    scripts/mutate.sh [--count N | --all] [--seconds N] [--seed N] [--only TEXT] [--kind KIND]
-#                      [--lines] [--record]
+#    scripts/mutate.sh [--table] [--count N | --all] [--seconds N] [--seed N] [--only TEXT]
+#                      [--kind KIND] [--lines] [--record]
 #
-# Without an option 12 changes are tried, for 90 seconds at most. --only keeps the files whose name
-# holds TEXT; --kind keeps "structure" (statements, conditions and calls that are dropped, doubled,
-# exchanged or moved), "text" (characters of texts) or "other" (operators, numbers, conditions).
-# --lines lists the changes and tries none; --record puts the figures into docs/reliability.md.
+# Without an option 12 changes are tried, for 90 seconds at most. --table changes table/ instead, and
+# runs its tests. --only keeps the files whose name holds TEXT; --kind keeps "structure" (statements,
+# conditions and calls that are dropped, doubled, exchanged or moved), "text" (characters of texts) or
+# "other" (operators, numbers, conditions). --lines lists the changes and tries none; --record puts the
+# figures into docs/reliability.md.
 #
 # The seed, which decides what is drawn, comes from the commit if it is not given.
 #
@@ -21,7 +22,7 @@ source scripts/build.sh
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" python3:python3
 configure mutate -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
     -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
-build_quietly mutate vornjsondb_tests
+build_quietly mutate vornjsondb_tests vornjsondb_table_tests
 
 seed=$(git rev-parse --short=7 HEAD 2>/dev/null || echo 1)
 exec python3 scripts/mutate.py --folder build/mutate --jobs "$jobs" --seed "$((16#$seed))" "$@"
