@@ -42,7 +42,7 @@ done
 run() {
     local program=$1 folder=$2
     shift 2
-    configure "$folder" "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON
+    configure "$folder" "$@" -DBUILD_TESTING=ON "${together[@]}"
     build_quietly "$folder" "vornjsondb_campaign_$program"
     UBSAN_OPTIONS=print_stacktrace=1 \
         "build/$folder/tests/campaigns/vornjsondb_campaign_$program" "${options[@]}" | tee build/campaign.txt

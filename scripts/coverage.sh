@@ -19,7 +19,7 @@ fi
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" gcovr:gcovr
 configure coverage -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_COVERAGE=ON \
-    -DVORNJSONDB_EXAMPLES=OFF
+    -DVORNJSONDB_EXAMPLES=OFF "${together[@]}"
 # Counters of an earlier build do not fit, those of an earlier run would add up.
 find build/coverage -name '*.gcda' -delete
 build coverage

@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# Looks for faults without running inputs: clang's static analyzer and cppcheck over the sources, and
-# the tests against the checked form of the standard library.
+# Looks for faults without running inputs: clang's static analyzer over the libraries, cppcheck over the
+# older one, and the tests against the checked form of the standard library.
 # Fails on any finding; what is left out, and why, stands in docs/reliability.md.
 #
 #    scripts/static-analysis.sh [clang|cppcheck|debug]...
@@ -18,7 +18,7 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_package
     clang-14:clang++-14 cppcheck:cppcheck
 
 mkdir -p build/analysis
-mapfile -t sources < <(find src -name '*.cpp' | LC_ALL=C sort)
+mapfile -t sources < <(find src table -name '*.cpp' | LC_ALL=C sort)
 flags=(-std=c++17 -Iinclude -I/usr/include/jsoncpp)
 
 # each COMMAND... runs the command with every source, side by side, and keeps all messages.
@@ -76,7 +76,7 @@ run_debug() {
     local prefix=$PWD/build/analysis-prefix flags=-D_GLIBCXX_DEBUG
     make_checked_libraries "$flags"
     configure analysis-debug -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
-        -DCMAKE_CXX_FLAGS="$flags" -DCMAKE_PREFIX_PATH="$prefix" \
+        "${together[@]}" -DCMAKE_CXX_FLAGS="$flags" -DCMAKE_PREFIX_PATH="$prefix" \
         -DVORNJSONDB_JSONCPP_LIBRARY="$prefix/lib/libjsoncpp.so"
     build_quietly analysis-debug vornjsondb_tests
     build/analysis-debug/tests/vornjsondb_tests --gtest_brief=1

@@ -14,7 +14,7 @@ need_packages g++-arm-linux-gnueabihf qemu-user:qemu-arm cmake:cmake \
     pkg-config:pkg-config iso-codes
 make_armhf_sysroot
 export PKG_CONFIG_LIBDIR=$armhf_sysroot/usr/lib/arm-linux-gnueabihf/pkgconfig
-configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON \
+configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON "${together[@]}" \
     -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchain-armhf.cmake" \
     -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot" -DVORNJSONDB_CAMPAIGN_SCALE=20
 build armhf

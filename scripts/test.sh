@@ -23,14 +23,14 @@ fi
 if [[ ${1:-} == --tsan ]]; then
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
     configure tsan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS="-fsanitize=thread -O1" \
-        -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON
+        -DBUILD_TESTING=ON "${together[@]}"
     build_quietly tsan vornjsondb_table_threads
     TSAN_OPTIONS=halt_on_error=1 build/tsan/tests/table/vornjsondb_table_threads
     exit
 fi
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
-configure "$name" "${options[@]}" -DBUILD_TESTING=ON
+configure "$name" "${options[@]}" "${together[@]}" -DBUILD_TESTING=ON
 build "$name"
 
 export UBSAN_OPTIONS=print_stacktrace=1

@@ -6,13 +6,13 @@ namespace vornjsondb {
 
 namespace {
 
-struct CodeRow {
+struct FindingRow {
     const char* szCode;
     Severity eSeverity;
     const char* szRemedy;
 };
 
-constexpr CodeRow kRows[] = {
+constexpr FindingRow kFindingRows[] = {
 #define VORN_FINDING_ROW(kConstant, szCode, kSeverity, szRemedy) \
     {szCode, Severity::kSeverity, szRemedy},
     VORN_FINDING_CODES(VORN_FINDING_ROW)
@@ -48,7 +48,7 @@ std::string_view Cut(std::string_view strText) {
 }  // namespace
 
 Finding RowOf(FindingCode eCode) {
-    const CodeRow& Row = kRows[static_cast<size_t>(eCode)];
+    const FindingRow& Row = kFindingRows[static_cast<size_t>(eCode)];
     return Finding{Row.eSeverity, Row.szCode, "", "", Row.szRemedy};
 }
 

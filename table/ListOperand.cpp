@@ -42,7 +42,7 @@ void AppendInteger(std::int64_t nValue, std::string& strJson) {
     strJson.append(szDigits, std::to_chars(szDigits, std::end(szDigits), nValue).ptr);
 }
 
-void AppendText(std::string_view strText, std::string& strJson) {
+void AppendJsonText(std::string_view strText, std::string& strJson) {
     static constexpr char kHex[] = "0123456789abcdef";
     strJson += '"';
     for (const char c : strText) {
@@ -75,7 +75,7 @@ bool AppendExact(const Operand& Each, std::string& strJson) {
             if (Each.eKind == ValueKind::kNumber || !IsPlainText(Value.strBytes)) {
                 return false;
             }
-            AppendText(Value.strBytes, strJson);
+            AppendJsonText(Value.strBytes, strJson);
             return true;
     }
 }

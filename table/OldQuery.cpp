@@ -13,7 +13,7 @@ namespace vornjsondb {
 
 namespace {
 
-void AppendText(std::string_view strText, std::string& strSql) {
+void AppendSqlText(std::string_view strText, std::string& strSql) {
     if (IsPlainText(strText)) {
         strSql += '\'';
         for (const char c : strText) {
@@ -66,7 +66,7 @@ void AppendLiteral(const BoundValue& Value, std::string& strSql) {
             AppendReal(Value.dValue, strSql);
             break;
         case BoundValue::Kind::kText:
-            AppendText(Value.strBytes, strSql);
+            AppendSqlText(Value.strBytes, strSql);
             break;
         case BoundValue::Kind::kBlob:
             strSql += "x''";  // the end of all texts

@@ -16,18 +16,6 @@ constexpr char kNameSql[] =
     "SELECT 1 FROM (SELECT name FROM sqlite_schema UNION ALL SELECT name FROM sqlite_temp_schema)"
     " WHERE name = ?1 COLLATE NOCASE";
 
-int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnStatement& Out) {
-    const int nResult = Prepare(pDb, szSql, Out);
-    return nResult == SQLITE_OK ? sqlite3_bind_text(Out.get(), 1, strText.data(),
-                                                    static_cast<int>(strText.size()), SQLITE_STATIC)
-                                : nResult;
-}
-
-std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
-    const auto* pText = sqlite3_column_text(pStatement.get(), nColumn);
-    return pText == nullptr ? std::string() : reinterpret_cast<const char*>(pText);
-}
-
 }  // namespace
 
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes) {

@@ -17,18 +17,9 @@ constexpr char kColumnsSql[] =
 constexpr int kVirtual = 2;
 constexpr int kStored = 3;
 
-std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
-    const auto* pText = sqlite3_column_text(pStatement.get(), nColumn);
-    return pText == nullptr ? std::string() : reinterpret_cast<const char*>(pText);
-}
-
 int ReadColumns(sqlite3* pDb, const std::string& strTable, std::vector<RealColumn>& vecColumns) {
     OwnStatement pStatement;
-    int nResult = Prepare(pDb, kColumnsSql, pStatement);
-    if (nResult == SQLITE_OK) {
-        nResult = sqlite3_bind_text(pStatement.get(), 1, strTable.data(),
-                                    static_cast<int>(strTable.size()), SQLITE_STATIC);
-    }
+    int nResult = PrepareFor(pDb, kColumnsSql, strTable, pStatement);
     if (nResult != SQLITE_OK) {
         return nResult;
     }

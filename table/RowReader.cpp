@@ -14,7 +14,7 @@ using Kind = VORN_JSON_DB::Row::Kind;
 
 // A column's value. SQLite calls it unprotected, for it is safe in one thread only; that is all
 // that a connection may have here, and all else of a column takes its lock once more.
-sqlite3_value* ValueAt(sqlite3_stmt* pStatement, int nColumn) {
+sqlite3_value* ColumnValue(sqlite3_stmt* pStatement, int nColumn) {
     return sqlite3_column_value(pStatement, nColumn);
 }
 
@@ -115,7 +115,7 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
     for (const Column& Each : m_vecInKeyOrder) {
         Json::Value& jMember = *itMember;
         ++itMember;
-        sqlite3_value* const pValue = ValueAt(pStatement, Each.nColumn);
+        sqlite3_value* const pValue = ColumnValue(pStatement, Each.nColumn);
         const Kind eKind = KindOf(pValue, Each.eKind);
         if (eKind != Kind::kNull) {
             Json::Value jValue = ReadValue(pStatement, pValue, eKind, Codec);
@@ -153,7 +153,7 @@ const std::string& Row::Name(int nColumn) const {
 
 Row::Kind Row::KindOf(int nColumn) const {
     const size_t nMember = m_From.vecColumns[static_cast<size_t>(nColumn)];
-    return vornjsondb::KindOf(vornjsondb::ValueAt(m_From.pStatement, nColumn),
+    return vornjsondb::KindOf(vornjsondb::ColumnValue(m_From.pStatement, nColumn),
                               m_From.Of.At(nMember).Kind());
 }
 
@@ -166,7 +166,8 @@ double Row::Real(int nColumn) const {
 }
 
 std::string_view Row::Text(int nColumn) const {
-    return vornjsondb::TextOf(m_From.pStatement, vornjsondb::ValueAt(m_From.pStatement, nColumn));
+    return vornjsondb::TextOf(m_From.pStatement,
+                              vornjsondb::ColumnValue(m_From.pStatement, nColumn));
 }
 
 }  // namespace VORN_JSON_DB

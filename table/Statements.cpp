@@ -20,6 +20,18 @@ int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out) {
     return nResult;
 }
 
+int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnStatement& Out) {
+    const int nResult = Prepare(pDb, szSql, Out);
+    return nResult == SQLITE_OK ? sqlite3_bind_text(Out.get(), 1, strText.data(),
+                                                    static_cast<int>(strText.size()), SQLITE_STATIC)
+                                : nResult;
+}
+
+std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
+    const auto* pText = sqlite3_column_text(pStatement.get(), nColumn);
+    return pText == nullptr ? std::string() : reinterpret_cast<const char*>(pText);
+}
+
 Statement::Statement(Statement&& From) noexcept
     : m_pHome(From.m_pHome),
       m_pStatement(std::move(From.m_pStatement)),

@@ -21,6 +21,12 @@ using OwnStatement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 // Prepares a statement that is used once. Returns SQLite's result.
 int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out);
 
+// The same with the first parameter bound to the text, which the caller keeps.
+int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnStatement& Out);
+
+// NULL is the empty text.
+std::string TextColumn(const OwnStatement& pStatement, int nColumn);
+
 class Statements;
 
 // A statement on loan. Given back at the end of its life: reset, so that it locks nothing, and with
@@ -28,6 +34,8 @@ class Statements;
 class Statement {
   public:
     Statement() = default;
+    Statement(const Statement&) = delete;
+    Statement& operator=(const Statement&) = delete;
     Statement(Statement&& From) noexcept;
     Statement& operator=(Statement&& From) noexcept;
     ~Statement();

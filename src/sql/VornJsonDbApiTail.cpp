@@ -10,6 +10,7 @@
 #include "../core/LogLine.h"
 
 int VornJsonDbApi::SqlFilterConditionFromJson(Json::Value& jFilter, std::string& strSqlOut) {
+    // mutate(exchanged): only an object has a sort_by.
     VORN_FAIL_IF(jFilter.type() != Json::objectValue && jFilter.type() != Json::nullValue);
     if (const Json::Value* pjSortBy = vornjsondb::FindMember(jFilter, "sort_by")) {
         // In single quotes SQLite sorts by a constant. The order that hosts see is that of the

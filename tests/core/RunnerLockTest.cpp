@@ -31,11 +31,6 @@ int StopWithEagain(void* pArg, int, char**, char**) {
     return 1;
 }
 
-int CountRows(void* pArg, int, char**, char**) {
-    ++*static_cast<int*>(pArg);
-    return 0;
-}
-
 using RunnerLockTest = TableTest;
 
 // m_pHandle's connection has the file m_strPath attached as f, with the empty table f.stored.

@@ -7,11 +7,6 @@ using namespace testhost;
 
 namespace {
 
-int CountRows(void* pArg, int, char**, char**) {
-    ++*static_cast<int*>(pArg);
-    return 0;
-}
-
 int StopAtFirstRow(void*, int, char**, char**) {
     return 1;
 }

@@ -40,3 +40,22 @@ consume_by_pkg_config() {
         "-Wl,-rpath,$library_dir"
     run_consumer "$folder/consumer"
 }
+
+# check_consumers WAY: what programs print that are built by consume_by_WAY, with one library and with
+# both in either order.
+check_consumers() {
+    local way=$1 here=$SOURCE_DIR/tests/install/consumer output expected source standard libraries
+    while IFS='|' read -r expected source standard libraries <&3; do
+        if [[ $libraries == *table* && -z $TABLE_LIBRARY ]]; then
+            continue
+        fi
+        # shellcheck disable=SC2086  # a list
+        output=$("consume_by_$way" "$here/$source.cpp" "$WORK_DIR/$way/$source" "$standard" $libraries)
+        diff -u - <(echo "$output") <<<"$expected"
+    done 3<<'END'
+consumer: Jack's plane|old|11|vornjsondb
+consumer: Jack's plane|table|17|table
+new reads plane, old reads 100 %d|both|17|vornjsondb table
+new reads plane, old reads 100 %d|both|17|table vornjsondb
+END
+}

@@ -9,8 +9,6 @@ const char kRun[] = "0 > runSqlEx(strSql, NULL, NULL)";
 const char kComma[] = "0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA)";
 const char kAnd[] = "0 > SqlExpandMemberList(jFilterIn, strSql, VORN_SQL_WHERE_TYPE_AND)";
 const char kInner[] = "0 > recUpdateByWhere(jParamIn, strSql)";
-const char kMatchText[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))";
-const char kMatchFailed[] = "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)";
 
 class Update : public TableTest {
   protected:
@@ -51,7 +49,7 @@ class Update : public TableTest {
     }
 };
 
-const char kRows[] = "1|a|10\n2|b|20\n3|c|30";
+const char kThreeRows[] = "1|a|10\n2|b|20\n3|c|30";
 
 }  // namespace
 
@@ -73,7 +71,7 @@ TEST_F(Update, EmptyConditionIsRefusedBeforeAnEmptyRecord) {
     ByWhere(R"({"size":7})", "", -1, {Check("strSqlWhere.empty()"), Plain(R"(jRecIn={"size":7})")});
     ByWhere("{}", "", -1, {Check("strSqlWhere.empty()"), Plain("jRecIn={}")});
     EXPECT_EQ(TakeSql(), Lines());
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, EmptyRecordIsRefused) {
@@ -113,11 +111,11 @@ TEST_F(Update, RecordHoldingOnlyARawFilterIsRejectedBySqlite) {
 TEST_F(Update, ConditionThatSelectsNoRowSucceeds) {
     ByWhere(R"({"size":7})", "id=99", 0);
     EXPECT_EQ(TakeSql().size(), 1U);
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, ValueOfAWrongKindLeavesTheStatementAsFarAsItWasBuilt) {
-    const Lines vecLines{Check(kMatchText), Check(kMatchFailed), Check(kComma),
+    const Lines vecLines{Check(kQuoteText), Check(kMatchFailed), Check(kComma),
                          Plain(R"(jRecIn={"name":"x","size":{}})")};
     ByWhere(R"({"name":"x","size":{}})", "id=1", -1, vecLines);
     MakeStaleError();
@@ -150,7 +148,7 @@ TEST_F(Update, DuplicateByWhereLeavesTheErrorMessageAndChangesNoRow) {
             {RunFailed(strError, strSql), Check(kRun), Plain(R"(jRecIn={"name":"same"})"),
              SqlError(strError, strSql)});
     EXPECT_EQ(m_pHandle->getErrMsg(), "");
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, ByWhereChecksNoTypes) {
@@ -168,7 +166,7 @@ TEST_F(Update, FilterSelectsTheRows) {
 
 TEST_F(Update, FilterThatMatchesNothingSucceeds) {
     ByFilter(R"({"id":99})", R"({"size":0})", 0);
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, EmptyFilterIsRefused) {
@@ -208,7 +206,7 @@ TEST_F(Update, RefusedFilterRunsNothing) {
              {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kAnd),
               FilterTail(R"({"size":"bad"})")});
     ByFilter(R"({"size":{}})", R"({"size":1})", -1,
-             {Check(kMatchText), Check(kMatchFailed), Check(kAnd), FilterTail(R"({"size":1})")});
+             {Check(kQuoteText), Check(kMatchFailed), Check(kAnd), FilterTail(R"({"size":1})")});
     EXPECT_EQ(TakeSql(), Lines());
 }
 
@@ -219,7 +217,7 @@ TEST_F(Update, FilterWithoutAConditionNeverBecomesAWholeTableUpdate) {
                  {Check("strSql.empty()"), FilterTail(R"({"size":"bad"})")});
     }
     EXPECT_EQ(TakeSql(), Lines());
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, EmptyListInTheFilterIsRejectedBySqlite) {
@@ -228,7 +226,7 @@ TEST_F(Update, EmptyListInTheFilterIsRejectedBySqlite) {
         R"({"id":[]})", R"({"size":0})", -1,
         {RunFailed("near \")\": syntax error", strSql), Check(kRun), Plain(R"(jRecIn={"size":0})"),
          SqlError("near \")\": syntax error", strSql), Check(kInner), FilterTail(R"({"size":0})")});
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, WronglyTypedNewValueRunsNothing) {
@@ -253,7 +251,7 @@ TEST_F(Update, KeyOfAnotherRowIsADuplicateAndChangesNoRow) {
               SqlError(strError, strSql), Check(kInner), FilterTail(R"({"id":3})")});
     EXPECT_EQ(TakeSql(), Lines{strSql});
     EXPECT_EQ(m_pHandle->getErrMsg(), kDuplicate);
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }
 
 TEST_F(Update, LaterFailureWithoutSqlReportsTheStaleDuplicateAgain) {
@@ -315,5 +313,5 @@ TEST_F(Update, SameObjectAsFilterAndNewValues) {
     Json::Value jBoth = ParseJson(R"({"id":1,"name":"a"})");
     EXPECT_EQ(m_pHandle->recUpdateByFilter(jBoth, jBoth), 0);
     EXPECT_EQ(TakeSql(), Lines{Statement("id=1 , name='a'", " (id=1 and name='a' )")});
-    EXPECT_EQ(All(), kRows);
+    EXPECT_EQ(All(), kThreeRows);
 }

@@ -37,123 +37,120 @@ class ConditionList : public TableTest {
     }
 };
 
-const int kOr = VORN_SQL_WHERE_TYPE_OR;
-const int kAnd = VORN_SQL_WHERE_TYPE_AND;
-const int kComma = VORN_SQL_WHERE_TYPE_COMMA;
+const int kOrMode = VORN_SQL_WHERE_TYPE_OR;
+const int kAndMode = VORN_SQL_WHERE_TYPE_AND;
+const int kCommaMode = VORN_SQL_WHERE_TYPE_COMMA;
 
 const char kKindCheck[] =
     "jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue";
 const char kMembershipFailed[] =
     "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)";
-const char kMatchFailed[] = "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)";
-const char kMatchText[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))";
-const char kListText[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jList[i].asString().c_str())))";
 
 }  // namespace
 
 TEST_F(ConditionList, JoinModesHaveTheirNumbers) {
-    EXPECT_EQ(kOr, 0);
-    EXPECT_EQ(kAnd, 1);
-    EXPECT_EQ(kComma, 2);
+    EXPECT_EQ(kOrMode, 0);
+    EXPECT_EQ(kAndMode, 1);
+    EXPECT_EQ(kCommaMode, 2);
 }
 
 TEST_F(ConditionList, AndModeWrapsTheJoinedConditions) {
-    EXPECT_EQ(Expanded(R"({"size":5,"name":"x"})", kAnd), " (name='x' and size=5 )");
+    EXPECT_EQ(Expanded(R"({"size":5,"name":"x"})", kAndMode), " (name='x' and size=5 )");
 }
 
 TEST_F(ConditionList, OrModeWrapsTheJoinedConditions) {
     Open("a:string,b:int");
-    EXPECT_EQ(Expanded(R"({"a":"x","b":2})", kOr), " (a='x' or b=2 )");
+    EXPECT_EQ(Expanded(R"({"a":"x","b":2})", kOrMode), " (a='x' or b=2 )");
 }
 
 TEST_F(ConditionList, CommaModeJoinsWithoutWrapping) {
-    EXPECT_EQ(Expanded(R"({"name":"y","size":6})", kComma), "name='y' , size=6");
+    EXPECT_EQ(Expanded(R"({"name":"y","size":6})", kCommaMode), "name='y' , size=6");
 }
 
 TEST_F(ConditionList, SingleConditionNeedsNoJoiner) {
-    EXPECT_EQ(Expanded(R"({"size":5})", kAnd), " (size=5 )");
-    EXPECT_EQ(Expanded(R"({"size":5})", kOr), " (size=5 )");
-    EXPECT_EQ(Expanded(R"({"size":5})", kComma), "size=5");
+    EXPECT_EQ(Expanded(R"({"size":5})", kAndMode), " (size=5 )");
+    EXPECT_EQ(Expanded(R"({"size":5})", kOrMode), " (size=5 )");
+    EXPECT_EQ(Expanded(R"({"size":5})", kCommaMode), "size=5");
 }
 
 TEST_F(ConditionList, AppendsToTheTextItIsGiven) {
     std::string strSql = "WHERE";
     Json::Value jQuery = ParseJson(R"({"size":5})");
-    EXPECT_EQ(m_pHandle->SqlExpandMemberList(jQuery, strSql, kAnd), 0);
+    EXPECT_EQ(m_pHandle->SqlExpandMemberList(jQuery, strSql, kAndMode), 0);
     EXPECT_EQ(strSql, "WHERE (size=5 )");
 }
 
 TEST_F(ConditionList, NullOrEmptyObjectGivesOneAndNoText) {
-    for (int nMode : {kOr, kAnd, kComma}) {
+    for (int nMode : {kOrMode, kAndMode, kCommaMode}) {
         EXPECT_EQ(Expanded("null", nMode, 1), "");
         EXPECT_EQ(Expanded("{}", nMode, 1), "");
     }
 }
 
 TEST_F(ConditionList, SortAndPagingKeysAloneGiveOneAndNoText) {
-    EXPECT_EQ(Expanded(R"({"sort_by":"name","limit":1,"offset":2})", kAnd, 1), "");
-    EXPECT_EQ(Expanded(R"({"limit":1})", kAnd, 1), "");
-    EXPECT_EQ(Expanded(R"({"sort_direction":"desc"})", kComma, 1), "");
+    EXPECT_EQ(Expanded(R"({"sort_by":"name","limit":1,"offset":2})", kAndMode, 1), "");
+    EXPECT_EQ(Expanded(R"({"limit":1})", kAndMode, 1), "");
+    EXPECT_EQ(Expanded(R"({"sort_direction":"desc"})", kCommaMode, 1), "");
 }
 
 TEST_F(ConditionList, UnknownMembersAreSkippedSilently) {
-    EXPECT_EQ(Expanded(R"({"Name":"x","zz":[]})", kAnd, 1), "");
-    EXPECT_EQ(Expanded(R"({"aa":1,"name":"x","nn":[],"size":1,"zz":{}})", kAnd),
+    EXPECT_EQ(Expanded(R"({"Name":"x","zz":[]})", kAndMode, 1), "");
+    EXPECT_EQ(Expanded(R"({"aa":1,"name":"x","nn":[],"size":1,"zz":{}})", kAndMode),
               " (name='x' and size=1 )");
 }
 
 TEST_F(ConditionList, MemberNamedLimitInTheTableIsACondition) {
     Open("limit:int,sort_by:string", "a");
-    EXPECT_EQ(Expanded(R"({"limit":5,"offset":1,"sort_by":"x"})", kAnd),
+    EXPECT_EQ(Expanded(R"({"limit":5,"offset":1,"sort_by":"x"})", kAndMode),
               " (limit=5 and sort_by='x' )");
 }
 
 TEST_F(ConditionList, ArrayValueIsAMembershipCondition) {
-    EXPECT_EQ(Expanded(R"({"name":["a"],"size":[1,2]})", kAnd),
+    EXPECT_EQ(Expanded(R"({"name":["a"],"size":[1,2]})", kAndMode),
               " (name in ('a' ) and size in (12 ) )");
 }
 
 TEST_F(ConditionList, ArrayOfAJsonTypedMemberIsAMembershipToo) {
     Open("j:Json::arrayValue");
-    EXPECT_EQ(Expanded(R"({"j":[1,{}]})", kAnd), " (j in ('1''{}' ) )");
+    EXPECT_EQ(Expanded(R"({"j":[1,{}]})", kAndMode), " (j in ('1''{}' ) )");
 }
 
 TEST_F(ConditionList, ObjectValueIsAnEquality) {
     Open("j:Json::objectValue");
-    EXPECT_EQ(Expanded(R"({"j":{"k":[1]}})", kAnd), R"( (j='{"k":[1]}' ))");
+    EXPECT_EQ(Expanded(R"({"j":{"k":[1]}})", kAndMode), R"( (j='{"k":[1]}' ))");
 }
 
 TEST_F(ConditionList, NullValueIsAnEqualityWithItsStringForm) {
-    EXPECT_EQ(Expanded(R"({"name":null,"size":null})", kAnd), " (name='' and size= )");
+    EXPECT_EQ(Expanded(R"({"name":null,"size":null})", kAndMode), " (name='' and size= )");
 }
 
 TEST_F(ConditionList, RawFilterStandsBetweenTwoBlanksOnEachSide) {
-    EXPECT_EQ(Expanded(R"({"name":"x","vornSqlWhereFilter":"size > 3"})", kAnd),
+    EXPECT_EQ(Expanded(R"({"name":"x","vornSqlWhereFilter":"size > 3"})", kAndMode),
               " (name='x' and  size > 3  )");
 }
 
 TEST_F(ConditionList, RawFilterAloneIsEnough) {
-    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":"1=1"})", kAnd), " ( 1=1  )");
-    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":""})", kOr), " (   )");
+    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":"1=1"})", kAndMode), " ( 1=1  )");
+    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":""})", kOrMode), " (   )");
 }
 
 TEST_F(ConditionList, RawFilterIsTakenAsItStands) {
-    EXPECT_EQ(Expanded(u8R"({"vornSqlWhereFilter":"n like '100%s%%' or x='é' -- \"\n"})", kAnd),
+    EXPECT_EQ(Expanded(u8R"({"vornSqlWhereFilter":"n like '100%s%%' or x='é' -- \"\n"})", kAndMode),
               u8" ( n like '100%s%%' or x='é' -- \"\n  )");
 }
 
 TEST_F(ConditionList, RawFilterLandsInASetList) {
-    EXPECT_EQ(Expanded(R"({"name":"y","vornSqlWhereFilter":"size=6"})", kComma),
+    EXPECT_EQ(Expanded(R"({"name":"y","vornSqlWhereFilter":"size=6"})", kCommaMode),
               "name='y' ,  size=6 ");
 }
 
 TEST_F(ConditionList, RawFilterIsRawEvenWhenTheTableDefinesTheName) {
     Open("vornSqlWhereFilter:string");
-    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":"a=1"})", kAnd), " ( a=1  )");
+    EXPECT_EQ(Expanded(R"({"vornSqlWhereFilter":"a=1"})", kAndMode), " ( a=1  )");
     Open("vornSqlWhereFilter:int");
-    EXPECT_EQ(
-        Left(R"({"vornSqlWhereFilter":1})", kAnd, {Check("!jRecParam[jmFieldName[i]].isString()")}),
-        " (");
+    EXPECT_EQ(Left(R"({"vornSqlWhereFilter":1})", kAndMode,
+                   {Check("!jRecParam[jmFieldName[i]].isString()")}),
+              " (");
 }
 
 TEST_F(ConditionList, RawFilterThatIsNoStringIsRefusedWithTheLeadInWritten) {
@@ -161,35 +158,36 @@ TEST_F(ConditionList, RawFilterThatIsNoStringIsRefusedWithTheLeadInWritten) {
     for (const char* szValue : {"5", "null", "true", "1.5", "[\"a\"]", "{}"}) {
         SCOPED_TRACE(szValue);
         const std::string strQuery = std::string(R"({"vornSqlWhereFilter":)") + szValue + "}";
-        EXPECT_EQ(Left(strQuery.c_str(), kAnd, vecLines), " (");
-        EXPECT_EQ(Left(strQuery.c_str(), kComma, vecLines), "");
+        EXPECT_EQ(Left(strQuery.c_str(), kAndMode, vecLines), " (");
+        EXPECT_EQ(Left(strQuery.c_str(), kCommaMode, vecLines), "");
     }
-    EXPECT_EQ(Left(R"({"name":"x","vornSqlWhereFilter":5})", kAnd, vecLines), " (name='x' and ");
+    EXPECT_EQ(Left(R"({"name":"x","vornSqlWhereFilter":5})", kAndMode, vecLines),
+              " (name='x' and ");
 }
 
 TEST_F(ConditionList, EmptyListLeavesItsJoinerBehind) {
     Open("a:int,b:int");
-    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kAnd), " ( and b=1 )");
-    EXPECT_EQ(Expanded(R"({"a":1,"b":[]})", kAnd), " (a=1 and  )");
-    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kOr), " ( or b=1 )");
-    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kComma), " , b=1");
-    EXPECT_EQ(Expanded(R"({"a":1,"b":[]})", kComma), "a=1 , ");
+    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kAndMode), " ( and b=1 )");
+    EXPECT_EQ(Expanded(R"({"a":1,"b":[]})", kAndMode), " (a=1 and  )");
+    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kOrMode), " ( or b=1 )");
+    EXPECT_EQ(Expanded(R"({"a":[],"b":1})", kCommaMode), " , b=1");
+    EXPECT_EQ(Expanded(R"({"a":1,"b":[]})", kCommaMode), "a=1 , ");
 }
 
 TEST_F(ConditionList, EmptyListAloneCountsAsWritten) {
     Open("a:int");
-    EXPECT_EQ(Expanded(R"({"a":[]})", kAnd, 0), " ( )");
-    EXPECT_EQ(Expanded(R"({"a":[]})", kComma, 0), "");
+    EXPECT_EQ(Expanded(R"({"a":[]})", kAndMode, 0), " ( )");
+    EXPECT_EQ(Expanded(R"({"a":[]})", kCommaMode, 0), "");
 }
 
 TEST_F(ConditionList, ArrayInASetListIsWrittenAsMembership) {
-    EXPECT_EQ(Expanded(R"({"name":["a"]})", kComma), "name in ('a' )");
+    EXPECT_EQ(Expanded(R"({"name":["a"]})", kCommaMode), "name in ('a' )");
 }
 
 TEST_F(ConditionList, QueryOfAWrongKindIsRefused) {
     for (const char* szQuery : {"[]", "[{\"name\":\"x\"}]", "\"name\"", "3", "1.5", "true"}) {
         SCOPED_TRACE(szQuery);
-        EXPECT_EQ(Left(szQuery, kAnd, {Check(kKindCheck)}), "");
+        EXPECT_EQ(Left(szQuery, kAndMode, {Check(kKindCheck)}), "");
         EXPECT_EQ(Left(szQuery, 99, {Check(kKindCheck)}), "");
     }
 }
@@ -201,36 +199,37 @@ TEST_F(ConditionList, UnknownJoinModeIsNamed) {
 }
 
 TEST_F(ConditionList, FailingEqualityIsReportedTwiceAndLeavesWhatStands) {
-    EXPECT_EQ(Left(R"({"name":"x","size":{}})", kAnd, {Check(kMatchText), Check(kMatchFailed)}),
+    EXPECT_EQ(Left(R"({"name":"x","size":{}})", kAndMode, {Check(kQuoteText), Check(kMatchFailed)}),
               " (name='x' and ");
-    EXPECT_EQ(Left(R"({"name":{},"size":1})", kAnd, {Check(kMatchText), Check(kMatchFailed)}),
+    EXPECT_EQ(Left(R"({"name":{},"size":1})", kAndMode, {Check(kQuoteText), Check(kMatchFailed)}),
               " (");
-    EXPECT_EQ(Left(R"({"name":"x","size":{}})", kComma, {Check(kMatchText), Check(kMatchFailed)}),
-              "name='x' , ");
+    EXPECT_EQ(
+        Left(R"({"name":"x","size":{}})", kCommaMode, {Check(kQuoteText), Check(kMatchFailed)}),
+        "name='x' , ");
 }
 
 TEST_F(ConditionList, FailingMembershipIsReportedTwiceAndLeavesWhatStands) {
-    EXPECT_EQ(
-        Left(R"({"name":"x","size":[1,[]]})", kOr, {Check(kListText), Check(kMembershipFailed)}),
-        " (name='x' or ");
+    EXPECT_EQ(Left(R"({"name":"x","size":[1,[]]})", kOrMode,
+                   {Check(kQuoteListText), Check(kMembershipFailed)}),
+              " (name='x' or ");
 }
 
 TEST_F(ConditionList, WrongKindForABoolMemberNamesTheBoolCall) {
     Open("flag:bool");
-    EXPECT_EQ(Left(R"({"flag":"yes"})", kAnd,
+    EXPECT_EQ(Left(R"({"flag":"yes"})", kAndMode,
                    {Check(R"(NULL == (szSql = sqlite3_mprintf("%d", jParam.asInt())))"),
                     Check(kMatchFailed)}),
               " (");
 }
 
 TEST_F(ConditionList, HandleWorksOnAfterAFailure) {
-    Left(R"({"size":{}})", kAnd, {Check(kMatchText), Check(kMatchFailed)});
-    EXPECT_EQ(Expanded(R"({"size":1})", kAnd), " (size=1 )");
+    Left(R"({"size":{}})", kAndMode, {Check(kQuoteText), Check(kMatchFailed)});
+    EXPECT_EQ(Expanded(R"({"size":1})", kAndMode), " (size=1 )");
 }
 
 TEST_F(ConditionList, ConditionsStandInNameOrder) {
     Open("z:int,a:int,B:int");
-    EXPECT_EQ(Expanded(R"({"z":3,"vornSqlWhereFilter":"raw","a":2,"B":1})", kAnd),
+    EXPECT_EQ(Expanded(R"({"z":3,"vornSqlWhereFilter":"raw","a":2,"B":1})", kAndMode),
               " (B=1 and a=2 and  raw  and z=3 )");
 }
 
@@ -242,5 +241,5 @@ TEST_F(ConditionList, FiveHundredAndTwelveMembers) {
         jQuery[strName] = 7;
     }
     OpenMembers(ManyMembers(), "a");
-    EXPECT_EQ(Expanded(Compact(jQuery).c_str(), kAnd), strExpected + " )");
+    EXPECT_EQ(Expanded(Compact(jQuery).c_str(), kAndMode), strExpected + " )");
 }

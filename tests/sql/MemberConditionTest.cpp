@@ -57,11 +57,10 @@ class MemberCondition : public TableTest {
     }
 };
 
-const char kMatchText[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))";
-const char kMatchJson[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.toString().c_str())))";
-const char kMatchBool[] = R"(NULL == (szSql = sqlite3_mprintf("%d", jParam.asInt())))";
-const char kListText[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jList[i].asString().c_str())))";
-const char kListJson[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jList[i].toString().c_str())))";
+const char kQuoteJson[] = R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.toString().c_str())))";
+const char kQuoteBool[] = R"(NULL == (szSql = sqlite3_mprintf("%d", jParam.asInt())))";
+const char kQuoteListJson[] =
+    R"(NULL == (szSql = sqlite3_mprintf("%q", jList[i].toString().c_str())))";
 
 const char* const kBareTypes[] = {
     "int",   "unsigned int",  "long long", "unsigned long long",
@@ -71,11 +70,11 @@ const char* const kBareTypes[] = {
 };
 const char* const kJsonTypes[] = {"Json::Value", "Json::arrayValue", "Json::objectValue"};
 
-const char* const kValues[] = {
+const char* const kConditionValues[] = {
     "null",       "true", "false",      "7",    "-7",        "18446744073709551615",
     "3000000000", "1.5",  "\"O'Neil\"", "\"\"", "[1,\"a\"]", "{\"k\":\"it's\"}",
 };
-const std::size_t kCount = sizeof(kValues) / sizeof(kValues[0]);
+const std::size_t kCount = sizeof(kConditionValues) / sizeof(kConditionValues[0]);
 // asString of each, escaped; null where it has no string form.
 const char* const kAsString[kCount] = {
     "",           "true", "false",   "7", "-7",    "18446744073709551615",
@@ -104,11 +103,12 @@ Json::Value ListOf(const Json::Value& jElement) {
 TEST_F(MemberCondition, StringTypeQuotesTheStringFormOfEveryKind) {
     Open("m:string");
     for (std::size_t i = 0; i < kCount; ++i) {
-        SCOPED_TRACE(kValues[i]);
+        SCOPED_TRACE(kConditionValues[i]);
         if (kAsString[i] == nullptr) {
-            ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchText);
+            ExpectMatchRefused("m", ParseJson(kConditionValues[i]), kQuoteText);
         } else {
-            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m='" + std::string(kAsString[i]) + "'");
+            EXPECT_EQ(Match("m", ParseJson(kConditionValues[i])),
+                      "m='" + std::string(kAsString[i]) + "'");
         }
     }
 }
@@ -117,8 +117,9 @@ TEST_F(MemberCondition, JsonTypesQuoteTheJsonTextOfEveryKind) {
     for (const char* szType : kJsonTypes) {
         Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
-            SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
-            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m='" + std::string(kAsJson[i]) + "'");
+            SCOPED_TRACE(std::string(szType) + " " + kConditionValues[i]);
+            EXPECT_EQ(Match("m", ParseJson(kConditionValues[i])),
+                      "m='" + std::string(kAsJson[i]) + "'");
         }
     }
 }
@@ -126,11 +127,11 @@ TEST_F(MemberCondition, JsonTypesQuoteTheJsonTextOfEveryKind) {
 TEST_F(MemberCondition, BoolTypeWritesTheIntegerOfEveryKind) {
     Open("m:bool");
     for (std::size_t i = 0; i < kCount; ++i) {
-        SCOPED_TRACE(kValues[i]);
+        SCOPED_TRACE(kConditionValues[i]);
         if (kAsInt[i] == nullptr) {
-            ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchBool);
+            ExpectMatchRefused("m", ParseJson(kConditionValues[i]), kQuoteBool);
         } else {
-            EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m=" + std::string(kAsInt[i]));
+            EXPECT_EQ(Match("m", ParseJson(kConditionValues[i])), "m=" + std::string(kAsInt[i]));
         }
     }
 }
@@ -139,11 +140,12 @@ TEST_F(MemberCondition, EveryOtherTypeNameWritesTheStringFormBare) {
     for (const char* szType : kBareTypes) {
         Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
-            SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
+            SCOPED_TRACE(std::string(szType) + " " + kConditionValues[i]);
             if (kAsString[i] == nullptr) {
-                ExpectMatchRefused("m", ParseJson(kValues[i]), kMatchText);
+                ExpectMatchRefused("m", ParseJson(kConditionValues[i]), kQuoteText);
             } else {
-                EXPECT_EQ(Match("m", ParseJson(kValues[i])), "m=" + std::string(kAsString[i]));
+                EXPECT_EQ(Match("m", ParseJson(kConditionValues[i])),
+                          "m=" + std::string(kAsString[i]));
             }
         }
     }
@@ -219,11 +221,11 @@ TEST_F(MemberCondition, TextOfAMillionBytesIsWrittenWhole) {
 TEST_F(MemberCondition, FormatterWithoutMemoryIsNamedInAnEquality) {
     ScarceMemory scarce;
     Open("m:string");
-    ExpectMatchRefused("m", LongText(), kMatchText);
+    ExpectMatchRefused("m", LongText(), kQuoteText);
     Open("m:int");
-    ExpectMatchRefused("m", LongText(), kMatchText);
+    ExpectMatchRefused("m", LongText(), kQuoteText);
     Open("m:Json::Value");
-    ExpectMatchRefused("m", LongText(), kMatchJson);
+    ExpectMatchRefused("m", LongText(), kQuoteJson);
 }
 
 // ---- membership --------------------------------------------------------------------------------
@@ -231,11 +233,11 @@ TEST_F(MemberCondition, FormatterWithoutMemoryIsNamedInAnEquality) {
 TEST_F(MemberCondition, StringListQuotesTheStringFormOfEveryKind) {
     Open("m:string");
     for (std::size_t i = 0; i < kCount; ++i) {
-        SCOPED_TRACE(kValues[i]);
+        SCOPED_TRACE(kConditionValues[i]);
         if (kAsString[i] == nullptr) {
-            ExpectListRefused("m", ListOf(ParseJson(kValues[i])), kListText);
+            ExpectListRefused("m", ListOf(ParseJson(kConditionValues[i])), kQuoteListText);
         } else {
-            EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+            EXPECT_EQ(List("m", ListOf(ParseJson(kConditionValues[i]))),
                       "m in ('" + std::string(kAsString[i]) + "' )");
         }
     }
@@ -245,8 +247,8 @@ TEST_F(MemberCondition, JsonListQuotesTheJsonTextOfEveryKind) {
     for (const char* szType : kJsonTypes) {
         Open(std::string("m:") + szType);
         for (std::size_t i = 0; i < kCount; ++i) {
-            SCOPED_TRACE(std::string(szType) + " " + kValues[i]);
-            EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+            SCOPED_TRACE(std::string(szType) + " " + kConditionValues[i]);
+            EXPECT_EQ(List("m", ListOf(ParseJson(kConditionValues[i]))),
                       "m in ('" + std::string(kAsJson[i]) + "' )");
         }
     }
@@ -258,11 +260,11 @@ TEST_F(MemberCondition, ListOfAnyOtherTypeBoolIncludedIsBare) {
     for (const std::string& strType : vecTypes) {
         Open(std::string("m:") + strType.c_str());
         for (std::size_t i = 0; i < kCount; ++i) {
-            SCOPED_TRACE(strType + " " + kValues[i]);
+            SCOPED_TRACE(strType + " " + kConditionValues[i]);
             if (kAsString[i] == nullptr) {
-                ExpectListRefused("m", ListOf(ParseJson(kValues[i])), kListText);
+                ExpectListRefused("m", ListOf(ParseJson(kConditionValues[i])), kQuoteListText);
             } else {
-                EXPECT_EQ(List("m", ListOf(ParseJson(kValues[i]))),
+                EXPECT_EQ(List("m", ListOf(ParseJson(kConditionValues[i]))),
                           "m in (" + std::string(kAsString[i]) + " )");
             }
         }
@@ -330,14 +332,14 @@ TEST_F(MemberCondition, ElementMissingInsideAnElementIsWrittenAsNull) {
     Open("m:Json::Value");
     EXPECT_EQ(List("m", jList), R"(m in ('null''[null,"x"]' ))");
     Open("m:string");
-    ExpectListRefused("m", jList, kListText);
+    ExpectListRefused("m", jList, kQuoteListText);
 }
 
 TEST_F(MemberCondition, LaterElementOfAWrongKindDropsTheWholeList) {
     Open("m:string");
-    ExpectListRefused("m", ParseJson(R"(["a","b",[]])"), kListText);
+    ExpectListRefused("m", ParseJson(R"(["a","b",[]])"), kQuoteListText);
     Open("m:int");
-    ExpectListRefused("m", ParseJson("[1,{}]"), kListText);
+    ExpectListRefused("m", ParseJson("[1,{}]"), kQuoteListText);
 }
 
 TEST_F(MemberCondition, ListWithoutAFieldNameIsRefused) {
@@ -366,17 +368,17 @@ TEST_F(MemberCondition, FormatterWithoutMemoryIsNamedInAList) {
     Json::Value jList = ListOf("a");
     jList.append(LongText());
     Open("m:string");
-    ExpectListRefused("m", jList, kListText);
+    ExpectListRefused("m", jList, kQuoteListText);
     Open("m:bool");
-    ExpectListRefused("m", jList, kListText);
+    ExpectListRefused("m", jList, kQuoteListText);
     Open("m:Json::objectValue");
-    ExpectListRefused("m", jList, kListJson);
+    ExpectListRefused("m", jList, kQuoteListJson);
 }
 
 TEST_F(MemberCondition, HandleWorksOnAfterEveryRefusal) {
     Open("m:string");
-    ExpectMatchRefused("m", ParseJson("[]"), kMatchText);
+    ExpectMatchRefused("m", ParseJson("[]"), kQuoteText);
     EXPECT_EQ(Match("m", "x"), "m='x'");
-    ExpectListRefused("m", ParseJson("[[]]"), kListText);
+    ExpectListRefused("m", ParseJson("[[]]"), kQuoteListText);
     EXPECT_EQ(List("m", ListOf("x")), "m in ('x' )");
 }

@@ -109,6 +109,11 @@ std::string SqlError(const std::string& strError, const std::string& strSql) {
     return Plain("sql error, err=" + strError + ", sql=" + strSql);
 }
 
+int CountRows(void* pArg, int, char**, char**) {
+    ++*static_cast<int*>(pArg);
+    return 0;
+}
+
 Lines Joined(Lines vecFirst, const Lines& vecSecond) {
     vecFirst.insert(vecFirst.end(), vecSecond.begin(), vecSecond.end());
     return vecFirst;

@@ -60,11 +60,21 @@ inline constexpr char kRowFailed[] =
     "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)";
 inline constexpr char kListFailed[] = "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)";
 inline constexpr char kSaveFailed[] = "0 > runSqlEx(strSql, DbCallBackFillList, &jArrayTmp)";
+inline constexpr char kMatchFailed[] =
+    "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)";
+inline constexpr char kQuoteText[] =
+    R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))";
+inline constexpr char kQuoteListText[] =
+    R"(NULL == (szSql = sqlite3_mprintf("%q", jList[i].asString().c_str())))";
 inline constexpr char kDuplicate[] = "DUPLICATE_PRIMARY_KEY";
 
 std::string RunFailed(const std::string& strError, const std::string& strSql, int nErrno = 0,
                       size_t nAttempts = 0);
 std::string SqlError(const std::string& strError, const std::string& strSql);
+
+// A row callback: counts in the int at pArg.
+int CountRows(void* pArg, int nColumns, char** pszValues, char** pszNames);
+
 Lines Joined(Lines vecFirst, const Lines& vecSecond);
 
 // One MiB.

@@ -35,7 +35,7 @@ class TestHostTest : public TableTest {
     std::string m_strPid;
 };
 
-Lines Malformed(const std::string& strRaw) {
+Lines MalformedLine(const std::string& strRaw) {
     return {"MALFORMED: " + strRaw};
 }
 
@@ -54,14 +54,14 @@ TEST_F(TestHostTest, LinesOfTheThreeVariantsAreRecognised) {
 
 TEST_F(TestHostTest, LinesThatDifferInOneThingAreMalformed) {
     const std::string strPlain = "util.cpp:7 (" + m_strPid + ")x";
-    EXPECT_EQ(Logged(strPlain, 0, LOG_DEBUG), Malformed(strPlain));
-    EXPECT_EQ(Logged(strPlain, ENOENT), Malformed(strPlain));
+    EXPECT_EQ(Logged(strPlain, 0, LOG_DEBUG), MalformedLine(strPlain));
+    EXPECT_EQ(Logged(strPlain, ENOENT), MalformedLine(strPlain));
     for (const std::string& strLine :
          {"util.cpp:7 (" + m_strPid + ")(%m)x", "src/util.cpp:7 (" + m_strPid + ")x",
           "util.cpp:0 (" + m_strPid + ")x", "util.cpp:7 (1" + m_strPid + ")x",
           "util.cpp:7(" + m_strPid + ")x", "other.cpp:7 (" + m_strPid + ")x",
           "util.cpp:7 (" + m_strPid + ")(util.cpp:7)(%m)x", std::string("x"), std::string()}) {
-        EXPECT_EQ(Logged(strLine), Malformed(strLine));
+        EXPECT_EQ(Logged(strLine), MalformedLine(strLine));
     }
 }
 
@@ -71,7 +71,7 @@ TEST_F(TestHostTest, PrintedLinesThatDifferInOneThingAreMalformed) {
           "(" + m_strPid + ") util.cpp:7 (util.cpp:7)(Success)x\n",
           "(1" + m_strPid + ") util.cpp:7 x\n", "(" + m_strPid + ")util.cpp:7 x\n",
           "(" + m_strPid + ") /util.cpp:7 x\n", std::string("x\n")}) {
-        EXPECT_EQ(Printed(strText), Malformed(strText));
+        EXPECT_EQ(Printed(strText), MalformedLine(strText));
     }
 }
 

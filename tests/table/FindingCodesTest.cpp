@@ -45,7 +45,7 @@ constexpr char kDSql[] =
     "CREATE TABLE d (id INTEGER PRIMARY KEY, i INTEGER, r REAL, j TEXT, l TEXT, s TEXT,"
     " g INTEGER GENERATED ALWAYS AS (i + 1), offset INTEGER, z TEXT)";
 
-const CodeCase kCases[] = {
+const CodeCase kCodeCases[] = {
     {"no-definition", Call::kDefinition, "{}"},
     {"unknown-type", Call::kDefinition, R"({"member": {"a": {"cpptype": "text"}}})"},
     {"bad-name", Call::kDefinition, R"({"member": {"$a": {"cpptype": "int"}}})"},
@@ -293,7 +293,7 @@ TEST_F(FindingCodesTest, EachIsProducedWithItsSeverityMessageAndRemedy) {
         setProduced.insert(setCodes.begin(), setCodes.end());
         return setCodes;
     };
-    for (const CodeCase& Case : kCases) {
+    for (const CodeCase& Case : kCodeCases) {
         EXPECT_EQ(Take(Make(Case)).count(Case.szCode), 1U) << Case.szCode;
     }
     for (const FindingList& vecFindings : MakeBuilt()) {
