@@ -29,19 +29,6 @@ const char* DeclaredType(BoundKind eKind) {
     }
 }
 
-std::string TextLiteral(std::string_view strText) {
-    std::string strLiteral = "'";
-    for (const char c : strText) {
-        strLiteral.append(c == '\'' ? 2 : 1, c);
-    }
-    return strLiteral += '\'';
-}
-
-// A key of one whole number is the rowid itself: SQLite hands out values, and finds rows fastest.
-bool IsRowid(const Members& Of) {
-    return Of.Key().size() == 1 && Of.At(Of.Key()[0]).Kind() == BoundKind::kInteger;
-}
-
 }  // namespace
 
 std::string DefaultClause(const Member& Declared) {
@@ -67,7 +54,7 @@ std::string DefaultClause(const Member& Declared) {
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
             return std::string(" DEFAULT ") + szReal;
         case BoundValue::Kind::kText:
-            return " DEFAULT " + TextLiteral(Value.strBytes);
+            return " DEFAULT " + Enclosed(Value.strBytes, '\'');
         default:
             return {};
     }
@@ -82,7 +69,7 @@ std::string CreateTableSql(const Members& Of) {
     std::string strSql = "CREATE TABLE IF NOT EXISTS " + Of.QuotedTable() + " (";
     const char* szBefore = "";
     for (const Member& Declared : Of.All()) {
-        const bool blRowid = Declared.blKey && IsRowid(Of);
+        const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
         strSql +=
             szBefore + (blRowid ? Declared.strQuoted + " INTEGER PRIMARY KEY"
@@ -90,7 +77,7 @@ std::string CreateTableSql(const Members& Of) {
         strSql += Declared.blUnique && !blRowid ? " UNIQUE" : "";
         szBefore = ", ";
     }
-    if (!Of.Key().empty() && !IsRowid(Of)) {
+    if (!Of.Key().empty() && !Of.HasRowidKey()) {
         strSql += ", PRIMARY KEY";
         szBefore = " (";
         for (const size_t nMember : Of.Key()) {

@@ -52,8 +52,8 @@ constexpr int Primary(int nSqlite) {
 
 // Everything else is a statement that SQLite refuses: no such column, too big, not authorised.
 StatusCode CodeOf(int nSqlite, int nSystemError) {
-    const bool blWrite = nSqlite == SQLITE_IOERR_WRITE;
-    if (blWrite && (nSystemError == ENOSPC || nSystemError == EDQUOT)) {
+    // Of a quota that is used up SQLite does not say that the disk is full.
+    if (nSqlite == SQLITE_IOERR_WRITE && nSystemError == EDQUOT) {
         return StatusCode::kDiskFull;
     }
     for (const CodeRow& Row : kCodes) {
@@ -82,13 +82,16 @@ std::string Doing::Text() const {
     if (nRecord != 0) {
         strText.replace(strText.find('#'), 1, std::to_string(nRecord));
     }
-    return pstrTable == nullptr ? strText : strText + " table " + Quoted(*pstrTable);
+    if (pstrTable != nullptr) {
+        strText += " table " + Quoted(*pstrTable);
+    }
+    return strText;
 }
 
-Status Fail(StatusCode eCode, const Doing& What, const std::string& strReason) {
+Status Fail(StatusCode eCode, const Doing& What, std::string_view strReason) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = eCode;
-    pDetails->strMessage = What.Text() + ": " + strReason;
+    pDetails->strMessage = What.Text().append(": ").append(strReason);
     return Status(std::move(pDetails));
 }
 
@@ -127,13 +130,13 @@ bool HasError(const FindingList& vecFindings) {
                        [](const Finding& Found) { return Found.eSeverity == Severity::kError; });
 }
 
-Status Amended(const Status& Outcome, Retry eRetry, const std::string& strMore) {
+Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = Outcome.Code();
     pDetails->eRetry = eRetry;
     pDetails->nSqliteCode = Outcome.SqliteCode();
     pDetails->nSystemError = Outcome.SystemError();
-    pDetails->strMessage = Outcome.Message() + strMore;
+    pDetails->strMessage = std::string(Outcome.Message()).append(strMore);
     pDetails->vecFindings = Outcome.Findings();
     return Status(std::move(pDetails));
 }

@@ -62,7 +62,10 @@ std::string Nearest(std::string_view strTyped, const std::vector<std::string>& v
 
 std::string Suggestion(std::string_view strTyped, const std::vector<std::string>& vecCandidates) {
     const std::string strNearest = Nearest(strTyped, vecCandidates);
-    return strNearest.empty() ? strNearest : " (did you mean " + Quoted(strNearest) + "?)";
+    if (strNearest.empty()) {
+        return {};
+    }
+    return " (did you mean " + Quoted(strNearest) + "?)";
 }
 
 }  // namespace vornjsondb

@@ -18,9 +18,11 @@ std::string SelectSql(const Members& Of, const std::vector<size_t>& vecColumns) 
 }
 
 std::string SelectOneSql(const Table::Parts& From, bool blByRowid) {
-    const std::string strSql = SelectSql(From.Of, From.WholeRow.Columns());
-    return blByRowid ? strSql + " WHERE " + From.Of.QuotedTable() + "." + From.strRowid + " = ?"
-                     : strSql + WhereKey(From.Of);
+    std::string strSql = SelectSql(From.Of, From.WholeRow.Columns());
+    if (blByRowid) {
+        return strSql + " WHERE " + From.Of.QuotedTable() + "." + From.strRowid + " = ?";
+    }
+    return strSql + WhereKey(From.Of);
 }
 
 }  // namespace vornjsondb

@@ -56,6 +56,14 @@ Status CheckVersion(int nVersion, const char* szVersion, const Doing& What);
 // A failure when the Table is not open, or is to be changed by a callback that reads from it.
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
 
+// What each public call begins with: fnCall, with the parts and what they are about to do, where
+// the state allows it.
+template <typename Call>
+Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange, Call&& fnCall) {
+    Status State = CheckState(pParts, szDo, blChange);
+    return State.Ok() ? fnCall(*pParts, pParts->Do(szDo)) : State;
+}
+
 }  // namespace vornjsondb
 
 #endif  // VORN_TABLE_TABLE_PARTS_H
