@@ -17,15 +17,39 @@ namespace {
 struct ExitRow {
     StatusCode eCode;
     int nExit;
+    const char* szHint;  // what to do, where no finding tells
 };
 
 // kRefused is the caller's to say. What is not here is unexpected.
 constexpr ExitRow kExits[] = {
-    {StatusCode::kNotFound, kExitNotFound},  {StatusCode::kDuplicate, kExitDuplicate},
-    {StatusCode::kConstraint, kExitBadData}, {StatusCode::kLocked, kExitLocked},
-    {StatusCode::kReadOnly, kExitIo},        {StatusCode::kDiskFull, kExitIo},
-    {StatusCode::kIoError, kExitIo},         {StatusCode::kCorrupt, kExitIo},
-    {StatusCode::kNotADatabase, kExitIo},    {StatusCode::kInterrupted, kExitInterrupted},
+    {StatusCode::kNotFound, kExitNotFound, ""},
+    {StatusCode::kDuplicate, kExitDuplicate, ""},
+    {StatusCode::kConstraint, kExitBadData, ""},
+    {StatusCode::kLocked, kExitLocked, "; try again, or wait longer with --wait MS"},
+    {StatusCode::kReadOnly, kExitIo, "; check the permissions of the file and of its folder"},
+    {StatusCode::kDiskFull, kExitIo, "; free some space"},
+    {StatusCode::kIoError, kExitIo, "; check the disk and the shell's limits"},
+    {StatusCode::kCorrupt, kExitIo, "; restore it from a copy"},
+    {StatusCode::kNotADatabase, kExitIo, "; name an SQLite database first"},
+    {StatusCode::kInterrupted, kExitInterrupted, ""},
+};
+
+// What a finding advises is a call of the library: here is what to type instead.
+struct RemedyRow {
+    const char* szCode;
+    const char* szRemedy;
+};
+
+constexpr RemedyRow kRemedies[] = {
+    {"full-scan", "create one by vornjsondb index, where the table is or gets large"},
+    {"key-not-unique", "vornjsondb sync adds a unique index"},
+    {"missing-column", "vornjsondb sync adds it"},
+    {"missing-unique", "vornjsondb sync adds a unique index"},
+    {"no-condition", "give a condition; delete --all removes all records"},
+    {"unknown-member", "correct the name, or add the member by insert --add-members"},
+    {"unknown-operator", "see vornjsondb list --help"},
+    {"unknown-type", "see vornjsondb init --help"},
+    {"wrong-operator", "$like and $prefix are for texts, $contains is for lists"},
 };
 
 void CheckOutput(bool blWritten) {
@@ -35,13 +59,31 @@ void CheckOutput(bool blWritten) {
     }
 }
 
+// Names and values in a message may come from anywhere, and must not steer the terminal. U+0080 to
+// U+009F do so, too; in UTF-8 they begin with the byte C2.
+std::string OneLine(const std::string& strText) {
+    std::string strLine;
+    bool blAfterC2 = false;
+    for (const char c : strText) {
+        const auto nByte = static_cast<unsigned char>(c);
+        if (nByte == '\n' || nByte == '\r') {
+            strLine += ' ';
+        } else if (nByte < ' ' || nByte == 0x7F || (blAfterC2 && nByte < 0xA0)) {
+            constexpr char kDigits[] = "0123456789abcdef";
+            strLine.resize(strLine.size() - (blAfterC2 && nByte >= 0x80 ? 1 : 0));
+            strLine += std::string("\\x") + kDigits[nByte >> 4U] + kDigits[nByte & 15U];
+        } else {
+            strLine += c;
+        }
+        blAfterC2 = nByte == 0xC2;
+    }
+    return strLine;
+}
+
 }  // namespace
 
-void Fail(int nExit, std::string strLine) {
-    for (char& c : strLine) {
-        c = c == '\n' || c == '\r' ? ' ' : c;
-    }
-    throw Error{nExit, std::move(strLine)};
+void Fail(int nExit, const std::string& strLine) {
+    throw Error{nExit, OneLine(strLine)};
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
@@ -56,13 +98,31 @@ int ExitOf(StatusCode eCode, int nRefused) {
     return kExitUnexpected;
 }
 
+std::string RemedyOf(const Finding& Found) {
+    for (const RemedyRow& Row : kRemedies) {
+        if (std::strcmp(Row.szCode, Found.szCode) == 0) {
+            return Row.szRemedy;
+        }
+    }
+    return Found.strRemedy;
+}
+
+const char* HintFor(StatusCode eCode) {
+    for (const ExitRow& Row : kExits) {
+        if (Row.eCode == eCode) {
+            return Row.szHint;
+        }
+    }
+    return "";
+}
+
 std::string LineOf(const Status& Outcome) {
     for (const Finding& Found : Outcome.Findings()) {
         if (Found.eSeverity == Severity::kError && !Found.strRemedy.empty()) {
-            return Outcome.Message() + "; " + Found.strRemedy;
+            return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
-    return Outcome.Message();
+    return Outcome.Message() + HintFor(Outcome.Code());
 }
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
@@ -127,7 +187,7 @@ int Context::WaitMs() const {
 
 void Context::Say(const std::string& strLine) const {
     if (!Quiet()) {
-        std::fprintf(stderr, "%s\n", strLine.c_str());
+        static_cast<void>(std::fprintf(stderr, "%s\n", OneLine(strLine).c_str()));
     }
 }
 

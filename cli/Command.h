@@ -26,6 +26,12 @@ enum Exit : int {
     kExitInterrupted = 130
 };
 
+struct ExitMeaning {
+    Exit nExit;
+    const char* szMeaning;
+};
+const std::vector<ExitMeaning>& AllExits();
+
 // Thrown to end a subcommand; main prints "error: " and the line, which says what is wrong, where,
 // and after a semicolon what to do.
 struct Error {
@@ -33,13 +39,15 @@ struct Error {
     std::string strLine;
 };
 
-[[noreturn]] void Fail(int nExit, std::string strLine);
+[[noreturn]] void Fail(int nExit, const std::string& strLine);
 
 // Throws what a failed Status stands for: "WHERE: message; remedy". What kRefused is depends on who
 // wrote the arguments: a person at the shell (usage) or the data (kExitBadData).
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused = kExitUsage);
 int ExitOf(StatusCode eCode, int nRefused = kExitUsage);
 std::string LineOf(const Status& Outcome);
+std::string RemedyOf(const Finding& Found);
+const char* HintFor(StatusCode eCode);  // "; what to do", or nothing
 
 // "; did you mean "NAME"?" for the nearest of vecNames, or nothing where none is near.
 std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames);
@@ -66,6 +74,7 @@ struct Command {
 };
 
 const std::vector<Command>& AllCommands();
+extern const char kOverviewExamples[];  // of the command as a whole
 const std::vector<Option>& SharedOptions();
 
 // One call. The words follow Command::szWords; options are found by their long names.

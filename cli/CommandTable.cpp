@@ -21,7 +21,9 @@ const Option kDryRun{"--dry-run", "-n", "", "show what would be done, and change
 
 const char kConditionText[] =
     "member=value means equal; the value is text for a text member, else JSON. member:=JSON is\n"
-    "JSON for every member: name:=null. All conditions must hold.\n";
+    "JSON for every member: name:=null. All conditions must hold.\n"
+    "Operators of --where: $eq $ne $lt $lte $gt $gte $between $in $nin $null, for texts $like\n"
+    "$prefix, for lists $contains; $and $or $not combine conditions.\n";
 
 const std::vector<Command>& Rows() {
     static const std::vector<Command> vecRows = {
@@ -190,6 +192,27 @@ const std::vector<Command>& Rows() {
 
 const std::vector<Command>& AllCommands() {
     return Rows();
+}
+
+const char kOverviewExamples[] =
+    "vornjsondb insert shop.db product products.json --key id\n"
+    "vornjsondb list shop.db product size=5 --sort -price\n"
+    "vornjsondb update shop.db product 17 price=9.5\n"
+    "vornjsondb list shop.db product --format csv > products.csv\n";
+
+const std::vector<ExitMeaning>& AllExits() {
+    static const std::vector<ExitMeaning> vecExits = {
+        {kExitFine, "done; an empty list is no failure"},
+        {kExitUnexpected, "anything else, such as no memory"},
+        {kExitUsage, "the command line is wrong"},
+        {kExitBadData, "data, a definition or a database is not as it must be"},
+        {kExitDuplicate, "a record or a table is there already"},
+        {kExitNotFound, "there is no such record or table"},
+        {kExitLocked, "another program held the database for too long"},
+        {kExitIo, "a file cannot be opened, read or written, or is no database"},
+        {kExitInterrupted, "stopped by Ctrl-C"},
+    };
+    return vecExits;
 }
 
 const std::vector<Option>& SharedOptions() {

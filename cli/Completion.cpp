@@ -1,11 +1,14 @@
-// completion: scripts for shells and the manual page, made from the table of subcommands.
+// completion: scripts for shells, made from the table of subcommands as the manual is.
 
 #include "Commands.h"
+#include "Manual.h"
 #include "Parse.h"
 
 namespace VORN_JSON_DB::Cli {
 
 namespace {
+
+constexpr char kShells[] = "bash zsh fish man";
 
 std::string CommandNames() {
     std::string strNames;
@@ -64,7 +67,9 @@ void PutBash() {
     Put("        esac\n"
         "    fi\n"
         "    if [[ -z $words && ${COMP_WORDS[1]} == completion ]]; then\n"
-        "        words='bash zsh fish man'\n"
+        "        words='" +
+        std::string(kShells) +
+        "'\n"
         "    elif [[ -z $words ]] && ((COMP_CWORD == 3)) && [[ -r ${COMP_WORDS[2]} ]]; then\n"
         "        words=$(vornjsondb tables \"${COMP_WORDS[2]}\" --format csv --no-headers "
         "2>/dev/null)\n"
@@ -78,11 +83,76 @@ void PutBash() {
         "complete -o filenames -F _vornjsondb vornjsondb\n");
 }
 
-// zsh runs the script of bash, which is the same words.
+// Within single quotes, in a part that square brackets enclose.
+std::string ZshHelp(const char* szText) {
+    std::string strOut;
+    for (const char* pAt = szText; *pAt != '\0'; ++pAt) {
+        strOut += *pAt == '[' || *pAt == ']' ? "\\" : "";
+        strOut += *pAt == '\'' ? "'\\''" : std::string(1, *pAt);
+    }
+    return strOut;
+}
+
+// One word for _arguments: names, help, and what the value may be.
+std::string ZshOption(const Option& Of) {
+    std::string strValue;
+    if (!Choices(Of).empty()) {
+        strValue = ":value:(" + Joined(Choices(Of)) + ")";
+    } else if (*Of.szValue != '\0') {
+        strValue = ":" + std::string(Of.szValue) + ":_files";
+    }
+    const std::string strNames =
+        *Of.szShort == '\0' ? Of.szName : "'{" + std::string(Of.szShort) + "," + Of.szName + "}'";
+    return "'" + std::string(Of.blRepeat ? "*" : "") + strNames + "[" + ZshHelp(Of.szHelp) + "]" +
+           strValue + "'";
+}
+
+std::string ZshWords(const Command& Of) {
+    const std::string strWords = Of.szWords;
+    if (strWords.compare(0, 2, "DB") != 0) {
+        return "'1:shell:(" + std::string(kShells) + ")'";
+    }
+    const bool blTable = strWords.find("TABLE") != std::string::npos;
+    return std::string("'1:database:_files'") + (blTable ? " '2:table:_vornjsondb_tables'" : "") +
+           " '*:word:_files'";
+}
+
+// What is read from the function path is the function's body at first, so that it calls what it
+// made.
 void PutZsh() {
     Put("#compdef vornjsondb\n"
-        "autoload -U +X bashcompinit && bashcompinit\n");
-    PutBash();
+        "_vornjsondb_tables() {\n"
+        "    local -a tables=(${(f)\"$(vornjsondb tables ${(Q)words[2]} --format csv --no-headers "
+        "2>/dev/null)\"})\n"
+        "    compadd -a tables\n"
+        "}\n"
+        "_vornjsondb() {\n"
+        "    local -a subcommands=(\n");
+    for (const Command& Of : AllCommands()) {
+        Put("        '" + std::string(Of.szName) + ":" + ZshHelp(Of.szHelp) + "'\n");
+    }
+    Put("    )\n"
+        "    if ((CURRENT == 2)); then\n"
+        "        _describe subcommand subcommands\n"
+        "        return\n"
+        "    fi\n"
+        "    shift words\n"
+        "    ((CURRENT--))\n"
+        "    case $words[1] in\n");
+    for (const Command& Of : AllCommands()) {
+        Put("        " + std::string(Of.szName) + ") _arguments");
+        for (const Option& Row : OptionsOf(Of)) {
+            Put(" \\\n            " + ZshOption(Row));
+        }
+        Put(std::string(" \\\n            ") + ZshWords(Of) + " ;;\n");
+    }
+    Put("    esac\n"
+        "}\n"
+        "if [[ $funcstack[1] == _vornjsondb ]]; then\n"
+        "    _vornjsondb \"$@\"\n"
+        "else\n"
+        "    compdef _vornjsondb vornjsondb\n"
+        "fi\n");
 }
 
 std::string FishQuoted(const std::string& strText) {
@@ -109,58 +179,11 @@ void PutFish() {
             Put(strLine + " -d " + FishQuoted(Row.szHelp) + "\n");
         }
     }
-    Put("complete -c vornjsondb -n '__fish_seen_subcommand_from completion' -f -a "
-        "'bash zsh fish man'\n");
-}
-
-// A text of the manual: a backslash or a leading point would be a request to its formatter.
-std::string Manual(const std::string& strText) {
-    std::string strOut;
-    for (const char c : strText) {
-        const bool blLineBegins = strOut.empty() || strOut.back() == '\n';
-        strOut += blLineBegins && (c == '.' || c == '\'') ? "\\&" : "";
-        strOut += c == '\\' ? "\\e" : c == '-' ? "\\-" : std::string(1, c);
-    }
-    return strOut;
-}
-
-void PutManualOptions(const std::vector<Option>& vecOptions) {
-    Put(".Bl -tag -width Ds\n");
-    for (const Option& Row : vecOptions) {
-        Put(".It ");
-        Put(*Row.szShort == '\0' ? "" : std::string("Fl ") + (Row.szShort + 1) + " , ");
-        Put("Fl " + Manual(Row.szName + 1) + (*Row.szValue == '\0' ? "" : " Ar ") + Row.szValue +
-            "\n" + Manual(Row.szHelp) + "\n");
-    }
-    Put(".El\n");
-}
-
-void PutManual() {
-    Put(".Dd November 21, 2026\n.Dt VORNJSONDB 1\n.Os\n"
-        ".Sh NAME\n.Nm vornjsondb\n.Nd JSON records in SQLite tables\n"
-        ".Sh SYNOPSIS\n.Nm\n.Ar SUBCOMMAND DB\n.Op Ar TABLE\n.Op Ar ...\n"
-        ".Sh DESCRIPTION\nReads, changes and describes the records of any SQLite database.\n"
-        "Options of every subcommand:\n");
-    PutManualOptions(SharedOptions());
-    for (const Command& Of : AllCommands()) {
-        Put(".Ss " + std::string(Of.szName) + "\n" + Manual(Of.szHelp) +
-            ".\n.Bd -literal\nvornjsondb " + Manual(std::string(Of.szName) + " " + Of.szWords) +
-            "\n\n" + Manual(Of.szExamples) + ".Ed\n");
-        if (*Of.szText != '\0') {
-            Put(".Bd -literal\n" + Manual(Of.szText) + ".Ed\n");
-        }
-        if (!Of.vecOptions.empty()) {
-            PutManualOptions(Of.vecOptions);
-        }
-    }
-    Put(".Sh ENVIRONMENT\n.Bl -tag -width Ds\n"
-        ".It Ev COLUMNS\nThe width of tables, where the terminal does not tell.\n"
-        ".It Ev NO_COLOR\nIf set and not empty, there are no colours.\n.El\n"
-        ".Sh FILES\nA database keeps definitions in its table\n.Ql vornjsondb_definition .\n"
-        ".Sh EXIT STATUS\n"
-        "0 fine, 1 unexpected, 2 usage, 3 bad data, 4 duplicate, 5 not found, 6 locked,\n"
-        "7 input or output, 130 interrupted.\n"
-        ".Sh SEE ALSO\n.Xr sqlite3 1\n");
+    Put("complete -c vornjsondb -n '__fish_seen_subcommand_from completion' -f -a '" +
+        std::string(kShells) +
+        "'\n"
+        "complete -c vornjsondb -n 'test (count (commandline -opc)) -eq 3' -f -a '(vornjsondb "
+        "tables (commandline -opc)[3] --format csv --no-headers 2>/dev/null)'\n");
 }
 
 }  // namespace

@@ -52,7 +52,17 @@ Json::Value TypedValue(const Table& Of, const std::string& strMember, const std:
     if (strType == "bool" && (strText == "0" || strText == "1")) {
         return strText == "1";
     }
-    return LooksLikeJson(strText) ? ParseJson(strText, strMember) : Json::Value(strText);
+    return LooksLikeJson(strText) ? ParseJson(strText, strMember, kExitUsage)
+                                  : Json::Value(strText);
+}
+
+Json::Value ParseWhere(const std::string& strText) {
+    if (strText.find_first_of("{[") == std::string::npos) {
+        Fail(kExitUsage,
+             "--where: \"" + strText +
+                 "\" is no JSON object; write {\"size\": 5}, or size=5 without --where");
+    }
+    return ParseJson(strText, "--where", kExitUsage);
 }
 
 }  // namespace
@@ -79,7 +89,7 @@ Assignment ParseAssignment(const Table& Of, const std::string& strWord) {
     if (blJson) {
         const std::string strName = strMember.substr(0, strMember.size() - 1);
         CheckMember(Of, strName);
-        return {strName, ParseJson(strText, strName)};
+        return {strName, ParseJson(strText, strName, kExitUsage)};
     }
     CheckMember(Of, strMember);
     return {strMember, TypedValue(Of, strMember, strText)};
@@ -105,7 +115,7 @@ Json::Value ParseKey(const Table& Of, const std::string& strWord) {
     if (vecKey.size() == 1) {
         return TypedValue(Of, vecKey[0], strWord);
     }
-    const Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"");
+    const Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
     for (const std::string& strMember : vecKey) {
         if (!jKey.isObject() || !jKey.isMember(strMember) || jKey.size() != vecKey.size()) {
             Fail(kExitUsage, "key \"" + strWord + "\": it must be an object with just " +
@@ -127,7 +137,7 @@ Query KeyQuery(const Table& Of, const Json::Value& jKey) {
 Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::string>& vecWords) {
     Json::Value jQuery(Json::objectValue);
     if (Call.Has("--where")) {
-        jQuery["where"] = ParseJson(Call.Text("--where"), "--where");
+        jQuery["where"] = ParseWhere(Call.Text("--where"));
     }
     Query Which(jQuery);
     for (const std::string& strWord : vecWords) {

@@ -27,13 +27,17 @@ StatusCode CodeOf(int nSqlite) {
             return StatusCode::kConstraint;
         case SQLITE_INTERRUPT:
             return StatusCode::kInterrupted;
-        case SQLITE_CANTOPEN:
-        case SQLITE_CORRUPT:
-        case SQLITE_FULL:
-        case SQLITE_IOERR:
-        case SQLITE_NOTADB:
-        case SQLITE_PERM:
         case SQLITE_READONLY:
+            return StatusCode::kReadOnly;
+        case SQLITE_FULL:
+            return StatusCode::kDiskFull;
+        case SQLITE_CORRUPT:
+            return StatusCode::kCorrupt;
+        case SQLITE_NOTADB:
+            return StatusCode::kNotADatabase;
+        case SQLITE_CANTOPEN:
+        case SQLITE_IOERR:
+        case SQLITE_PERM:
             return StatusCode::kIoError;
         default:
             return StatusCode::kMisuse;
@@ -49,13 +53,21 @@ std::string FileOf(sqlite3* pDb) {
     std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
     const StatusCode eCode = CodeOf(sqlite3_extended_errcode(pDb));
     if (eCode == StatusCode::kLocked) {
-        strLine += "; try again, or wait longer with --wait MS";
+        const Statement pWaited = Prepare(pDb, "PRAGMA busy_timeout");
+        Step(pWaited.get());
+        strLine += " (waited " + ColumnText(pWaited.get(), 0) + " ms)";
     }
-    Fail(ExitOf(eCode), strLine);
+    Fail(ExitOf(eCode), strLine + HintFor(eCode));
 }
 
 void CheckFile(const std::string& strFile, Access eAccess) {
     if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
+        const std::size_t nSlash = strFile.rfind('/');
+        const std::string strFolder =
+            nSlash == std::string::npos ? "." : strFile.substr(0, nSlash + 1);
+        if (access(strFolder.c_str(), W_OK | X_OK) != 0) {
+            Fail(kExitIo, strFile + ": " + std::strerror(errno) + "; check the folder");
+        }
         return;
     }
     if (access(strFile.c_str(), eAccess == Access::kRead ? R_OK : R_OK | W_OK) != 0) {
@@ -83,14 +95,6 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
     // SQLite looks into the file no sooner than now.
     if (sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr) !=
         SQLITE_OK) {
-        if (sqlite3_errcode(pDb) == SQLITE_NOTADB) {
-            Fail(kExitIo, strFile + ": " + sqlite3_errmsg(pDb) + "; name an SQLite database first");
-        }
-        if (CodeOf(sqlite3_errcode(pDb)) == StatusCode::kLocked) {
-            Fail(kExitLocked, strFile + ": " + sqlite3_errmsg(pDb) + " (waited " +
-                                  std::to_string(Call.WaitMs()) +
-                                  " ms); try again, or wait longer with --wait MS");
-        }
         FailBySqlite(pDb, strFile);
     }
     return pOwner;
@@ -116,7 +120,7 @@ std::string ReadFile(const std::string& strFile) {
     return strText;
 }
 
-Json::Value ParseJson(const std::string& strText, const std::string& strWhere) {
+Json::Value ParseJson(const std::string& strText, const std::string& strWhere, int nExit) {
     Json::CharReaderBuilder Builder;
     Json::CharReaderBuilder::strictMode(&Builder.settings_);
     Builder["strictRoot"] = false;
@@ -138,8 +142,8 @@ Json::Value ParseJson(const std::string& strText, const std::string& strWhere) {
         std::getline(Lines, strPlace);
         std::getline(Lines, strReason);
         strReason.erase(0, strReason.find_first_not_of(' '));
-        Fail(kExitBadData, strWhere + ": " + strPlace +
-                               (strReason.empty() ? "" : ": " + strReason) + "; it must be JSON");
+        Fail(nExit, strWhere + ": " + strPlace + (strReason.empty() ? "" : ": " + strReason) +
+                        "; it must be JSON");
     }
     return jValue;
 }

@@ -23,8 +23,9 @@ Database OpenDatabase(const Context& Call, Access eAccess);
 
 // Reads a whole file, "-" being standard input.
 std::string ReadFile(const std::string& strFile);
-// Strict JSON; strWhere begins the Error.
-Json::Value ParseJson(const std::string& strText, const std::string& strWhere);
+// Strict JSON; strWhere begins the Error. What stands on the command line is its fault: kExitUsage.
+Json::Value ParseJson(const std::string& strText, const std::string& strWhere,
+                      int nExit = kExitBadData);
 
 // The definition of a table: from --def, else what the database keeps, else null.
 Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable);

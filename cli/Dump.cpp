@@ -15,7 +15,7 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-const char kFormat[] = "vornjsondb-dump";
+const char kStreamFormat[] = "vornjsondb-dump";
 constexpr int kVersion = 1;
 
 // FNV-1a: against accidents, not against people.
@@ -28,7 +28,8 @@ class Checksum {
     }
     std::string Text() const {
         char szHex[17];
-        std::snprintf(szHex, sizeof szHex, "%016llx", static_cast<unsigned long long>(m_nHash));
+        static_cast<void>(std::snprintf(szHex, sizeof szHex, "%016llx",
+                                        static_cast<unsigned long long>(m_nHash)));
         return szHex;
     }
 
@@ -78,8 +79,8 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
         case SQLITE_FLOAT:
             // No reader of JSON has to take 1e999.
             if (std::isinf(sqlite3_column_double(pRow, nColumn))) {
-                strOut += sqlite3_column_double(pRow, nColumn) > 0 ? "{\"$real\":\"inf\"}"
-                                                                   : "{\"$real\":\"-inf\"}";
+                strOut += sqlite3_column_double(pRow, nColumn) > 0 ? R"({"$real":"inf"})"
+                                                                   : R"({"$real":"-inf"})";
                 return;
             }
             return AppendReal(strOut, sqlite3_column_double(pRow, nColumn));
@@ -87,7 +88,7 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
             if (IsUtf8(Bytes())) {
                 return AppendJsonString(strOut, Bytes());
             }
-            strOut += "{\"$text\":true,\"encoded\":\"";
+            strOut += R"({"$text":true,"encoded":")";
             AppendBase64(strOut, Bytes());
             strOut += "\"}";
             return;
@@ -104,7 +105,7 @@ struct Described {
 };
 
 Described Describe(const Context& Call, sqlite3* pDb) {
-    const std::string strTable = Call.TableName();
+    const std::string& strTable = Call.TableName();
     const std::vector<std::string> vecCreate =
         Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
     if (vecCreate.empty() || vecCreate[0].compare(0, 15, "CREATE VIRTUAL ") == 0) {
@@ -113,7 +114,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     }
     Described Found;
     Json::Value& jHeader = Found.jHeader;
-    jHeader["format"] = kFormat;
+    jHeader["format"] = kStreamFormat;
     jHeader["version"] = kVersion;
     jHeader["table"] = strTable;
     const Json::Value jDefinition = KnownDefinition(Call, pDb, strTable);
@@ -231,7 +232,7 @@ Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
 }
 
 void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
-    const bool blDump = jHeader.isObject() && jHeader["format"] == kFormat &&
+    const bool blDump = jHeader.isObject() && jHeader["format"] == kStreamFormat &&
                         jHeader["table"].isString() && jHeader["columns"].isArray() &&
                         jHeader["statements"].isArray() && !jHeader["statements"].empty();
     if (!blDump) {
@@ -239,6 +240,14 @@ void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
     }
     if (jHeader["version"] != kVersion) {
         From.FailHere("version " + CompactJson(jHeader["version"]) + " is not known here");
+    }
+    if (jHeader.isMember("sequence") && !jHeader["sequence"].isInt64()) {
+        From.FailHere("the counter is no number");
+    }
+    for (const Json::Value& jColumn : jHeader["columns"]) {
+        if (!jColumn.isString()) {
+            From.FailHere("a column has no name");
+        }
     }
     for (const Json::Value& jSql : jHeader["statements"]) {
         if (!jSql.isString() || jSql.asString().compare(0, 7, "CREATE ") != 0) {
@@ -310,7 +319,7 @@ int RunDump(Context& Call) {
         Put(strLine + "\n");
         ++nRows;
     }
-    Put("{\"rows\":" + std::to_string(nRows) + ",\"checksum\":\"" + Sum.Text() + "\"}\n");
+    Put("{\"rows\":" + std::to_string(nRows) + R"(,"checksum":")" + Sum.Text() + "\"}\n");
     return kExitFine;
 }
 

@@ -5,6 +5,7 @@
 #include "Database.h"
 #include "JsonCells.h"
 #include "Terminal.h"
+#include "input/JsonText.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -227,7 +228,9 @@ class JsonWriter : public RecordOutput {
             case Row::Kind::kText:
                 return AppendJsonString(m_strLine, Value.strText);
             case Row::Kind::kJson:
-                return AppendJson(m_strLine, Value.strText);
+                // Whoever made the table may have put any text there.
+                return IsJson(Value.strText) ? AppendJson(m_strLine, Value.strText)
+                                             : AppendJsonString(m_strLine, Value.strText);
             case Row::Kind::kBlob:
                 return AppendBlob(m_strLine, Value.strText);
             default:

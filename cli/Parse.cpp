@@ -85,11 +85,9 @@ void PutHelp(const Command& Of) {
 }
 
 void PutOverview() {
-    Put("Examples\n"
-        "  vornjsondb insert shop.db product products.json --key id\n"
-        "  vornjsondb list shop.db product size=5 --sort -price\n"
-        "  vornjsondb update shop.db product 17 price=9.5\n\n"
-        "Usage\n  vornjsondb SUBCOMMAND DB [TABLE] ... [OPTION]...\n\n"
+    Put("Examples\n");
+    PutIndented(kOverviewExamples);
+    Put("\nUsage\n  vornjsondb SUBCOMMAND DB [TABLE] ... [OPTION]...\n\n"
         "JSON records in SQLite tables, of any database.\n\nSubcommands\n");
     for (const Command& Row : AllCommands()) {
         Put("  " + Padded(Row.szName, 12) + Row.szHelp + "\n");

@@ -29,15 +29,16 @@ void AppendFindings(const FindingList& vecFindings, const std::string& strTable,
         jFinding["code"] = Found.szCode;
         jFinding["path"] = Found.strPath;
         jFinding["message"] = Found.strMessage;
-        jFinding["remedy"] = Found.strRemedy;
+        jFinding["remedy"] = RemedyOf(Found);
         jFindings.append(std::move(jFinding));
     }
 }
 
 void PutFindings(const FindingList& vecFindings) {
     for (const Finding& Found : vecFindings) {
+        const std::string strRemedy = RemedyOf(Found);
         Put(std::string(kSeverities[static_cast<int>(Found.eSeverity)]) + ": " + Found.strMessage +
-            (Found.strRemedy.empty() ? "" : "; " + Found.strRemedy) + "\n");
+            (strRemedy.empty() ? "" : "; " + strRemedy) + "\n");
     }
 }
 

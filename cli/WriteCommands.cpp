@@ -103,7 +103,7 @@ int RunUpsert(Context& Call) {
     OpenTable Open(Call, Access::kChange);
     Json::Value jRecord;
     if (Call.vecWords.size() == 3 && Call.vecWords[2].compare(0, 1, "{") == 0) {
-        jRecord = ParseJson(Call.vecWords[2], "record");
+        jRecord = ParseJson(Call.vecWords[2], "record", kExitUsage);
     } else {
         jRecord = ParseAssignments(Open.Records, Call.WordsFrom(2));
     }

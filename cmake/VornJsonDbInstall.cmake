@@ -1,5 +1,5 @@
-# What `cmake --install` lays down: headers, libraries with their links, CMake package, pkg-config
-# files.
+# What `cmake --install` lays down: the command with its manual and what shells complete; headers,
+# libraries with their links, CMake package, pkg-config files.
 
 set(VORNJSONDB_PACKAGE_DIR "${CMAKE_INSTALL_LIBDIR}/cmake/vornjsondb")
 
@@ -14,6 +14,22 @@ if(VORNJSONDB_TABLE)
         ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development)
     install(FILES include/VornJsonDbTable.h
         DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}" COMPONENT development)
+endif()
+
+if(VORNJSONDB_COMMAND)
+    install(TARGETS vornjsondb_command
+        RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT runtime)
+endif()
+if(TARGET vornjsondb_pages)
+    set(VORNJSONDB_PAGE_DIR "${PROJECT_BINARY_DIR}/cli/pages")
+    install(FILES "${VORNJSONDB_PAGE_DIR}/man" RENAME vornjsondb.1
+        DESTINATION "${CMAKE_INSTALL_MANDIR}/man1" COMPONENT runtime)
+    install(FILES "${VORNJSONDB_PAGE_DIR}/bash" RENAME vornjsondb
+        DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions" COMPONENT runtime)
+    install(FILES "${VORNJSONDB_PAGE_DIR}/zsh" RENAME _vornjsondb
+        DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/site-functions" COMPONENT runtime)
+    install(FILES "${VORNJSONDB_PAGE_DIR}/fish" RENAME vornjsondb.fish
+        DESTINATION "${CMAKE_INSTALL_DATADIR}/fish/vendor_completions.d" COMPONENT runtime)
 endif()
 
 install(EXPORT vornjsondbTargets NAMESPACE vornjsondb::

@@ -26,7 +26,8 @@ fi
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" valgrind:valgrind
 configure instructions -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF \
-    -DVORNJSONDB_EXAMPLES=OFF -DVORNJSONDB_TABLE=ON -DVORNJSONDB_BENCHMARKS=ON
+    -DVORNJSONDB_EXAMPLES=OFF -DVORNJSONDB_TABLE=ON -DVORNJSONDB_COMMAND=OFF \
+    -DVORNJSONDB_BENCHMARKS=ON
 build instructions vornjsondb_instructions >/dev/null
 folder=build/instructions/bench
 

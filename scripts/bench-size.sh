@@ -22,7 +22,7 @@ size() {
     local name=$1 strip=$2 folder=build/$1 with without
     shift 2
     configure "$name" -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF -DVORNJSONDB_TABLE=ON \
-        -DVORNJSONDB_BENCHMARKS=ON "$@"
+        -DVORNJSONDB_COMMAND=OFF -DVORNJSONDB_BENCHMARKS=ON "$@"
     build "$name" vornjsondb vornjsondb_small vornjsondb_small_without >/dev/null
     with=$(stripped "$strip" "$folder/bench/vornjsondb_small")
     without=$(stripped "$strip" "$folder/bench/vornjsondb_small_without")

@@ -33,7 +33,7 @@ if [[ $measure == yes ]]; then
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" libbenchmark-dev \
         "${peer_packages[@]}"
     configure bench -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF \
-        -DVORNJSONDB_TABLE=ON -DVORNJSONDB_BENCHMARKS=ON
+        -DVORNJSONDB_TABLE=ON -DVORNJSONDB_COMMAND=OFF -DVORNJSONDB_BENCHMARKS=ON
     build bench
     dpkg-query -W -f '${Package} ${Version}\n' "${library_packages[@]}" "${peer_packages[@]}" \
         libc6 >"$results/packages.txt"

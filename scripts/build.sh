@@ -61,5 +61,8 @@ build_quietly() {
         compiler_packages+=(make:make)
     fi
     library_packages=(libsqlite3-dev libjsoncpp-dev)
+    command_packages=(libcli11-dev libcsv-dev libutf8proc-dev rapidjson-dev)
     test_packages=(libgtest-dev libgmock-dev pkg-config:pkg-config iso-codes)
+    # The shells read their completion scripts, mandoc the manual page.
+    command_test_packages=(fish:fish mandoc:mandoc sqlite3:sqlite3 zsh:zsh)
 }

@@ -12,7 +12,7 @@
 # model   random sequences of all operations beside a model of the library. --count SEQUENCES;
 #         "sequence S" in the output runs alone with --seed S --count 1.
 #
-# memory and io then run with the operations of VORN_JSON_DB::Table as well.
+# All but model then run with the operations of VORN_JSON_DB::Table as well.
 #
 # --record puts the figures into docs/reliability.md.
 set -euo pipefail
@@ -42,7 +42,7 @@ done
 run() {
     local program=$1 folder=$2
     shift 2
-    configure "$folder" "$@" -DBUILD_TESTING=ON "${together[@]}"
+    configure "$folder" "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
     build_quietly "$folder" "vornjsondb_campaign_$program"
     UBSAN_OPTIONS=print_stacktrace=1 \
         "build/$folder/tests/campaigns/vornjsondb_campaign_$program" "${options[@]}" | tee build/campaign.txt
@@ -50,7 +50,7 @@ run() {
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
 programs=("$name")
-if [[ $name == memory || $name == io ]]; then
+if [[ $name != model ]]; then
     programs+=("table_$name")
 fi
 for program in "${programs[@]}"; do

@@ -21,7 +21,8 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" abigail-tools:a
 make_armhf_sysroot
 
 # Without debug information a change of the class layout goes unseen.
-options=(-DCMAKE_BUILD_TYPE=RelWithDebInfo -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF)
+options=(-DCMAKE_BUILD_TYPE=RelWithDebInfo -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF
+    -DVORNJSONDB_COMMAND=OFF)
 configure abi-amd64 "${options[@]}"
 configure abi-armhf "${options[@]}" -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchain-armhf.cmake" \
     -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot"

@@ -6,9 +6,10 @@ cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
 
-need_packages "${compiler_packages[@]}" "${library_packages[@]}" clang-tidy:clang-tidy
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}" \
+    clang-tidy:clang-tidy
 configure tidy -DCMAKE_EXPORT_COMPILE_COMMANDS=ON -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON \
-    "${together[@]}"
+    "${together[@]}" -DVORNJSONDB_COMMAND=ON
 
 # All of them take a tenth of the time when twelve are read at once, as files that include them.
 files=("$@")

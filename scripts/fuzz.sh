@@ -39,7 +39,7 @@ for target in "${targets[@]}"; do
     fi
 done
 
-need_packages clang-14:clang++-14 libclang-rt-14-dev "${library_packages[@]}"
+need_packages clang-14:clang++-14 libclang-rt-14-dev "${library_packages[@]}" libcsv-dev rapidjson-dev
 
 folder=build/fuzz
 mkdir -p "$folder/objects" "$folder/findings" "$folder/figures"
@@ -86,7 +86,7 @@ link_target() {
     for source in "fuzz/$1.cpp" "${shared_sources[@]}"; do
         objects+=("$(object_of "$source")")
     done
-    clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$1" "${objects[@]}" -ljsoncpp -lsqlite3
+    clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$1" "${objects[@]}" -ljsoncpp -lsqlite3 -lcsv
 }
 
 # run_target TARGET runs one target and prints a line of figures, or what went wrong.
@@ -141,6 +141,11 @@ report() {
 }
 
 mapfile -t shared_sources < <(find src fuzz tests/support/JsonHelpers.cpp -name '*.cpp' ! -path 'fuzz/[a-z]*' | sort)
+# The command's readers, which know nothing of the command.
+readers=(ByteSource GuessFormat Inference JsonHandler JsonLinesReader JsonReader LineBuffer MemberNames
+    Numbers Readers SeparatedReader Utf8)
+readers=("${readers[@]/#/cli/input/}")
+shared_sources+=("${readers[@]/%/.cpp}")
 sources=("${targets[@]/#/fuzz/}")
 each compile "${shared_sources[@]}" "${sources[@]/%/.cpp}"
 each link_target "${targets[@]}"

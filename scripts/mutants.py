@@ -237,11 +237,11 @@ class Source:
                 continue
             inner = self.text[slice(*run[0])]
             if self.code.find("{", begin) + 1 == first and not (JUMP.match(inner) or DECLARATION.match(inner)):
-                yield begin, run[0][1], inner + " " + self.text[begin : run[0][0]], "moved"
+                yield begin, run[0][1], inner + " " + self.text[begin : run[0][0]], "hoisted"
             inner = self.text[slice(*run[-1])]
             if last == end - 1 and not JUMP.match(inner):
                 rest = self.text[begin : run[-1][0]] + self.text[run[-1][1] : end]
-                yield begin, end, rest + " " + inner, "moved"
+                yield begin, end, rest + " " + inner, "sunk"
 
 
 def changed_text(literal):

@@ -249,7 +249,7 @@ def try_all(check, draw, jobs):
 
 
 def kind_of(change):
-    if change.name in ("dropped", "doubled", "exchanged", "moved"):
+    if change.name in ("dropped", "doubled", "exchanged", "hoisted", "sunk"):
         return "structure"
     return "text" if change.name in ("text", "cut") else "other"
 

@@ -7,7 +7,7 @@
 #
 # Without an option 12 changes are tried, for 90 seconds at most. --table changes table/ instead, and
 # runs its tests. --only keeps the files whose name holds TEXT; --kind keeps "structure" (statements,
-# conditions and calls that are dropped, doubled, exchanged or moved), "text" (characters of texts) or
+# conditions and calls that are dropped, doubled, exchanged, hoisted or sunk), "text" (characters of texts) or
 # "other" (operators, numbers, conditions). --lines lists the changes and tries none; --record puts the
 # figures into docs/reliability.md.
 #
@@ -21,6 +21,7 @@ source scripts/build.sh
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" python3:python3
 configure mutate -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
+    -DVORNJSONDB_COMMAND=OFF \
     -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
 build_quietly mutate vornjsondb_tests vornjsondb_table_tests
 

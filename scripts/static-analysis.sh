@@ -76,7 +76,8 @@ run_debug() {
     local prefix=$PWD/build/analysis-prefix flags=-D_GLIBCXX_DEBUG
     make_checked_libraries "$flags"
     configure analysis-debug -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
-        "${together[@]}" -DCMAKE_CXX_FLAGS="$flags" -DCMAKE_PREFIX_PATH="$prefix" \
+        "${together[@]}" -DVORNJSONDB_COMMAND=OFF \
+        -DCMAKE_CXX_FLAGS="$flags" -DCMAKE_PREFIX_PATH="$prefix" \
         -DVORNJSONDB_JSONCPP_LIBRARY="$prefix/lib/libjsoncpp.so"
     build_quietly analysis-debug vornjsondb_tests
     build/analysis-debug/tests/vornjsondb_tests --gtest_brief=1

@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Builds the library and runs all its tests.
+# Builds libraries and command, and runs all their tests.
 #
 #    scripts/test.sh [--asan] [CTEST-OPTION...]
 #    scripts/test.sh --tsan
@@ -23,15 +23,17 @@ fi
 if [[ ${1:-} == --tsan ]]; then
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
     configure tsan -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS="-fsanitize=thread -O1" \
-        -DBUILD_TESTING=ON "${together[@]}"
+        -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
     build_quietly tsan vornjsondb_table_threads
     TSAN_OPTIONS=halt_on_error=1 build/tsan/tests/table/vornjsondb_table_threads
     exit
 fi
 
-need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
-configure "$name" "${options[@]}" "${together[@]}" -DBUILD_TESTING=ON
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}" \
+    "${test_packages[@]}" "${command_test_packages[@]}"
+configure "$name" "${options[@]}" -DBUILD_TESTING=ON "${together[@]}" -DVORNJSONDB_COMMAND=ON
 build "$name"
+scripts/real-files.sh
 
 export UBSAN_OPTIONS=print_stacktrace=1
 cd "build/$name"

@@ -10,7 +10,7 @@ source scripts/build.sh
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" valgrind:valgrind
 configure valgrind -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
-    "${together[@]}"
+    "${together[@]}" -DVORNJSONDB_COMMAND=OFF
 build valgrind vornjsondb_tests
 
 # All tests in one process, because the start of valgrind costs more than most tests. What a forked

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <thread>
 
+#include "Concat.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -26,12 +28,30 @@ bool Patience::Wait() {
 }
 
 std::string WaitedText(int nWaitMs) {
-    return " (waited " + std::to_string(nWaitMs) + " ms)";
+    return Concat({" (waited ", std::to_string(nWaitMs), " ms)"});
 }
 
 Status InTransaction(sqlite3* pDb, const Status& Outcome) {
     const bool blGone = !Outcome.Ok() && sqlite3_get_autocommit(pDb) != 0;
     return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
+}
+
+Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce) {
+    if (sqlite3_get_autocommit(pDb) == 0) {
+        return InTransaction(pDb, fnOnce());
+    }
+    Status Outcome = fnOnce();
+    if (!IsLock(Outcome)) {
+        return Outcome;
+    }
+    Patience Left(nWaitMs);
+    while (Left.Wait()) {
+        Outcome = fnOnce();
+        if (!IsLock(Outcome)) {
+            return Outcome;
+        }
+    }
+    return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
 }
 
 // How it ends is prepared before it begins: undoing must not need memory.
@@ -73,6 +93,25 @@ Whole::~Whole() {
 int Whole::Take(const char* szSql, Statement& Lent) {
     return m_Kept.Take(
         szSql, [szSql] { return std::string(szSql); }, Lent);
+}
+
+Status AttemptWhole(sqlite3* pDb, Statements& Kept, int nWaitMs, const Doing& What,
+                    Callable<Status()> fnSteps) {
+    return Attempt(pDb, nWaitMs, [&]() -> Status {
+        Whole All(pDb, Kept);
+        int nResult = All.Begin();
+        if (nResult != SQLITE_OK) {
+            return FailBySqlite(pDb, nResult, What);
+        }
+        Status Outcome = fnSteps();
+        if (Outcome.Ok()) {
+            nResult = All.Keep();
+            if (nResult != SQLITE_OK) {
+                Outcome = FailBySqlite(pDb, nResult, What);
+            }
+        }
+        return Outcome;
+    });
 }
 
 }  // namespace vornjsondb

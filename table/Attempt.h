@@ -8,6 +8,7 @@
 
 #include <sqlite3.h>
 
+#include "Callable.h"
 #include "Failure.h"
 #include "Statements.h"
 
@@ -36,24 +37,7 @@ Status InTransaction(sqlite3* pDb, const Status& Outcome);
 
 // Calls fnOnce until it gives something else than a lock, or the time is over. In a transaction
 // that is open already there is one try: the other side may be waiting for just this transaction.
-template <typename Once>
-Status Attempt(sqlite3* pDb, int nWaitMs, Once&& fnOnce) {
-    if (sqlite3_get_autocommit(pDb) == 0) {
-        return InTransaction(pDb, fnOnce());
-    }
-    Status Outcome = fnOnce();
-    if (!IsLock(Outcome)) {
-        return Outcome;
-    }
-    Patience Left(nWaitMs);
-    while (Left.Wait()) {
-        Outcome = fnOnce();
-        if (!IsLock(Outcome)) {
-            return Outcome;
-        }
-    }
-    return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
-}
+Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce);
 
 // Several statements as one: a transaction, or a savepoint inside of one that is open. Undone at
 // the end of its life unless Keep succeeded.
@@ -78,26 +62,9 @@ class Whole {
     bool m_blSavepoint = false;
 };
 
-// fnSteps, which returns a Status, as a whole or not at all, waiting for locks.
-template <typename Steps>
+// fnSteps as a whole or not at all, waiting for locks.
 Status AttemptWhole(sqlite3* pDb, Statements& Kept, int nWaitMs, const Doing& What,
-                    Steps&& fnSteps) {
-    return Attempt(pDb, nWaitMs, [&]() -> Status {
-        Whole All(pDb, Kept);
-        int nResult = All.Begin();
-        if (nResult != SQLITE_OK) {
-            return FailBySqlite(pDb, nResult, What);
-        }
-        Status Outcome = fnSteps();
-        if (Outcome.Ok()) {
-            nResult = All.Keep();
-            if (nResult != SQLITE_OK) {
-                Outcome = FailBySqlite(pDb, nResult, What);
-            }
-        }
-        return Outcome;
-    });
-}
+                    Callable<Status()> fnSteps);
 
 }  // namespace vornjsondb
 

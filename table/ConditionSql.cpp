@@ -30,13 +30,10 @@ int OpenLevels(size_t nLeaves) {
 // Longer chains would exceed SQLite's depth of expressions.
 constexpr size_t kChain = 8;
 
-std::vector<const Node*> NodesOf(const std::vector<Condition>& vecParts) {
-    std::vector<const Node*> vecNodes;
-    vecNodes.reserve(vecParts.size());
+void AddNodes(const std::vector<Condition>& vecParts, std::vector<const Node*>& vecNodes) {
     for (const Condition& Part : vecParts) {
         vecNodes.push_back(&Part.Root());
     }
-    return vecNodes;
 }
 
 class ConditionWriter {
@@ -120,7 +117,9 @@ class ConditionWriter {
         } else if (What.vecParts.empty()) {
             Report(m_vecFindings, FindingCode::kEmptyGroup, "/where", "a group holds no condition");
         } else {
-            WriteGroup(NodesOf(What.vecParts), What.eKind, nLevel, blOpen && !blHidden);
+            std::vector<const Node*> vecNodes;
+            AddNodes(What.vecParts, vecNodes);
+            WriteGroup(std::move(vecNodes), What.eKind, nLevel, blOpen && !blHidden);
         }
         m_strSql += szClose != nullptr ? szClose : "";
     }
@@ -157,12 +156,15 @@ void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of,
                       bool blChange, BoundSql& Out, FindingList& vecFindings) {
     size_t nLeaves = 0;
     std::vector<const Node*> vecNodes;
-    for (const Node* pEach : NodesOf(vecWhere)) {
-        nLeaves += pEach->nLeaves;
+    vecNodes.reserve(vecWhere.size());
+    for (const Condition& Each : vecWhere) {
+        nLeaves += Each.Root().nLeaves;
         // All of all is all: one chain, whoever grouped it.
-        const bool blAll = pEach->eKind == Kind::kAll && !pEach->vecParts.empty();
-        const auto vecParts = blAll ? NodesOf(pEach->vecParts) : std::vector<const Node*>{pEach};
-        vecNodes.insert(vecNodes.end(), vecParts.begin(), vecParts.end());
+        if (Each.Root().eKind == Kind::kAll && !Each.Root().vecParts.empty()) {
+            AddNodes(Each.Root().vecParts, vecNodes);
+        } else {
+            vecNodes.push_back(&Each.Root());
+        }
     }
     if (nLeaves > kMaxConditions) {
         Report(vecFindings, FindingCode::kTooManyConditions, "/where",

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "../src/base/JsonText.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Fit.h"
 
@@ -49,31 +50,30 @@ std::string DefaultClause(const Member& Declared) {
     char szReal[32];
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            return " DEFAULT " + std::to_string(Value.nValue);
+            return Concat({" DEFAULT ", std::to_string(Value.nValue)});
         case BoundValue::Kind::kReal:
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
-            return std::string(" DEFAULT ") + szReal;
+            return Concat({" DEFAULT ", szReal});
         case BoundValue::Kind::kText:
-            return " DEFAULT " + Enclosed(Value.strBytes, '\'');
+            return Concat({" DEFAULT ", Enclosed(Value.strBytes, '\'')});
         default:
             return {};
     }
 }
 
 std::string ColumnClause(const Member& Declared, bool blNotNull) {
-    return Declared.strQuoted + DeclaredType(Declared.Kind()) + (blNotNull ? " NOT NULL" : "") +
-           DefaultClause(Declared);
+    return Concat({Declared.strQuoted, DeclaredType(Declared.Kind()), blNotNull ? " NOT NULL" : "",
+                   DefaultClause(Declared)});
 }
 
 std::string CreateTableSql(const Members& Of) {
-    std::string strSql = "CREATE TABLE IF NOT EXISTS " + Of.QuotedTable() + " (";
+    std::string strSql = Concat({"CREATE TABLE IF NOT EXISTS ", Of.QuotedTable(), " ("});
     const char* szBefore = "";
     for (const Member& Declared : Of.All()) {
         const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
-        strSql +=
-            szBefore + (blRowid ? Declared.strQuoted + " INTEGER PRIMARY KEY"
-                                : ColumnClause(Declared, Declared.blNotNull || Declared.blKey));
+        strSql += blRowid ? Concat({szBefore, Declared.strQuoted, " INTEGER PRIMARY KEY"})
+                          : szBefore + ColumnClause(Declared, Declared.blNotNull || Declared.blKey);
         strSql += Declared.blUnique && !blRowid ? " UNIQUE" : "";
         szBefore = ", ";
     }
@@ -81,7 +81,7 @@ std::string CreateTableSql(const Members& Of) {
         strSql += ", PRIMARY KEY";
         szBefore = " (";
         for (const size_t nMember : Of.Key()) {
-            strSql += szBefore + Of.At(nMember).strQuoted;
+            Append(strSql, {szBefore, Of.At(nMember).strQuoted});
             szBefore = ", ";
         }
         strSql += ")";

@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -83,7 +84,7 @@ std::string Doing::Text() const {
         strText.replace(strText.find('#'), 1, std::to_string(nRecord));
     }
     if (pstrTable != nullptr) {
-        strText += " table " + Quoted(*pstrTable);
+        Append(strText, {" table ", Quoted(*pstrTable)});
     }
     return strText;
 }
@@ -91,7 +92,7 @@ std::string Doing::Text() const {
 Status Fail(StatusCode eCode, const Doing& What, std::string_view strReason) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = eCode;
-    pDetails->strMessage = What.Text().append(": ").append(strReason);
+    pDetails->strMessage = Concat({What.Text(), ": ", strReason});
     return Status(std::move(pDetails));
 }
 
@@ -104,7 +105,7 @@ Status FailBySqlite(sqlite3* pDb, int nResult, const Doing& What) {
     pDetails->eCode = CodeOf(pDetails->nSqliteCode, pDetails->nSystemError);
     pDetails->eRetry = RetryOf(pDetails->nSqliteCode, sqlite3_get_autocommit(pDb) == 0);
     pDetails->strMessage =
-        What.Text() + ": " + (blLast ? sqlite3_errmsg(pDb) : sqlite3_errstr(nResult));
+        Concat({What.Text(), ": ", blLast ? sqlite3_errmsg(pDb) : sqlite3_errstr(nResult)});
     ReportRefusal(pDetails->strMessage, pDetails->vecFindings);
     return Status(std::move(pDetails));
 }
@@ -117,7 +118,7 @@ Status FromFindings(FindingList vecFindings, const Doing& What) {
     for (const Finding& Found : vecFindings) {
         if (Found.eSeverity == Severity::kError) {
             pDetails->eCode = StatusCode::kRefused;
-            pDetails->strMessage = What.Text() + ": " + Found.strMessage;
+            pDetails->strMessage = Concat({What.Text(), ": ", Found.strMessage});
             break;
         }
     }
@@ -136,7 +137,7 @@ Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {
     pDetails->eRetry = eRetry;
     pDetails->nSqliteCode = Outcome.SqliteCode();
     pDetails->nSystemError = Outcome.SystemError();
-    pDetails->strMessage = std::string(Outcome.Message()).append(strMore);
+    pDetails->strMessage = Concat({Outcome.Message(), strMore});
     pDetails->vecFindings = Outcome.Findings();
     return Status(std::move(pDetails));
 }

@@ -2,6 +2,8 @@
 
 #include <utility>
 
+#include "Concat.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -65,7 +67,7 @@ void Report(FindingList& vecFindings, FindingCode eCode, std::string strPath,
 
 void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings) {
     Report(vecFindings, FindingCode::kNoDefinition, Below("", strTable),
-           "the definition names no members of table " + Quoted(strTable));
+           Concat({"the definition names no members of table ", Quoted(strTable)}));
 }
 
 void ReportRefusal(const std::string& strWords, FindingList& vecFindings) {
@@ -93,11 +95,11 @@ std::string Below(const std::string& strPath, std::string_view strStep) {
 std::string Shown(const Json::Value& jValue) {
     switch (jValue.type()) {
         case Json::arrayValue:
-            return "a list of " + std::to_string(jValue.size());
+            return Concat({"a list of ", std::to_string(jValue.size())});
         case Json::objectValue:
-            return "an object of " + std::to_string(jValue.size());
+            return Concat({"an object of ", std::to_string(jValue.size())});
         case Json::stringValue:
-            return ShownText(TextOf(jValue));
+            return ShownText(BytesOf(jValue));
         case Json::realValue: {
             char szDigits[32];
             sqlite3_snprintf(sizeof szDigits, szDigits, "%!.17g", jValue.asDouble());
@@ -115,7 +117,7 @@ std::string ShownText(std::string_view strText) {
     return Quoted(blLong ? Cut(strText) : strText).append(blLong ? "..." : "");
 }
 
-std::string_view TextOf(const Json::Value& jText) {
+std::string_view BytesOf(const Json::Value& jText) {
     const char* pBegin = nullptr;
     const char* pEnd = nullptr;
     jText.getString(&pBegin, &pEnd);

@@ -154,7 +154,7 @@ std::string Shown(const Json::Value& jValue);
 std::string ShownText(std::string_view strText);
 
 // The bytes of a JSON value that is a text.
-std::string_view TextOf(const Json::Value& jText);
+std::string_view BytesOf(const Json::Value& jText);
 
 // A name in double quotes, as messages and SQL show it; quotes in it are doubled.
 std::string Quoted(std::string_view strName);

@@ -6,6 +6,8 @@
 
 #include "../src/base/JsonMember.h"
 #include "../src/base/JsonMemory.h"
+#include "../src/base/PlainJson.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -60,6 +62,13 @@ Misfit CheckTree(const Json::Value& jValue) {
     return eMisfit == Misfit::kDepth ? CheckTree(jValue, ReaderLevels()) : eMisfit;
 }
 
+// Whether a member of that type takes JSON that begins so.
+bool TakesJson(const MemberType& Type, char cFirst) {
+    const BoundKind eKind = Type.Bound.eKind;
+    return eKind == BoundKind::kJson || (eKind == BoundKind::kObject && cFirst == '{') ||
+           (eKind == BoundKind::kList && cFirst == '[');
+}
+
 Misfit Readable(const MemberType& Type, bool blCompatible) {
     return blCompatible && Type.pfnRead == nullptr ? Misfit::kUnreadable : Misfit::kNone;
 }
@@ -72,23 +81,22 @@ Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, 
     return blReal && !blExact ? Misfit::kRange : FitReal(Type, dValue, blCompatible, Out);
 }
 
+// Plain values are written without a look before: they have few levels and no fractions.
 Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out) try {
-    const BoundKind eKind = Type.Bound.eKind;
-    const bool blFits = eKind == BoundKind::kJson ||
-                        (eKind == BoundKind::kObject && jValue.isObject()) ||
-                        (eKind == BoundKind::kList && jValue.isArray());
-    if (!blFits) {
+    const char cOther = jValue.isObject() ? '{' : '"';
+    if (!TakesJson(Type, jValue.isArray() ? '[' : cOther)) {
         return Misfit::kKind;
     }
-    const Misfit eMisfit = CheckTree(jValue);
-    if (eMisfit != Misfit::kNone) {
-        return eMisfit;
+    strJson.clear();
+    if (!WritePlainJson(jValue, strJson)) {
+        const Misfit eMisfit = CheckTree(jValue);
+        if (eMisfit != Misfit::kNone) {
+            return eMisfit;
+        }
+        strJson = Codec.Write(jValue);
     }
-    strJson = Codec.Write(jValue);
-    Out.eKind = BoundValue::Kind::kText;
-    Out.strBytes = strJson;
-    return Readable(Type, blCompatible);
+    return FitWritten(Type, strJson, blCompatible, Out);
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
@@ -192,6 +200,13 @@ Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompati
     return Type.Bound.eKind == BoundKind::kAny ? Readable(Type, blCompatible) : Misfit::kKind;
 }
 
+Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompatible,
+                  BoundValue& Out) {
+    Out.eKind = BoundValue::Kind::kText;
+    Out.strBytes = strJson;
+    return TakesJson(Type, strJson[0]) ? Readable(Type, blCompatible) : Misfit::kKind;
+}
+
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
     if (jValue.isNull()) {
@@ -212,7 +227,7 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
         case Json::realValue:
             return FitReal(Type, jValue.asDouble(), blCompatible, Out);
         case Json::stringValue:
-            return FitText(Type, TextOf(jValue), blCompatible, Out);
+            return FitText(Type, BytesOf(jValue), blCompatible, Out);
         default:
             return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
     }
@@ -241,8 +256,8 @@ std::string Expected(const MemberType& Type) {
         case BoundKind::kBoolean:
             return "true or false";
         case BoundKind::kInteger:
-            return "a whole number from " + std::to_string(Of.nLeast) + " to " +
-                   std::to_string(Of.nMost);
+            return Concat({"a whole number from ", std::to_string(Of.nLeast), " to ",
+                           std::to_string(Of.nMost)});
         case BoundKind::kReal:
             return "a number";
         case BoundKind::kObject:

@@ -52,6 +52,10 @@ Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompati
 Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompatible,
                BoundValue& Out);
 
+// For JSON text just as it is stored, not empty.
+Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompatible,
+                  BoundValue& Out);
+
 // For every kind of value, null included. strJson keeps the text of a JSON member.
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out);

@@ -1,5 +1,7 @@
 #include "LeafSql.h"
 
+#include "Concat.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -29,8 +31,8 @@ bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
 }
 
 Problem WrongOperand(const Operator& Row, const Json::Value& jOperand) {
-    return {FindingCode::kWrongOperand,
-            Quoted(Row.szName) + " takes " + Expected(Row.eForm) + ", not " + Shown(jOperand)};
+    return {FindingCode::kWrongOperand, Concat({Quoted(Row.szName), " takes ", Expected(Row.eForm),
+                                                ", not ", Shown(jOperand)})};
 }
 
 }  // namespace
@@ -64,9 +66,9 @@ bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
     m_blPath = !m_Where.strPath.empty();
     const Operator& Row = RowOf(Leaf.eOp);
     if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
-        Why = {FindingCode::kWrongOperator, Quoted(Row.szName) + " is not for member " +
-                                                Quoted(m_pMember->strName) + " of type " +
-                                                Quoted(m_pMember->pType->szName)};
+        Why = {FindingCode::kWrongOperator,
+               Concat({Quoted(Row.szName), " is not for member ", Quoted(m_pMember->strName),
+                       " of type ", Quoted(m_pMember->pType->szName)})};
         return false;
     }
     if (!IsOfForm(Row.eForm, Leaf.jOperand)) {
@@ -181,7 +183,7 @@ bool LeafSql::ReadOrdered(const Operator& Row, const Json::Value& jValue, Operan
     }
     if (jValue.isNull()) {
         Why = {FindingCode::kNullOperand,
-               Quoted(Row.szName) + ": nothing is less or greater than null"};
+               Concat({Quoted(Row.szName), ": nothing is less or greater than null"})};
     } else {
         Why = WrongOperand(Row, jValue);
     }
@@ -220,7 +222,7 @@ bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Proble
     }
     if (IsLess(jPair[1], jPair[0])) {
         Why = {FindingCode::kSwappedEnds,
-               "nothing lies between " + Shown(jPair[0]) + " and " + Shown(jPair[1])};
+               Concat({"nothing lies between ", Shown(jPair[0]), " and ", Shown(jPair[1])})};
         return false;
     }
     OpenJson();

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "Concat.h"
 #include "LeafSql.h"
 
 namespace vornjsondb {
@@ -58,15 +59,15 @@ bool LeafSql::WriteContains(const Json::Value& jElement, Problem& Why) {
     }
     // A name that no table of the statement has.
     const std::string strElement = Quoted(m_Of.Table() + "[]");
-    m_strSql += "EXISTS (SELECT 1 FROM json_each(" +
-                ElementsAt(m_pMember->strColumn, m_Where.strPath) + ") AS " + strElement +
-                " WHERE ";
+    Append(m_strSql,
+           {"EXISTS (SELECT 1 FROM json_each(", ElementsAt(m_pMember->strColumn, m_Where.strPath),
+            ") AS ", strElement, " WHERE "});
     if (What.Value.eKind != BoundValue::Kind::kNull) {
-        m_strSql += strElement + ".value IS ";
+        Append(m_strSql, {strElement, ".value IS "});
         AddValue(What.eKind, What.Value);
         m_strSql += " AND ";
     }
-    m_strSql += strElement + ".type" + JsonTypeTest(What.eKind) + ")";
+    Append(m_strSql, {strElement, ".type", JsonTypeTest(What.eKind), ")"});
     return true;
 }
 

@@ -3,6 +3,7 @@
 #include <cstring>
 #include <utility>
 
+#include "Concat.h"
 #include "LeafSql.h"
 
 namespace vornjsondb {
@@ -50,14 +51,14 @@ BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
 
 // With a bare parameter SQLite would prepare the statement again for each pattern.
 bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
-    if (const char* szFault = PatternFault(TextOf(jPattern))) {
-        Why = {FindingCode::kBadPattern, "pattern " + Shown(jPattern) + " " + szFault};
+    if (const char* szFault = PatternFault(BytesOf(jPattern))) {
+        Why = {FindingCode::kBadPattern, Concat({"pattern ", Shown(jPattern), " ", szFault})};
         return false;
     }
     m_strSql += '(';
     AddLeft(ValueKind::kNull);
     m_strSql += " LIKE ";
-    m_Out.Add(BoundText(TextOf(jPattern)));
+    m_Out.Add(BoundText(BytesOf(jPattern)));
     m_strSql += "||'' ESCAPE '\\'";
     if (m_blPath) {
         CloseJson(ValueKind::kText);
@@ -71,11 +72,11 @@ void LeafSql::WritePrefix(const Json::Value& jPrefix) {
     m_strSql += '(';
     AddLeft(ValueKind::kText);
     m_strSql += " >= ";
-    m_Out.Add(BoundText(TextOf(jPrefix)));
+    m_Out.Add(BoundText(BytesOf(jPrefix)));
     m_strSql += " AND ";
     AddLeft(ValueKind::kText);
     m_strSql += " < ";
-    m_Out.Add(Beyond(TextOf(jPrefix), m_Reader));
+    m_Out.Add(Beyond(BytesOf(jPrefix), m_Reader));
     m_strSql += m_blPath ? "" : ")";
     CloseJson(ValueKind::kText);
 }

@@ -2,6 +2,7 @@
 #include <cmath>
 #include <iterator>
 
+#include "Concat.h"
 #include "Operand.h"
 
 namespace vornjsondb {
@@ -99,7 +100,7 @@ bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, Ope
               ListOperand& Out, Problem& Why) {
     if (jList.size() > kMostValues) {
         Why = {FindingCode::kTooManyValues,
-               "a list may have 100000 values, not " + std::to_string(jList.size())};
+               Concat({"a list may have 100000 values, not ", std::to_string(jList.size())})};
         return false;
     }
     for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {

@@ -7,6 +7,7 @@
 #include "../src/base/PlainJson.h"
 #include "FindingCodes.h"
 #include "LoaderParts.h"
+#include "WrittenJson.h"
 
 namespace VORN_JSON_DB {
 
@@ -79,16 +80,22 @@ std::unique_ptr<Json::CharReader> StrictReader() {
     return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
 }
 
-// Most lists and objects are plain, and the short way reads them: it wants a NUL behind the text.
-bool Parse(Parts& Of, int nMember, std::string_view strJson, Json::Value& jOut) {
-    const std::string_view strCopy = Copied(Of, nMember, strJson.data(), strJson.size());
-    if (vornjsondb::ReadPlainJson(strCopy.data(), strCopy.size(), jOut)) {
+// Most texts are just as they will be stored, and need no reading.
+bool SetWritten(Parts& Of, size_t nPlace, std::string_view strJson) {
+    const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
+    return vornjsondb::IsWrittenJson(strJson.data(), strJson.size()) && !Into.blGenerated &&
+           FitWritten(*Into.pType, strJson, Of.Into.How.blCompatible, Of.Values.Give(nPlace)) ==
+               Misfit::kNone;
+}
+
+bool Parse(Parts& Of, std::string_view strJson, Json::Value& jOut) {
+    if (vornjsondb::ReadPlainJson(strJson.data(), strJson.size(), jOut)) {
         return true;
     }
     if (!Of.pReader) {
         Of.pReader = StrictReader();
     }
-    return Of.pReader->parse(strCopy.data(), strCopy.data() + strCopy.size(), &jOut, nullptr);
+    return Of.pReader->parse(strJson.data(), strJson.data() + strJson.size(), &jOut, nullptr);
 }
 
 }  // namespace
@@ -144,12 +151,17 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
         return;
     }
     m_pParts->mapWrong.erase(nPlace);
+    // A NUL stands behind the copy.
+    strJson = Copied(*m_pParts, nMember, strJson.data(), strJson.size());
+    if (SetWritten(*m_pParts, nPlace, strJson)) {
+        return;
+    }
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);
     FindingList vecFindings;
     try {
         Json::Value jValue;
-        if (!Parse(*m_pParts, nMember, strJson, jValue)) {
+        if (!Parse(*m_pParts, strJson, jValue)) {
             Report(
                 vecFindings, FindingCode::kWrongKind, strPath,
                 "member " + Into.strQuoted + ": " + vornjsondb::ShownText(strJson) + " is no JSON");

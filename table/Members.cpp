@@ -6,6 +6,7 @@
 #include "../src/base/JsonMember.h"
 #include "../src/base/JsonMemory.h"
 #include "../src/schema/TableDefinition.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Nearest.h"
 
@@ -59,23 +60,24 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
         const std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
-            Report(
-                vecFindings, FindingCode::kBadName, Below(strPath, strName),
-                ShownText(strName) + " cannot be a member: it begins with $ or holds a NUL byte");
+            Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
+                   Concat({ShownText(strName),
+                           " cannot be a member: it begins with $ or holds a NUL byte"}));
         } else if (FindColumn(strName) != kNone) {
             Report(vecFindings, FindingCode::kSameColumn, Below(strPath, strName),
-                   ShownText(strName) +
-                       " is another member's column: letter case makes no difference");
+                   Concat({ShownText(strName),
+                           " is another member's column: letter case makes no difference"}));
         } else if (Type.Bound.eKind == BoundKind::kNone) {
-            Report(
-                vecFindings, FindingCode::kUnknownType, Below(Below(strPath, strName), "cpptype"),
-                "member " + Quoted(strName) + " has the unknown type " + ShownText(TypeName(*it)));
+            Report(vecFindings, FindingCode::kUnknownType,
+                   Below(Below(strPath, strName), "cpptype"),
+                   Concat({"member ", Quoted(strName), " has the unknown type ",
+                           ShownText(TypeName(*it))}));
         } else {
             const std::string strQuoted = Quoted(strName);
-            m_vecAll.push_back(Member{strName, strQuoted, m_strQuotedTable + "." + strQuoted, &Type,
-                                      FindMember(*it, "cppDefaultValue"), false,
-                                      IsSet(*it, "notNull"), IsSet(*it, "unique"),
-                                      IsSet(*it, "nullSeen"), false});
+            m_vecAll.push_back(
+                Member{strName, strQuoted, Concat({m_strQuotedTable, ".", strQuoted}), &Type,
+                       FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
+                       IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false});
             m_vecNames.push_back(strName);
         }
     }
@@ -93,9 +95,9 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     for (const Json::Value& jName : jNames) {
         const std::string strName = jName.isString() ? jName.asString() : std::string();
         if (Find(strName) == kNone) {
-            Report(
-                vecFindings, FindingCode::kUnknownKey, strPath,
-                Shown(jName) + " is no member that can be a key" + Suggestion(strName, m_vecNames));
+            Report(vecFindings, FindingCode::kUnknownKey, strPath,
+                   Concat({Shown(jName), " is no member that can be a key",
+                           Suggestion(strName, m_vecNames)}));
         }
         vecNames.push_back(strName);
     }

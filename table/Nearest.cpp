@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -65,7 +66,7 @@ std::string Suggestion(std::string_view strTyped, const std::vector<std::string>
     if (strNearest.empty()) {
         return {};
     }
-    return " (did you mean " + Quoted(strNearest) + "?)";
+    return Concat({" (did you mean ", Quoted(strNearest), "?)"});
 }
 
 }  // namespace vornjsondb

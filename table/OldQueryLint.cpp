@@ -85,7 +85,7 @@ class OldQueryLint {
     }
 
     void LintFilter(const Json::Value& jFilter, const std::string& strPath) {
-        if (!jFilter.isString() || TextOf(jFilter).empty()) {
+        if (!jFilter.isString() || BytesOf(jFilter).empty()) {
             Report(m_vecFindings, FindingCode::kOldRefuses, strPath,
                    Shown(jFilter) + " is no condition: expected is a text of SQL");
         } else {
@@ -129,7 +129,7 @@ class OldQueryLint {
                    m_strMember + ": " + Shown(jValue) + " is converted: expected is " +
                        Expected(Type));
         } else if (eForm == ConditionForm::kQuotedText &&
-                   TextOf(jValue).find('\0') != std::string_view::npos) {
+                   BytesOf(jValue).find('\0') != std::string_view::npos) {
             Report(m_vecFindings, FindingCode::kNulCut, strPath,
                    m_strMember + ": compared is the text before its NUL byte");
         }

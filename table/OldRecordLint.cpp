@@ -96,7 +96,7 @@ class OldRecordLint {
         } else if (Type.Bound.eKind == BoundKind::kInteger) {
             LintInteger(strMember, Type, jValue, strPath);
         } else if (jValue.isString()) {
-            LintText(strMember, std::string(TextOf(jValue)), strPath, nLater);
+            LintText(strMember, std::string(BytesOf(jValue)), strPath, nLater);
         } else if (Type.Bound.eKind != BoundKind::kBoolean) {
             LintJson(strMember, Type, jValue, strPath, nLater);
         }

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "Concat.h"
 
 namespace vornjsondb {
 
@@ -26,7 +27,7 @@ Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& j
     while (pRow->eMisfit != eMisfit) {
         ++pRow;
     }
-    return {pRow->eCode, strOf + ": " + Shown(jValue) + " " + pRow->szReason};
+    return {pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason})};
 }
 
 ValueKind KindOf(const BoundValue& Value) {
@@ -59,13 +60,13 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
         Out.eKind = KindOf(Out.Value);
         return true;
     }
-    const std::string strMember = "member " + Quoted(Of.strName);
+    const std::string strMember = Concat({"member ", Quoted(Of.strName)});
     if (eMisfit == Misfit::kKind && Of.Kind() == BoundKind::kList) {
         Why = {FindingCode::kListMember,
-               strMember + " is a list, and " + Shown(jValue) + " is none"};
+               Concat({strMember, " is a list, and ", Shown(jValue), " is none"})};
     } else if (eMisfit == Misfit::kKind) {
         Why = {FindingCode::kWrongKind,
-               strMember + " is " + Expected(*Of.pType) + ", not " + Shown(jValue)};
+               Concat({strMember, " is ", Expected(*Of.pType), ", not ", Shown(jValue)})};
     } else {
         Why = ProblemOf(eMisfit, strMember, jValue);
     }
@@ -85,7 +86,7 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     }
     if (jValue.isString()) {
         Out.eKind = ValueKind::kText;
-        Out.Value = BoundText(TextOf(jValue));
+        Out.Value = BoundText(BytesOf(jValue));
         return true;
     }
     Out.eKind = jValue.isArray() ? ValueKind::kList

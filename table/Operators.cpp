@@ -3,6 +3,7 @@
 #include <iterator>
 #include <vector>
 
+#include "Concat.h"
 #include "Nearest.h"
 
 namespace vornjsondb {
@@ -73,7 +74,7 @@ const Operator* FindOperator(std::string_view strName) {
 std::string OperatorSuggestion(std::string_view strName) {
     for (const auto& szPair : kForeign) {
         if (strName == szPair[0]) {
-            return std::string(" (did you mean \"") + szPair[1] + "\"?)";
+            return Concat({" (did you mean \"", szPair[1], "\"?)"});
         }
     }
     std::vector<std::string> vecNames;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Concat.h"
 #include "Nearest.h"
 
 namespace vornjsondb {
@@ -30,11 +31,12 @@ bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
         return false;
     }
     if (!IsReachable(strName)) {
-        Why = {FindingCode::kBadPath, "no path leads to " + ShownText(strName)};
+        Why = {FindingCode::kBadPath, Concat({"no path leads to ", ShownText(strName)})};
         return false;
     }
     if (IsNumber(strName)) {
-        Why = {FindingCode::kNumberInPath, ShownText(strName) + " would be a name, not an index"};
+        Why = {FindingCode::kNumberInPath,
+               Concat({ShownText(strName), " would be a name, not an index"})};
         return false;
     }
     strOut.append(".\"");
@@ -76,8 +78,8 @@ bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
 
 std::string Guarded(const char* szFunction, const std::string& strColumn,
                     const std::string& strPath) {
-    return "CASE WHEN json_valid(" + strColumn + ") THEN " + szFunction + "(" + strColumn + ", " +
-           strPath + ") END";
+    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN ", szFunction, "(", strColumn, ", ",
+                   strPath, ") END"});
 }
 
 }  // namespace
@@ -95,9 +97,9 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     }
     if (Out.nMember == Members::kNone) {
         const std::string_view strFirst = strName.substr(0, strName.find_first_of(".["));
-        Why = {FindingCode::kUnknownMember, "table " + Of.QuotedTable() + " has no member " +
-                                                ShownText(strFirst) +
-                                                Suggestion(strFirst, Of.Names())};
+        Why = {FindingCode::kUnknownMember,
+               Concat({"table ", Of.QuotedTable(), " has no member ", ShownText(strFirst),
+                       Suggestion(strFirst, Of.Names())})};
         return false;
     }
     if (nEnd == strName.size()) {
@@ -105,8 +107,9 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     }
     const Member& Base = Of.At(Out.nMember);
     if (!Base.IsJson()) {
-        Why = {FindingCode::kNoJsonMember, "member " + ShownText(Base.strName) + " of type \"" +
-                                               Base.pType->szName + "\" has nothing inside"};
+        Why = {FindingCode::kNoJsonMember,
+               Concat({"member ", ShownText(Base.strName), " of type \"", Base.pType->szName,
+                       "\" has nothing inside"})};
         return false;
     }
     const bool blTooLong = strName.size() > kMostPathBytes;
@@ -114,7 +117,7 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
         Why = {FindingCode::kBadPath, "it is too long"};
     }
     if (blTooLong || !TakeSteps(strName.substr(nEnd), Out.strPath, Why)) {
-        Why.strMessage = "path " + ShownText(strName) + ": " + Why.strMessage;
+        Why.strMessage = Concat({"path ", ShownText(strName), ": ", Why.strMessage});
         return false;
     }
     return true;
@@ -130,9 +133,9 @@ std::string KindAt(const std::string& strColumn, const std::string& strPath) {
 
 // One CASE in the other: SQLite does not promise to look at the left side of an AND first.
 std::string ElementsAt(const std::string& strColumn, const std::string& strPath) {
-    const std::string strTail = (strPath.empty() ? "" : ", ") + strPath;
-    return "CASE WHEN json_valid(" + strColumn + ") THEN CASE json_type(" + strColumn + strTail +
-           ") WHEN 'array' THEN " + strColumn + " END END" + strTail;
+    const std::string strTail = Concat({strPath.empty() ? "" : ", ", strPath});
+    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN CASE json_type(", strColumn, strTail,
+                   ") WHEN 'array' THEN ", strColumn, " END END", strTail});
 }
 
 }  // namespace vornjsondb

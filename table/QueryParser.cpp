@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "../src/base/JsonMember.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Nearest.h"
 
@@ -16,7 +17,8 @@ using VORN_JSON_DB::Query;
 void ReadNames(const Json::Value& jNames, const char* szPath, FindingCode eCode,
                std::vector<std::string>& vecNames, FindingList& vecFindings) {
     if (!jNames.isArray()) {
-        Report(vecFindings, eCode, szPath, "a list of names belongs here, not " + Shown(jNames));
+        Report(vecFindings, eCode, szPath,
+               Concat({"a list of names belongs here, not ", Shown(jNames)}));
         return;
     }
     for (Json::ArrayIndex i = 0; i < jNames.size(); ++i) {
@@ -24,7 +26,7 @@ void ReadNames(const Json::Value& jNames, const char* szPath, FindingCode eCode,
             vecNames.push_back(jNames[i].asString());
         } else {
             Report(vecFindings, eCode, Below(szPath, std::to_string(i)),
-                   "a name belongs here, not " + Shown(jNames[i]));
+                   Concat({"a name belongs here, not ", Shown(jNames[i])}));
         }
     }
 }
@@ -35,7 +37,7 @@ void ReadCount(const Json::Value& jCount, const char* szPath, std::int64_t& nCou
         nCount = jCount.asInt64();
     } else {
         Report(vecFindings, FindingCode::kBadCount, szPath,
-               "a whole number from 0 belongs here, not " + Shown(jCount));
+               Concat({"a whole number from 0 belongs here, not ", Shown(jCount)}));
     }
 }
 
@@ -86,7 +88,7 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
     }
     const std::string strKey(Name.pBegin, Name.pEnd);
     Report(Out.vecFindings, FindingCode::kUnknownQueryKey, Below("", strKey),
-           "a query has no key " + ShownText(strKey) + Suggestion(strKey, vecKeys));
+           Concat({"a query has no key ", ShownText(strKey), Suggestion(strKey, vecKeys)}));
 }
 
 }  // namespace
@@ -95,7 +97,7 @@ Query ParseQuery(const Json::Value& jQuery, bool blValuesOnly) {
     Query Parsed;
     if (!jQuery.isObject()) {
         Report(Parsed.vecFindings, FindingCode::kNotAQuery, "",
-               "a query is an object, not " + Shown(jQuery));
+               Concat({"a query is an object, not ", Shown(jQuery)}));
         return Parsed;
     }
     const Json::Value::const_iterator itEnd = jQuery.end();

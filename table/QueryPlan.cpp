@@ -1,9 +1,9 @@
 #include "QueryPlan.h"
 
 #include <algorithm>
-#include <numeric>
 
 #include "../src/base/SqlText.h"
+#include "Concat.h"
 #include "ConditionSql.h"
 
 namespace vornjsondb {
@@ -11,6 +11,8 @@ namespace vornjsondb {
 namespace {
 
 using VORN_JSON_DB::Query;
+
+constexpr size_t kUsualValues = 4;  // an operand or two, and a page
 
 bool IsPaged(const Query& Which) {
     return Which.nLimit != -1 || Which.nOffset != 0;
@@ -49,6 +51,7 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
     }
     CheckPage(Which, eUse, vecFindings);
     m_Sql.strSql.reserve(kUsualStatement);
+    m_Sql.vecValues.reserve(kUsualValues);
     AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
     m_nConditionEnd = m_Sql.strSql.size();
     if (eUse == QueryUse::kRead) {
@@ -59,24 +62,18 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
         AppendPage(Which);
     }
     m_nTailEnd = m_Sql.strSql.size();
-    if (!Which.vecMembers.empty()) {
-        for (const size_t nMember : m_vecColumns) {
-            m_Sql.strSql += " " + std::to_string(nMember);
-        }
+    for (const size_t nMember : m_vecColumns) {
+        m_Sql.strSql += " " + std::to_string(nMember);
     }
 }
 
 void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
-    if (Which.vecMembers.empty()) {
-        m_vecColumns.resize(m_Of.Size());
-        std::iota(m_vecColumns.begin(), m_vecColumns.end(), size_t{0});
-        return;
-    }
     for (size_t i = 0; i < Which.vecMembers.size(); ++i) {
         Place Where;
         Problem Why;
         if (FindPlace(m_Of, Which.vecMembers[i], Where, Why) && !Where.strPath.empty()) {
-            Why = {FindingCode::kBadMembers, ShownText(Which.vecMembers[i]) + " is a path"};
+            Why = {FindingCode::kBadMembers,
+                   Concat({ShownText(Which.vecMembers[i]), " is a path"})};
         }
         if (!Why.strMessage.empty()) {
             Report(vecFindings, Why.eCode, Below("/members", std::to_string(i)), Why.strMessage);

@@ -40,8 +40,14 @@ class QueryPlan {
     // statement. Any bytes.
     const std::string& Shape() const { return m_Sql.strSql; }
 
-    // The members to read, in the order of the result's columns.
-    const std::vector<size_t>& Columns() const { return m_vecColumns; }
+    // The same with a letter for what the statement does, at the end, which spares a copy. Asked
+    // for once.
+    const std::string& ShapeFor(char cUse) { return m_Sql.strSql += cUse; }
+
+    // The members to read, in the order of the result's columns: vecAll where the query names none.
+    const std::vector<size_t>& Columns(const std::vector<size_t>& vecAll) const {
+        return m_vecColumns.empty() ? vecAll : m_vecColumns;
+    }
 
     // "<condition>", the same behind " WHERE ", and " ORDER BY ... LIMIT ? OFFSET ?"; or nothing.
     std::string_view Condition() const;

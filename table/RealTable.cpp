@@ -4,6 +4,7 @@
 #include <map>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Members.h"
 #include "Statements.h"
@@ -49,7 +50,7 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
             Real.vecColumns.begin(), Real.vecColumns.end(),
             [szName](const RealColumn& Column) { return IsSameColumn(Column.strName, szName); });
         OwnStatement pStatement;
-        const std::string strSql = std::string("SELECT ") + szName + " FROM " + Quoted(strTable);
+        const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
         if (!blColumn && Prepare(pDb, strSql, pStatement) == SQLITE_OK) {
             return szName;
         }

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "Nearest.h"
 
@@ -27,13 +28,14 @@ RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatibl
 
 void RecordValues::Clear() {
     std::fill(m_strGiven.begin(), m_strGiven.end(), '0');
+    m_blEmpty = true;
 }
 
 bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
     Clear();
     if (!jRecord.isObject() || jRecord.empty()) {
         Report(vecFindings, FindingCode::kNotARecord, "",
-               Shown(jRecord) + " is no record: an object with members is expected");
+               Concat({Shown(jRecord), " is no record: an object with members is expected"}));
         return false;
     }
     // Records and definition are sorted alike: one step a member.
@@ -71,7 +73,7 @@ void RecordValues::Refuse(const Member& Into, Misfit eMisfit, const Json::Value&
 
 void RecordValues::RefuseUnknown(const std::string& strName, FindingList& vecFindings) const {
     Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
-           "there is no member " + ShownText(strName) + Suggestion(strName, m_Of.Names()));
+           Concat({"there is no member ", ShownText(strName), Suggestion(strName, m_Of.Names())}));
 }
 
 bool RecordValues::FillDefaults(FindingList& vecFindings) {
@@ -91,7 +93,7 @@ bool RecordValues::HasKey(FindingList& vecFindings) const {
     for (const size_t nMember : m_Of.Key()) {
         if (!Has(nMember) || At(nMember).eKind == BoundValue::Kind::kNull) {
             Report(vecFindings, FindingCode::kMissingKey, Below("", m_Of.At(nMember).strName),
-                   "the key's member " + m_Of.At(nMember).strQuoted + " has no value");
+                   Concat({"the key's member ", m_Of.At(nMember).strQuoted, " has no value"}));
         }
     }
     return vecFindings.empty();
@@ -137,15 +139,16 @@ void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShow
     };
     if (eMisfit == Misfit::kNone) {
         Report(vecFindings, FindingCode::kGenerated, std::move(strPath),
-               "member " + Into.strQuoted + " is computed by the table");
+               Concat({"member ", Into.strQuoted, " is computed by the table"}));
         return;
     }
     const MisfitRow* pRow = kRows;
     while (pRow->eMisfit != eMisfit) {
         ++pRow;
     }
-    Report(vecFindings, pRow->eCode, std::move(strPath),
-           "member " + Into.strQuoted + ": " + strShown + pRow->szReason + Expected(*Into.pType));
+    Report(
+        vecFindings, pRow->eCode, std::move(strPath),
+        Concat({"member ", Into.strQuoted, ": ", strShown, pRow->szReason, Expected(*Into.pType)}));
 }
 
 }  // namespace vornjsondb

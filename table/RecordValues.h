@@ -30,6 +30,7 @@ class RecordValues {
     // One member: for a Fit... function to fill, and from JSON.
     BoundValue& Give(size_t nMember) {
         m_strGiven[nMember] = '1';
+        m_blEmpty = false;
         return m_vecValues[nMember];
     }
     void SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
@@ -40,7 +41,7 @@ class RecordValues {
     // Whether every member of the key has a value; those without are reported.
     bool HasKey(FindingList& vecFindings) const;
 
-    bool IsEmpty() const { return m_strGiven.find('1') == std::string::npos; }
+    bool IsEmpty() const { return m_blEmpty; }
     bool Has(size_t nMember) const { return m_strGiven[nMember] == '1'; }
     const BoundValue& At(size_t nMember) const { return m_vecValues[nMember]; }
 
@@ -68,6 +69,7 @@ class RecordValues {
     std::vector<BoundValue> m_vecValues;
     std::vector<std::string> m_vecJson;  // texts of JSON members
     std::string m_strGiven;
+    bool m_blEmpty = true;
 };
 
 // What a misfit means to the caller; kNone: the table computes the member.

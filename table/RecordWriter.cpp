@@ -3,6 +3,7 @@
 #include <string_view>
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 
 namespace vornjsondb {
@@ -14,17 +15,17 @@ std::string InsertSql(const Members& Of, const RecordValues& Values) {
     std::string strValues;
     for (size_t i = 0; i < Of.Size(); ++i) {
         if (Values.Has(i)) {
-            strColumns += (strColumns.empty() ? " (" : ", ") + Of.At(i).strQuoted;
+            Append(strColumns, {strColumns.empty() ? " (" : ", ", Of.At(i).strQuoted});
             strValues += strValues.empty() ? ") VALUES (?" : ", ?";
         }
     }
-    return "INSERT INTO " + Of.QuotedTable() + strColumns + strValues + ")";
+    return Concat({"INSERT INTO ", Of.QuotedTable(), strColumns, strValues, ")"});
 }
 
 std::string KeyList(const Members& Of) {
     std::string strList;
     for (const size_t nMember : Of.Key()) {
-        strList += (strList.empty() ? "(" : ", ") + Of.At(nMember).strQuoted;
+        Append(strList, {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted});
     }
     return strList + ")";
 }
@@ -35,12 +36,12 @@ std::string OnConflict(const Members& Of, bool blReplace) {
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
         if (blReplace && !Other.blKey && !Other.blGenerated) {
-            strSet += (strSet.empty() ? "UPDATE SET " : ", ") + Other.strQuoted + "=excluded." +
-                      Other.strQuoted;
+            Append(strSet, {strSet.empty() ? "UPDATE SET " : ", ", Other.strQuoted, "=excluded.",
+                            Other.strQuoted});
         }
     }
     strSet.append(strSet.empty() ? "NOTHING" : "");
-    return " ON CONFLICT " + KeyList(Of) + " DO " + strSet;
+    return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet});
 }
 
 // A record of nothing but its key changes nothing: "id" = "id" finds out whether it is there.
@@ -48,14 +49,14 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     std::string strSet;
     for (size_t i = 0; i < Of.Size(); ++i) {
         if (Values.Has(i) && !Of.At(i).blKey) {
-            strSet += (strSet.empty() ? "" : ", ") + Of.At(i).strQuoted + "=?";
+            Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
     if (strSet.empty()) {
         const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
-        strSet = strKey + "=" + strKey;
+        strSet = Concat({strKey, "=", strKey});
     }
-    return "UPDATE " + Of.QuotedTable() + " SET " + strSet + WhereKey(Of);
+    return Concat({"UPDATE ", Of.QuotedTable(), " SET ", strSet, WhereKey(Of)});
 }
 
 }  // namespace
@@ -63,7 +64,8 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
-        strWhere += (strWhere.empty() ? " WHERE " : " AND ") + Of.At(nMember).strColumn + " = ?";
+        Append(strWhere,
+               {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn, " = ?"});
     }
     return strWhere;
 }
@@ -78,7 +80,7 @@ std::string RecordWriter::Sql(Verb eVerb) const {
         case Verb::kUpdate:
             return UpdateSql(m_Into.Of, m_Values);
         default:
-            return "SELECT 1 FROM " + m_Into.Of.QuotedTable() + WhereKey(m_Into.Of);
+            return Concat({"SELECT 1 FROM ", m_Into.Of.QuotedTable(), WhereKey(m_Into.Of)});
     }
 }
 
@@ -156,12 +158,12 @@ Status RecordWriter::WithValues(const Status& Failed) const {
     const std::string& strMessage = Failed.Message();
     std::string strMore;
     for (size_t i = 0; i < Of.Size(); ++i) {
-        const std::string strName = Of.Table() + "." + Of.At(i).strName;
+        const std::string strName = Concat({Of.Table(), ".", Of.At(i).strName});
         const size_t nFound = strMessage.rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
-            strMore +=
-                (strMore.empty() ? " (" : ", ") + Of.At(i).strName + " = " + Shown(m_Values.At(i));
+            Append(strMore,
+                   {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
         }
     }
     strMore.append(strMore.empty() ? "" : ")");

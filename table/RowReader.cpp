@@ -36,43 +36,31 @@ Json::Value TextValue(std::string_view strText) {
     return {strText.data(), strText.data() + strText.size()};
 }
 
-Json::Value ReadJson(std::string_view strText, JsonCodec& Codec) {
-    Json::Value jRead;
-    if (!Codec.Read(strText.data(), strText.size(), jRead)) {
-        jRead = TextValue(strText);
+void ReadJson(std::string_view strText, JsonCodec& Codec, Json::Value& jOut) {
+    if (!Codec.Read(strText.data(), strText.size(), jOut)) {
+        jOut = TextValue(strText);
     }
-    return jRead;
 }
 
 // What a value is: of its member's kind where it fits it, else of the stored one.
 Kind KindOf(sqlite3_value* pValue, BoundKind eKind) {
-    switch (sqlite3_value_type(pValue)) {
-        case SQLITE_INTEGER: {
-            if (eKind == BoundKind::kBoolean) {
-                const sqlite3_int64 nValue = sqlite3_value_int64(pValue);
-                return nValue == 0 || nValue == 1 ? Kind::kBoolean : Kind::kInteger;
-            }
-            if (eKind == BoundKind::kReal) {
-                return Kind::kReal;
-            }
-            return eKind == BoundKind::kText ? Kind::kText : Kind::kInteger;
-        }
-        case SQLITE_FLOAT:
-            return eKind == BoundKind::kText ? Kind::kText : Kind::kReal;
-        case SQLITE_TEXT:
-            return eKind == BoundKind::kObject || eKind == BoundKind::kList ||
-                           eKind == BoundKind::kJson
-                       ? Kind::kJson
-                       : Kind::kText;
-        case SQLITE_BLOB:
-            return Kind::kBlob;
-        default:
-            return Kind::kNull;
-    }
+    constexpr Kind kInt = Kind::kInteger, kReal = Kind::kReal, kText = Kind::kText,
+                   kJson = Kind::kJson, kBlob = Kind::kBlob, kNull = Kind::kNull;
+    // By SQLite's type, from 1, and the member's: none, text, boolean, integer, real, object, list,
+    // JSON, any.
+    static constexpr Kind kKinds[][9] = {
+        {kInt, kText, Kind::kBoolean, kInt, kReal, kInt, kInt, kInt, kInt},
+        {kReal, kText, kReal, kReal, kReal, kReal, kReal, kReal, kReal},
+        {kText, kText, kText, kText, kText, kJson, kJson, kJson, kText},
+        {kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob},
+        {kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull}};
+    const Kind eFound = kKinds[sqlite3_value_type(pValue) - 1][static_cast<size_t>(eKind)];
+    const bool blNumber =
+        eFound == Kind::kBoolean && (sqlite3_value_int64(pValue) & ~sqlite3_int64{1}) != 0;
+    return blNumber ? kInt : eFound;
 }
 
-Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, Kind eKind,
-                      JsonCodec& Codec) {
+Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, Kind eKind) {
     switch (eKind) {
         case Kind::kBoolean:
             return sqlite3_value_int(pValue) == 1;
@@ -80,8 +68,6 @@ Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, Kind eKin
             return static_cast<Json::Int64>(sqlite3_value_int64(pValue));
         case Kind::kReal:
             return sqlite3_value_double(pValue);
-        case Kind::kJson:
-            return ReadJson(TextOf(pStatement, pValue), Codec);
         default:
             return TextValue(TextOf(pStatement, pValue));
     }
@@ -117,11 +103,14 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
         ++itMember;
         sqlite3_value* const pValue = ColumnValue(pStatement, Each.nColumn);
         const Kind eKind = KindOf(pValue, Each.eKind);
-        if (eKind != Kind::kNull) {
-            Json::Value jValue = ReadValue(pStatement, pValue, eKind, Codec);
+        if (eKind == Kind::kJson) {
+            ReadJson(TextOf(pStatement, pValue), Codec, jMember);
+        } else if (eKind != Kind::kNull) {
+            Json::Value jValue = ReadValue(pStatement, pValue, eKind);
             jMember.swapPayload(jValue);
+        } else {
+            blLeaveOut = blLeaveOut || !Each.blKeepNull;
         }
-        blLeaveOut = blLeaveOut || (eKind == Kind::kNull && !Each.blKeepNull);
     }
     if (blLeaveOut) {
         LeaveOutNulls(pStatement, jRecord);

@@ -18,22 +18,9 @@ std::string SelectOneSql(const Table::Parts& From, bool blByRowid);
 
 // Lends the statement, binds, and makes the first step, which takes the lock: only here can a wait
 // help. nResult is the step's.
-template <typename MakeSql, typename BindAll>
-Status FirstStep(Table::Parts& From, const Doing& What, std::string_view strShape, MakeSql&& fnSql,
-                 BindAll&& fnBind, Statement& Lent, int& nResult) {
-    return Attempt(From.pDb, From.How.nWaitMs, [&]() -> Status {
-        Lent = Statement();
-        nResult = From.Kept.Take(strShape, fnSql, Lent);
-        if (nResult == SQLITE_OK) {
-            nResult = fnBind(Lent.Get());
-        }
-        if (nResult == SQLITE_OK) {
-            nResult = Lent.Step();
-        }
-        const bool blRan = nResult == SQLITE_ROW || nResult == SQLITE_DONE;
-        return blRan ? Status() : FailBySqlite(From.pDb, nResult, What);
-    });
-}
+Status FirstStep(Table::Parts& From, const Doing& What, std::string_view strShape,
+                 Callable<std::string()> fnSql, Callable<int(sqlite3_stmt*)> fnBind,
+                 Statement& Lent, int& nResult);
 
 }  // namespace vornjsondb
 

@@ -84,9 +84,12 @@ bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
     return true;
 }
 
-int Statements::Prepare(std::string_view strShape, const std::string& strSql, Statement& Lent) {
+int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, Statement& Lent) {
+    if (TakeKept(strShape, Lent)) {
+        return SQLITE_OK;
+    }
     OwnStatement pStatement;
-    const int nResult = vornjsondb::Prepare(m_pDb, strSql, pStatement);
+    const int nResult = Prepare(m_pDb, fnSql(), pStatement);
     if (nResult == SQLITE_OK) {
         Lent.m_strShape = strShape;
         Lent.m_pStatement = std::move(pStatement);

@@ -11,6 +11,8 @@
 
 #include <sqlite3.h>
 
+#include "Callable.h"
+
 namespace vornjsondb {
 
 struct FinalizeStatement {
@@ -73,10 +75,7 @@ class Statements {
 
     // Lends the statement of that shape, prepared from what fnSql returns when it is not here.
     // Returns SQLite's result.
-    template <typename MakeSql>
-    int Take(std::string_view strShape, MakeSql&& fnSql, Statement& Lent) {
-        return TakeKept(strShape, Lent) ? SQLITE_OK : Prepare(strShape, fnSql(), Lent);
-    }
+    int Take(std::string_view strShape, Callable<std::string()> fnSql, Statement& Lent);
 
   private:
     friend class Statement;
@@ -87,7 +86,6 @@ class Statements {
     };
 
     bool TakeKept(std::string_view strShape, Statement& Lent);
-    int Prepare(std::string_view strShape, const std::string& strSql, Statement& Lent);
     void GiveBack(Statement& Lent);
 
     sqlite3* m_pDb;

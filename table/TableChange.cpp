@@ -11,6 +11,7 @@ namespace VORN_JSON_DB {
 
 namespace {
 
+using vornjsondb::Callable;
 using vornjsondb::Doing;
 using vornjsondb::QueryPlan;
 using vornjsondb::QueryUse;
@@ -18,9 +19,9 @@ using vornjsondb::Statement;
 using Parts = Table::Parts;
 
 // Runs one statement, which is whole by itself, and counts the rows that it changed.
-template <typename MakeSql, typename BindAll>
-Status Run(Parts& Into, const Doing& What, const std::string& strShape, MakeSql&& fnSql,
-           BindAll&& fnBind, std::int64_t* pnRows) {
+Status Run(Parts& Into, const Doing& What, const std::string& strShape,
+           Callable<std::string()> fnSql, Callable<int(sqlite3_stmt*)> fnBind,
+           std::int64_t* pnRows) {
     return vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, [&]() -> Status {
         Statement Lent;
         int nResult = Into.Kept.Take(strShape, fnSql, Lent);

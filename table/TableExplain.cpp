@@ -80,7 +80,7 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         if (!Checked.Ok()) {
             return Checked;
         }
-        Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns());
+        Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns(From.WholeRow.Columns()));
         Resolved.AppendWhere(Made.strSql);
         Resolved.AppendTail(Made.strSql);
         Status Outcome = ReadPlan(From, What, Made);

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "RecordWriter.h"
 #include "SelectSql.h"
@@ -12,17 +13,37 @@ namespace vornjsondb {
 std::string SelectSql(const Members& Of, const std::vector<size_t>& vecColumns) {
     std::string strSql = "SELECT ";
     for (size_t i = 0; i < vecColumns.size(); ++i) {
-        strSql += (i == 0 ? "" : ", ") + Of.At(vecColumns[i]).strColumn;
+        Append(strSql, {i == 0 ? "" : ", ", Of.At(vecColumns[i]).strColumn});
     }
-    return strSql + " FROM " + Of.QuotedTable();
+    Append(strSql, {" FROM ", Of.QuotedTable()});
+    return strSql;
 }
 
 std::string SelectOneSql(const Table::Parts& From, bool blByRowid) {
     std::string strSql = SelectSql(From.Of, From.WholeRow.Columns());
     if (blByRowid) {
-        return strSql + " WHERE " + From.Of.QuotedTable() + "." + From.strRowid + " = ?";
+        Append(strSql, {" WHERE ", From.Of.QuotedTable(), ".", From.strRowid, " = ?"});
+    } else {
+        strSql += WhereKey(From.Of);
     }
-    return strSql + WhereKey(From.Of);
+    return strSql;
+}
+
+Status FirstStep(Table::Parts& From, const Doing& What, std::string_view strShape,
+                 Callable<std::string()> fnSql, Callable<int(sqlite3_stmt*)> fnBind,
+                 Statement& Lent, int& nResult) {
+    return Attempt(From.pDb, From.How.nWaitMs, [&]() -> Status {
+        Lent = Statement();
+        nResult = From.Kept.Take(strShape, fnSql, Lent);
+        if (nResult == SQLITE_OK) {
+            nResult = fnBind(Lent.Get());
+        }
+        if (nResult == SQLITE_OK) {
+            nResult = Lent.Step();
+        }
+        const bool blRan = nResult == SQLITE_ROW || nResult == SQLITE_DONE;
+        return blRan ? Status() : FailBySqlite(From.pDb, nResult, What);
+    });
 }
 
 }  // namespace vornjsondb
@@ -72,8 +93,9 @@ Status Table::Get(const Json::Value& jKey, Json::Value& jRecord) {
         Json::Value jFound = m_pParts->WholeRow.Read(Lent.Get(), m_pParts->Codec);
         jRecord.swapPayload(jFound);
     } else if (Outcome.Ok()) {
-        return vornjsondb::Fail(StatusCode::kNotFound, What,
-                                "no record has the key " + vornjsondb::Shown(jKey));
+        return vornjsondb::Fail(
+            StatusCode::kNotFound, What,
+            vornjsondb::Concat({"no record has the key ", vornjsondb::Shown(jKey)}));
     }
     return Outcome;
 }

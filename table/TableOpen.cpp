@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "Attempt.h"
+#include "Concat.h"
 #include "CreateStatement.h"
 #include "FindingCodes.h"
 #include "RealTable.h"
@@ -38,8 +39,9 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     }
     const std::string strEncoding = vornjsondb::TextColumn(pStatement, 0);
     if (strEncoding.compare(0, 6, "UTF-16") == 0) {
-        return vornjsondb::Fail(StatusCode::kRefused, What,
-                                "the database is " + strEncoding + ", not UTF-8");
+        return vornjsondb::Fail(
+            StatusCode::kRefused, What,
+            vornjsondb::Concat({"the database is ", strEncoding, ", not UTF-8"}));
     }
     return {};
 }
@@ -181,7 +183,7 @@ Status CheckVersion(int nVersion, const char* szVersion, const Doing& What) {
     constexpr int kOldest = 3035000;
     if (nVersion < kOldest) {
         return Fail(StatusCode::kRefused, What,
-                    std::string("SQLite 3.35 or later is needed, and this is ") + szVersion);
+                    Concat({"SQLite 3.35 or later is needed, and this is ", szVersion}));
     }
     return {};
 }
@@ -194,6 +196,12 @@ Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
         return Fail(StatusCode::kMisuse, pParts->Do(szDo), "a callback is reading from it");
     }
     return {};
+}
+
+Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
+               Callable<Status(Table::Parts&, const Doing&)> fnCall) {
+    Status State = CheckState(pParts, szDo, blChange);
+    return State.Ok() ? fnCall(*pParts, pParts->Do(szDo)) : State;
 }
 
 }  // namespace vornjsondb

@@ -11,6 +11,7 @@
 #include <sqlite3.h>
 
 #include "../src/base/JsonText.h"
+#include "Callable.h"
 #include "Members.h"
 #include "RecordValues.h"
 #include "RowReader.h"
@@ -58,11 +59,8 @@ Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
 
 // What each public call begins with: fnCall, with the parts and what they are about to do, where
 // the state allows it.
-template <typename Call>
-Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange, Call&& fnCall) {
-    Status State = CheckState(pParts, szDo, blChange);
-    return State.Ok() ? fnCall(*pParts, pParts->Do(szDo)) : State;
-}
+Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
+               Callable<Status(Table::Parts&, const Doing&)> fnCall);
 
 }  // namespace vornjsondb
 

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "QueryPlan.h"
 #include "SelectSql.h"
@@ -11,6 +12,7 @@ namespace VORN_JSON_DB {
 
 namespace {
 
+using vornjsondb::Callable;
 using vornjsondb::Doing;
 using vornjsondb::FailBySqlite;
 using vornjsondb::QueryPlan;
@@ -19,8 +21,8 @@ using vornjsondb::Statement;
 using Parts = Table::Parts;
 
 // Goes through the rows that a query selects until fnRow, called with the statement, returns false.
-template <typename PerRow>
-Status Select(Parts& From, const Query& Which, const Doing& What, PerRow&& fnRow) {
+Status Select(Parts& From, const Query& Which, const Doing& What,
+              Callable<bool(sqlite3_stmt*, const std::vector<size_t>&)> fnRow) {
     FindingList vecFindings;
     QueryPlan Plan(From.Of, From.Codec);
     Plan.Resolve(Which, QueryUse::kRead, vecFindings);
@@ -30,20 +32,21 @@ Status Select(Parts& From, const Query& Which, const Doing& What, PerRow&& fnRow
     }
     Statement Lent;
     int nResult = SQLITE_OK;
+    const std::vector<size_t>& vecColumns = Plan.Columns(From.WholeRow.Columns());
     const auto fnSql = [&] {
-        std::string strSql = vornjsondb::SelectSql(From.Of, Plan.Columns());
+        std::string strSql = vornjsondb::SelectSql(From.Of, vecColumns);
         Plan.AppendWhere(strSql);
         Plan.AppendTail(strSql);
         return strSql;
     };
     Status Begun = vornjsondb::FirstStep(
-        From, What, "L" + Plan.Shape(), fnSql,
+        From, What, Plan.ShapeFor('L'), fnSql,
         [&](sqlite3_stmt* pStatement) { return Plan.Bind(pStatement, 1); }, Lent, nResult);
     if (!Begun.Ok()) {
         return Begun;
     }
     while (nResult == SQLITE_ROW) {
-        if (!fnRow(Lent.Get(), Plan.Columns())) {
+        if (!fnRow(Lent.Get(), vecColumns)) {
             return Outcome;
         }
         nResult = Lent.Step();
@@ -52,11 +55,11 @@ Status Select(Parts& From, const Query& Which, const Doing& What, PerRow&& fnRow
 }
 
 // The same with records. fnRecord may take the record.
-template <typename PerRecord>
-Status SelectRecords(Parts& From, const Query& Which, const Doing& What, PerRecord&& fnRecord) {
+Status SelectRecords(Parts& From, const Query& Which, const Doing& What,
+                     Callable<bool(Json::Value&)> fnRecord) {
     std::unique_ptr<vornjsondb::RowReader> pSome;
     const auto fnRow = [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
-        const bool blAll = vecColumns == From.WholeRow.Columns();
+        const bool blAll = &vecColumns == &From.WholeRow.Columns();
         if (!blAll && !pSome) {
             pSome = std::make_unique<vornjsondb::RowReader>(From.Of, vecColumns, From.How.eNulls);
         }
@@ -80,18 +83,17 @@ Status Compute(Parts& From, const Query& Which, const Doing& What, bool blExists
         std::string strRows;
         Plan.AppendWhere(strRows);
         Plan.AppendTail(strRows);
-        strRows = " FROM " + From.Of.QuotedTable() + strRows;
-        if (blExists) {
-            return "SELECT EXISTS (SELECT 1" + strRows + ")";
-        }
         const bool blPaged = Which.nLimit >= 0 || Which.nOffset > 0;
-        return blPaged ? "SELECT count(*) FROM (SELECT 1" + strRows + ")"
-                       : "SELECT count(*)" + strRows;
+        const bool blInner = blExists || blPaged;
+        return vornjsondb::Concat({blExists  ? "SELECT EXISTS (SELECT 1"
+                                   : blPaged ? "SELECT count(*) FROM (SELECT 1"
+                                             : "SELECT count(*)",
+                                   " FROM ", From.Of.QuotedTable(), strRows, blInner ? ")" : ""});
     };
     Statement Lent;
     int nResult = SQLITE_OK;
     Status Begun = vornjsondb::FirstStep(
-        From, What, (blExists ? "E" : "C") + Plan.Shape(), fnSql,
+        From, What, Plan.ShapeFor(blExists ? 'E' : 'C'), fnSql,
         [&](sqlite3_stmt* pStatement) { return Plan.Bind(pStatement, 1); }, Lent, nResult);
     if (!Begun.Ok()) {
         return Begun;

@@ -5,6 +5,7 @@
 
 #include "../src/base/JsonMember.h"
 #include "../src/base/JsonMemory.h"
+#include "Concat.h"
 #include "ConditionNode.h"
 #include "FindingCodes.h"
 #include "Operators.h"
@@ -72,7 +73,7 @@ class WhereParser {
         }
         if (!jObject.isObject()) {
             Report(m_vecFindings, FindingCode::kNotConditions, strPath,
-                   "conditions are an object, not " + Shown(jObject));
+                   Concat({"conditions are an object, not ", Shown(jObject)}));
             return vecOut;
         }
         const Json::Value::const_iterator itEnd = jObject.end();
@@ -99,7 +100,7 @@ class WhereParser {
             AddLeaf(strMember, Op::kEqual, jValue, strPath, vecOut);
         } else if (m_blValuesOnly) {
             Report(m_vecFindings, FindingCode::kOperatorRefused, strPath,
-                   "the value of " + ShownText(strMember) + " holds operators");
+                   Concat({"the value of ", ShownText(strMember), " holds operators"}));
         } else {
             ReadOperators(strMember, jValue, strPath, nLevel, vecOut);
         }
@@ -112,7 +113,8 @@ class WhereParser {
         if (nOperators == 0 || nLevel > kMaxLevels) {
             Report(m_vecFindings,
                    nOperators == 0 ? FindingCode::kWrongOperand : FindingCode::kNestedTooDeep,
-                   strPath, "\"$not\" takes an object of operators, not " + Shown(jOperators));
+                   strPath,
+                   Concat({"\"$not\" takes an object of operators, not ", Shown(jOperators)}));
             return;
         }
         if (nOperators < jOperators.size()) {
@@ -141,7 +143,7 @@ class WhereParser {
                    int nLevel, Conditions& vecOut) {
         if (Group.blList && !jParts.isArray()) {
             Report(m_vecFindings, FindingCode::kNotConditions, strPath,
-                   "this group is a list of conditions, not " + Shown(jParts));
+                   Concat({"this group is a list of conditions, not ", Shown(jParts)}));
             return;
         }
         if (IsEmpty(jParts, strPath)) {
@@ -198,13 +200,13 @@ class WhereParser {
         const std::string strShown = ShownText(strKey);
         if (m_blValuesOnly) {
             Report(m_vecFindings, FindingCode::kOperatorRefused, strPath,
-                   strShown + " is an operator, and this query takes plain values");
+                   Concat({strShown, " is an operator, and this query takes plain values"}));
         } else if (FindOperator(strKey) != nullptr || FindGroupKey(strKey) != nullptr) {
             Report(m_vecFindings, FindingCode::kMisplacedOperator, strPath,
-                   strShown + " cannot stand here");
+                   Concat({strShown, " cannot stand here"}));
         } else {
             Report(m_vecFindings, FindingCode::kUnknownOperator, strPath,
-                   "there is no operator " + strShown + OperatorSuggestion(strKey));
+                   Concat({"there is no operator ", strShown, OperatorSuggestion(strKey)}));
         }
     }
 

@@ -106,6 +106,8 @@ ReadOptions GuessFormat(std::string_view strFirst) {
         Guess.eFormat = Format::kJson;
     } else if (cFirst == '{') {
         Guess.eFormat = OfObjects(strText.substr(nBegin));
+    } else if (cFirst == '\0') {
+        Guess.eFormat = Format::kJsonLines;  // blanks alone would be a header to CSV
     } else {
         Guess.eFormat = Format::kSeparated;
         Guess.cDelimiter = GuessDelimiter(strText);

@@ -85,6 +85,11 @@ bool InputFiles::ReadOne(Input& Now, Sink& To) {
 bool InputFiles::Read(Sink& To, const Begin& fnBegin, bool blAgain) {
     for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
         const bool blReady = m_blReadBefore ? pNow->From.Rewind() : !blAgain || pNow->From.Spool();
+        if (!blReady && !Interrupt::Came()) {
+            Fail(kExitIo, pNow->From.Name() + ": cannot copy it to read it twice: " +
+                              std::strerror(pNow->From.Error()) +
+                              "; set TMPDIR to a folder with space");
+        }
         if (!blReady) {
             FailBySystem(pNow->From);
         }

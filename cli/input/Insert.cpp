@@ -194,6 +194,9 @@ void Import::LearnTypes() {
         Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
     }
     m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    if (m_jDefinition[m_strTable]["member"].empty()) {
+        Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
+    }
     m_blToKeep = true;
 }
 
@@ -209,7 +212,7 @@ void Import::CheckColumns() const {
 
 int Import::ShowDryRun() {
     std::string strSql;
-    Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable);
+    Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
     if (m_Call.Json()) {
         Json::Value jShown;
         jShown["definition"] = m_jDefinition;
@@ -235,7 +238,8 @@ void Import::Prepare() {
     How.blCreateTable = true;
     How.nWaitMs = m_Call.WaitMs();
     Begin();
-    Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db());
+    // The names come from the records.
+    Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db(), kExitBadData);
     if (m_blAdded) {
         SyncReport Report;
         Check(m_Table.Sync(SyncMode::kChange, Report), m_Call.Db());

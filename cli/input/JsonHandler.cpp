@@ -20,8 +20,8 @@ constexpr const char* kErrorTexts[] = {
     "a comma or ] is missing after an element",
     "\\u needs four hexadecimal digits",
     "\\u gives half of a surrogate pair",
-    "there is no such escape in a text",
-    "a text has no end quote, or a control character that must be escaped",
+    "a text has an escape that JSON has not, or a control character that must be escaped",
+    "a text has no end quote",
     "a text is no UTF-8; convert the input with iconv",
     "a number is greater than any double",
     "a number has no digit after the point",
@@ -93,7 +93,7 @@ bool JsonHandler::NoRecord(const char* szKind) {
 }
 
 void JsonHandler::CheckText(std::string_view strText) {
-    if (HasSurrogate(strText)) {
+    if (m_blEscapes && HasSurrogate(strText)) {
         Blame("\\u gives half of a surrogate pair");
     }
 }

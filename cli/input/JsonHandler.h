@@ -3,6 +3,10 @@
 #ifndef VORNJSONDB_CLI_INPUT_JSON_HANDLER_H
 #define VORNJSONDB_CLI_INPUT_JSON_HANDLER_H
 
+// For texts that are read in place without a check of their encoding.
+#if defined(__SSE2__) && !defined(RAPIDJSON_SSE2)
+#define RAPIDJSON_SSE2
+#endif
 #include <rapidjson/reader.h>
 
 #include <cstdint>
@@ -43,6 +47,9 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool StartArray();
     bool EndArray(rapidjson::SizeType nElements);
 
+    // Whether there may be escapes in what follows.
+    void MayHaveEscapes(bool blMay) { m_blEscapes = blMay; }
+
     // A value that could not be read to its end. Returns whether to go on after it.
     bool Broken(const std::string& strReason);
 
@@ -76,6 +83,7 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     int m_nLevel = 0;        // how many brackets are open
     int m_nRecordLevel = 0;  // of them, around each record
     bool m_blInRecord = false;
+    bool m_blEscapes = true;
     bool m_blStopped = false;
     std::int64_t m_nRecord = 0;
     size_t m_nMember = 0;

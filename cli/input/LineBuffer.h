@@ -14,7 +14,7 @@ class LineBuffer {
   public:
     // Lines longer than nMost are skipped and reported as such. After each line there are kPad
     // bytes more that may be overwritten, if they are put back.
-    static constexpr size_t kPad = 4;
+    static constexpr size_t kPad = 16;
     LineBuffer(ByteSource& From, size_t nMost) : m_From(From), m_nMost(nMost) {}
 
     // False at the end. The line is without its line feed.

@@ -163,7 +163,8 @@ void SeparatedReader::Header() {
         const auto itFirst = std::find(vecLower.begin(), vecLower.end(), vecLower.back());
         const auto nFirst = static_cast<size_t>(itFirst - vecLower.begin());
         if (vecNames[i].empty()) {
-            Fail(m_nRowLine, "column " + std::to_string(i + 1) + " has no name");
+            Fail(m_nRowLine, "column " + std::to_string(i + 1) +
+                                 " has no name; --no-header is for input without names");
             return;
         }
         if (nFirst < i) {

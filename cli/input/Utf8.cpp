@@ -45,7 +45,36 @@ bool IsAllAscii(const char* pEight) {
     return (nEight & 0x8080808080808080ULL) == 0;
 }
 
+// All of eight bytes lie between the blank and the last of ASCII.
+bool IsAllPrintable(const char* pEight) {
+    unsigned long long nEight = 0;
+    std::memcpy(&nEight, pEight, sizeof nEight);
+    return ((nEight | (nEight - 0x2020202020202020ULL)) & 0x8080808080808080ULL) == 0;
+}
+
 }  // namespace
+
+bool IsUtf8WithoutControls(std::string_view strBytes) {
+    size_t i = 0;
+    while (i < strBytes.size()) {
+        const auto cNext = static_cast<unsigned char>(strBytes[i]);
+        if (i + 8 <= strBytes.size() && IsAllPrintable(strBytes.data() + i)) {
+            i += 8;
+        } else if (cNext < 0x80) {
+            if (cNext < ' ') {
+                return false;
+            }
+            ++i;
+        } else {
+            const size_t nLength = LengthAt(strBytes, i);
+            if (nLength == 0) {
+                return false;
+            }
+            i += nLength;
+        }
+    }
+    return true;
+}
 
 size_t FindNoUtf8(std::string_view strBytes) {
     size_t i = 0;

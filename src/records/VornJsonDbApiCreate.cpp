@@ -20,7 +20,7 @@ int VornJsonDbApi::recCreate(Json::Value& jParamIn, Json::Value& jParamOut) try 
         const vornjsondb::TableTypes& Types = Handle.LookUp().Types();
         // The caller's record is copied only where there is something to fill in. A value that is
         // no object is left for the type check to refuse.
-        // mutate(moved): a copy that is not needed changes nothing.
+        // mutate(hoisted): a copy that is not needed changes nothing.
         if (jParamIn.isObject() && vornjsondb::LacksDefaults(Types, jParamIn)) {
             jCompleted = jParamIn;
             vornjsondb::FillDefaults(Types, jCompleted);

@@ -162,6 +162,14 @@ TEST_F(JsonTextTest, CommentsOfAStoredTextAreNoPartOfTheValue) {
     EXPECT_FALSE(jRead.hasComment(Json::commentBefore));
 }
 
+TEST_F(JsonTextTest, CommentsOfAValueAreNotWritten) {
+    Json::Value jList(Json::arrayValue);
+    jList.append(1.5);
+    jList[0].setComment(std::string("// of the element"), Json::commentBefore);
+    jList.setComment(std::string("// of the list"), Json::commentBefore);
+    EXPECT_EQ(vornjsondb::JsonCodec().Write(jList), "[1.5]");
+}
+
 TEST_F(JsonTextTest, ReadingSaysWhetherTheTextIsJson) {
     vornjsondb::JsonCodec Codec;
     Json::Value jRead;

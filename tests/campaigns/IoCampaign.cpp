@@ -78,10 +78,7 @@ class Case {
 
     void RunOnFile() {
         const Database db(m_strPath, kFaultyVfs);
-        // A constructor is the connection's first use: the files are not open yet.
-        const std::string strName = m_operation.szName;
-        const bool blFirst = strName == "constructor" || strName == "Open";
-        const HandlePtr pHandle = blFirst ? nullptr : Open(db);
+        const HandlePtr pHandle = m_operation.eReach == Reach::kOpens ? nullptr : Open(db);
         Subject subject = {m_table, db.Get(), pHandle.get()};
         Arguments argsBefore;
         m_operation.pfnPrepare(m_table, argsBefore);
@@ -121,7 +118,7 @@ class Case {
             Check(nPauses == 0, "paused without a lock");
             return;
         }
-        Check(nPauses == 0 || nPauses == (m_blForEver ? 500 : 1),
+        Check(nPauses == 0 || nPauses == (m_blForEver ? kMostPauses : 1),
               "paused " + std::to_string(nPauses) + " times");
     }
 
@@ -199,7 +196,7 @@ int RunIoCampaign(const Options& options) {
     const Table wide("wide", 40);
     for (const char* szMode : {"DELETE", "TRUNCATE", "WAL"}) {
         for (const Operation& operation : kOperations) {
-            if (!operation.blOnDatabase || operation.blFirstUse) {
+            if (operation.eReach == Reach::kNoFiles || operation.blFirstUse) {
                 continue;
             }
             ++Figure("operations");

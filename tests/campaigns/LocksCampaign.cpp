@@ -7,6 +7,7 @@
 #include <memory>
 
 #include "locks/Load.h"
+#include "support/Store.h"
 
 namespace campaign {
 
@@ -23,71 +24,131 @@ bool FreeLock(int nPause) {
     return g_blSleep;
 }
 
-enum class Call { kCreate, kList, kUpdate, kDelete };
-
-int Run(VornJsonDbApi& handle, Call eCall) {
-    Json::Value jRecord = LoadRecord(7, 0, "new");
-    Json::Value jQuery(Json::objectValue);
-    Json::Value jRows;
-    jQuery["id"] = 7;
-    switch (eCall) {
-        case Call::kCreate:
-            return handle.recCreate(jRecord, jRecord);
-        case Call::kList:
-            return handle.recList(jQuery, jRows) == 0 ? static_cast<int>(jRows.size()) : -1;
-        case Call::kUpdate:
-            return handle.recUpdateByFilter(jQuery, jRecord);
-        default:
-            return handle.recDelete(jQuery);
-    }
+// What is a whole by itself.
+bool IsStep(const ActRow& row) {
+    return row.eAct != Act::kBegin && row.eAct != Act::kCommit && row.eAct != Act::kRollback;
 }
 
-struct Known {
-    const char* szName;
-    int nFreeAt;
-    int nPauses;
-    bool blDone;
-};
-
-constexpr Known kKnown[] = {
-    {"never locked", 0, 0, true},
-    {"free at the first pause", 1, 1, true},
-    {"free before the last attempt", kAttempts - 1, kAttempts - 1, true},
-    {"free after the last attempt", kAttempts, kAttempts, false},
-};
-
-void RunKnown(const Database& db, const Database& blocker, VornJsonDbApi& handle,
-              const Known& known, Call eCall, int nWanted) {
-    const std::string strBefore = db.Rows("SELECT * FROM load");
-    if (known.nFreeAt > 0) {
-        blocker.Run("BEGIN EXCLUSIVE");
+// The connections, and what the one under test has stored.
+class Scene {
+  public:
+    explicit Scene(const std::string& strPath)
+        : m_db(strPath),
+          m_blocker(strPath),
+          m_pStore(NewStore(m_db)),
+          m_stream(1, Owner{0, 1, 40}, ReadState(m_db, 0)) {
+        g_pBlocker = &m_blocker;
+        m_db.Run(kFast);
+        m_blocker.Run(kFast);
     }
-    g_nFreeAt = known.nFreeAt;
-    TakePauses();
-    const int nResult = Run(handle, eCall);
-    const int nPauses = TakePauses().nCount;
-    Expect(nResult == (known.blDone ? nWanted : -1) && nPauses == known.nPauses, [&] {
-        return std::string(known.szName) + ": result " + std::to_string(nResult) + " after " +
-               std::to_string(nPauses) + " pauses";
-    });
-    Expect(known.blDone || db.Rows("SELECT * FROM load") == strBefore,
-           [] { return std::string("a failure changed rows"); });
-    ++Figure("cases of a known attempt");
-}
+    Scene(const Scene&) = delete;
+    Scene& operator=(const Scene&) = delete;
+    ~Scene() { g_pfnOnPause = nullptr; }
+
+    const Database& Db() const { return m_db; }
+
+    // The step that tries this act, after others that make it possible.
+    Step Prepare(const ActRow& row) {
+        const Step step = m_stream.Make(row, 6);
+        for (const ActRow& other : kActs) {
+            if (!m_stream.IsPossible(row.eWhen, step.nKey) && IsStep(other) &&
+                m_stream.IsPossible(other.eWhen, step.nKey)) {
+                Expect(Run(m_stream.Make(other, 6)), [&] { return m_pStore->Failure(); });
+            }
+        }
+        Expect(m_stream.IsPossible(row.eWhen, step.nKey),
+               [&] { return std::string("no way to try ") + row.szName; });
+        return step;
+    }
+
+    bool Run(const Step& step) {
+        const bool blDone = m_pStore->Run(step) >= 0;
+        if (blDone) {
+            m_stream.Apply(step);
+        }
+        return blDone;
+    }
+
+    // Returns the pauses.
+    template <typename Call>
+    Pauses RunLocked(const Hold& hold, int nFreeAt, bool blSleep, const Call& fnCall) {
+        if (nFreeAt > 0) {
+            m_blocker.Run(hold.szSql);
+        }
+        g_nFreeAt = nFreeAt;
+        g_blSleep = blSleep;
+        g_pfnOnPause = FreeLock;
+        TakePauses();
+        fnCall();
+        const Pauses pauses = TakePauses();
+        g_pfnOnPause = nullptr;
+        if (sqlite3_get_autocommit(m_blocker.Get()) == 0) {
+            m_blocker.Run("COMMIT");
+        }
+        return pauses;
+    }
+
+    // A step whose lock is let go of as known, and all that must be so afterwards.
+    void RunKnown(const Step& step, const Hold& hold, const Known& known) {
+        bool blDone = false;
+        const Pauses pauses = RunLocked(hold, known.nFreeAt, false, [&] { blDone = Run(step); });
+        const std::string strFailure = m_pStore->Failure();
+        // What is taken back is not committed.
+        const bool blInTheWay = !hold.blAtCommit || step.pRow->eAct != Act::kTakenBack;
+        CheckAnswer(step.pRow->szName, hold, known, blInTheWay, blDone, pauses, strFailure);
+        Expect(blDone || m_pStore->IsGivenUp(pauses.nCount, false),
+               [&] { return std::string(step.pRow->szName) + " failed: " + strFailure; });
+        CheckRows(step.pRow->szName);
+    }
+
+    void RunKnownList(const Hold& hold, const Known& known) {
+        bool blDone = false;
+        std::map<int, std::string> rows;
+        const Pauses pauses =
+            RunLocked(hold, known.nFreeAt, false, [&] { blDone = m_pStore->List(0, rows); });
+        CheckAnswer("list", hold, known, hold.blReading, blDone, pauses, m_pStore->Failure());
+        Expect(!blDone || rows == m_stream.Now().rows, [] { return std::string("listed others"); });
+    }
+
+    // Whole or not at all.
+    void CheckRows(const char* szName) {
+        const State now = ReadState(m_db, 0);
+        Expect(now == m_stream.Now(), [&] {
+            return std::string(szName) + ": " + now.Text() + " instead of " + m_stream.Now().Text();
+        });
+    }
+
+  private:
+    static void CheckAnswer(const char* szName, const Hold& hold, const Known& known,
+                            bool blInTheWay, bool blDone, const Pauses& pauses,
+                            const std::string& strFailure) {
+        const int nPauses = blInTheWay ? known.nPauses : 0;
+        const bool blWanted = known.blDone || !blInTheWay;
+        Expect(blDone == blWanted && pauses.nCount == nPauses, [&] {
+            return std::string(szName) + ", " + hold.szSql + ", " + known.szName +
+                   (blDone ? ": done" : ": failed") + " after " + std::to_string(pauses.nCount) +
+                   " pauses: " + strFailure;
+        });
+        ++Figure("cases of a known attempt");
+    }
+
+    Database m_db;
+    Database m_blocker;
+    std::unique_ptr<Store> m_pStore;
+    Stream m_stream;
+};
 
 void RunKnownAttempts(const std::string& strPath) {
-    const Database db(strPath);
-    const Database blocker(strPath);
-    const std::unique_ptr<VornJsonDbApi> pHandle = LoadHandle(db);
-    g_pBlocker = &blocker;
-    g_blSleep = false;
-    g_pfnOnPause = FreeLock;
-    for (const Known& known : kKnown) {
-        RunKnown(db, blocker, *pHandle, known, Call::kCreate, 0);
-        const int nRows = known.blDone ? 1 : 0;
-        RunKnown(db, blocker, *pHandle, known, Call::kList, nRows);
-        RunKnown(db, blocker, *pHandle, known, Call::kUpdate, 0);
-        RunKnown(db, blocker, *pHandle, known, Call::kDelete, nRows);
+    Scene scene(strPath);
+    for (const Hold& hold : kHolds) {
+        for (const Known& known : kKnown) {
+            for (const ActRow& row : kActs) {
+                if (IsStep(row)) {
+                    scene.RunKnown(scene.Prepare(row), hold, known);
+                }
+            }
+            scene.RunKnownList(hold, known);
+        }
     }
 }
 
@@ -95,30 +156,31 @@ void OnSignal(int) {}
 
 // The pauses end early, and the attempts go on.
 void RunSignalStorm(const std::string& strPath) {
-    const Database db(strPath);
-    const Database blocker(strPath);
-    const std::unique_ptr<VornJsonDbApi> pHandle = LoadHandle(db);
-    g_pBlocker = &blocker;
-    g_blSleep = true;
+    Scene scene(strPath);
     struct sigaction action = {};
     action.sa_handler = OnSignal;
     sigaction(SIGALRM, &action, nullptr);
     const itimerval storm = {{0, 500}, {0, 500}};
     const itimerval calm = {{0, 0}, {0, 0}};
-    setitimer(ITIMER_REAL, &storm, nullptr);
-    const Known known = {"free after 40 pauses among signals", 40, 40, true};
-    RunKnown(db, blocker, *pHandle, known, Call::kCreate, 0);
-    blocker.Run("BEGIN EXCLUSIVE");
-    TakePauses();
-    g_nFreeAt = 60;
-    const int nDeleted = Run(*pHandle, Call::kDelete);
-    const Pauses pauses = TakePauses();
-    setitimer(ITIMER_REAL, &calm, nullptr);
-    Expect(nDeleted == 1 && pauses.nCount == 60 && pauses.nInterrupted > 0, [&] {
-        return "signal storm: result " + std::to_string(nDeleted) + ", " +
-               std::to_string(pauses.nInterrupted) + " pauses interrupted";
-    });
-    Figure("pauses interrupted by signals") += static_cast<std::uint64_t>(pauses.nInterrupted);
+    constexpr int kFreeAt = 60;
+    for (const ActRow& row : kActs) {
+        if (row.eAct != Act::kCreate && row.eAct != Act::kRemove) {
+            continue;
+        }
+        const Step step = scene.Prepare(row);
+        bool blDone = false;
+        setitimer(ITIMER_REAL, &storm, nullptr);
+        const Pauses pauses =
+            scene.RunLocked(kHolds[0], kFreeAt, true, [&] { blDone = scene.Run(step); });
+        setitimer(ITIMER_REAL, &calm, nullptr);
+        Expect(blDone && pauses.nCount >= kFreeAt && pauses.nInterrupted > 0, [&] {
+            return std::string("signal storm: ") + row.szName + (blDone ? " done" : " failed") +
+                   " after " + std::to_string(pauses.nCount) + " pauses, of which " +
+                   std::to_string(pauses.nInterrupted) + " were interrupted";
+        });
+        scene.CheckRows(row.szName);
+        Figure("pauses interrupted by signals") += static_cast<std::uint64_t>(pauses.nInterrupted);
+    }
 }
 
 int OnBusy(void* pCalls, int nBefore) {
@@ -127,21 +189,21 @@ int OnBusy(void* pCalls, int nBefore) {
 }
 
 void RunBusyHandler(const std::string& strPath) {
-    const Database db(strPath);
-    const Database blocker(strPath);
-    g_pBlocker = &blocker;
-    g_blSleep = false;
+    Scene scene(strPath);
     int nCalls = 0;
-    sqlite3_busy_handler(db.Get(), OnBusy, &nCalls);
-    const std::unique_ptr<VornJsonDbApi> pHandle = LoadHandle(db);
+    sqlite3_busy_handler(scene.Db().Get(), OnBusy, &nCalls);
     const Known known = {"free at the third pause, own busy handler", 3, 3, true};
-    for (const Call eCall : {Call::kCreate, Call::kUpdate, Call::kDelete}) {
+    for (const ActRow& row : kActs) {
+        if (!IsStep(row)) {
+            continue;
+        }
+        const Step step = scene.Prepare(row);
         const int nBefore = nCalls;
-        RunKnown(db, blocker, *pHandle, known, eCall, eCall == Call::kDelete ? 1 : 0);
+        scene.RunKnown(step, kHolds[0], known);
         // Three attempts find the lock, and the handler asks for two more tries in each.
         Expect(nCalls - nBefore == 9, [&] {
-            return "the caller's busy handler was called " + std::to_string(nCalls - nBefore) +
-                   " times";
+            return std::string(row.szName) + ": the caller's busy handler was called " +
+                   std::to_string(nCalls - nBefore) + " times";
         });
     }
     Figure("calls of the caller's busy handler") += static_cast<std::uint64_t>(nCalls);
@@ -150,19 +212,20 @@ void RunBusyHandler(const std::string& strPath) {
 int RunLocksCampaign(const Options& options) {
     for (const char* szFigure :
          {"cases of a known attempt", "pauses interrupted by signals",
-          "calls of the caller's busy handler", "operations under load", "retries",
-          "most retries of one operation", "longest operation, microseconds",
-          "given up after 500 attempts", "created, answer lost to a lock"}) {
+          "calls of the caller's busy handler", "operations under load", "pauses",
+          "most pauses of one operation", "longest operation, microseconds", "given up for a lock",
+          "done, answer lost to a lock"}) {
         Figure(szFigure);
     }
-    const std::string strPath = NewLoadFile("DELETE");
+    const std::string strPath = TempFolder() + "/locks.db";
+    NewFile(strPath, "DELETE");
     RunKnownAttempts(strPath);
     RunSignalStorm(strPath);
     RunBusyHandler(strPath);
     // The count is in seconds, halved between the two modes.
     const int nMilliseconds = (options.nCount > 0 ? options.nCount : options.blLong ? 60 : 3) * 500;
-    RunLoad("DELETE", options.nSeed, nMilliseconds / options.nScale);
-    RunLoad("WAL", options.nSeed + 1, nMilliseconds / options.nScale);
+    RunLoad(strPath, "DELETE", options.nSeed, nMilliseconds / options.nScale);
+    RunLoad(strPath, "WAL", options.nSeed + 1, nMilliseconds / options.nScale);
     return Finish("locks");
 }
 

@@ -14,6 +14,14 @@ expect 2 '' 'error: --format: unknown value "xml"; it is one of json|jsonl|csv|t
 expect 2 '' 'error: table "product" has no member "nmae"; did you mean "name"?' -- \
     count shop.db product nmae=x
 expect 2 '' 'error: "[1,2]" sets no member; write member=value' -- list shop.db product '[1,2]'
+expect 2 '' 'error: --where: "size=5" is no JSON object; write {"size": 5}, or size=5 without --where' -- \
+    list shop.db product --where size=5
+expect 2 '' 'error: --where: Line 1, Column 8: Missing '"','"' or '"'}'"' in object declaration; it must be JSON' \
+    -- list shop.db product --where '{"id":5'
+expect 2 '' 'error: tags: Line 1, Column 2: Syntax error: value, object or array expected.; it must be JSON' -- \
+    update shop.db product 1 tags=[
+expect 2 '' 'error: record: Line 1, Column 2: Missing '"'}'"' or object member name; it must be JSON' -- \
+    upsert shop.db product '{'
 expect 5 '' 'error: shop.db: there is no table "produkt"; did you mean "product"?' -- \
     list shop.db produkt
 expect 7 '' 'error: none.db: No such file or directory; check the name, or make it with init or insert' \
@@ -37,4 +45,32 @@ expect 6 '' 'error: shop.db: database is locked (waited 10 ms); try again, or wa
     -- list shop.db product --wait 10
 : >go
 wait
+rm go
+mkfifo go
+(echo 'BEGIN IMMEDIATE; SELECT 1;'; cat go) | sqlite3 shop.db >held_again &
+until [[ -s held_again ]]; do sleep 0.05; done
+expect 6 '' 'error: shop.db: cannot begin a transaction: database is locked (waited 10 ms); try again, or wait longer with --wait MS' \
+    -- delete shop.db product 1 --wait 10
+: >go
+wait
+
+# What a finding advises is a call of the library; here it is what to type.
+refused='error: shop.db: cannot read records of table "product": '
+expect 2 '' "$refused"'there is no operator "$foo" (did you mean "$or"?); see vornjsondb list --help' -- \
+    list shop.db product --where '{"id": {"$foo": 1}}'
+expect 2 '' "$refused"'"$contains" is not for member "name" of type "string"; $like and $prefix are for texts, $contains is for lists' \
+    -- list shop.db product --where '{"name": {"$contains": "e"}}'
+expect 2 '' "$refused"'table "product" has no member "size"; correct the name, or add the member by insert --add-members' \
+    -- list shop.db product --sort size
+expect 3 '' 'error: shop.db: cannot make a statement for table "shelf": member "a" has the unknown type "txt"; see vornjsondb init --help' \
+    -- init shop.db shelf a:txt
+expect 2 '' 'error: shop.db: cannot remove records from table "product": the query has no condition and would reach every record; give a condition; delete --all removes all records' \
+    -- delete shop.db product --where '{}'
+
+# What a message quotes does not steer the terminal.
+expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \
+    list shop.db $'a\e[31m\u009b0m\nb'
+echo '[{"id": 9, "name": "x"}]' >$'a\e[31m.json'
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (a\x1b[31m.json: JSON)' -- \
+    insert shop.db product $'a\e[31m.json'
 finish

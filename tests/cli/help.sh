@@ -5,11 +5,65 @@ source "$(dirname "$0")/Check.sh"
 for shell in bash zsh fish man; do
     "$VORNJSONDB" completion $shell >script.$shell
 done
-same 'bash reads its script' "$(bash -n script.bash 2>&1)" ''
-command -v zsh >/dev/null && same 'zsh reads its script' "$(zsh -n script.zsh 2>&1)" ''
-command -v fish >/dev/null && same 'fish completes' \
-    "$(fish -c 'source script.fish; complete -C "vornjsondb ini"')" $'init\tCreate a table'
-command -v mandoc >/dev/null && same 'the manual is clean' \
+# The scripts ask the command itself for tables.
+mkdir bin
+ln -s "$VORNJSONDB" bin/vornjsondb
+export PATH=$PWD/bin:$PATH
+"$VORNJSONDB" init shop.db product id:int --quiet
+"$VORNJSONDB" init shop.db price id:int --quiet
+
+# in_bash WORD...: what bash offers for the last of them.
+in_bash() {
+    bash -c 'source script.bash; COMP_WORDS=("$@") COMP_CWORD=$(($# - 1)); _vornjsondb
+        echo "${COMPREPLY[*]}"' bash "$@"
+}
+same 'bash: subcommands' "$(in_bash vornjsondb in)" 'insert init index'
+same 'bash: tables' "$(in_bash vornjsondb list shop.db pr)" 'price product'
+same 'bash: options' "$(in_bash vornjsondb list shop.db price --no)" '--no-headers'
+same 'bash: choices' "$(in_bash vornjsondb list shop.db price --format js)" 'json jsonl'
+same 'bash: files' "$(in_bash vornjsondb list sh)" 'shop.db'
+same 'bash: shells' "$(in_bash vornjsondb completion f)" 'fish'
+
+in_fish() {
+    fish -c "source script.fish; complete -C '$1'"
+}
+same 'fish: subcommands' "$(in_fish 'vornjsondb ini')" $'init\tCreate a table'
+same 'fish: tables' "$(in_fish 'vornjsondb list shop.db pri')" 'price'
+
+# zsh completes on a terminal only: one is made, with a key on it that completes and shows the line.
+# The function is loaded from the path, as it is from its installed place.
+in_zsh() {
+    zsh -f zsh.input "$1"
+}
+mkdir functions
+cp script.zsh functions/_vornjsondb
+cat >zsh.input <<'END'
+zmodload zsh/zpty
+export LINE=$1
+zpty shell 'PS1= zsh -f -i'
+zpty -w shell 'fpath=($PWD/functions $fpath); autoload -Uz compinit; compinit -u -D'
+zpty -w shell 'shown() { BUFFER=$LINE; CURSOR=$#LINE; zle expand-or-complete; print -r -- "<$BUFFER>"; BUFFER= }'
+zpty -w shell 'zle -N shown; bindkey "^X" shown'
+zpty -n -w shell $'\x18'
+zpty -r shell text "*<vornjsondb*>*"
+print -r -- ${${text##*<}%%>*}
+zpty -d shell
+END
+same 'zsh: subcommands' "$(in_zsh 'vornjsondb ini')" 'vornjsondb init '
+same 'zsh: tables' "$(in_zsh 'vornjsondb list shop.db pri')" 'vornjsondb list shop.db price '
+same 'zsh: options' "$(in_zsh 'vornjsondb list shop.db price --no')" 'vornjsondb list shop.db price --no-headers '
+same 'zsh: choices' "$(in_zsh 'vornjsondb list shop.db price --format ts')" 'vornjsondb list shop.db price --format tsv '
+same 'zsh: shells' "$(in_zsh 'vornjsondb completion z')" 'vornjsondb completion zsh '
+
+# The table of exit codes: in the sources, in the manual and on the page.
+root=$(dirname "$0")/../..
+codes=$(sed -n 's/^    kExit[A-Za-z]* = \([0-9]*\),*$/\1/p' "$root/cli/Command.h")
+documented=$(sed -n 's/^| \([0-9]*\) | \(.*\) |$/\1 \2/p' "$root/docs/command.md")
+same 'exit codes: page' "$(cut -d ' ' -f 1 <<<"$documented")" "$codes"
+same 'exit codes: manual' "$(sed -n '/^\.Sh EXIT/,/^\.El/p' script.man | sed 's/\\-/-/g' |
+    sed -n '/^\.It/{N;s/^\.It //;s/\n/ /;p}')" "$documented"
+
+same 'the manual is clean' \
     "$(mandoc -T lint -W style script.man 2>&1 | grep -v 'outdated mandoc.db')" ''
 
 names=$("$VORNJSONDB" --help | sed -n '/^Subcommands/,/^$/s/^  \([a-z]*\) .*/\1/p')
@@ -17,6 +71,7 @@ same 'number of subcommands' "$(($(wc -w <<<"$names") >= 17))" 1
 for name in $names; do
     "$VORNJSONDB" "$name" --help >help
     same "$name: examples first" "$(head -n 1 help)" Examples
+    same "$name: on the page" "$(($(grep -cE "vornjsondb $name\b" "$root/docs/command.md") > 0))" 1
     same "$name: in the manual" "$(grep -c "^\.Ss $name\$" script.man)" 1
     options=$(sed -n '/^Options/,$s/^  \(-., \|    \)\(--[a-z-]*\).*/\2/p' help)
     for option in $options; do
@@ -24,6 +79,8 @@ for name in $names; do
         same "$name $option: bash" "$(grep -cE -- " $name\) words=.*$option\b" script.bash)" 1
         same "$name $option: fish" \
             "$(grep -cE -- "from $name' -l ${option#--}( |\$)" script.fish)" 1
+        same "$name $option: zsh" \
+            "$(sed -n "/^        $name) _arguments/,/;;/p" script.zsh | grep -cE -- "[',*]${option}[}['=]")" 1
         same "$name $option: manual" \
             "$(($(grep -cF -- "Fl \\-${option#--}" <(sed 's/\\-/-/g; s/Fl -/Fl \\-/g' script.man)) > 0))" 1
     done

@@ -13,7 +13,16 @@ expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -
     index shop.db product name
 expect 0 '[{"index":"product_name","unique":false,"members":"name"}]' '' -- \
     index shop.db product --json
+expect 0 'SELECT "product"."id" FROM "product" WHERE "product"."price" IS ?
+  SCAN product
+warning: all records are looked at, which an index spares on "price"; create one by vornjsondb index, where the table is or gets large' \
+    '' -- explain shop.db product price=5 --members id
 expect 0 '' 'no findings' -- lint shop.db
+echo '{"product": {"key": "id", "member": {"id": {"cpptype": "int"}, "size": {"cpptype": "int"}, "name": {"cpptype": "string", "unique": true}}}}' >grown.def
+"$VORNJSONDB" lint shop.db product --def grown.def --format tsv >found 2>&1
+same 'lint names subcommands' "$(cut -f 2,3,6 found | grep -v extra-column)" 'severity	code	remedy
+error	missing-column	vornjsondb sync adds it
+warning	missing-unique	vornjsondb sync adds a unique index'
 expect 0 '' 'nothing to do' -- sync shop.db product
 expect 0 'check         result
 ------------  ------
@@ -44,4 +53,8 @@ expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load thi
 sed 's/,1\.0\]/,2.0]/' dump >changed
 expect 3 '' 'error: changed:8: count or checksum differ from the rows; dump the table again' -- \
     load fourth.db changed
+sed '1s/"columns":\[/&{},/' dump >named
+expect 3 '' 'error: named:1: a column has no name; dump the table again' -- load fifth.db named
+sed '1s/{/{"sequence":"x",/' dump >counted
+expect 3 '' 'error: counted:1: the counter is no number; dump the table again' -- load fifth.db counted
 finish

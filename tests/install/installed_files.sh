@@ -26,7 +26,23 @@ include/VornJsonDbTable.h
 lib/libvornjsondb-table.a
 lib/pkgconfig/vornjsondb-table.pc"
 fi
+if [[ -n $COMMAND ]]; then
+    expected+="
+bin/vornjsondb
+share/bash-completion/completions/vornjsondb
+share/fish/vendor_completions.d/vornjsondb.fish
+share/man/man1/vornjsondb.1
+share/zsh/site-functions/_vornjsondb"
+fi
 diff -u <(LC_ALL=C sort <<<"$expected") "$WORK_DIR/installed.txt"
+
+# The pages are those of this command, and it runs from where it lies now.
+if [[ -n $COMMAND ]]; then
+    for page in man:man/man1/vornjsondb.1 bash:bash-completion/completions/vornjsondb \
+        zsh:zsh/site-functions/_vornjsondb fish:fish/vendor_completions.d/vornjsondb.fish; do
+        diff -u <("$STAGE/bin/vornjsondb" completion "${page%%:*}") "$STAGE/share/${page#*:}"
+    done
+fi
 
 # A tree that names the folder it was built in breaks when it is moved. Debug information and
 # instrumented code may name sources.

@@ -83,4 +83,5 @@ check() {
 }
 
 check README.md
+check docs/sharp-edges.md
 check docs/table.md

@@ -6,260 +6,174 @@
 #include <unistd.h>
 
 #include <chrono>
-#include <map>
+#include <memory>
 #include <thread>
+
+#include "../support/Store.h"
 
 namespace campaign {
 
 namespace {
 
-constexpr char kTable[] = "load";
+using Clock = std::chrono::steady_clock;
+
 constexpr int kProcesses = 8;
 
-}  // namespace
-
-std::unique_ptr<VornJsonDbApi> LoadHandle(const Database& db) {
-    return NewHandle(
-        db.Get(), kTable, Definition(kTable, "id:int,name:string,owner:int,text:string"),
-        "CREATE TABLE IF NOT EXISTS load (id INTEGER PRIMARY KEY, name TEXT UNIQUE, owner INTEGER, "
-        "text TEXT)");
+Json::Value AsJson(const State& state) {
+    Json::Value jState;
+    jState["counted"] = state.nCounted;
+    jState["columns"] = state.nSideColumns;
+    jState["indexes"] = state.nSideIndexes;
+    for (const auto& row : state.rows) {
+        jState["rows"][std::to_string(row.first)] = row.second;
+    }
+    return jState;
 }
-
-Json::Value LoadRecord(int nKey, int nOwner, const std::string& strText) {
-    Json::Value jRecord;
-    jRecord["id"] = nKey;
-    jRecord["name"] = "name-" + std::to_string(nKey);
-    jRecord["owner"] = nOwner;
-    jRecord["text"] = strText;
-    return jRecord;
-}
-
-std::string NewLoadFile(const char* szMode) {
-    const std::string strPath = TempFolder() + "/locks.db";
-    RemoveDatabase(strPath);
-    const Database db(strPath);
-    db.Run(std::string("PRAGMA journal_mode=") + szMode);
-    LoadHandle(db);
-    db.Run("INSERT INTO load VALUES (0, 'name-0', -1, '0')");
-    return strPath;
-}
-
-namespace {
-
-using Clock = std::chrono::steady_clock;
 
 class Worker {
   public:
     Worker(const Database& db, int nOwner, std::uint64_t nSeed)
-        : m_db(db), m_pHandle(LoadHandle(db)), m_nOwner(nOwner), m_random(nSeed) {}
+        : m_db(db),
+          m_pStore(NewStore(db)),
+          m_nOwner(nOwner),
+          m_stream(nSeed, Owner{nOwner, kProcesses, 40}, State()) {}
 
     void Step() {
-        const int nKey = 1 + m_nOwner + kProcesses * m_random.Below(40);
-        const bool blThere = m_rows.count(nKey) > 0;
-        switch (m_random.Below(7)) {
-            case 0:
-                CountUp();
-                break;
-            case 1:
-                List();
-                break;
-            case 2:
-                Transaction(nKey);
-                break;
-            case 3:
-                blThere ? Delete(nKey) : Create(nKey);
-                break;
-            default:
-                blThere ? Update(nKey) : Create(nKey);
+        if (m_stream.Dice().OneIn(7)) {
+            List();
+            return;
+        }
+        const campaign::Step step = m_stream.Choose();
+        if (Do(step.pRow->szName, [&] { return m_pStore->Run(step) >= 0; }) || IsDone(step)) {
+            m_stream.Apply(step);
+        } else if (step.pRow->eAct == Act::kCommit) {
+            RollBack();
         }
     }
 
-    Json::Value Result() const {
-        Json::Value jResult;
-        jResult["counted"] = m_nCounted;
-        jResult["rows"] = Json::Value(Json::objectValue);
-        for (const auto& row : m_rows) {
-            jResult["rows"][std::to_string(row.first)] = row.second;
+    void End() {
+        if (m_stream.IsOpen()) {
+            RollBack();
         }
-        return jResult;
     }
+
+    Json::Value Known() const { return AsJson(m_stream.Now()); }
 
   private:
-    // One call; returns whether it succeeded. A failure is right after all attempts only.
-    bool Do(const char* szName, const std::function<int()>& fn) {
+    // One call; returns whether it succeeded.
+    bool Do(const char* szName, const std::function<bool()>& fn) {
         TakePauses();
         const Clock::time_point start = Clock::now();
-        m_nLast = fn();
+        const bool blDone = fn();
         const auto nWait =
             std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - start).count();
         m_nPauses = TakePauses().nCount;
         AddTo(Figure("operations under load"), 1);
-        AddTo(Figure("retries"), static_cast<std::uint64_t>(m_nPauses));
-        RaiseTo(Figure("most retries of one operation"), static_cast<std::uint64_t>(m_nPauses));
+        AddTo(Figure("pauses"), static_cast<std::uint64_t>(m_nPauses));
+        RaiseTo(Figure("most pauses of one operation"), static_cast<std::uint64_t>(m_nPauses));
         RaiseTo(Figure("longest operation, microseconds"), static_cast<std::uint64_t>(nWait));
-        if (m_nLast < 0 && m_nPauses >= kAttempts) {
-            AddTo(Figure("given up after 500 attempts"), 1);
-        } else if (m_nLast < 0 && !IsRepeated(szName)) {
-            Violation(std::string(szName) + " failed after " + std::to_string(m_nPauses) +
-                      " pauses");
+        if (!blDone && m_pStore->IsAnswerLost(m_nPauses)) {
+            AddTo(Figure("done, answer lost to a lock"), 1);
+        } else if (!blDone && Expect(m_pStore->IsGivenUp(m_nPauses, m_stream.IsOpen()), [&] {
+                       return std::string(szName) + " failed after " + std::to_string(m_nPauses) +
+                              " pauses: " + m_pStore->Failure();
+                   })) {
+            AddTo(Figure("given up for a lock"), 1);
         }
-        return m_nLast >= 0;
+        return blDone;
     }
 
-    bool IsRepeated(const std::string& strName) const {
-        return strName == "recCreate" && m_nPauses > 0;
-    }
-
-    std::string Text() { return std::to_string(m_random.Next()); }
-
-    std::string Stored(int nKey) const {
-        return m_db.Rows("SELECT text FROM load WHERE id=" + std::to_string(nKey));
-    }
-
-    void Create(int nKey) {
-        Json::Value jRecord = LoadRecord(nKey, m_nOwner, Text());
-        const std::string strText = jRecord["text"].asString();
-        m_pHandle->setErrMsg("");
-        if (Do("recCreate", [&] { return m_pHandle->recCreate(jRecord, jRecord); })) {
-            m_rows[nKey] = strText;
-            return;
+    // Whether a step that failed was done all the same.
+    bool IsDone(const campaign::Step& step) const {
+        const bool blLost = m_pStore->IsAnswerLost(m_nPauses);
+        const bool blOfRow =
+            step.pRow->eWhen == When::kPresent || step.pRow->eWhen == When::kAbsent;
+        if (!blLost && !(m_pStore->MayBeDone() && blOfRow)) {
+            return false;
         }
-        // Its text has two statements: when the second met the lock, the first was run again, and
-        // found its own row there.
-        if (m_nPauses < kAttempts) {
-            Expect(m_pHandle->getErrMsg() == "DUPLICATE_PRIMARY_KEY",
-                   [] { return std::string("recCreate failed without a duplicate"); });
-            AddTo(Figure("created, answer lost to a lock"), 1);
-        }
-        Resync(nKey, strText);
-    }
-
-    // A call that gave up may have stored its row all the same.
-    void Resync(int nKey, const std::string& strText) {
+        const std::string strQuery =
+            "SELECT text FROM shared WHERE id=" + std::to_string(step.nKey);
         std::string strNow = "error";
         for (int i = 0; i < 10000 && strNow.compare(0, 5, "error") == 0; ++i) {
             // The others hold the file most of the time, and their writes may take long.
             std::this_thread::sleep_for(std::chrono::milliseconds(1));
-            strNow = Stored(nKey);
+            strNow = m_db.Rows(strQuery);
         }
         Expect(strNow.compare(0, 5, "error") != 0,
                [&] { return "the row could not be looked at: " + strNow; });
-        if (strNow == "'" + strText + "'\n") {
-            m_rows[nKey] = strText;
-        }
-    }
-
-    void Update(int nKey) {
-        Json::Value jFilter;
-        jFilter["id"] = nKey;
-        Json::Value jNew;
-        jNew["text"] = Text();
-        if (m_random.OneIn(3)) {
-            Json::Value jRecord = LoadRecord(nKey, m_nOwner, jNew["text"].asString());
-            const std::string strText = jNew["text"].asString();
-            if (Do("recSave", [&] { return m_pHandle->recSave(jRecord, false); })) {
-                m_rows[nKey] = strText;
-            } else {
-                Resync(nKey, strText);
-            }
-        } else if (Do("recUpdateByFilter",
-                      [&] { return m_pHandle->recUpdateByFilter(jFilter, jNew); })) {
-            m_rows[nKey] = jNew["text"].asString();
-        }
-    }
-
-    void Delete(int nKey) {
-        std::string strName = "name-" + std::to_string(nKey);
-        if (Do("recDeleteByName", [&] { return m_pHandle->recDeleteByName(strName, "name"); })) {
-            Expect(m_nLast == 1, [&] { return "deleted " + std::to_string(m_nLast) + " rows"; });
-            m_rows.erase(nKey);
-        }
-    }
-
-    void CountUp() {
-        const std::string strSql = "UPDATE load SET text = text + 1 WHERE id = 0";
-        if (Do("runSqlEx", [&] { return m_pHandle->runSqlEx(strSql); })) {
-            Expect(m_nLast == 1, [] { return std::string("the counter is not there"); });
-            ++m_nCounted;
-        }
+        const bool blThere = strNow == "'" + step.strText + "'\n";
+        Expect(blThere || !blLost, [] { return std::string("a lost answer, and a lost row"); });
+        return blThere;
     }
 
     void List() {
-        Json::Value jQuery;
-        jQuery["owner"] = m_nOwner;
-        Json::Value jRows(Json::arrayValue);
-        if (!Do("recList", [&] {
-                jRows.clear();
-                return m_pHandle->recList(jQuery, jRows);
-            })) {
-            return;
-        }
         std::map<int, std::string> rows;
-        for (const Json::Value& jRow : jRows) {
-            rows[jRow["id"].asInt()] = jRow["text"].asString();
+        if (Do("list", [&] { return m_pStore->List(m_nOwner, rows); })) {
+            Expect(rows == m_stream.Now().rows,
+                   [] { return std::string("listed other rows than were stored"); });
         }
-        Expect(rows == m_rows, [] { return std::string("listed other rows than were stored"); });
     }
 
-    void Transaction(int nKey) {
-        if (!Do("BEGIN", [&] { return m_pHandle->runSqlEx("BEGIN IMMEDIATE"); })) {
-            return;
-        }
-        const std::map<int, std::string> before = m_rows;
-        m_rows.count(nKey) > 0 ? Update(nKey) : Create(nKey);
-        m_rows.count(nKey) > 0 ? Update(nKey) : Create(nKey);
-        const bool blCommit = !m_random.OneIn(4);
-        if (!blCommit || !Do("COMMIT", [&] { return m_pHandle->runSqlEx("COMMIT"); })) {
-            m_pHandle->runSqlEx("ROLLBACK");
-            m_rows = before;
+    void RollBack() {
+        for (const ActRow& row : kActs) {
+            if (row.eAct == Act::kRollback) {
+                const campaign::Step step = m_stream.Make(row, 0);
+                Expect(m_pStore->Run(step) >= 0, [&] { return m_pStore->Failure(); });
+                m_stream.Apply(step);
+            }
         }
     }
 
     const Database& m_db;
-    std::unique_ptr<VornJsonDbApi> m_pHandle;
+    std::unique_ptr<Store> m_pStore;
     int m_nOwner;
-    Random m_random;
-    std::map<int, std::string> m_rows;
-    int m_nCounted = 0;
-    int m_nLast = 0;
+    Stream m_stream;
     int m_nPauses = 0;
 };
+
+std::string ResultPath(const std::string& strPath, int nOwner) {
+    return strPath + "." + std::to_string(nOwner);
+}
 
 void RunWorker(const std::string& strPath, int nOwner, std::uint64_t nSeed, int nMilliseconds) {
     const Clock::time_point end = Clock::now() + std::chrono::milliseconds(nMilliseconds);
     const Database db(strPath);
+    db.Run(kFast);
     Worker worker(db, nOwner, nSeed);
     while (Clock::now() < end) {
         worker.Step();
     }
-    WriteFile(strPath + "." + std::to_string(nOwner), ToText(worker.Result()));
+    worker.End();
+    WriteFile(ResultPath(strPath, nOwner), ToText(worker.Known()));
 }
 
 void CheckFile(const std::string& strPath) {
-    std::map<int, std::string> rows;
-    int nCounted = 0;
-    for (int i = 0; i < kProcesses; ++i) {
-        const Json::Value jResult = FromText(ReadFile(strPath + "." + std::to_string(i)));
-        nCounted += jResult["counted"].asInt();
-        for (const std::string& strKey : jResult["rows"].getMemberNames()) {
-            rows[std::stoi(strKey)] = jResult["rows"][strKey].asString();
-        }
-    }
-    std::string strWanted = "0|'" + std::to_string(nCounted) + "'\n";
-    for (const auto& row : rows) {
-        strWanted += std::to_string(row.first) + "|'" + row.second + "'\n";
-    }
     const Database db(strPath);
-    Expect(db.Rows("SELECT id, text FROM load ORDER BY id") == strWanted,
-           [] { return std::string("under load: the file holds other rows than were stored"); });
+    int nCounted = 0;
+    int nInFile = 0;
+    for (int i = 0; i < kProcesses; ++i) {
+        const Json::Value jKnown = FromText(ReadFile(ResultPath(strPath, i)));
+        State found = ReadState(db, i);
+        nInFile = found.nCounted;
+        nCounted += jKnown["counted"].asInt();
+        found.nCounted = jKnown["counted"].asInt();
+        Expect(AsJson(found) == jKnown, [&] {
+            return "under load: process " + std::to_string(i) +
+                   " does not find what it stored, but " + found.Text();
+        });
+    }
+    Expect(nInFile == nCounted, [&] {
+        return "counted to " + std::to_string(nInFile) + " instead of " + std::to_string(nCounted);
+    });
     Expect(db.Rows("PRAGMA integrity_check") == "'ok'\n",
            [] { return std::string("the database is damaged"); });
 }
 
 }  // namespace
 
-void RunLoad(const char* szMode, std::uint64_t nSeed, int nMilliseconds) {
-    const std::string strPath = NewLoadFile(szMode);
+void RunLoad(const std::string& strPath, const char* szMode, std::uint64_t nSeed,
+             int nMilliseconds) {
+    NewFile(strPath, szMode);
     g_pfnOnPause = nullptr;
     pid_t aChildren[kProcesses] = {};
     for (int i = 0; i < kProcesses; ++i) {

@@ -1,25 +1,20 @@
-// One table in one file, for the handles of several processes.
+// Many processes on one file.
 #ifndef VORNJSONDB_TESTS_CAMPAIGNS_LOCKS_LOAD_H
 #define VORNJSONDB_TESTS_CAMPAIGNS_LOCKS_LOAD_H
 
-#include <memory>
 #include <string>
 
 #include "../support/Campaign.h"
 
 namespace campaign {
 
-constexpr int kAttempts = 500;
+// Locks do not depend on it. To say so needs a moment without one.
+constexpr char kFast[] = "PRAGMA busy_timeout=60000; PRAGMA synchronous=OFF; PRAGMA busy_timeout=0";
 
-std::unique_ptr<VornJsonDbApi> LoadHandle(const Database& db);
-Json::Value LoadRecord(int nKey, int nOwner, const std::string& strText);
-
-// A fresh file in that journal mode, with the row that counts.
-std::string NewLoadFile(const char* szMode);
-
-// Eight processes with mixed operations on one file for that long; then the file must hold what
-// they were told that it holds.
-void RunLoad(const char* szMode, std::uint64_t nSeed, int nMilliseconds);
+// Eight processes with mixed operations on a fresh file for that long; then the file must hold
+// what they were told that it holds.
+void RunLoad(const std::string& strPath, const char* szMode, std::uint64_t nSeed,
+             int nMilliseconds);
 
 }  // namespace campaign
 

@@ -110,8 +110,9 @@ void WriteFile(const std::string& strPath, const std::string& strBytes);
 // System log lines are rendered, so that bad arguments show, and dropped.
 std::uint64_t LogLines();
 
-// Called for each usleep(10000), the library's pause between two attempts. True: the pause is
-// slept, false: it is not. Without a function it is slept.
+// Called for each pause between two attempts: usleep(10000) of the old handle, nanosleep of the
+// second one. True: the pause is slept, false: it is not, but its time has passed all the same.
+// Without a function it is slept.
 extern bool (*g_pfnOnPause)(int nPause);
 
 // SQLite's own sleeps, while a write-ahead log is busy, are left out.

@@ -4,6 +4,9 @@
 // The fortified headers define some of the names inline: <syslog.h> stays out of this file.
 #undef _FORTIFY_SOURCE
 
+#include <sys/syscall.h>
+#include <unistd.h>
+
 #include <cerrno>
 #include <cstdarg>
 #include <cstdio>
@@ -31,10 +34,29 @@ __attribute__((format(printf, 1, 0))) void Render(const char* szFormat, va_list 
     errno = nErrno;
 }
 
-int RealSleep(unsigned nMicroseconds) {
-    const timespec wait = {static_cast<time_t>(nMicroseconds / 1000000),
-                           static_cast<long>(nMicroseconds % 1000000) * 1000};
-    return nanosleep(&wait, nullptr);
+constexpr long long kSecond = 1000000000;
+long long g_nPaused = 0;  // nanoseconds, of all pauses while there was a function for them
+
+timespec TimeOf(long long nNanoseconds) {
+    return {static_cast<time_t>(nNanoseconds / kSecond), static_cast<long>(nNanoseconds % kSecond)};
+}
+
+// Returns what is left when a signal ends it.
+long long RealSleep(long long nNanoseconds) {
+    const timespec wait = TimeOf(nNanoseconds);
+    timespec left = {0, 0};
+    const int nResult = clock_nanosleep(CLOCK_MONOTONIC, 0, &wait, &left);
+    return nResult == 0 ? 0 : static_cast<long long>(left.tv_sec) * kSecond + left.tv_nsec;
+}
+
+// A pause of the library; returns what is left of it.
+long long Pause(long long nNanoseconds) {
+    ++g_pauses.nCount;
+    const bool blSleep = g_pfnOnPause == nullptr || g_pfnOnPause(g_pauses.nCount);
+    const long long nLeft = blSleep ? RealSleep(nNanoseconds) : 0;
+    g_pauses.nInterrupted += nLeft == 0 ? 0 : 1;
+    g_nPaused += nNanoseconds - nLeft;
+    return nLeft;
 }
 
 }  // namespace
@@ -49,18 +71,34 @@ Pauses TakePauses() {
     return taken;
 }
 
-// SQLite sleeps by usleep, too, but never for this long; those sleeps are not the library's.
+// The old handle pauses by usleep. SQLite sleeps by it, too, but never for this long; those sleeps
+// are not the library's.
 int Sleep(unsigned nMicroseconds) {
+    const long long nNanoseconds = nMicroseconds * 1000LL;
     if (nMicroseconds != kLibraryPauseUs) {
-        return g_blSkipSqliteSleeps ? 0 : RealSleep(nMicroseconds);
+        return g_blSkipSqliteSleeps || RealSleep(nNanoseconds) == 0 ? 0 : -1;
     }
-    ++g_pauses.nCount;
-    if (g_pfnOnPause != nullptr && !g_pfnOnPause(g_pauses.nCount)) {
-        return 0;
+    return Pause(nNanoseconds) == 0 ? 0 : -1;
+}
+
+// The second handle pauses by nanosleep.
+int Sleep(const timespec& wanted, timespec* pLeft) {
+    const long long nLeft = Pause(static_cast<long long>(wanted.tv_sec) * kSecond + wanted.tv_nsec);
+    if (pLeft != nullptr) {
+        *pLeft = TimeOf(nLeft);
     }
-    const int nResult = RealSleep(nMicroseconds);
-    g_pauses.nInterrupted += nResult == 0 ? 0 : 1;
-    return nResult;
+    errno = nLeft == 0 ? errno : EINTR;
+    return nLeft == 0 ? 0 : -1;
+}
+
+// While pauses are told to a function, only they take time: the waits of the second handle, which
+// end by the clock, then have a known number of pauses.
+int Clock(clockid_t nClock, timespec* pTime) {
+    if (g_pfnOnPause == nullptr || nClock != CLOCK_MONOTONIC) {
+        return static_cast<int>(syscall(SYS_clock_gettime, nClock, pTime));
+    }
+    *pTime = TimeOf(g_nPaused);
+    return 0;
 }
 
 }  // namespace campaign
@@ -69,6 +107,14 @@ int Sleep(unsigned nMicroseconds) {
 
 VORN_CAMPAIGN_EXIT int usleep(unsigned nMicroseconds) {
     return campaign::Sleep(nMicroseconds);
+}
+
+VORN_CAMPAIGN_EXIT int nanosleep(const timespec* pWanted, timespec* pLeft) {
+    return campaign::Sleep(*pWanted, pLeft);
+}
+
+VORN_CAMPAIGN_EXIT int clock_gettime(clockid_t nClock, timespec* pTime) noexcept {
+    return campaign::Clock(nClock, pTime);
 }
 
 VORN_CAMPAIGN_EXIT __attribute__((format(printf, 2, 3))) void syslog(int, const char* szFormat,

@@ -196,6 +196,9 @@ int Conditions(Sub& s, Args& a) {
     return s.pHandle->SqlExpandMemberList(a.jFirst, a.strSecond, VORN_SQL_WHERE_TYPE_AND);
 }
 
+constexpr Reach kNoFiles = Reach::kNoFiles;
+constexpr Reach kFiles = Reach::kFiles;
+constexpr Reach kOpens = Reach::kOpens;
 constexpr After kSame = After::kUnchanged;
 constexpr After kPart = After::kPart;
 
@@ -203,52 +206,52 @@ constexpr After kPart = After::kPart;
 
 // clang-format off
 const std::vector<Operation> kOperations = {
-    {"constructor",               true,  false, false, kSame, HandleParts,   Construct},
-    {"tableCreate",               true,  false, false, kSame, NoArguments,   [](Sub& s, Args&) { return s.pHandle->tableCreate(); }},
-    {"setErrMsg",                 false, false, false, kSame, LongText,      SetMessage},
-    {"getErrMsg",                 false, false, false, kSame, NoArguments,   GetMessage},
-    {"runSqlEx",                  true,  false, false, kSame, RawText,       [](Sub& s, Args& a) { return s.pHandle->runSqlEx(a.strFirst); }},
-    {"runSqlEx, refused",         true,  false, false, kSame, RefusedText,   [](Sub& s, Args& a) { return s.pHandle->runSqlEx(a.strFirst); }},
-    {"checkJsonType",             false, false, false, kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->checkJsonType(a.jFirst); }},
-    {"checkJsonType, refused",    false, false, false, kSame, WrongKind,     [](Sub& s, Args& a) { return s.pHandle->checkJsonType(a.jFirst); }},
-    {"fillDefaultValue",          false, false, false, kPart, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->fillDefaultValue(a.jFirst, false); }},
-    {"fillDefaultValue, strict",  false, false, false, kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->fillDefaultValue(a.jFirst, true); }},
-    {"SqlExpandMemberName",       false, false, false, kPart, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberName(a.strSecond, &a.jFirst); }},
-    {"SqlExpandMemberSymbol",     false, false, true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberSymbol(a.strSecond, a.jFirst); }},
-    {"SqlExpandMemberSymbol, %%", false, false, true,  kSame, PercentRecord, [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberSymbol(a.strSecond, a.jFirst); }},
-    {"SqlMakeByMatchField",       false, false, false, kSame, Query,         Match},
-    {"SqlMakeByListField",        false, false, false, kSame, Query,         List},
-    {"SqlExpandMemberList",       false, false, false, kPart, Query,         Conditions},
-    {"SqlFilterConditionFromJson", false, false, false, kPart, Query,        [](Sub& s, Args& a) { return s.pHandle->SqlFilterConditionFromJson(a.jFirst, a.strSecond); }},
-    {"recSave, create",           true,  false, true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, true); }},
-    {"recSave, replace",          true,  false, true,  kSame, StoredRecord,  [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, false); }},
-    {"recSave, first use",        true,  true,  true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, true); }},
-    {"recSave, column unknown",   true,  true,  true,  kSame, StoredRecord,  ListUnknownColumn},
-    {"recCreate",                 true,  false, true,  kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
-    {"recCreate, first use",      true,  true,  true,  kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
-    {"recCreate, same key",       true,  false, true,  kSame, SameKey,       [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
-    {"recCreate, wrong kind",     false, false, true,  kSame, WrongKind,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
-    {"recList",                   true,  false, false, kPart, AllRows,       [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
-    {"recList, first use",        true,  true,  false, kPart, AllRows,       [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
-    {"recList, query",            true,  false, false, kPart, Query,         [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
-    {"recList, refused",          true,  false, false, kPart, RefusedQuery,  [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
-    {"recGetOne",                 true,  false, false, kPart, OneRow,        [](Sub& s, Args& a) { return s.pHandle->recGetOne(a.jFirst, a.jSecond); }},
-    {"recUpdateByWhere",          true,  false, false, kSame, Update,        [](Sub& s, Args& a) { return s.pHandle->recUpdateByWhere(a.jSecond, a.strFirst); }},
-    {"recUpdateByFilter",         true,  false, false, kSame, Update,        [](Sub& s, Args& a) { return s.pHandle->recUpdateByFilter(a.jFirst, a.jSecond); }},
-    {"recUpdateByFilter, same key", true, false, false, kSame, UpdateToDuplicate, [](Sub& s, Args& a) { return s.pHandle->recUpdateByFilter(a.jFirst, a.jSecond); }},
-    {"recDelete",                 true,  false, false, kSame, Query,         [](Sub& s, Args& a) { return s.pHandle->recDelete(a.jFirst); }},
-    {"recDeleteAll",              true,  false, false, kSame, NoArguments,   [](Sub& s, Args&) { return s.pHandle->recDeleteAll(); }},
-    {"recDeleteByArray",          true,  false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByArray(a.vecValues, Key(s)); }},
-    {"recDeleteByArray, refused", false, false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByArray(a.vecValues, "a name that is no member of the table"); }},
-    {"recDeleteByName",           true,  false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByName(a.strFirst, Key(s)); }},
-    {"recDeleteByName, first use", true, true,  false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByName(a.strFirst, Key(s)); }},
-    {"VectorParamToJson",         false, false, false, kPart, Values,        [](Sub& s, Args& a) { return s.pHandle->VectorParamToJson(a.vecValues, Key(s), a.jSecond); }},
-    {"recType",                   false, false, false, kSame, NoArguments,   LookUp},
-    {"recType, first use",        false, true,  false, kSame, NoArguments,   LookUp},
-    {"recType, faulty",           false, true,  false, kSame, FaultyDefinition, LookUpFaulty},
-    {"jsonCopyMember",            false, false, false, kPart, TwoObjects,    [](Sub&, Args& a) { return VORN_JSON_DB::jsonCopyMember(a.jFirst, a.jSecond, true); }},
-    {"time text",                 false, false, false, kPart, NoArguments,   TimeText},
-    {"time number",               false, false, false, kSame, NoArguments,   TimeNumber},
+    {"constructor",               kOpens,   false, false, kSame, HandleParts,   Construct},
+    {"tableCreate",               kFiles,   false, false, kSame, NoArguments,   [](Sub& s, Args&) { return s.pHandle->tableCreate(); }},
+    {"setErrMsg",                 kNoFiles, false, false, kSame, LongText,      SetMessage},
+    {"getErrMsg",                 kNoFiles, false, false, kSame, NoArguments,   GetMessage},
+    {"runSqlEx",                  kFiles,   false, false, kSame, RawText,       [](Sub& s, Args& a) { return s.pHandle->runSqlEx(a.strFirst); }},
+    {"runSqlEx, refused",         kFiles,   false, false, kSame, RefusedText,   [](Sub& s, Args& a) { return s.pHandle->runSqlEx(a.strFirst); }},
+    {"checkJsonType",             kNoFiles, false, false, kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->checkJsonType(a.jFirst); }},
+    {"checkJsonType, refused",    kNoFiles, false, false, kSame, WrongKind,     [](Sub& s, Args& a) { return s.pHandle->checkJsonType(a.jFirst); }},
+    {"fillDefaultValue",          kNoFiles, false, false, kPart, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->fillDefaultValue(a.jFirst, false); }},
+    {"fillDefaultValue, strict",  kNoFiles, false, false, kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->fillDefaultValue(a.jFirst, true); }},
+    {"SqlExpandMemberName",       kNoFiles, false, false, kPart, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberName(a.strSecond, &a.jFirst); }},
+    {"SqlExpandMemberSymbol",     kNoFiles, false, true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberSymbol(a.strSecond, a.jFirst); }},
+    {"SqlExpandMemberSymbol, %%", kNoFiles, false, true,  kSame, PercentRecord, [](Sub& s, Args& a) { return s.pHandle->SqlExpandMemberSymbol(a.strSecond, a.jFirst); }},
+    {"SqlMakeByMatchField",       kNoFiles, false, false, kSame, Query,         Match},
+    {"SqlMakeByListField",        kNoFiles, false, false, kSame, Query,         List},
+    {"SqlExpandMemberList",       kNoFiles, false, false, kPart, Query,         Conditions},
+    {"SqlFilterConditionFromJson", kNoFiles, false, false, kPart, Query,        [](Sub& s, Args& a) { return s.pHandle->SqlFilterConditionFromJson(a.jFirst, a.strSecond); }},
+    {"recSave, create",           kFiles,   false, true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, true); }},
+    {"recSave, replace",          kFiles,   false, true,  kSame, StoredRecord,  [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, false); }},
+    {"recSave, first use",        kFiles,   true,  true,  kSame, WholeRecord,   [](Sub& s, Args& a) { return s.pHandle->recSave(a.jFirst, true); }},
+    {"recSave, column unknown",   kFiles,   true,  true,  kSame, StoredRecord,  ListUnknownColumn},
+    {"recCreate",                 kFiles,   false, true,  kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
+    {"recCreate, first use",      kFiles,   true,  true,  kSame, NewRecord,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
+    {"recCreate, same key",       kFiles,   false, true,  kSame, SameKey,       [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
+    {"recCreate, wrong kind",     kNoFiles, false, true,  kSame, WrongKind,     [](Sub& s, Args& a) { return s.pHandle->recCreate(a.jFirst, a.jSecond); }},
+    {"recList",                   kFiles,   false, false, kPart, AllRows,       [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
+    {"recList, first use",        kFiles,   true,  false, kPart, AllRows,       [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
+    {"recList, query",            kFiles,   false, false, kPart, Query,         [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
+    {"recList, refused",          kFiles,   false, false, kPart, RefusedQuery,  [](Sub& s, Args& a) { return s.pHandle->recList(a.jFirst, a.jSecond); }},
+    {"recGetOne",                 kFiles,   false, false, kPart, OneRow,        [](Sub& s, Args& a) { return s.pHandle->recGetOne(a.jFirst, a.jSecond); }},
+    {"recUpdateByWhere",          kFiles,   false, false, kSame, Update,        [](Sub& s, Args& a) { return s.pHandle->recUpdateByWhere(a.jSecond, a.strFirst); }},
+    {"recUpdateByFilter",         kFiles,   false, false, kSame, Update,        [](Sub& s, Args& a) { return s.pHandle->recUpdateByFilter(a.jFirst, a.jSecond); }},
+    {"recUpdateByFilter, same key", kFiles,   false, false, kSame, UpdateToDuplicate, [](Sub& s, Args& a) { return s.pHandle->recUpdateByFilter(a.jFirst, a.jSecond); }},
+    {"recDelete",                 kFiles,   false, false, kSame, Query,         [](Sub& s, Args& a) { return s.pHandle->recDelete(a.jFirst); }},
+    {"recDeleteAll",              kFiles,   false, false, kSame, NoArguments,   [](Sub& s, Args&) { return s.pHandle->recDeleteAll(); }},
+    {"recDeleteByArray",          kFiles,   false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByArray(a.vecValues, Key(s)); }},
+    {"recDeleteByArray, refused", kNoFiles, false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByArray(a.vecValues, "a name that is no member of the table"); }},
+    {"recDeleteByName",           kFiles,   false, false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByName(a.strFirst, Key(s)); }},
+    {"recDeleteByName, first use", kFiles,   true,  false, kSame, Values,        [](Sub& s, Args& a) { return s.pHandle->recDeleteByName(a.strFirst, Key(s)); }},
+    {"VectorParamToJson",         kNoFiles, false, false, kPart, Values,        [](Sub& s, Args& a) { return s.pHandle->VectorParamToJson(a.vecValues, Key(s), a.jSecond); }},
+    {"recType",                   kNoFiles, false, false, kSame, NoArguments,   LookUp},
+    {"recType, first use",        kNoFiles, true,  false, kSame, NoArguments,   LookUp},
+    {"recType, faulty",           kNoFiles, true,  false, kSame, FaultyDefinition, LookUpFaulty},
+    {"jsonCopyMember",            kNoFiles, false, false, kPart, TwoObjects,    [](Sub&, Args& a) { return VORN_JSON_DB::jsonCopyMember(a.jFirst, a.jSecond, true); }},
+    {"time text",                 kNoFiles, false, false, kPart, NoArguments,   TimeText},
+    {"time number",               kNoFiles, false, false, kSame, NoArguments,   TimeNumber},
 };
 // clang-format on
 
@@ -279,6 +282,8 @@ bool CanList(Handle& handle) {
 std::string MessageSlot(const Handle& handle) {
     return const_cast<Handle&>(handle).getErrMsg();
 }
+
+const int kMostPauses = 500;
 
 bool IsMemoryFailure(int nResult) {
     return nResult == -1;

@@ -57,9 +57,15 @@ enum class After {
     kPart        // a failure may leave a part of what a success writes
 };
 
+enum class Reach {
+    kNoFiles,  // does without SQLite's files
+    kFiles,
+    kOpens  // is the connection's first use, for which the files are not open yet
+};
+
 struct Operation {
     const char* szName;
-    bool blOnDatabase;  // reaches SQLite's files
+    Reach eReach;
     bool blFirstUse;    // the table name is new to the type cache
     bool blLogicError;  // std::logic_error may leave it
     After eAfter;
@@ -79,6 +85,9 @@ bool CanList(Handle& handle);
 
 // The message that failures leave in the handle.
 std::string MessageSlot(const Handle& handle);
+
+// How often an operation pauses for a lock that nobody lets go of.
+extern const int kMostPauses;
 
 // What a call may return when memory ran out, or when the files failed.
 bool IsMemoryFailure(int nResult);

@@ -100,7 +100,7 @@ constexpr int Code(db::StatusCode eCode) {
 
 db::Options Patience() {
     db::Options options;
-    options.nWaitMs = 10;  // nobody holds a lock for long here
+    options.nWaitMs = 10;
     return options;
 }
 
@@ -231,45 +231,48 @@ int Several(Sub& s, Args& a) {
     return Result(status);
 }
 
+constexpr Reach kNoFiles = Reach::kNoFiles;
+constexpr Reach kFiles = Reach::kFiles;
+constexpr Reach kOpens = Reach::kOpens;
 constexpr After kSame = After::kUnchanged;
 
 }  // namespace
 
 // clang-format off
 const std::vector<Operation> kOperations = {
-    {"Open",                      true,  false, false, kSame, NoArguments,  Open},
-    {"Open, creates",             true,  false, false, kSame, NoArguments,  OpenNew},
-    {"Open, without definition",  true,  false, false, kSame, NoArguments,  OpenUndefined},
-    {"Create",                    true,  false, false, kSame, NewRecord,    Save<db::OnDuplicate::kStop>},
-    {"Create, first use",         true,  true,  false, kSame, NewRecord,    Save<db::OnDuplicate::kStop>},
-    {"Create, unread",            true,  false, false, kSame, NewRecord,    SaveUnread<db::OnDuplicate::kStop>},
-    {"Create, same key",          true,  false, false, kSame, StoredKey,    Save<db::OnDuplicate::kStop>},
-    {"Create, wrong kind",        false, false, false, kSame, WrongKind,    Save<db::OnDuplicate::kStop>},
-    {"Save, skip",                true,  false, false, kSame, StoredKey,    Save<db::OnDuplicate::kSkip>},
-    {"Save, replace",             true,  false, false, kSame, StoredKey,    Save<db::OnDuplicate::kReplace>},
-    {"Save, replace, new",        true,  false, false, kSame, NewRecord,    Save<db::OnDuplicate::kReplace>},
-    {"Save, upsert",              true,  false, false, kSame, StoredKey,    Save<db::OnDuplicate::kUpsert>},
-    {"Save, upsert, unread",      true,  false, false, kSame, StoredKey,    SaveUnread<db::OnDuplicate::kUpsert>},
-    {"Get",                       true,  false, false, kSame, Key,          [](Sub& s, Args& a) { return Result(s.pHandle->table.Get(a.jFirst, a.jSecond)); }},
-    {"First",                     true,  false, false, kSame, Page,         [](Sub& s, Args& a) { return Result(s.pHandle->table.First(a.jFirst, a.jSecond)); }},
-    {"List",                      true,  false, false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
-    {"List, first use",           true,  true,  false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
-    {"List, page",                true,  false, false, kSame, Page,         [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
-    {"List, refused",             false, false, false, kSame, FaultyQuery,  [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
-    {"ForEach",                   true,  false, false, kSame, OldQuery,     ForEach},
-    {"Count",                     true,  false, false, kSame, Condition,    Count},
-    {"Exists",                    true,  false, false, kSame, Condition,    Exists},
-    {"Update",                    true,  false, false, kSame, Condition,    Update},
-    {"Update, same value",        true,  false, false, kSame, ToDuplicate,  Update},
-    {"Remove",                    true,  false, false, kSame, Condition,    Remove},
-    {"RemoveAll",                 true,  false, false, kSame, NoArguments,  RemoveAll},
-    {"ToOldQuery",                false, false, false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.ToOldQuery(a.jFirst, db::OldCall::kChange, a.jSecond)); }},
-    {"Loader, stop",              true,  false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kStop); }},
-    {"Loader, skip",              true,  false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kSkip); }},
-    {"Loader, replace",           true,  false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kReplace); }},
-    {"Loader, upsert",            true,  false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kUpsert); }},
-    {"Loader, setters",           true,  false, false, kSame, NewRecord,    LoadBySetters},
-    {"Transaction",               true,  false, false, kSame, NewRecord,    Several},
+    {"Open",                      kOpens,   false, false, kSame, NoArguments,  Open},
+    {"Open, creates",             kOpens,   false, false, kSame, NoArguments,  OpenNew},
+    {"Open, without definition",  kOpens,   false, false, kSame, NoArguments,  OpenUndefined},
+    {"Create",                    kFiles,   false, false, kSame, NewRecord,    Save<db::OnDuplicate::kStop>},
+    {"Create, first use",         kFiles,   true,  false, kSame, NewRecord,    Save<db::OnDuplicate::kStop>},
+    {"Create, unread",            kFiles,   false, false, kSame, NewRecord,    SaveUnread<db::OnDuplicate::kStop>},
+    {"Create, same key",          kFiles,   false, false, kSame, StoredKey,    Save<db::OnDuplicate::kStop>},
+    {"Create, wrong kind",        kNoFiles, false, false, kSame, WrongKind,    Save<db::OnDuplicate::kStop>},
+    {"Save, skip",                kFiles,   false, false, kSame, StoredKey,    Save<db::OnDuplicate::kSkip>},
+    {"Save, replace",             kFiles,   false, false, kSame, StoredKey,    Save<db::OnDuplicate::kReplace>},
+    {"Save, replace, new",        kFiles,   false, false, kSame, NewRecord,    Save<db::OnDuplicate::kReplace>},
+    {"Save, upsert",              kFiles,   false, false, kSame, StoredKey,    Save<db::OnDuplicate::kUpsert>},
+    {"Save, upsert, unread",      kFiles,   false, false, kSame, StoredKey,    SaveUnread<db::OnDuplicate::kUpsert>},
+    {"Get",                       kFiles,   false, false, kSame, Key,          [](Sub& s, Args& a) { return Result(s.pHandle->table.Get(a.jFirst, a.jSecond)); }},
+    {"First",                     kFiles,   false, false, kSame, Page,         [](Sub& s, Args& a) { return Result(s.pHandle->table.First(a.jFirst, a.jSecond)); }},
+    {"List",                      kFiles,   false, false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
+    {"List, first use",           kFiles,   true,  false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
+    {"List, page",                kFiles,   false, false, kSame, Page,         [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
+    {"List, refused",             kNoFiles, false, false, kSame, FaultyQuery,  [](Sub& s, Args& a) { return Result(s.pHandle->table.List(a.jFirst, a.jSecond)); }},
+    {"ForEach",                   kFiles,   false, false, kSame, OldQuery,     ForEach},
+    {"Count",                     kFiles,   false, false, kSame, Condition,    Count},
+    {"Exists",                    kFiles,   false, false, kSame, Condition,    Exists},
+    {"Update",                    kFiles,   false, false, kSame, Condition,    Update},
+    {"Update, same value",        kFiles,   false, false, kSame, ToDuplicate,  Update},
+    {"Remove",                    kFiles,   false, false, kSame, Condition,    Remove},
+    {"RemoveAll",                 kFiles,   false, false, kSame, NoArguments,  RemoveAll},
+    {"ToOldQuery",                kNoFiles, false, false, kSame, OldQuery,     [](Sub& s, Args& a) { return Result(s.pHandle->table.ToOldQuery(a.jFirst, db::OldCall::kChange, a.jSecond)); }},
+    {"Loader, stop",              kFiles,   false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kStop); }},
+    {"Loader, skip",              kFiles,   false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kSkip); }},
+    {"Loader, replace",           kFiles,   false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kReplace); }},
+    {"Loader, upsert",            kFiles,   false, false, kSame, ManyRecords,  [](Sub& s, Args& a) { return Load(s, a, db::OnDuplicate::kUpsert); }},
+    {"Loader, setters",           kFiles,   false, false, kSame, NewRecord,    LoadBySetters},
+    {"Transaction",               kFiles,   false, false, kSame, NewRecord,    Several},
 };
 // clang-format on
 
@@ -296,6 +299,8 @@ bool CanList(Handle& handle) {
 std::string MessageSlot(const Handle&) {
     return "";
 }
+
+const int kMostPauses = 4;  // of 1, 2, 4 and 3 ms
 
 bool IsMemoryFailure(int nResult) {
     return nResult == Code(db::StatusCode::kNoMemory);

@@ -20,7 +20,7 @@ std::string Lines(const std::string& strText) {
     return ReadAll(strText, How);
 }
 
-struct Case {
+struct ReaderCase {
     std::string strText;
     std::string strRead;
 };
@@ -84,7 +84,7 @@ TEST(JsonReader, WhatIsWrongWithOneRecordHarmsNoOther) {
 TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
     const std::string strDeep(100000, '[');
     const std::string strUtf8 = "a text is no UTF-8; convert the input with iconv";
-    const Case aCases[] = {
+    const ReaderCase aCases[] = {
         {"[{\"a\":1},\n{\"a\" 2}]",
          "1@1: a=1\nfailed in line 2: a colon is missing after a member's name\n"},
         {"[{\"a\":1}\n{\"a\":2}]",
@@ -105,7 +105,9 @@ TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
          "failed in line 1: a number is greater than any double\n"},
         {"[{\"a\":NaN}]", "failed in line 1: no value can begin like this\n"},
         {"[{\"a\":'x'}]", "failed in line 1: no value can begin like this\n"},
-        {"[{\"a\":\"\\x\"}]", "failed in line 1: there is no such escape in a text\n"},
+        {"[{\"a\":\"\\x\"}]",
+         "failed in line 1: a text has an escape that JSON has not, or a "
+         "control character that must be escaped\n"},
         {"[{\"a\":\"\\u12G4\"}]", "failed in line 1: \\u needs four hexadecimal digits\n"},
         {"[{\"a\":\"\\ud800\"}]", "failed in line 1: \\u gives half of a surrogate pair\n"},
         {"[{\"a\":\"\xC0\xAF\"}]", "failed in line 1: " + strUtf8 + "\n"},
@@ -124,7 +126,7 @@ TEST(JsonReader, AfterBrokenJsonThereIsNoWayOn) {
         {"[{\"a\":" + strDeep,
          "failed in line 1: lists and objects are nested more than 1000 levels deep\n"},
     };
-    for (const Case& Each : aCases) {
+    for (const ReaderCase& Each : aCases) {
         EXPECT_EQ(Json(Each.strText), Each.strRead) << Each.strText.substr(0, 100);
     }
 }

@@ -54,7 +54,9 @@ TEST(SeparatedReader, RowsThatAreTooShortOrTooLongAreBad) {
 }
 
 TEST(SeparatedReader, HeadersThatNameNoColumnsAreRefused) {
-    EXPECT_EQ(Csv("a,,b\n1,2,3\n"), "failed in line 1: column 2 has no name\n");
+    EXPECT_EQ(Csv("a,,b\n1,2,3\n"),
+              "failed in line 1: column 2 has no name; --no-header is for input "
+              "without names\n");
     EXPECT_EQ(Csv("a,b,A\n1,2,3\n"),
               "failed in line 1: columns 1 and 3 have the same name \"A\"; letter case makes no "
               "difference\n");
@@ -135,7 +137,8 @@ TEST(GuessFormat, TheFirstBytesTell) {
         const char* szFormat;
     };
     const Case aCases[] = {
-        {"", "CSV"},
+        {"", "JSON Lines"},
+        {" \n ", "JSON Lines"},
         {"[{", "JSON"},
         {"\xEF\xBB\xBF \n [", "JSON"},
         {"{\"a\":1}", "JSON"},

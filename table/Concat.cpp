@@ -1,0 +1,25 @@
+#include "Concat.h"
+
+namespace vornjsondb {
+
+std::string Concat(std::initializer_list<std::string_view> listParts) {
+    std::string strAll;
+    Append(strAll, listParts);
+    return strAll;
+}
+
+void Append(std::string& strTo, std::initializer_list<std::string_view> listParts) {
+    size_t nSize = strTo.size();
+    for (const std::string_view strPart : listParts) {
+        nSize += strPart.size();
+    }
+    // Twice the room when it runs out: texts grow by many calls.
+    if (nSize > strTo.capacity()) {
+        strTo.reserve(strTo.empty() ? nSize : 2 * nSize);
+    }
+    for (const std::string_view strPart : listParts) {
+        strTo.append(strPart);
+    }
+}
+
+}  // namespace vornjsondb

@@ -1,0 +1,18 @@
+// Texts put together by one function, where std::string's operators would be compiled into each
+// place anew.
+
+#ifndef VORN_TABLE_CONCAT_H
+#define VORN_TABLE_CONCAT_H
+
+#include <initializer_list>
+#include <string>
+#include <string_view>
+
+namespace vornjsondb {
+
+std::string Concat(std::initializer_list<std::string_view> listParts);
+void Append(std::string& strTo, std::initializer_list<std::string_view> listParts);
+
+}  // namespace vornjsondb
+
+#endif  // VORN_TABLE_CONCAT_H
