@@ -55,6 +55,18 @@ TEST_F(EdgesTest, EmptyBlobIsReadAsAnEmptyText) {
     EXPECT_EQ(strText, "");
 }
 
+TEST_F(EdgesTest, TextOfANullIsEmpty) {
+    Run("INSERT INTO doc (id) VALUES (1)");
+    std::string strText = "none";
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}),
+                                      [&](const Row& Each) {
+                                          strText = Each.Text(0);
+                                          return true;
+                                      })),
+              "ok");
+    EXPECT_EQ(strText, "");
+}
+
 TEST_F(EdgesTest, UnsignedNumbersAreNumbers) {
     Json::Value jRecord;
     jRecord["id"] = 1U;
@@ -103,11 +115,14 @@ TEST_F(EdgesTest, JsonOfALoaderMayBeForNoMemberAndMayBeAText) {
     EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
     Into.SetInteger(Into.MemberIndex("id"), 1);
     Into.SetJson(Into.MemberIndex("json"), "\"x\"");
+    Into.SetBoolean(Into.MemberIndex("done"), false);
     EXPECT_EQ(Text(Into.EndRecord()), "ok");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
     Into.SetJson(99, "1");
     EXPECT_EQ(Text(Into.EndRecord()),
               "refused: cannot load record 2 into table \"doc\": there is no member of number 99 "
               "[unknown-member ]");
+    EXPECT_EQ(Rows("SELECT id, json, done FROM doc"), R"(1|"x"|0)");
 }
 
 TEST_F(EdgesTest, WordsGoOnInUnderscoresDollarsAndOtherAlphabets) {
