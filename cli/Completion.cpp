@@ -56,7 +56,11 @@ void PutBash() {
         }
     }
     for (const auto& [strName, strChoices] : mapChoices) {
-        Put("        " + strName + ") words='" + strChoices + "' ;;\n");
+        Put("        ");
+        Put(strName);
+        Put(") words='");
+        Put(strChoices);
+        Put("' ;;\n");
     }
     Put("    esac\n"
         "    if [[ -z $words && $word == -* ]]; then\n"

@@ -60,7 +60,7 @@ Json::Value ParseWhere(const std::string& strText) {
     if (strText.find_first_of("{[") == std::string::npos) {
         Fail(kExitUsage,
              "--where: \"" + strText +
-                 "\" is no JSON object; write {\"size\": 5}, or size=5 without --where");
+                 R"(" is no JSON object; write {"size": 5}, or size=5 without --where)");
     }
     return ParseJson(strText, "--where", kExitUsage);
 }
@@ -115,12 +115,12 @@ Json::Value ParseKey(const Table& Of, const std::string& strWord) {
     if (vecKey.size() == 1) {
         return TypedValue(Of, vecKey[0], strWord);
     }
-    const Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
+    Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
+    const std::string strWanted = "key \"" + strWord + "\": it must be an object with just " +
+                                  std::to_string(vecKey.size()) + " members, one of them ";
     for (const std::string& strMember : vecKey) {
         if (!jKey.isObject() || !jKey.isMember(strMember) || jKey.size() != vecKey.size()) {
-            Fail(kExitUsage, "key \"" + strWord + "\": it must be an object with just " +
-                                 std::to_string(vecKey.size()) + " members, one of them \"" +
-                                 strMember + "\"");
+            Fail(kExitUsage, strWanted + '"' + strMember + '"');
         }
     }
     return jKey;

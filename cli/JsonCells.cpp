@@ -134,7 +134,7 @@ std::string FromBase64(const std::string& strText, bool& blRight) {
 }
 
 void AppendBlob(std::string& strOut, std::string_view strBytes) {
-    strOut += "{\"$base64\":true,\"encoded\":\"";
+    strOut += R"({"$base64":true,"encoded":")";
     AppendBase64(strOut, strBytes);
     strOut += "\"}";
 }

@@ -18,8 +18,9 @@ using namespace VORN_JSON_DB::Cli;  // NOLINT(google-build-using-namespace): mai
 
 int Report(int nExit, const std::string& strLine) {
     const bool blColour = HasColour(stderr);
-    std::fprintf(stderr, "%serror:%s %s\n", blColour ? "\033[1;31m" : "", blColour ? "\033[0m" : "",
-                 strLine.c_str());
+    // There is nobody else to tell.
+    static_cast<void>(std::fprintf(stderr, "%serror:%s %s\n", blColour ? "\033[1;31m" : "",
+                                   blColour ? "\033[0m" : "", strLine.c_str()));
     return nExit;
 }
 
@@ -52,13 +53,19 @@ int RunGuarded(int nArguments, char** pszArguments) {
 int main(int nArguments, char** pszArguments) {
     // A reader that goes away ends the command without a word, whatever the parent made of it; a
     // file that hits the limit of the shell is a write error like others.
-    signal(SIGPIPE, SIG_DFL);
-    signal(SIGXFSZ, SIG_IGN);
+    static_cast<void>(signal(SIGPIPE, SIG_DFL));
+    static_cast<void>(signal(SIGXFSZ, SIG_IGN));
     const int nExit = RunGuarded(nArguments, pszArguments);
     // Some file systems report a failed write no sooner than here.
     if (std::fclose(stdout) != 0 && nExit == kExitFine) {
         return Report(kExitIo,
                       std::string("standard output: cannot write: ") + std::strerror(errno));
+    }
+    if (nExit == kExitInterrupted) {
+        // A loop in a shell goes on unless the signal itself ended the command; the shell shows
+        // 130.
+        signal(SIGINT, SIG_DFL);
+        raise(SIGINT);
     }
     return nExit;
 }

@@ -159,6 +159,7 @@ std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, RecordO
 void WriteObjects(const Context& Call, const Json::Value& jObjects,
                   const std::vector<std::string>& vecColumns) {
     std::vector<Column> vecShown;
+    vecShown.reserve(vecColumns.size());
     for (const std::string& strName : vecColumns) {
         vecShown.push_back({strName, false});
     }

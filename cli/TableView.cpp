@@ -37,8 +37,9 @@ std::string Escaped(utf8proc_int32_t nCode) {
         return nCode == '\n' ? "\\n" : nCode == '\t' ? "\\t" : "\\r";
     }
     char szEscape[16];
-    std::snprintf(szEscape, sizeof szEscape, nCode < 0x100 ? "\\x%02x" : "\\u%04x",
-                  static_cast<unsigned>(nCode));
+    static_cast<void>(std::snprintf(szEscape, sizeof szEscape,
+                                    nCode < 0x100 ? "\\x%02x" : "\\u%04x",
+                                    static_cast<unsigned>(nCode)));
     return szEscape;
 }
 
@@ -117,6 +118,7 @@ class TableWriter : public RecordOutput {
 
     void Begin(const std::vector<Column>& vecColumns) override {
         std::vector<Shown> vecNames;
+        vecNames.reserve(vecColumns.size());
         for (const Column& Named : vecColumns) {
             vecNames.push_back(Show(Named.strName));
         }
@@ -226,7 +228,8 @@ class TableWriter : public RecordOutput {
             }
             const int nPad = std::max(0, m_vecWidths[nColumn] - Value.nWidth);
             if (Value.nWidth > 0) {
-                strLine.append(static_cast<std::size_t>(nOwed + (Value.blRight ? nPad : 0)), ' ');
+                const int nBlanks = nOwed + (Value.blRight ? nPad : 0);
+                strLine.append(static_cast<std::size_t>(nBlanks), ' ');
                 strLine += Value.strText;
                 nOwed = kGap + (Value.blRight ? 0 : nPad);
             } else {

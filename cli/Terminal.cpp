@@ -8,6 +8,12 @@
 
 namespace VORN_JSON_DB::Cli {
 
+namespace {
+
+constexpr long kWidest = 10000;
+
+}  // namespace
+
 bool IsTerminal(std::FILE* pStream) {
     return isatty(fileno(pStream)) != 0;
 }
@@ -26,8 +32,8 @@ int TerminalWidth() {
         return Size.ws_col;
     }
     const char* const szColumns = std::getenv("COLUMNS");
-    const int nColumns = szColumns == nullptr ? 0 : std::atoi(szColumns);
-    return nColumns > 0 ? nColumns : 80;
+    const long nColumns = szColumns == nullptr ? 0 : std::strtol(szColumns, nullptr, 10);
+    return nColumns > 0 && nColumns <= kWidest ? static_cast<int>(nColumns) : 80;
 }
 
 }  // namespace VORN_JSON_DB::Cli

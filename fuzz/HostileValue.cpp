@@ -26,7 +26,9 @@ constexpr const char* kWords[] = {
     "Json::objectValue", "Json::arrayValue", "Json::Value", "time_t", "set", "vornSqlWhereFilter",
     "sort_by", "sort_direction", "desc", "offset", "", "x", "it's", "100%", "100%%", "%s", "%n",
     "b = 1", "null", "0x1", "\"", "\\", "\x01", "\x7f", "gr\xc3\xbc\xc3\x9f", "\xc3", "\xff\xfe",
-    "\xed\xa0\x80"};
+    "\xed\xa0\x80", "where", "sort", "members", "$and", "$or", "$not", "$eq", "$ne", "$lt", "$lte",
+    "$gt", "$gte", "$in", "$nin", "$between", "$like", "$prefix", "$null", "$contains", "d.a.b[0]",
+    "t[1]", "-a"};
 
 constexpr double kReals[] = {
     0.0, -0.0, 1.0, -3.0, 0.5, 1e15, 1e16, 1e17, 1e300, -1e300, 5e-324, 2147483648.0,

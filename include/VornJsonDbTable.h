@@ -173,7 +173,7 @@ class [[nodiscard]] Status {
 // An empty "$in" selects nothing and an empty "$or" is refused: no condition is ever dropped.
 // A path leads into a JSON member: "address.city", "tags[0]". What is absent there counts as null.
 // Within JSON some versions of SQLite, 3.40 among them, end a text at a NUL byte: paths and
-// "$contains" then see what stands before it.
+// "$contains" then see what stands before it, and operands of theirs with a NUL byte are refused.
 // A member of a JSON type is compared whole with {member: value}.
 // Unknown members, unknown operators and values that a member's type cannot have are findings.
 

@@ -24,12 +24,10 @@ if [[ ${1:-} == --update ]]; then
     reason=${2:?"--update wants the reason for the new budget"}
 fi
 
-need_packages "${compiler_packages[@]}" "${library_packages[@]}" valgrind:valgrind
-configure instructions -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF \
-    -DVORNJSONDB_EXAMPLES=OFF -DVORNJSONDB_TABLE=ON -DVORNJSONDB_COMMAND=OFF \
-    -DVORNJSONDB_BENCHMARKS=ON
-build instructions vornjsondb_instructions >/dev/null
-folder=build/instructions/bench
+need_packages valgrind:valgrind
+configure_release -DVORNJSONDB_BENCHMARKS=ON
+build_quietly release vornjsondb_instructions
+folder=build/release/bench
 
 # count WORK prints: work, total, ours, JsonCpp's, SQLite's, rest; each divided by the units.
 count() {

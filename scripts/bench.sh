@@ -49,7 +49,7 @@ if [[ $measure == yes ]]; then
         --benchmark_out="$results/scale.json"
     scripts/bench-size.sh | tee "$results/sizes.txt"
     scripts/bench-instructions.sh || true
-    cp build/instructions/bench/instructions.txt "$results/instructions.txt"
+    cp build/release/bench/instructions.txt "$results/instructions.txt"
 fi
 
 python3 -B bench/report/report.py "$results" docs

@@ -53,6 +53,14 @@ build_quietly() {
     fi
 }
 
+# configure_release [CMAKE-OPTION...] makes build/release: all that is installed, as it is installed. It
+# takes scripts/install-packages.sh, too.
+configure_release() {
+    need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}"
+    configure release -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON \
+        -DVORNJSONDB_COMMAND=ON "$@"
+}
+
 # What the scripts need. Where the compiler is given with CXX, it counts in the place of g++.
 # shellcheck disable=SC2034  # used by those who source this file
 {

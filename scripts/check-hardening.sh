@@ -11,11 +11,10 @@ source scripts/build.sh
 
 libraries=("$@")
 if ((${#libraries[@]} == 0)); then
-    need_packages "${compiler_packages[@]}" "${library_packages[@]}" binutils:readelf
-    configure hardening -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=OFF \
-        -DVORNJSONDB_TABLE=OFF
-    build_quietly hardening vornjsondb
-    libraries=(build/hardening/libvornjsondb.so)
+    need_packages binutils:readelf
+    configure_release
+    build_quietly release vornjsondb
+    libraries=(build/release/libvornjsondb.so)
 fi
 
 status=0

@@ -11,7 +11,8 @@ source scripts/build.sh
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}" \
     iso-codes jq:jq
 configure quickstart -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON \
-    -DVORNJSONDB_COMMAND=ON
+    -DVORNJSONDB_COMMAND=ON "${together[@]}"
+echo "building, which takes about half a minute"
 build_quietly quickstart vornjsondb vornjsondb_pages vornjsondb_quickstart
 prefix=$PWD/build/vornjsondb
 example=$PWD/build/quickstart/vornjsondb_quickstart

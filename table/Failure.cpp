@@ -131,15 +131,28 @@ bool HasError(const FindingList& vecFindings) {
                        [](const Finding& Found) { return Found.eSeverity == Severity::kError; });
 }
 
-Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {
+namespace {
+
+Status Retold(const Status& Outcome, Retry eRetry, std::string strMessage) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = Outcome.Code();
     pDetails->eRetry = eRetry;
     pDetails->nSqliteCode = Outcome.SqliteCode();
     pDetails->nSystemError = Outcome.SystemError();
-    pDetails->strMessage = Concat({Outcome.Message(), strMore});
+    pDetails->strMessage = std::move(strMessage);
     pDetails->vecFindings = Outcome.Findings();
     return Status(std::move(pDetails));
+}
+
+}  // namespace
+
+Status Within(const Doing& What, const Status& Step) {
+    return Step.Ok() ? Step
+                     : Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
+}
+
+Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {
+    return Retold(Outcome, eRetry, Concat({Outcome.Message(), strMore}));
 }
 
 }  // namespace vornjsondb

@@ -67,6 +67,9 @@ inline bool IsLock(const Status& Outcome) {
     return Outcome.Advice() != Retry::kNever;
 }
 
+// The failure of a step, or success, told as that of the call that it is a step of.
+Status Within(const Doing& What, const Status& Step);
+
 // The same failure with other advice and more words.
 Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore);
 

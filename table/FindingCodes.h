@@ -41,6 +41,10 @@
       "declare the member as DefinitionOf does, or copy the rows into a new table")               \
     X(kNullableColumn, "nullable-column", kWarning,                                               \
       "give the member a value in every record, or copy the rows into a new table")               \
+    X(kOtherDefault, "other-default", kWarning,                                                   \
+      "declare the default that the column has, or copy the rows into a new table")               \
+    X(kView, "view", kWarning,                                                                    \
+      "open the table that the view reads, or give it INSTEAD OF triggers")                       \
     X(kWithoutRowid, "without-rowid", kWarning,                                                   \
       "create the table without WITHOUT ROWID where a VornJsonDbApi writes it")                   \
     X(kKeyNotUnique, "key-not-unique", kWarning, "call Sync, which adds a unique index")          \
@@ -81,6 +85,7 @@
     X(kNoJsonMember, "no-json-member", kError, "name the member alone")                           \
     X(kBadPath, "bad-path", kError, "write a path as in \"address.city\" and \"tags[0]\"")        \
     X(kNumberInPath, "number-in-path", kError, "write an index in brackets: \"tags[0]\"")         \
+    X(kNulInJson, "nul-in-json", kError, "compare up to the NUL byte, or encode binary data")     \
     X(kBadPattern, "bad-pattern", kError, "escape text by EscapeLike")                            \
     X(kTooManyValues, "too-many-values", kError, "ask several times, with a part of the list")    \
     X(kTooManyConditions, "too-many-conditions", kError, "use $in where one member has many values") \

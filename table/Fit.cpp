@@ -35,8 +35,11 @@ size_t ReaderLevels() {
     return Builder["stackLimit"].asUInt();
 }
 
-bool IsNaN(const Json::Value& jValue) {
-    return jValue.type() == Json::realValue && std::isnan(jValue.asDouble());
+Misfit CheckReal(double dValue) {
+    if (std::isnan(dValue)) {
+        return Misfit::kNotANumber;
+    }
+    return std::isinf(dValue) ? Misfit::kInfinite : Misfit::kNone;
 }
 
 // What no JSON text can hold, or no reader gives back, anywhere in the value.
@@ -45,7 +48,7 @@ Misfit CheckTree(const Json::Value& jValue, size_t nLevelsLeft) {
         return Misfit::kDepth;
     }
     if (!jValue.isArray() && !jValue.isObject()) {
-        return IsNaN(jValue) ? Misfit::kNotANumber : Misfit::kNone;
+        return jValue.type() == Json::realValue ? CheckReal(jValue.asDouble()) : Misfit::kNone;
     }
     const Json::Value::const_iterator itEnd = jValue.end();
     for (Json::Value::const_iterator it = jValue.begin(); it != itEnd; ++it) {

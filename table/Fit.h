@@ -38,6 +38,7 @@ enum class Misfit {
     kKind,        // another kind of value
     kRange,       // a number beyond the type's range
     kNotANumber,  // NaN, for which SQLite would store NULL
+    kInfinite,    // an infinity inside of JSON, whose text its reader does not take
     kUnreadable,  // by an old handle
     kDepth        // JSON that its reader would refuse
 };

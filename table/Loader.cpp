@@ -31,7 +31,7 @@ Loader::Parts::Parts(Table::Parts& To, const LoadOptions& HowToLoad)
 Status Loader::Parts::BeginIfNone(const vornjsondb::Doing& What) {
     if (!All.IsOpen()) {
         blCallers = sqlite3_get_autocommit(Into.pDb) == 0;
-        return All.Begin(Into.pDb, Transaction::Mode::kImmediate, Into.How.nWaitMs);
+        return Within(What, All.Begin(Into.pDb, Transaction::Mode::kImmediate, Into.How.nWaitMs));
     }
     return sqlite3_get_autocommit(Into.pDb) == 0
                ? Status()
@@ -101,7 +101,7 @@ Status Loader::Parts::EndRecord(FindingList& vecFindings) {
 
 Status Loader::Parts::Commit() {
     if (All.IsOpen()) {
-        const Status Outcome = All.Commit();
+        const Status Outcome = vornjsondb::Within(Into.Do(kDo), All.Commit());
         if (!Outcome.Ok()) {
             const bool blAgain = Outcome.Code() == StatusCode::kLocked && All.IsOpen();
             return blAgain ? Outcome : End(Outcome);

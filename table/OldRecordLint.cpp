@@ -134,14 +134,17 @@ class OldRecordLint {
         std::string strJson;
         BoundValue Value;
         const Misfit eMisfit = FitJson(Type, jValue, false, m_Codec, strJson, Value);
-        if (eMisfit != Misfit::kNone) {
-            Report(m_vecFindings, FindingCode::kOldJsonChanged, strPath,
-                   strMember + (eMisfit == Misfit::kDepth
-                                    ? " is nested too deeply: it is stored, and only a part is read"
-                                    : " holds NaN, which is stored as null"));
-        } else {
+        if (eMisfit == Misfit::kNone) {
             LintPercents(strMember, strJson, strPath, nLater);
+            return;
         }
+        const char* szFate = " holds NaN, which is stored as null";
+        if (eMisfit == Misfit::kInfinite) {
+            szFate = " holds an infinity: it is stored, and not read back";
+        } else if (eMisfit == Misfit::kDepth) {
+            szFate = " is nested too deeply: it is stored, and only a part is read";
+        }
+        Report(m_vecFindings, FindingCode::kOldJsonChanged, strPath, strMember + szFate);
     }
 
     void LintPercents(const std::string& strMember, const std::string& strText,

@@ -18,6 +18,7 @@ struct MisfitRow {
 constexpr MisfitRow kMisfits[] = {
     {Misfit::kRange, FindingCode::kOutOfRange, "is beyond its range"},
     {Misfit::kNotANumber, FindingCode::kNotANumber, "is no number"},
+    {Misfit::kInfinite, FindingCode::kNotANumber, "is or holds an infinity, which JSON cannot"},
     {Misfit::kDepth, FindingCode::kNestedTooDeep, "is nested too deep"},
     {Misfit::kKind, FindingCode::kWrongKind, "is no value of it"},
 };
@@ -87,6 +88,11 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     if (jValue.isString()) {
         Out.eKind = ValueKind::kText;
         Out.Value = BoundText(BytesOf(jValue));
+        if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
+            Why = {FindingCode::kNulInJson,
+                   "JSON: " + Shown(jValue) + " holds a NUL byte, where SQLite may end it"};
+            return false;
+        }
         return true;
     }
     Out.eKind = jValue.isArray() ? ValueKind::kList

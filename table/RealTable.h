@@ -37,6 +37,14 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealI
 // Whether a table, an index, a view or a trigger has that name, in any letter case.
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);
 
+// Whether the name is that of a view. Returns SQLite's result.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
+
+// Whether two SQL expressions without names have one value; as JSON, where both are JSON. What
+// SQLite cannot compute counts as the same. Returns SQLite's result.
+int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& strRight, bool blJson,
+                 bool& blSame);
+
 }  // namespace vornjsondb
 
 #endif  // VORN_TABLE_REAL_TABLE_H

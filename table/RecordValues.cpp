@@ -132,6 +132,7 @@ void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShow
         {Misfit::kKind, FindingCode::kWrongKind, " is another kind of value: expected is "},
         {Misfit::kRange, FindingCode::kOutOfRange, " is out of range: expected is "},
         {Misfit::kNotANumber, FindingCode::kNotANumber, " is or holds NaN: expected is "},
+        {Misfit::kInfinite, FindingCode::kNotANumber, " is or holds an infinity: expected is "},
         {Misfit::kDepth, FindingCode::kTooDeep,
          " is nested too deeply to be read back: expected is "},
         {Misfit::kUnreadable, FindingCode::kOldCannotRead,

@@ -10,7 +10,7 @@ namespace vornjsondb {
 
 namespace {
 
-using Kind = VORN_JSON_DB::Row::Kind;
+using RowKind = VORN_JSON_DB::Row::Kind;
 
 // A column's value. SQLite calls it unprotected, for it is safe in one thread only; that is all
 // that a connection may have here, and all else of a column takes its lock once more.
@@ -43,30 +43,30 @@ void ReadJson(std::string_view strText, JsonCodec& Codec, Json::Value& jOut) {
 }
 
 // What a value is: of its member's kind where it fits it, else of the stored one.
-Kind KindOf(sqlite3_value* pValue, BoundKind eKind) {
-    constexpr Kind kInt = Kind::kInteger, kReal = Kind::kReal, kText = Kind::kText,
-                   kJson = Kind::kJson, kBlob = Kind::kBlob, kNull = Kind::kNull;
+RowKind KindOf(sqlite3_value* pValue, BoundKind eKind) {
+    constexpr RowKind kInt = RowKind::kInteger, kReal = RowKind::kReal, kText = RowKind::kText,
+                      kJson = RowKind::kJson, kBlob = RowKind::kBlob, kNull = RowKind::kNull;
     // By SQLite's type, from 1, and the member's: none, text, boolean, integer, real, object, list,
     // JSON, any.
-    static constexpr Kind kKinds[][9] = {
-        {kInt, kText, Kind::kBoolean, kInt, kReal, kInt, kInt, kInt, kInt},
+    static constexpr RowKind kKinds[][9] = {
+        {kInt, kText, RowKind::kBoolean, kInt, kReal, kInt, kInt, kInt, kInt},
         {kReal, kText, kReal, kReal, kReal, kReal, kReal, kReal, kReal},
         {kText, kText, kText, kText, kText, kJson, kJson, kJson, kText},
         {kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob},
         {kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull}};
-    const Kind eFound = kKinds[sqlite3_value_type(pValue) - 1][static_cast<size_t>(eKind)];
+    const RowKind eFound = kKinds[sqlite3_value_type(pValue) - 1][static_cast<size_t>(eKind)];
     const bool blNumber =
-        eFound == Kind::kBoolean && (sqlite3_value_int64(pValue) & ~sqlite3_int64{1}) != 0;
+        eFound == RowKind::kBoolean && (sqlite3_value_int64(pValue) & ~sqlite3_int64{1}) != 0;
     return blNumber ? kInt : eFound;
 }
 
-Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, Kind eKind) {
+Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, RowKind eKind) {
     switch (eKind) {
-        case Kind::kBoolean:
+        case RowKind::kBoolean:
             return sqlite3_value_int(pValue) == 1;
-        case Kind::kInteger:
+        case RowKind::kInteger:
             return static_cast<Json::Int64>(sqlite3_value_int64(pValue));
-        case Kind::kReal:
+        case RowKind::kReal:
             return sqlite3_value_double(pValue);
         default:
             return TextValue(TextOf(pStatement, pValue));
@@ -102,10 +102,10 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
         Json::Value& jMember = *itMember;
         ++itMember;
         sqlite3_value* const pValue = ColumnValue(pStatement, Each.nColumn);
-        const Kind eKind = KindOf(pValue, Each.eKind);
-        if (eKind == Kind::kJson) {
+        const RowKind eKind = KindOf(pValue, Each.eKind);
+        if (eKind == RowKind::kJson) {
             ReadJson(TextOf(pStatement, pValue), Codec, jMember);
-        } else if (eKind != Kind::kNull) {
+        } else if (eKind != RowKind::kNull) {
             Json::Value jValue = ReadValue(pStatement, pValue, eKind);
             jMember.swapPayload(jValue);
         } else {

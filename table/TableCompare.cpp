@@ -34,13 +34,22 @@ class TableCompare {
         if (nResult == SQLITE_OK && blFound) {
             nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_vecIndexes);
         }
+        if (nResult == SQLITE_OK && blFound) {
+            nResult = IsView(m_pDb, m_Of.Table(), m_blView);
+        }
         if (nResult != SQLITE_OK || !blFound) {
             return nResult;
         }
-        for (size_t i = 0; i < m_Of.Size(); ++i) {
-            CompareMember(i);
+        if (m_blView) {
+            m_pvecStatements = nullptr;  // nothing can be added to a view
+        }
+        for (size_t i = 0; nResult == SQLITE_OK && i < m_Of.Size(); ++i) {
+            nResult = CompareMember(i);
         }
         CompareColumns();
+        if (m_blView) {
+            return nResult;
+        }
         for (size_t i = 0; nResult == SQLITE_OK && i < m_Of.Size(); ++i) {
             if (m_Of.At(i).blUnique) {
                 nResult = CompareUnique({i}, false);
@@ -69,12 +78,12 @@ class TableCompare {
                sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
     }
 
-    void CompareMember(size_t nMember) {
+    int CompareMember(size_t nMember) {
         const Member& Of = m_Of.At(nMember);
         const RealColumn* pColumn = ColumnOf(Of);
         if (pColumn == nullptr) {
             CompareMissing(Of);
-            return;
+            return SQLITE_OK;
         }
         if (pColumn->strName != Of.strName) {
             Add(FindingCode::kOtherCase, Of,
@@ -88,9 +97,27 @@ class TableCompare {
                     Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
                     " affinity and changes what is stored");
         }
-        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn)) {
+        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn) && !m_blView) {
             Add(FindingCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
         }
+        return CompareDefault(Of, *pColumn);
+    }
+
+    // Where only one of them has a default it is the one that counts.
+    int CompareDefault(const Member& Of, const RealColumn& Column) {
+        static constexpr std::string_view kBefore = " DEFAULT ";
+        const std::string strClause = DefaultClause(Of);
+        if (strClause.empty() || Column.strDefault.empty()) {
+            return SQLITE_OK;
+        }
+        const std::string strDefault = strClause.substr(kBefore.size());
+        bool blSame = false;
+        const int nResult = HaveOneValue(m_pDb, strDefault, Column.strDefault, Of.IsJson(), blSame);
+        if (nResult == SQLITE_OK && !blSame) {
+            Add(FindingCode::kOtherDefault, Of,
+                " has the default " + strDefault + ", and its column " + Column.strDefault);
+        }
+        return nResult;
     }
 
     // SQLite adds NOT NULL only beside a default, which the rows that are there get.
@@ -122,7 +149,10 @@ class TableCompare {
                            (blNeeded ? ", and no record can be created without its value" : ""));
             }
         }
-        if (m_Real.strRowid.empty()) {
+        if (m_blView) {
+            Report(m_vecFindings, FindingCode::kView, Below("", m_Of.Table()),
+                   m_Of.QuotedTable() + " is a view");
+        } else if (m_Real.strRowid.empty()) {
             Report(m_vecFindings, FindingCode::kWithoutRowid, Below("", m_Of.Table()),
                    "the table has no rowid: a VornJsonDbApi cannot read back what it creates");
         }
@@ -182,6 +212,7 @@ class TableCompare {
     std::vector<std::string>* m_pvecStatements;
     FindingList& m_vecFindings;
     RealTable m_Real;
+    bool m_blView = false;
     std::vector<RealIndex> m_vecIndexes;
     std::vector<std::string> m_vecPlanned;                    // names of indexes
     std::vector<std::vector<std::string>> m_vecUniqueByPlan;  // their columns

@@ -1,6 +1,7 @@
 #include "ByteSource.h"
 
 #include <fcntl.h>
+#include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -9,6 +10,8 @@
 #include <cstdlib>
 #include <cstring>
 #include <memory>
+
+#include "Interrupt.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -68,8 +71,22 @@ bool ByteSource::Open(const std::string& strPath) {
     return true;
 }
 
+// Until there is something to read, or an interrupt: then it is EINTR, however early it came.
+bool ByteSource::Wait() {
+    pollfd aFiles[] = {{m_nFile, POLLIN, 0}, {Interrupt::File(), POLLIN, 0}};
+    if (poll(aFiles, 2, -1) < 0) {
+        return false;
+    }
+    errno = EINTR;
+    return aFiles[1].revents == 0;
+}
+
 size_t ByteSource::ReadFile(char* pInto, size_t nMost) {
-    const ssize_t nRead = m_nError == 0 ? read(m_nFile, pInto, nMost) : 0;
+    if (m_nError != 0) {
+        return 0;
+    }
+    const bool blReady = m_nSize >= 0 || Wait();
+    const ssize_t nRead = blReady ? read(m_nFile, pInto, nMost) : -1;
     if (nRead < 0) {
         // An interrupt, too, ends the input: whoever wants to go on has handlers that restart.
         m_nError = errno;

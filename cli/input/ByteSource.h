@@ -40,6 +40,7 @@ class ByteSource {
     bool Rewind();
 
   private:
+    bool Wait();
     size_t ReadFile(char* pInto, size_t nMost);
     bool Fail();
 

@@ -18,6 +18,10 @@ class Interrupt {
 
     static bool Came();
 
+    // A file that can be read from then on, for those who wait for something else as well: a signal
+    // may come just before they begin to wait. -1: there is no Interrupt.
+    static int File();
+
   private:
     struct sigaction m_Before = {};
 };

@@ -92,10 +92,12 @@ bool JsonHandler::NoRecord(const char* szKind) {
     return EndRecord();
 }
 
-void JsonHandler::CheckText(std::string_view strText) {
-    if (m_blEscapes && HasSurrogate(strText)) {
+bool JsonHandler::CheckText(std::string_view strText) {
+    const bool blWrong = m_blEscapes && HasSurrogate(strText);
+    if (blWrong) {
         Blame("\\u gives half of a surrogate pair");
     }
+    return !blWrong;
 }
 
 void JsonHandler::AppendToJson(std::string_view strText) {
@@ -165,11 +167,15 @@ bool JsonHandler::String(const char* pText, rapidjson::SizeType nText, bool) {
 
 bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strName(pText, nText);
-    CheckText(strName);
+    const bool blGood = CheckText(strName);
     if (m_nLevel > m_nRecordLevel + 1) {
         AppendTextToJson(strName);
         m_strJson += ':';
         return true;
+    }
+    if (!blGood) {
+        m_eList = List::kNone;
+        return m_nLevel > m_nRecordLevel;  // nobody is told of a name that is no text
     }
     if (m_nLevel < m_nRecordLevel) {
         Blame("the object has the member \"" + std::string(strName) + "\" beside the list \"" +

@@ -72,7 +72,7 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     void BeginRecord();
     bool EndRecord();
     void Blame(std::string strReason);
-    void CheckText(std::string_view strText);
+    bool CheckText(std::string_view strText);
     void AppendToJson(std::string_view strText);
     void AppendTextToJson(std::string_view strText);
 

@@ -77,10 +77,11 @@ class LinesReader {
         if (std::memchr(pBegin, '\0', m_Lines.Size()) != nullptr) {
             return m_Handler.Broken("there is a NUL byte");
         }
-        // RapidJSON is several times as fast where it checks no text; one check of the line does it.
-        // What it would complain about, it is given to find.
+        // RapidJSON is several times as fast where it checks no text; one check of the line does
+        // it. What it would complain about, it is given to find.
         constexpr unsigned kFlags = kJsonFlags | rapidjson::kParseInsituFlag;
-        constexpr unsigned kCheckedFlags = kFlags & ~unsigned{rapidjson::kParseValidateEncodingFlag};
+        constexpr unsigned kCheckedFlags =
+            kFlags & ~unsigned{rapidjson::kParseValidateEncodingFlag};
         const std::string_view strLine(pBegin, m_Lines.Size());
         const bool blChecked = IsUtf8WithoutControls(strLine);
         m_Handler.MayHaveEscapes(strLine.find('\\') != std::string_view::npos);

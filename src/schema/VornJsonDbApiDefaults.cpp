@@ -14,6 +14,7 @@ namespace vornjsondb {
 bool LacksDefaults(const TableTypes& Types, const Json::Value& jRec) {
     MemberCursor Record(jRec);
     for (const TypedMember& Member : Types.Members()) {
+        // mutate(true): a copy that is not needed changes nothing.
         if (Member.pjDefault != nullptr && Record.Find(Member.Name) == nullptr) {
             return true;
         }

@@ -137,7 +137,7 @@ int VORN_JSON_DB::convert2ReadableTime(long now, std::string& strOut, int iType)
 }
 
 int VORN_JSON_DB::getTimeAfterNow(int offsetSecond, std::string& strOut, int iType) {
-    long now = 0;
+    long now = 0;                                          // mutate(0 to 1): the next line sets it.
     VORN_FAIL_IF(0 > getTimeAfterNow(offsetSecond, now));  // GCOVR_EXCL_BR_LINE: cannot fail
     VORN_FAIL_IF(0 > convert2ReadableTime(now, strOut, iType));
     return 0;

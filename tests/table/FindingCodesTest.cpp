@@ -75,6 +75,10 @@ const CodeCase kCodeCases[] = {
      "CREATE TABLE t (a TEXT)"},
     {"nullable-column", Call::kReal, R"({"member": {"a": {"cpptype": "int", "notNull": true}}})",
      "CREATE TABLE t (a)"},
+    {"other-default", Call::kReal, R"({"member": {"a": {"cpptype": "int", "cppDefaultValue": 1}}})",
+     "CREATE TABLE t (a DEFAULT 2)"},
+    {"view", Call::kReal, R"({"member": {"a": {"cpptype": "int"}}})",
+     "CREATE VIEW t AS SELECT 1 AS a"},
     {"without-rowid", Call::kReal, R"({"member": {"a": {"cpptype": "int"}}})",
      "CREATE TABLE t (a INTEGER PRIMARY KEY) WITHOUT ROWID"},
     {"key-not-unique", Call::kReal, R"({"key": "a", "member": {"a": {"cpptype": "int"}}})",
@@ -109,6 +113,7 @@ const CodeCase kCodeCases[] = {
     {"no-json-member", Call::kQuery, R"({"where": {"s.x": 1}})"},
     {"bad-path", Call::kQuery, R"({"where": {"j.": 1}})"},
     {"number-in-path", Call::kQuery, R"({"where": {"j.0": 1}})"},
+    {"nul-in-json", Call::kQuery, R"({"where": {"l": {"$contains": "a\u0000b"}}})"},
     {"bad-pattern", Call::kQuery, R"({"where": {"s": {"$like": "\\"}}})"},
     {"bad-sort", Call::kQuery, R"({"sort": "s"})"},
     {"bad-members", Call::kQuery, R"({"members": []})"},
@@ -237,7 +242,8 @@ class FindingCodesTest : public TableTest {
         EXPECT_EQ(Text(Of.Open(m_pDb, "t", jDefinition)), "ok");
         EXPECT_EQ(Text(Of.Lint(vecFindings)), "ok");
         Of = Table();
-        Run("DROP TABLE t");
+        const bool blView = std::string(szSql).compare(0, 11, "CREATE VIEW") == 0;
+        Run(blView ? "DROP VIEW t" : "DROP TABLE t");
         return vecFindings;
     }
 

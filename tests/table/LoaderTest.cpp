@@ -469,12 +469,16 @@ TEST_F(LoaderTest, CommitThatFailsUndoesWhatItWouldHaveStored) {
         Loader Into;
         EXPECT_EQ("ok", Text(Into.Start(Child)));
         EXPECT_EQ("ok", Add(Into, {R"({"id": 1, "of": 1})"}));
-        EXPECT_EQ("constraint: cannot commit a transaction: FOREIGN KEY constraint failed",
-                  Text(Into.Commit()));
+        EXPECT_EQ(
+            "constraint: cannot load records into table \"child\": cannot commit a transaction: "
+            "FOREIGN KEY constraint failed",
+            Text(Into.Commit()));
         EXPECT_EQ("1 0 0 0 0 0", Counts(Into));
         EXPECT_EQ("ok", Text(Into.Start(Child, With(OnDuplicate::kStop, true, 1))));
-        EXPECT_EQ("constraint: cannot commit a transaction: FOREIGN KEY constraint failed",
-                  Add(Into, {R"({"id": 1, "of": 1})"}));
+        EXPECT_EQ(
+            "constraint: cannot load records into table \"child\": cannot commit a transaction: "
+            "FOREIGN KEY constraint failed",
+            Add(Into, {R"({"id": 1, "of": 1})"}));
     }
     EXPECT_FALSE(IsInTransaction());
     EXPECT_EQ("", Rows("SELECT id FROM child"));

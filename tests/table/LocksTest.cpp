@@ -157,11 +157,28 @@ TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
     EXPECT_EQ("ok", Text(Into.Start(m_Table)));
     EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
     EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
-    EXPECT_EQ("locked: cannot commit a transaction: database is locked (waited 5000 ms)",
-              Text(Into.Commit()));
+    EXPECT_EQ(
+        "locked: cannot load records into table \"task\": cannot commit a transaction: database is "
+        "locked (waited 5000 ms)",
+        Text(Into.Commit()));
     Other("COMMIT");
     EXPECT_EQ("ok", Text(Into.Commit()));
     EXPECT_EQ(1, Into.Counts().nCommitted);
+}
+
+TEST_F(LocksTest, LoaderThatCannotBeginNamesTheTable) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time;
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    const Status Outcome = Into.Add(Parse(R"({"id": 1})"));
+    EXPECT_EQ(
+        "locked: cannot load record 1 into table \"task\": cannot begin a transaction: database is "
+        "locked (waited 5000 ms)",
+        Text(Outcome));
+    EXPECT_EQ(Retry::kCall, Outcome.Advice());
+    EXPECT_EQ(SQLITE_BUSY, Outcome.SqliteCode());
+    Other("COMMIT");
 }
 
 }  // namespace

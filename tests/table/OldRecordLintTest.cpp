@@ -1,6 +1,7 @@
 // What LintOldRecord says of records, beside what recCreate makes of them.
 
 #include <cmath>
+#include <limits>
 
 #include "OldHandleFixture.h"
 
@@ -171,6 +172,10 @@ TEST_F(OldRecordLintTest, JsonThatIsNotReadBackAsItWas) {
     jRecord["j"].append(std::nan(""));
     Expect(jRecord, "old-json-changed /j: member \"j\" holds NaN, which is stored as null",
            R"(0 {"j":[null]})", "[null]");
+    jRecord["j"][0] = std::numeric_limits<double>::infinity();
+    Expect(jRecord,
+           "old-json-changed /j: member \"j\" holds an infinity: it is stored, and not read back",
+           R"(0 {"j":[null]})", "[1e+9999]");
     jRecord["j"] = Nested(1100);
     EXPECT_EQ(Text(LintOldRecord(m_strName, m_jDefinition, jRecord)),
               "old-json-changed /j: member \"j\" is nested too deeply: it is stored, and only a "

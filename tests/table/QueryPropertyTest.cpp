@@ -312,7 +312,7 @@ class Round {
     Json::Value Ordered(const std::string& strType) {
         Json::Value jValue;
         do {
-            jValue = strType.empty() ? m_Make.JsonValue(0) : m_Make.ValueOf(strType);
+            jValue = strType.empty() ? InJson(m_Make.JsonValue(0)) : m_Make.ValueOf(strType);
         } while (!jValue.isString() && !jValue.isNumeric());
         return jValue;
     }
@@ -335,11 +335,20 @@ class Round {
         return strPattern;
     }
 
+    // What is looked for inside of JSON must not have a NUL byte.
+    static Json::Value InJson(const Json::Value& jOperand) {
+        if (!jOperand.isString()) {
+            return jOperand;
+        }
+        const std::string strText = jOperand.asString();
+        return strText.substr(0, strText.find('\0'));
+    }
+
     Json::Value Operators(const std::string& strMember, bool blPath) {
         const std::string strType = blPath ? "" : m_Model.mapTypes[strMember];
         const auto Any = [&] {
             return m_Make.OneIn(8) ? Json::Value()
-                                   : (blPath ? m_Make.JsonValue(1) : Operand(strMember));
+                                   : (blPath ? InJson(m_Make.JsonValue(1)) : Operand(strMember));
         };
         const bool blText = blPath || strType == "string" || strType == "any";
         const bool blJson = strType.compare(0, 6, "Json::") == 0;
@@ -384,12 +393,14 @@ class Round {
                     if (blText) {
                         const bool blPrefix = m_Make.OneIn(2);
                         jOperators[blPrefix ? "$prefix" : "$like"] =
-                            blPrefix ? Json::Value(m_Make.String()) : Pattern();
+                            blPrefix
+                                ? (blPath ? InJson(m_Make.String()) : Json::Value(m_Make.String()))
+                                : Pattern();
                     }
                     break;
                 case 7:
                     if (blList) {
-                        jOperators["$contains"] = m_Make.JsonValue(1);
+                        jOperators["$contains"] = InJson(m_Make.JsonValue(1));
                     }
                     break;
                 default:

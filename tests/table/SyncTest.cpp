@@ -94,6 +94,48 @@ TEST_F(SyncTest, LintTellsEveryDifference) {
         "have one value");
 }
 
+TEST_F(SyncTest, LintComparesDefaultsByTheirValues) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, a INTEGER DEFAULT 2, b INTEGER DEFAULT (1 - 1),"
+        " c TEXT DEFAULT 'it''s', d TEXT DEFAULT 'none', e TEXT DEFAULT '{\"a\": 1}',"
+        " f TEXT DEFAULT '[', g REAL DEFAULT 1, h TEXT, i TEXT DEFAULT 'x', j TEXT DEFAULT bare,"
+        " k TEXT DEFAULT '[1]')",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "a": {"cpptype": "int", "cppDefaultValue": 3},
+             "b": {"cpptype": "bool", "cppDefaultValue": false},
+             "c": {"cpptype": "string", "cppDefaultValue": "it's"},
+             "d": {"cpptype": "string", "cppDefaultValue": "some"},
+             "e": {"cpptype": "Json::objectValue", "cppDefaultValue": {"a": 1}},
+             "f": {"cpptype": "Json::arrayValue", "cppDefaultValue": []},
+             "g": {"cpptype": "double", "cppDefaultValue": 1.0},
+             "h": {"cpptype": "string", "cppDefaultValue": "x"},
+             "i": {"cpptype": "string"},
+             "j": {"cpptype": "string", "cppDefaultValue": "other"},
+             "k": {"cpptype": "Json::arrayValue", "cppDefaultValue": [2]}}})");
+    EXPECT_EQ(
+        Lint(),
+        "other-default /item/member/a: member \"a\" has the default 3, and its column 2; "
+        "other-default /item/member/d: member \"d\" has the default 'some', and its column "
+        "'none'; "
+        "other-default /item/member/f: member \"f\" has the default '[]', and its column '['; "
+        "other-default /item/member/k: member \"k\" has the default '[2]', and its column "
+        "'[1]'");
+}
+
+TEST_F(SyncTest, ViewIsToldFromATable) {
+    Meet("CREATE TABLE behind (a INTEGER); CREATE VIEW Item AS SELECT a FROM behind",
+         R"({"key": "a", "member": {"a": {"cpptype": "int", "notNull": true, "unique": true},
+             "b": {"cpptype": "int"}}})");
+    const std::string strExpected =
+        "missing-column /item/member/b: member \"b\" has no column; view /item: \"item\" is a view";
+    EXPECT_EQ(Lint(), strExpected);
+    EXPECT_EQ(Sync(), strExpected);
+    m_Table = Table();
+    Meet("CREATE TEMP TABLE item (a INTEGER PRIMARY KEY)",
+         R"({"key": "a", "member": {"a": {"cpptype": "int"}}})");
+    EXPECT_EQ(Lint(), "");
+}
+
 TEST_F(SyncTest, TablesWithoutARowidAndWithoutAKey) {
     Meet("CREATE TABLE item (id TEXT PRIMARY KEY) WITHOUT ROWID",
          R"({"key": "id", "member": {"id": {"cpptype": "string"}}})");

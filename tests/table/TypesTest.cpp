@@ -167,6 +167,39 @@ TEST_F(TypesTest, MisfitsAreTold) {
         Text(m_Table.Create(jRecord)));
 }
 
+// Its text in JSON, 1e+9999, is no number to JsonCpp's reader: neither handle would read it back.
+TEST_F(TypesTest, InfinityIsStoredAsAColumnAndRefusedInsideOfJson) {
+    Options How;
+    How.blCompatible = false;
+    Open(R"({"t": {"key": "i", "member": {"d": {"cpptype": "double"}, "i": {"cpptype": "int"},
+             "j": {"cpptype": "Json::Value"}, "l": {"cpptype": "Json::arrayValue"}}}})",
+         How);
+    const double dInfinity = std::numeric_limits<double>::infinity();
+    Json::Value jRecord = Parse(R"({"i": 1})");
+    jRecord["d"] = dInfinity;
+    EXPECT_EQ("ok", Text(m_Table.Create(jRecord)));
+    EXPECT_EQ("ok", Text(m_Table.Get(1, jRecord)));
+    EXPECT_EQ(dInfinity, jRecord["d"].asDouble());
+    jRecord = Parse(R"({"i": 2, "l": [1, [2]]})");
+    jRecord["l"][1].append(-dInfinity);
+    EXPECT_EQ(
+        "refused: cannot save a record in table \"t\": member \"l\": a list of 2 is or holds an "
+        "infinity: expected is a list [not-a-number /l]",
+        Text(m_Table.Create(jRecord)));
+    jRecord = Parse(R"({"i": 2})");
+    jRecord["j"] = dInfinity;
+    EXPECT_EQ(
+        "refused: cannot save a record in table \"t\": member \"j\": Inf is or holds an "
+        "infinity: expected is any JSON [not-a-number /j]",
+        Text(m_Table.Create(jRecord)));
+    Query Which;
+    Which.Where("l", Op::kContains, dInfinity);
+    EXPECT_EQ(
+        "refused: cannot list records of table \"t\": JSON: Inf is or holds an infinity, "
+        "which JSON cannot [not-a-number /where/l/$contains]",
+        Text(m_Table.List(Which, jRecord)));
+}
+
 TEST_F(TypesTest, CompatibleRefusesWhatAnOldHandleCannotReadBack) {
     const Case kCases[] = {
         {"string", R"("a")", "text|a|\"a\""},

@@ -1,0 +1,162 @@
+#!/usr/bin/env bash
+# Files that are none, permissions, a full disk, closed and broken outputs, locks and Ctrl-C.
+source "$(dirname "$0")/Check.sh"
+seq 2000 | sed 's/.*/{"id": &, "text": "abcdefghijklmnopqrstuvwxyz"}/' >lines
+expect 0 '' '' -- insert all.db t lines --key id --quiet
+
+# Not a database, or no longer one.
+mkdir folder
+expect 7 '' 'error: folder: disk I/O error; is it a file?' -- list folder t
+expect 7 '' 'error: folder: unable to open database file; is it a file?' -- insert folder t lines
+expect 7 '' 'error: no/such.db: No such file or directory; check the folder' -- insert no/such.db t lines
+expect 7 '' 'error: lines: file is not a database; name an SQLite database first' -- insert lines t lines
+cp all.db cut.db && truncate -s 8192 cut.db
+for subcommand in list count dump lint; do
+    expect 7 '' 'error: cut.db: database disk image is malformed; restore it from a copy' -- \
+        "$subcommand" cut.db t
+done
+cp all.db junk.db && printf '%40s' x | dd of=junk.db bs=1 seek=4096 conv=notrunc 2>/dev/null
+expect 7 '' 'error: junk.db: cannot read records of table "t": database disk image is malformed; restore it from a copy' \
+    -- list junk.db t
+"$VORNJSONDB" doctor junk.db >out
+same 'exit of doctor' $? 3
+same 'doctor' "$(sed -n 3p out | cut -c 1-39)" 'integrity     *** in database main ***\'
+: >empty
+expect 5 '' 'error: empty: there is no table "t"; see vornjsondb tables' -- list empty t
+
+# Other files.
+expect 7 '' 'error: none: No such file or directory; check name and permissions' -- insert all.db t none
+expect 7 '' 'error: folder: Is a directory; check name and permissions' -- insert all.db t folder
+expect 7 '' 'error: none: cannot be opened; check the name' -- load all.db none
+expect 7 '' 'error: none: No such file or directory; check the name' -- list all.db t --def none
+: | TMPDIR=/none "$VORNJSONDB" insert new.db t - 2>err
+same 'exit without a temporary folder' $? 7
+same 'no temporary folder' "$(cat err)" \
+    'error: standard input: cannot copy it to read it twice: No such file or directory; set TMPDIR to a folder with space (nothing is stored)'
+
+# Permissions, which count for the superuser only without these two rights.
+restricted=$VORNJSONDB
+if [[ $(id -u) -eq 0 ]]; then
+    printf '#!/bin/sh\nexec setpriv --bounding-set -dac_override,-dac_read_search %q "$@"\n' \
+        "$VORNJSONDB" >restricted
+    chmod +x restricted
+    restricted=$PWD/restricted
+fi
+mkdir locked && cp all.db locked && chmod 555 locked
+cp all.db readonly.db && chmod 444 readonly.db
+original=$VORNJSONDB VORNJSONDB=$restricted
+expect 0 2000 '' -- count readonly.db t
+expect 7 '' 'error: readonly.db: Permission denied; check its permissions' -- update readonly.db t 1 text=x
+expect 7 '' 'error: readonly.db: Permission denied; check its permissions' -- insert readonly.db t lines
+expect 0 2000 '' -- count locked/all.db t
+expect 7 '' 'error: locked/all.db: cannot remove records from table "t": attempt to write a readonly database; check the permissions of the file and of its folder' \
+    -- delete locked/all.db t 1
+expect 7 '' 'error: locked/new.db: Permission denied; check the folder' -- insert locked/new.db t lines
+expect 7 '' 'error: locked/errors: Permission denied; name another file for --errors (nothing is stored)' \
+    -- insert new.db t lines --errors locked/errors
+chmod 000 readonly.db
+expect 7 '' 'error: readonly.db: Permission denied; check its permissions' -- count readonly.db t
+expect 7 '' 'error: readonly.db: Permission denied; check name and permissions' -- insert new.db t readonly.db
+VORNJSONDB=$original
+chmod -R u+w locked
+
+# Outputs that take nothing, or no more.
+written='cannot write: %s; what was written so far is not all'
+"$VORNJSONDB" list all.db t --format jsonl 2>err | head -n 1 >out
+same 'exit of a list into a closed pipe' "${PIPESTATUS[0]}" 141
+same 'a list into a closed pipe' "$(cat out err)" '{"id":1,"text":"abcdefghijklmnopqrstuvwxyz"}'
+for subcommand in list dump; do
+    "$VORNJSONDB" "$subcommand" all.db t >&- 2>err
+    same "exit of $subcommand with a closed output" $? 7
+    # shellcheck disable=SC2059  # the text has the place for the reason
+    same "$subcommand with a closed output" "$(cat err)" \
+        "error: standard output: $(printf "$written" 'Bad file descriptor')"
+done
+"$VORNJSONDB" list all.db nope >&- 2>&- <&-
+same 'exit with nothing open' $? 5
+printf '{"id": 1}\nx\n' >bad
+expect 7 '' 'error: /dev/full: cannot write: No space left on device (the first 2 records are dealt with and stay)' \
+    -- insert all.db t bad --replace --errors /dev/full
+same 'the database is sound' "$(sqlite3 all.db 'PRAGMA integrity_check; SELECT count(*) FROM t')" \
+    $'ok\n2000'
+
+# A disk that takes no more than 40 kB.
+small() {
+    (
+        ulimit -f 40
+        "$VORNJSONDB" "$@" >out 2>err
+    )
+}
+small insert new.db t lines
+same 'exit with a full disk' $? 7
+same 'a full disk' "$(cat err)" \
+    "error: new.db: cannot commit a transaction: disk I/O error; check the disk and the shell's limits (nothing is stored)"
+same 'no database is left' "$(ls new.db 2>/dev/null)" ''
+cp all.db before.db
+small update all.db t --where '{"id": {"$gt": 0}}' "text=$(printf 'x%.0s' {1..200})"
+same 'exit of an update with a full disk' $? 7
+same 'nothing is updated' "$(sqlite3 all.db .dump | cksum)" "$(sqlite3 before.db .dump | cksum)"
+small list all.db t
+same 'exit of a list with a full disk' $? 7
+# shellcheck disable=SC2059
+same 'a list with a full disk' "$(cat err)" \
+    "error: standard output: $(printf "$written" 'File too large')"
+
+# What is stored when Ctrl-C comes: --batch says where the borders are. The input is a pipe that stays
+# open, so that the command waits for more.
+mkfifo feed
+# interrupt COUNT OPTION...: Ctrl-C when all that was fed is read, and COUNT records are stored.
+interrupt() {
+    local count=$1
+    shift
+    sqlite3 all.db 'DELETE FROM t'
+    "$VORNJSONDB" insert all.db t feed --format jsonl "$@" 2>err &
+    local pid=$!
+    exec 3>feed
+    head -n 5 lines >&3
+    until [[ $(sqlite3 -cmd '.timeout 5000' all.db 'SELECT count(*) FROM t') == "$count" &&
+        $(cut -d ' ' -f 3 /proc/$pid/stat) == S && ! -s err ]]; do
+        :
+    done
+    kill -INT "$pid"
+    wait "$pid"
+    same "exit after Ctrl-C with $*" $? 130
+    exec 3>&-
+}
+interrupt 4 --batch 2
+same 'Ctrl-C at a border' "$(cat err)" 'error: interrupted (the first 4 records are dealt with and stay)'
+same 'what stays' "$(sqlite3 all.db 'SELECT group_concat(id) FROM t')" 1,2,3,4
+interrupt 0
+same 'Ctrl-C' "$(cat err)" 'error: interrupted (nothing is stored)'
+same 'nothing stays' "$(sqlite3 all.db 'SELECT count(*) FROM t')" 0
+# A shell's loop goes on unless the signal itself ended the command.
+cat >interrupt.py <<'END'
+import signal, subprocess, sys
+command = subprocess.Popen(sys.argv[1:], stderr=subprocess.DEVNULL)
+with open('feed', 'w') as feed:
+    command.send_signal(signal.SIGINT)
+    print(command.wait())
+END
+same 'ended by the signal' \
+    "$(python3 interrupt.py "$VORNJSONDB" insert all.db t feed --format jsonl)" -2
+
+# What waits for a lock says how long, and a reader need not wait.
+mkfifo go
+(
+    echo 'BEGIN IMMEDIATE; SELECT 1;'
+    cat go
+) | sqlite3 all.db >held &
+until [[ -s held ]]; do :; done
+locked='database is locked (waited 10 ms); try again, or wait longer with --wait MS'
+expect 0 0 '' -- count all.db t
+expect 6 '' "error: all.db: cannot begin a transaction: $locked (nothing is stored)" -- \
+    insert all.db t lines --wait 10
+expect 6 '' "error: all.db: cannot begin a transaction: $locked" -- update all.db t 1 text=x --wait 10
+expect 6 '' "error: all.db: cannot save a record in table \"t\": $locked" -- \
+    upsert all.db t id=1 --wait 10
+expect 6 '' "error: all.db: cannot create an index on table \"t\": $locked" -- index all.db t text --wait 10
+"$VORNJSONDB" doctor all.db >out
+same 'who holds it' "$(grep writes out | sed 's/[0-9]\+/N/')" 'lock          process N (sqlite3) writes'
+: >go
+wait
+finish
