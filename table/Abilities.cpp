@@ -18,10 +18,10 @@ Abilities OldAbilities(const MemberType& Type) {
     const BoundKind eKind = Type.Bound.eKind;
     const bool blRead = Type.pfnRead != nullptr;
     const bool blFits = Type.pfnFits != nullptr;
+    const bool blWritten = blFits && Type.pfnAppend != nullptr;
     const bool blList = eKind == BoundKind::kList;
     const bool blBareTexts = eKind == BoundKind::kAny || eKind == BoundKind::kNone;
-    return Abilities{blRead && blFits && Type.pfnAppend != nullptr, blRead, blFits && !blList,
-                     !blList && !blBareTexts};
+    return Abilities{blRead && blWritten, blRead, blFits && !blList, !blList && !blBareTexts};
 }
 
 std::string Lacking(const Abilities& Some) {

@@ -1,34 +1,32 @@
 #include "Affinity.h"
 
+#include <sqlite3.h>
+
 namespace vornjsondb {
 
 namespace {
 
 struct PartRow {
-    const char* szPart;
+    const char* szPart;  // a pattern of LIKE
     Affinity eAffinity;
 };
 
 // The first part that is found decides, in the order in which SQLite looks.
 constexpr PartRow kParts[] = {
-    {"INT", Affinity::kInteger}, {"CHAR", Affinity::kText}, {"CLOB", Affinity::kText},
-    {"TEXT", Affinity::kText},   {"BLOB", Affinity::kNone}, {"REAL", Affinity::kReal},
-    {"FLOA", Affinity::kReal},   {"DOUB", Affinity::kReal},
+    {"%INT%", Affinity::kInteger}, {"%CHAR%", Affinity::kText}, {"%CLOB%", Affinity::kText},
+    {"%TEXT%", Affinity::kText},   {"%BLOB%", Affinity::kNone}, {"%REAL%", Affinity::kReal},
+    {"%FLOA%", Affinity::kReal},   {"%DOUB%", Affinity::kReal},
 };
 
 }  // namespace
 
 Affinity AffinityOf(const std::string& strDeclared) {
-    std::string strUpper = strDeclared;
-    for (char& c : strUpper) {
-        c = c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c;
-    }
     for (const PartRow& Row : kParts) {
-        if (strUpper.find(Row.szPart) != std::string::npos) {
+        if (sqlite3_strlike(Row.szPart, strDeclared.c_str(), 0) == 0) {
             return Row.eAffinity;
         }
     }
-    return strUpper.empty() ? Affinity::kNone : Affinity::kNumeric;
+    return strDeclared.empty() ? Affinity::kNone : Affinity::kNumeric;
 }
 
 bool Keeps(Affinity eAffinity, BoundKind eKind) {

@@ -1,6 +1,7 @@
 #include "BareNames.h"
 
 #include <algorithm>
+#include <cctype>
 #include <new>
 
 #include "Statements.h"
@@ -9,16 +10,15 @@ namespace vornjsondb {
 
 namespace {
 
-bool IsLetter(char c) {
-    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_' ||
-           static_cast<unsigned char>(c) >= 0x80;
+bool IsOfName(char c) {
+    const auto nByte = static_cast<unsigned char>(c);
+    return std::isalnum(nByte) != 0 || c == '_' || nByte >= 0x80;
 }
 
 // One word for SQLite: nothing in it ends the name, so it can go into a statement.
 bool IsWord(const std::string& strName) {
-    return !strName.empty() && IsLetter(strName[0]) &&
-           std::all_of(strName.begin(), strName.end(),
-                       [](char c) { return IsLetter(c) || (c >= '0' && c <= '9'); });
+    return std::isdigit(static_cast<unsigned char>(strName[0])) == 0 &&
+           std::all_of(strName.begin(), strName.end(), IsOfName);
 }
 
 }  // namespace
@@ -34,11 +34,19 @@ BareNames::BareNames() {
 
 // A name that gives the column's value is no keyword, and no constant as NULL and CURRENT_TIME are.
 bool BareNames::Has(const std::string& strName) const {
+    if (!IsWord(strName)) {
+        return false;
+    }
     OwnStatement pStatement;
     const std::string strSql = "SELECT " + strName + " FROM (SELECT 7 AS \"" + strName + "\")";
-    return IsWord(strName) && Prepare(m_pDb.get(), strSql, pStatement) == SQLITE_OK &&
-           sqlite3_step(pStatement.get()) == SQLITE_ROW &&
-           sqlite3_column_int(pStatement.get(), 0) == 7;
+    int nResult = Prepare(m_pDb.get(), strSql, pStatement);
+    if (nResult == SQLITE_OK) {
+        nResult = sqlite3_step(pStatement.get());
+    }
+    if (nResult == SQLITE_NOMEM) {
+        throw std::bad_alloc();
+    }
+    return nResult == SQLITE_ROW && sqlite3_column_int(pStatement.get(), 0) == 7;
 }
 
 }  // namespace vornjsondb

@@ -30,19 +30,6 @@ const char* DeclaredType(BoundKind eKind) {
     }
 }
 
-std::string TextLiteral(std::string_view strText) {
-    std::string strLiteral = "'";
-    for (const char c : strText) {
-        strLiteral.append(c == '\'' ? 2 : 1, c);
-    }
-    return strLiteral += '\'';
-}
-
-// A key of one whole number is the rowid itself: SQLite hands out values, and finds rows fastest.
-bool IsRowid(const Members& Of) {
-    return Of.Key().size() == 1 && Of.At(Of.Key()[0]).Kind() == BoundKind::kInteger;
-}
-
 }  // namespace
 
 std::string DefaultClause(const Member& Declared) {
@@ -68,7 +55,7 @@ std::string DefaultClause(const Member& Declared) {
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
             return Concat({" DEFAULT ", szReal});
         case BoundValue::Kind::kText:
-            return Concat({" DEFAULT ", TextLiteral(Value.strBytes)});
+            return Concat({" DEFAULT ", Enclosed(Value.strBytes, '\'')});
         default:
             return {};
     }
@@ -83,14 +70,14 @@ std::string CreateTableSql(const Members& Of) {
     std::string strSql = Concat({"CREATE TABLE IF NOT EXISTS ", Of.QuotedTable(), " ("});
     const char* szBefore = "";
     for (const Member& Declared : Of.All()) {
-        const bool blRowid = Declared.blKey && IsRowid(Of);
+        const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
         strSql += blRowid ? Concat({szBefore, Declared.strQuoted, " INTEGER PRIMARY KEY"})
                           : szBefore + ColumnClause(Declared, Declared.blNotNull || Declared.blKey);
         strSql += Declared.blUnique && !blRowid ? " UNIQUE" : "";
         szBefore = ", ";
     }
-    if (!Of.Key().empty() && !IsRowid(Of)) {
+    if (!Of.Key().empty() && !Of.HasRowidKey()) {
         strSql += ", PRIMARY KEY";
         szBefore = " (";
         for (const size_t nMember : Of.Key()) {

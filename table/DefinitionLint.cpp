@@ -19,24 +19,18 @@ namespace vornjsondb {
 
 namespace {
 
-const std::vector<std::string>& TableKeys() {
-    static const std::vector<std::string> s_vecKeys{"key", "member"};
-    return s_vecKeys;
-}
-
-const std::vector<std::string>& MemberKeys() {
-    static const std::vector<std::string> s_vecKeys{"cppDefaultValue", "cpptype", "notNull",
-                                                    "nullSeen", "unique"};
-    return s_vecKeys;
-}
+constexpr const char* kTableKeys[] = {"key", "member"};
+constexpr const char* kMemberKeys[] = {"cppDefaultValue", "cpptype", "notNull", "nullSeen",
+                                       "unique"};
 
 // Hosts keep keys of their own in a definition, so only what looks like a slip is reported.
-void LintKeys(const Json::Value& jEntry, const std::vector<std::string>& vecKnown,
+template <size_t nKeys>
+void LintKeys(const Json::Value& jEntry, const char* const (&aszKeys)[nKeys],
               const std::string& strPath, FindingList& vecFindings) {
+    const std::vector<std::string> vecKnown(aszKeys, aszKeys + nKeys);
     for (const std::string& strKey : jEntry.getMemberNames()) {
-        const bool blKnown = std::count(vecKnown.begin(), vecKnown.end(), strKey) > 0;
-        const std::string strSuggestion = blKnown ? "" : Suggestion(strKey, vecKnown);
-        if (!strSuggestion.empty()) {
+        const std::string strSuggestion = Suggestion(strKey, vecKnown);
+        if (std::count(vecKnown.begin(), vecKnown.end(), strKey) == 0 && !strSuggestion.empty()) {
             Report(vecFindings, FindingCode::kMisspeltKey, Below(strPath, strKey),
                    ShownText(strKey) + " is no key of a definition" + strSuggestion);
         }
@@ -57,7 +51,7 @@ class DefinitionLint {
             return;
         }
         const std::string strPath = Below("", m_strTable);
-        LintKeys(m_Of.Definition()[m_strTable], TableKeys(), strPath, m_vecFindings);
+        LintKeys(m_Of.Definition()[m_strTable], kTableKeys, strPath, m_vecFindings);
         if (!m_Names.Has(m_strTable)) {
             AddOldName(strPath, "table " + m_Of.QuotedTable());
         }
@@ -83,7 +77,7 @@ class DefinitionLint {
     void LintMember(const std::string& strName, const Json::Value& jEntry) {
         const std::string strPath = PathOf(strName);
         if (jEntry.isObject()) {
-            LintKeys(jEntry, MemberKeys(), strPath, m_vecFindings);
+            LintKeys(jEntry, kMemberKeys, strPath, m_vecFindings);
             LintFlags(jEntry, strPath);
         }
         LintName(strName, strPath);
@@ -117,9 +111,7 @@ class DefinitionLint {
                        "for more than a condition");
         }
         // As the table's key of one whole number the column is the rowid itself.
-        const size_t nMember = m_Of.Find(strName);
-        const bool blRowid = m_Of.Key() == std::vector<size_t>{nMember} &&
-                             m_Of.At(nMember).Kind() == BoundKind::kInteger;
+        const bool blRowid = m_Of.HasRowidKey() && m_Of.Key()[0] == m_Of.Find(strName);
         if (sqlite3_stricmp(strName.c_str(), "rowid") == 0 && !blRowid) {
             Report(m_vecFindings, FindingCode::kRowidName, strPath,
                    "member " + Quoted(strName) + " hides the row number by which a VornJsonDbApi " +

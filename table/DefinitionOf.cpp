@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "../src/base/JsonMemory.h"
+#include "Affinity.h"
 #include "Failure.h"
 #include "RealTable.h"
 
@@ -12,33 +13,20 @@ namespace VORN_JSON_DB {
 
 namespace {
 
+using vornjsondb::AffinityOf;
 using vornjsondb::RealColumn;
 using vornjsondb::RealTable;
 
-struct TypeRow {
-    const char* szPart;
-    const char* szType;
-};
-
-// A part of a declared type, in the order in which SQLite looks for it, and in front what it has
-// no rule for. Columns of other types hold values of any kind.
-constexpr TypeRow kTypes[] = {
-    {"BOOL", "bool"},   {"JSON", "Json::Value"}, {"INT", "long long"}, {"CHAR", "string"},
-    {"CLOB", "string"}, {"TEXT", "string"},      {"BLOB", "any"},      {"REAL", "double"},
-    {"FLOA", "double"}, {"DOUB", "double"},
-};
-
+// SQLite has no rule for the first two. Columns of types without one hold values of any kind.
 const char* TypeFor(const std::string& strDeclared) {
-    std::string strUpper = strDeclared;
-    for (char& c : strUpper) {
-        c = c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c;
+    static constexpr const char* kTypes[] = {"any", "string", "any", "long long", "double"};
+    if (sqlite3_strlike("%BOOL%", strDeclared.c_str(), 0) == 0) {
+        return "bool";
     }
-    for (const TypeRow& Row : kTypes) {
-        if (strUpper.find(Row.szPart) != std::string::npos) {
-            return Row.szType;
-        }
+    if (sqlite3_strlike("%JSON%", strDeclared.c_str(), 0) == 0) {
+        return "Json::Value";
     }
-    return "any";
+    return kTypes[static_cast<size_t>(AffinityOf(strDeclared))];
 }
 
 Json::Value Describe(const RealTable& Real) {

@@ -53,8 +53,8 @@ constexpr int Primary(int nSqlite) {
 
 // Everything else is a statement that SQLite refuses: no such column, too big, not authorised.
 StatusCode CodeOf(int nSqlite, int nSystemError) {
-    const bool blWrite = nSqlite == SQLITE_IOERR_WRITE;
-    if (blWrite && (nSystemError == ENOSPC || nSystemError == EDQUOT)) {
+    // Of a quota that is used up SQLite does not say that the disk is full.
+    if (nSqlite == SQLITE_IOERR_WRITE && nSystemError == EDQUOT) {
         return StatusCode::kDiskFull;
     }
     for (const CodeRow& Row : kCodes) {
@@ -83,10 +83,13 @@ std::string Doing::Text() const {
     if (nRecord != 0) {
         strText.replace(strText.find('#'), 1, std::to_string(nRecord));
     }
-    return pstrTable == nullptr ? strText : Concat({strText, " table ", Quoted(*pstrTable)});
+    if (pstrTable != nullptr) {
+        Append(strText, {" table ", Quoted(*pstrTable)});
+    }
+    return strText;
 }
 
-Status Fail(StatusCode eCode, const Doing& What, const std::string& strReason) {
+Status Fail(StatusCode eCode, const Doing& What, std::string_view strReason) {
     auto pDetails = std::make_shared<Status::Details>();
     pDetails->eCode = eCode;
     pDetails->strMessage = Concat({What.Text(), ": ", strReason});
@@ -148,7 +151,7 @@ Status Within(const Doing& What, const Status& Step) {
                      : Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
 }
 
-Status Amended(const Status& Outcome, Retry eRetry, const std::string& strMore) {
+Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {
     return Retold(Outcome, eRetry, Concat({Outcome.Message(), strMore}));
 }
 

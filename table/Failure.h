@@ -7,6 +7,7 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 #include <sqlite3.h>
 
@@ -38,14 +39,26 @@ struct Doing {
     std::string Text() const;
 };
 
-Status Fail(StatusCode eCode, const Doing& What, const std::string& strReason);
+Status Fail(StatusCode eCode, const Doing& What, std::string_view strReason);
 
 // nResult is what SQLite just returned; its words and details are the connection's last.
 Status FailBySqlite(sqlite3* pDb, int nResult, const Doing& What);
 
+// The same, or success for SQLITE_OK.
+inline Status FromSqlite(sqlite3* pDb, int nResult, const Doing& What) {
+    return nResult == SQLITE_OK ? Status() : FailBySqlite(pDb, nResult, What);
+}
+
 // Success, with the findings, when none of them is an error; else kRefused with the first one's
 // message.
 Status FromFindings(FindingList vecFindings, const Doing& What);
+
+// What a call returns a reference to where it has nothing.
+template <typename Kind>
+const Kind& None() {
+    static const Kind s_None{};
+    return s_None;
+}
 
 bool HasError(const FindingList& vecFindings);
 
@@ -58,7 +71,7 @@ inline bool IsLock(const Status& Outcome) {
 Status Within(const Doing& What, const Status& Step);
 
 // The same failure with other advice and more words.
-Status Amended(const Status& Outcome, Retry eRetry, const std::string& strMore);
+Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore);
 
 }  // namespace vornjsondb
 

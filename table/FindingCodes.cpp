@@ -98,33 +98,42 @@ std::string Shown(const Json::Value& jValue) {
             return Concat({"a list of ", std::to_string(jValue.size())});
         case Json::objectValue:
             return Concat({"an object of ", std::to_string(jValue.size())});
-        case Json::stringValue: {
-            const char* pBegin = nullptr;
-            const char* pEnd = nullptr;
-            jValue.getString(&pBegin, &pEnd);
-            return ShownText(std::string_view(pBegin, static_cast<size_t>(pEnd - pBegin)));
-        }
+        case Json::stringValue:
+            return ShownText(BytesOf(jValue));
         case Json::realValue: {
             char szDigits[32];
             sqlite3_snprintf(sizeof szDigits, szDigits, "%!.17g", jValue.asDouble());
             return szDigits;
         }
+        case Json::nullValue:
+            return "null";
         default:
-            return jValue.isNull() ? "null" : jValue.asString();
+            return jValue.asString();
     }
 }
 
 std::string ShownText(std::string_view strText) {
     const bool blLong = strText.size() > kShownBytes;
-    return Quoted(blLong ? Cut(strText) : strText) + (blLong ? "..." : "");
+    return Quoted(blLong ? Cut(strText) : strText).append(blLong ? "..." : "");
+}
+
+std::string_view BytesOf(const Json::Value& jText) {
+    const char* pBegin = nullptr;
+    const char* pEnd = nullptr;
+    jText.getString(&pBegin, &pEnd);
+    return {pBegin, static_cast<size_t>(pEnd - pBegin)};
 }
 
 std::string Quoted(std::string_view strName) {
-    std::string strQuoted = "\"";
-    for (const char c : strName) {
-        strQuoted.append(c == '"' ? 2 : 1, c);
+    return Enclosed(strName, '"');
+}
+
+std::string Enclosed(std::string_view strText, char cQuote) {
+    std::string strEnclosed(1, cQuote);
+    for (const char c : strText) {
+        strEnclosed.append(c == cQuote ? 2 : 1, c);
     }
-    return strQuoted += '"';
+    return strEnclosed += cQuote;
 }
 
 }  // namespace vornjsondb

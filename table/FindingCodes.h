@@ -158,8 +158,14 @@ std::string Below(const std::string& strPath, std::string_view strStep);
 std::string Shown(const Json::Value& jValue);
 std::string ShownText(std::string_view strText);
 
+// The bytes of a JSON value that is a text.
+std::string_view BytesOf(const Json::Value& jText);
+
 // A name in double quotes, as messages and SQL show it; quotes in it are doubled.
 std::string Quoted(std::string_view strName);
+
+// A text in quotes of that kind, those in it doubled.
+std::string Enclosed(std::string_view strText, char cQuote);
 
 }  // namespace vornjsondb
 

@@ -229,11 +229,8 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
                                     : FitHuge(Type, jValue.asUInt64(), blCompatible, Out);
         case Json::realValue:
             return FitReal(Type, jValue.asDouble(), blCompatible, Out);
-        case Json::stringValue: {
-            MemberName Text = {};
-            jValue.getString(&Text.pBegin, &Text.pEnd);
-            return FitText(Type, std::string_view(Text.pBegin, Text.Length()), blCompatible, Out);
-        }
+        case Json::stringValue:
+            return FitText(Type, BytesOf(jValue), blCompatible, Out);
         default:
             return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
     }

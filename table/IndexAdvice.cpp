@@ -19,7 +19,7 @@ bool IsFoundByIndex(const Node& Leaf) {
         case Op::kContains:
             return false;
         case Op::kNull:
-            return Leaf.jOperand.isBool() && Leaf.jOperand.asBool();
+            return Leaf.jOperand.asBool();
         case Op::kIn:
             return !Leaf.jOperand.empty();
         default:

@@ -24,16 +24,14 @@ bool EndsWith(const std::string& strText, const std::string& strEnd) {
 
 int FindFreeName(sqlite3* pDb, const std::string& strBase,
                  const std::vector<std::string>& vecPlanned, std::string& strName) {
-    bool blTaken = true;
-    for (int i = 1; blTaken; ++i) {
-        strName = i == 1 ? strBase : strBase + "_" + std::to_string(i);
-        const int nResult = IsNameTaken(pDb, strName, blTaken);
-        if (nResult != SQLITE_OK) {
-            return nResult;
-        }
-        blTaken = blTaken || std::count(vecPlanned.begin(), vecPlanned.end(), strName) > 0;
+    bool blTaken = false;
+    int nResult = IsNameTaken(pDb, strBase, blTaken);
+    strName = strBase;
+    for (int i = 2; blTaken || std::count(vecPlanned.begin(), vecPlanned.end(), strName) > 0; ++i) {
+        strName = strBase + "_" + std::to_string(i);
+        nResult = IsNameTaken(pDb, strName, blTaken);
     }
-    return SQLITE_OK;
+    return nResult;
 }
 
 }  // namespace

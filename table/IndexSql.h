@@ -10,7 +10,7 @@
 
 #include "Members.h"
 #include "PathSql.h"
-#include "RealIndexes.h"
+#include "RealTable.h"
 
 namespace vornjsondb {
 

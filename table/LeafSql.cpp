@@ -89,7 +89,11 @@ bool LeafSql::WriteOperator(const Operator& Row, const Json::Value& jOperand, Pr
         case OperandForm::kList:
             return WriteIn(Row, jOperand, Why);
         case OperandForm::kText:
-            return Row.eOp == Op::kLike ? WriteLike(jOperand, Why) : WritePrefix(jOperand, Why);
+            if (Row.eOp == Op::kLike) {
+                return WriteLike(jOperand, Why);
+            }
+            WritePrefix(jOperand);
+            return true;
         case OperandForm::kElement:
             return WriteContains(jOperand, Why);
         default:

@@ -42,7 +42,7 @@ class LeafSql {
     bool WriteIn(const Operator& Row, const Json::Value& jList, Problem& Why);
     bool WriteContains(const Json::Value& jElement, Problem& Why);
     bool WriteLike(const Json::Value& jPattern, Problem& Why);
-    bool WritePrefix(const Json::Value& jPrefix, Problem& Why);
+    void WritePrefix(const Json::Value& jPrefix);
 
     void AddLeft(ValueKind eKind);
     void AddKindTest(ValueKind eKind);

@@ -51,18 +51,14 @@ BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
 
 // With a bare parameter SQLite would prepare the statement again for each pattern.
 bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
-    Operand Pattern;
-    if (!m_Reader.Read(m_Where, jPattern, Pattern, Why)) {
-        return false;
-    }
-    if (const char* szFault = PatternFault(Pattern.Value.strBytes)) {
+    if (const char* szFault = PatternFault(BytesOf(jPattern))) {
         Why = {FindingCode::kBadPattern, Concat({"pattern ", Shown(jPattern), " ", szFault})};
         return false;
     }
     m_strSql += '(';
     AddLeft(ValueKind::kNull);
     m_strSql += " LIKE ";
-    m_Out.Add(Pattern.Value);
+    m_Out.Add(BoundText(BytesOf(jPattern)));
     m_strSql += "||'' ESCAPE '\\'";
     if (m_blPath) {
         CloseJson(ValueKind::kText);
@@ -72,22 +68,17 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
     return true;
 }
 
-bool LeafSql::WritePrefix(const Json::Value& jPrefix, Problem& Why) {
-    Operand Prefix;
-    if (!m_Reader.Read(m_Where, jPrefix, Prefix, Why)) {
-        return false;
-    }
+void LeafSql::WritePrefix(const Json::Value& jPrefix) {
     m_strSql += '(';
     AddLeft(ValueKind::kText);
     m_strSql += " >= ";
-    m_Out.Add(Prefix.Value);
+    m_Out.Add(BoundText(BytesOf(jPrefix)));
     m_strSql += " AND ";
     AddLeft(ValueKind::kText);
     m_strSql += " < ";
-    m_Out.Add(Beyond(Prefix.Value.strBytes, m_Reader));
+    m_Out.Add(Beyond(BytesOf(jPrefix), m_Reader));
     m_strSql += m_blPath ? "" : ")";
     CloseJson(ValueKind::kText);
-    return true;
 }
 
 }  // namespace vornjsondb

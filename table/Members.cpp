@@ -23,14 +23,6 @@ bool IsSet(const Json::Value& jEntry, const char* szFlag) {
     return pjFlag != nullptr && pjFlag->isBool() && pjFlag->asBool();
 }
 
-// SQLite compares names of columns so.
-std::string InLowerCase(std::string strName) {
-    for (char& c : strName) {
-        c = c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-    }
-    return strName;
-}
-
 bool IsUsableName(const std::string& strName) {
     return strName.find('\0') == std::string::npos && strName.compare(0, 1, "$") != 0;
 }
@@ -63,17 +55,15 @@ VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
-    std::vector<std::string> vecColumns;
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
         const std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
-        const std::string strColumn = InLowerCase(strName);
         if (!IsUsableName(strName)) {
             Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
                    Concat({ShownText(strName),
                            " cannot be a member: it begins with $ or holds a NUL byte"}));
-        } else if (std::count(vecColumns.begin(), vecColumns.end(), strColumn) > 0) {
+        } else if (FindColumn(strName) != kNone) {
             Report(vecFindings, FindingCode::kSameColumn, Below(strPath, strName),
                    Concat({ShownText(strName),
                            " is another member's column: letter case makes no difference"}));
@@ -89,7 +79,6 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
                        IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false});
             m_vecNames.push_back(strName);
-            vecColumns.push_back(strColumn);
         }
     }
 }
@@ -122,15 +111,20 @@ size_t Members::Find(std::string_view strName) const {
                : kNone;
 }
 
-// SQLite's table may spell a column in another letter case than the definition.
+bool IsSameColumn(const std::string& strLeft, const std::string& strRight) {
+    return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
+}
+
 size_t Members::FindColumn(const std::string& strColumn) const {
-    const std::string strWanted = InLowerCase(strColumn);
-    for (size_t i = 0; i < m_vecNames.size(); ++i) {
-        if (InLowerCase(m_vecNames[i]) == strWanted) {
-            return i;
-        }
+    size_t nMember = 0;
+    while (nMember < m_vecNames.size() && !IsSameColumn(m_vecNames[nMember], strColumn)) {
+        ++nMember;
     }
-    return kNone;
+    return nMember < m_vecNames.size() ? nMember : kNone;
+}
+
+bool Members::HasRowidKey() const {
+    return m_vecKey.size() == 1 && At(m_vecKey[0]).Kind() == BoundKind::kInteger;
 }
 
 void Members::SetKey(const std::vector<std::string>& vecColumns) {

@@ -57,6 +57,10 @@ class Members {
     // The places of the key's members, in the key's order; none when there is no key.
     const std::vector<size_t>& Key() const { return m_vecKey; }
 
+    // A key of one whole number is the rowid itself: SQLite hands out values, and finds rows
+    // fastest.
+    bool HasRowidKey() const;
+
     // What only the real table tells. A key of which not all columns are members is none.
     void SetKey(const std::vector<std::string>& vecColumns);
     void SetGenerated(size_t nMember) { m_vecAll[nMember].blGenerated = true; }
@@ -76,6 +80,9 @@ class Members {
     std::vector<std::string> m_vecNames;
     std::vector<size_t> m_vecKey;
 };
+
+// By their names, in any letter case: so SQLite takes them.
+bool IsSameColumn(const std::string& strLeft, const std::string& strRight);
 
 }  // namespace vornjsondb
 

@@ -63,7 +63,10 @@ std::string Nearest(std::string_view strTyped, const std::vector<std::string>& v
 
 std::string Suggestion(std::string_view strTyped, const std::vector<std::string>& vecCandidates) {
     const std::string strNearest = Nearest(strTyped, vecCandidates);
-    return strNearest.empty() ? strNearest : Concat({" (did you mean ", Quoted(strNearest), "?)"});
+    if (strNearest.empty()) {
+        return {};
+    }
+    return Concat({" (did you mean ", Quoted(strNearest), "?)"});
 }
 
 }  // namespace vornjsondb

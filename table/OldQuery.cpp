@@ -15,11 +15,7 @@ namespace {
 
 void AppendSqlText(std::string_view strText, std::string& strSql) {
     if (IsPlainText(strText)) {
-        strSql += '\'';
-        for (const char c : strText) {
-            strSql.append(c == '\'' ? 2 : 1, c);
-        }
-        strSql += '\'';
+        strSql += Enclosed(strText, '\'');
         return;
     }
     // The plus takes away the CAST's affinity: a bound value has none.
@@ -82,11 +78,10 @@ void AppendLiteral(const BoundValue& Value, std::string& strSql) {
 // its own, for what its UPDATE leaves on the parser's stack.
 static Status Try(const Table::Parts& From, const std::string& strCondition,
                   const std::string& strTail, const Doing& What) {
-    const std::string strSql = "SELECT 1 FROM " + From.Of.QuotedTable() + " WHERE ((((" +
-                               (strCondition.empty() ? "1" : strCondition) + "))))" + strTail;
+    const std::string strSql =
+        "SELECT 1 FROM " + From.Of.QuotedTable() + " WHERE ((((" + strCondition + "))))" + strTail;
     OwnStatement pStatement;
-    const int nResult = Prepare(From.pDb, strSql, pStatement);
-    return nResult == SQLITE_OK ? Status() : FailBySqlite(From.pDb, nResult, What);
+    return FromSqlite(From.pDb, Prepare(From.pDb, strSql, pStatement), What);
 }
 
 }  // namespace vornjsondb
@@ -94,40 +89,39 @@ static Status Try(const Table::Parts& From, const std::string& strCondition,
 namespace VORN_JSON_DB {
 
 Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQuery) try {
-    constexpr char kDo[] = "write an old query for";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& From = *m_pParts;
-    const vornjsondb::Doing What = From.Do(kDo);
-    FindingList vecFindings;
-    vornjsondb::QueryPlan Plan(From.Of, From.Codec, vornjsondb::AppendLiteral);
-    const auto eUse =
-        eCall == OldCall::kRead ? vornjsondb::QueryUse::kRead : vornjsondb::QueryUse::kChange;
-    Plan.Resolve(Which, eUse, vecFindings);
-    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
-    if (!Checked.Ok()) {
+    const auto fnWrite = [&](Parts& From, const vornjsondb::Doing& What) {
+        FindingList vecFindings;
+        vornjsondb::QueryPlan Plan(From.Of, From.Codec, vornjsondb::AppendLiteral);
+        const auto eUse =
+            eCall == OldCall::kRead ? vornjsondb::QueryUse::kRead : vornjsondb::QueryUse::kChange;
+        Plan.Resolve(Which, eUse, vecFindings);
+        Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
+        if (!Checked.Ok()) {
+            return Checked;
+        }
+        std::string strCondition(Plan.Condition());
+        std::string strTail;
+        Plan.AppendTail(strTail);
+        const bool blAll = strCondition.empty() && strTail.empty();
+        strCondition.append(strCondition.empty() ? "1" : "");
+        Status Tried = vornjsondb::Try(From, strCondition, strTail, What);
+        if (!Tried.Ok()) {
+            return Tried;
+        }
+        // The old handle writes the filter in parentheses and a semicolon behind; its own sorting
+        // sorts nothing. So the filter closes the parenthesis by itself and makes a comment of the
+        // rest.
+        if (!strTail.empty()) {
+            strCondition += ")" + strTail + " --";
+        }
+        Json::Value jMade(Json::objectValue);
+        if (!blAll) {
+            jMade["vornSqlWhereFilter"] = strCondition;
+        }
+        jOldQuery.swapPayload(jMade);
         return Checked;
-    }
-    std::string strCondition(Plan.Condition());
-    std::string strTail;
-    Plan.AppendTail(strTail);
-    Status Tried = vornjsondb::Try(From, strCondition, strTail, What);
-    if (!Tried.Ok()) {
-        return Tried;
-    }
-    // The old handle writes the filter in parentheses and a semicolon behind; its own sorting sorts
-    // nothing. So the filter closes the parenthesis by itself and makes a comment of the rest.
-    if (!strTail.empty()) {
-        strCondition = (strCondition.empty() ? "1" : strCondition) + ")" + strTail + " --";
-    }
-    Json::Value jMade(Json::objectValue);
-    if (!strCondition.empty()) {
-        jMade["vornSqlWhereFilter"] = strCondition;
-    }
-    jOldQuery.swapPayload(jMade);
-    return Checked;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "write an old query for", false, fnWrite);
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 

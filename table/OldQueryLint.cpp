@@ -14,14 +14,6 @@ namespace vornjsondb {
 
 namespace {
 
-bool HoldsNul(const Json::Value& jValue) {
-    const char* pBegin = nullptr;
-    const char* pEnd = nullptr;
-    return jValue.isString() && jValue.getString(&pBegin, &pEnd) &&
-           std::string_view(pBegin, static_cast<size_t>(pEnd - pBegin)).find('\0') !=
-               std::string_view::npos;
-}
-
 // Kinds of values as the type knows them; null is another matter.
 bool IsOfKind(BoundKind eKind, const Json::Value& jValue) {
     switch (eKind) {
@@ -31,7 +23,7 @@ bool IsOfKind(BoundKind eKind, const Json::Value& jValue) {
             return jValue.isBool();
         case BoundKind::kInteger:
         case BoundKind::kReal:
-            return jValue.isNumeric() && !jValue.isBool();
+            return jValue.isNumeric();
         case BoundKind::kObject:
             return jValue.isObject();
         default:
@@ -93,7 +85,7 @@ class OldQueryLint {
     }
 
     void LintFilter(const Json::Value& jFilter, const std::string& strPath) {
-        if (!jFilter.isString() || jFilter.asString().empty()) {
+        if (!jFilter.isString() || BytesOf(jFilter).empty()) {
             Report(m_vecFindings, FindingCode::kOldRefuses, strPath,
                    Shown(jFilter) + " is no condition: expected is a text of SQL");
         } else {
@@ -136,7 +128,8 @@ class OldQueryLint {
             Report(m_vecFindings, FindingCode::kOldOtherKind, strPath,
                    m_strMember + ": " + Shown(jValue) + " is converted: expected is " +
                        Expected(Type));
-        } else if (eForm == ConditionForm::kQuotedText && HoldsNul(jValue)) {
+        } else if (eForm == ConditionForm::kQuotedText &&
+                   BytesOf(jValue).find('\0') != std::string_view::npos) {
             Report(m_vecFindings, FindingCode::kNulCut, strPath,
                    m_strMember + ": compared is the text before its NUL byte");
         }
@@ -194,7 +187,7 @@ class OldQueryLint {
         if (pjCount == nullptr) {
             return;
         }
-        if (!pjCount->isInt64() || pjCount->isBool()) {
+        if (!pjCount->isInt64()) {
             Report(m_vecFindings, FindingCode::kBadCount, Below("", szKey),
                    Quoted(szKey) + " is " + Shown(*pjCount) + ", no whole number");
         } else {

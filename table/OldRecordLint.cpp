@@ -37,13 +37,6 @@ Percents FateOf(std::string strText, size_t nLater) {
     return eFate;
 }
 
-std::string TextOf(const Json::Value& jText) {
-    const char* pBegin = nullptr;
-    const char* pEnd = nullptr;
-    jText.getString(&pBegin, &pEnd);
-    return {pBegin, pEnd};
-}
-
 class OldRecordLint {
   public:
     OldRecordLint(const Json::Value& jMembers, const Json::Value& jRecord, FindingList& vecFindings)
@@ -103,7 +96,7 @@ class OldRecordLint {
         } else if (Type.Bound.eKind == BoundKind::kInteger) {
             LintInteger(strMember, Type, jValue, strPath);
         } else if (jValue.isString()) {
-            LintText(strMember, TextOf(jValue), strPath, nLater);
+            LintText(strMember, std::string(BytesOf(jValue)), strPath, nLater);
         } else if (Type.Bound.eKind != BoundKind::kBoolean) {
             LintJson(strMember, Type, jValue, strPath, nLater);
         }

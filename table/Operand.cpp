@@ -25,16 +25,10 @@ constexpr MisfitRow kMisfits[] = {
 
 Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& jValue) {
     const MisfitRow* pRow = std::begin(kMisfits);
-    while (pRow->eMisfit != eMisfit && pRow + 1 != std::end(kMisfits)) {
+    while (pRow->eMisfit != eMisfit) {
         ++pRow;
     }
     return {pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason})};
-}
-
-std::string_view ViewOf(const Json::Value& jText) {
-    MemberName Text = {};
-    jText.getString(&Text.pBegin, &Text.pEnd);
-    return Text.View();
 }
 
 ValueKind KindOf(const BoundValue& Value) {
@@ -93,8 +87,7 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     }
     if (jValue.isString()) {
         Out.eKind = ValueKind::kText;
-        Out.Value.eKind = BoundValue::Kind::kText;
-        Out.Value.strBytes = ViewOf(jValue);
+        Out.Value = BoundText(BytesOf(jValue));
         if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
             Why = {FindingCode::kNulInJson,
                    "JSON: " + Shown(jValue) + " holds a NUL byte, where SQLite may end it"};
@@ -122,9 +115,13 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
 
 BoundValue OperandReader::Keep(std::string strText) {
     m_listTexts.push_front(std::move(strText));
+    return BoundText(m_listTexts.front());
+}
+
+BoundValue BoundText(std::string_view strText) {
     BoundValue Text;
     Text.eKind = BoundValue::Kind::kText;
-    Text.strBytes = m_listTexts.front();
+    Text.strBytes = strText;
     return Text;
 }
 

@@ -26,6 +26,9 @@ struct Operand {
     BoundValue Value;  // kNull where the kind says it all
 };
 
+// Points to the text.
+BoundValue BoundText(std::string_view strText);
+
 class OperandReader {
   public:
     OperandReader(const Members& Of, JsonCodec& Codec, std::forward_list<std::string>& listTexts)

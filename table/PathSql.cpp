@@ -12,12 +12,8 @@ namespace {
 constexpr size_t kMostIndexDigits = 9;   // SQLite lets a longer index wrap around
 constexpr size_t kMostPathBytes = 1000;  // SQLite follows a path by recursion
 
-bool IsDigit(char c) {
-    return c >= '0' && c <= '9';
-}
-
 bool IsNumber(std::string_view strText) {
-    return !strText.empty() && std::all_of(strText.begin(), strText.end(), IsDigit);
+    return !strText.empty() && strText.find_first_not_of("0123456789") == std::string_view::npos;
 }
 
 // SQLite has no escape for what would end the name or begin one.
@@ -30,10 +26,12 @@ bool IsReachable(std::string_view strName) {
 // Takes ".name" from the front of strSteps.
 bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const std::string_view strName = strSteps.substr(1, strSteps.find_first_of(".[", 1) - 1);
-    if (strName.empty() || !IsReachable(strName)) {
-        Why = {FindingCode::kBadPath, strName.empty()
-                                          ? "a name is missing in it"
-                                          : Concat({"no path leads to ", ShownText(strName)})};
+    if (strName.empty()) {
+        Why = {FindingCode::kBadPath, "a name is missing in it"};
+        return false;
+    }
+    if (!IsReachable(strName)) {
+        Why = {FindingCode::kBadPath, Concat({"no path leads to ", ShownText(strName)})};
         return false;
     }
     if (IsNumber(strName)) {
@@ -80,8 +78,8 @@ bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
 
 std::string Guarded(const char* szFunction, const std::string& strColumn,
                     const std::string& strPath) {
-    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN ", szFunction, "(", strColumn,
-                   strPath.empty() ? "" : ", ", strPath, ") END"});
+    return Concat({"CASE WHEN json_valid(", strColumn, ") THEN ", szFunction, "(", strColumn, ", ",
+                   strPath, ") END"});
 }
 
 }  // namespace

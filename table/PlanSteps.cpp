@@ -10,13 +10,12 @@ namespace vornjsondb {
 namespace {
 
 // Whether the step is of that kind and of the table. Releases before 3.36 write "SCAN TABLE task".
-bool IsOf(const std::string& strStep, const std::string& strKind, const std::string& strTable) {
+bool IsOf(const std::string& strStep, const char* szKind, const std::string& strTable) {
     const std::string strFound = strStep.substr(strStep.find_first_not_of(' ')) + " ";
-    const auto BeginsWith = [&strFound](const std::string& strHead) {
-        return strFound.compare(0, strHead.size(), strHead) == 0;
-    };
-    return BeginsWith(strKind + " " + strTable + " ") ||
-           BeginsWith(strKind + " TABLE " + strTable + " ");
+    const std::string strNew = std::string(szKind) + " " + strTable + " ";
+    const std::string strOld = std::string(szKind) + " TABLE " + strTable + " ";
+    return strFound.compare(0, strNew.size(), strNew) == 0 ||
+           strFound.compare(0, strOld.size(), strOld) == 0;
 }
 
 }  // namespace
@@ -27,18 +26,14 @@ int ReadPlanSteps(sqlite3* pDb, const std::string& strSql, std::vector<std::stri
     if (nResult != SQLITE_OK) {
         return nResult;
     }
-    std::vector<std::pair<int, std::string>> vecOpen{{0, ""}};  // steps by number, with indents
+    std::vector<std::pair<int, std::string>> vecOpen(1);  // steps by number, with indents
     while ((nResult = sqlite3_step(pStatement.get())) == SQLITE_ROW) {
         const int nParent = sqlite3_column_int(pStatement.get(), 1);
         while (vecOpen.size() > 1 && vecOpen.back().first != nParent) {
             vecOpen.pop_back();
         }
         const std::string strIndent = vecOpen.back().second;
-        const auto* pDetail = sqlite3_column_text(pStatement.get(), 3);
-        if (pDetail == nullptr) {
-            return SQLITE_NOMEM;
-        }
-        vecSteps.push_back(strIndent + reinterpret_cast<const char*>(pDetail));
+        vecSteps.push_back(strIndent + TextColumn(pStatement, 3));
         vecOpen.emplace_back(sqlite3_column_int(pStatement.get(), 0), strIndent + "  ");
     }
     return nResult == SQLITE_DONE ? SQLITE_OK : nResult;

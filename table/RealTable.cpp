@@ -1,10 +1,12 @@
 #include "RealTable.h"
 
 #include <algorithm>
+#include <map>
 #include <utility>
 
 #include "Concat.h"
 #include "FindingCodes.h"
+#include "Members.h"
 #include "Statements.h"
 
 namespace vornjsondb {
@@ -14,24 +16,31 @@ namespace {
 constexpr char kColumnsSql[] =
     "SELECT name, type, dflt_value, pk, \"notnull\", hidden FROM pragma_table_xinfo(?1)";
 
-// Columns of pragma_table_xinfo: generated ones are hidden in their own ways.
-constexpr int kVirtual = 2;
-constexpr int kStored = 3;
+constexpr char kIndexesSql[] =
+    "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name,"
+    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name)"
+    " FROM pragma_index_list(?1) AS Listed, pragma_index_info(Listed.name) AS Part"
+    " ORDER BY Listed.seq, Part.seqno";
 
-int ReadColumns(sqlite3* pDb, const std::string& strTable, std::vector<RealColumn>& vecColumns) {
+constexpr char kNameSql[] =
+    "SELECT 1 FROM (SELECT name FROM sqlite_schema UNION ALL SELECT name FROM sqlite_temp_schema)"
+    " WHERE name = ?1 COLLATE NOCASE";
+
+// Calls fnRow for each row of a statement about the name.
+template <typename PerRow>
+int ForEachRow(sqlite3* pDb, const char* szSql, const std::string& strName, PerRow&& fnRow) {
     OwnStatement pStatement;
-    int nResult = PrepareFor(pDb, kColumnsSql, strTable, pStatement);
-    if (nResult != SQLITE_OK) {
-        return nResult;
-    }
-    while ((nResult = sqlite3_step(pStatement.get())) == SQLITE_ROW) {
-        const int nHidden = sqlite3_column_int(pStatement.get(), 5);
-        vecColumns.push_back(RealColumn{
-            TextColumn(pStatement, 0), TextColumn(pStatement, 1), TextColumn(pStatement, 2),
-            sqlite3_column_int(pStatement.get(), 3), sqlite3_column_int(pStatement.get(), 4) != 0,
-            nHidden == kVirtual || nHidden == kStored});
+    int nResult = PrepareFor(pDb, szSql, strName, pStatement);
+    if (nResult == SQLITE_OK) {
+        while ((nResult = sqlite3_step(pStatement.get())) == SQLITE_ROW) {
+            fnRow(pStatement);
+        }
     }
     return nResult == SQLITE_DONE ? SQLITE_OK : nResult;
+}
+
+int NumberColumn(const OwnStatement& pStatement, int nColumn) {
+    return sqlite3_column_int(pStatement.get(), nColumn);
 }
 
 // Binds the text, where one is given, and gives the first column of the first row as a number; no
@@ -52,19 +61,15 @@ int ReadNumber(const OwnStatement& pStatement, const std::string* pstrText, int&
     return SQLITE_OK;
 }
 
-bool IsColumn(const RealTable& Real, const char* szName) {
-    return std::any_of(Real.vecColumns.begin(), Real.vecColumns.end(),
-                       [szName](const RealColumn& Column) {
-                           return sqlite3_stricmp(Column.strName.c_str(), szName) == 0;
-                       });
-}
-
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
+        const bool blColumn = std::any_of(
+            Real.vecColumns.begin(), Real.vecColumns.end(),
+            [szName](const RealColumn& Column) { return IsSameColumn(Column.strName, szName); });
         OwnStatement pStatement;
         const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
-        if (!IsColumn(Real, szName) && Prepare(pDb, strSql, pStatement) == SQLITE_OK) {
+        if (!blColumn && Prepare(pDb, strSql, pStatement) == SQLITE_OK) {
             return szName;
         }
     }
@@ -74,27 +79,39 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
 }  // namespace
 
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
-    RealTable Real;
-    const int nResult = ReadColumns(pDb, strTable, Real.vecColumns);
-    if (nResult != SQLITE_OK || Real.vecColumns.empty()) {
-        Out = std::move(Real);
-        return nResult;
-    }
-    std::vector<const RealColumn*> vecKey;
-    for (const RealColumn& Column : Real.vecColumns) {
-        if (Column.nKeyPlace > 0) {
-            vecKey.push_back(&Column);
-        }
-    }
-    std::sort(vecKey.begin(), vecKey.end(), [](const RealColumn* pLeft, const RealColumn* pRight) {
-        return pLeft->nKeyPlace < pRight->nKeyPlace;
+    // Generated columns are hidden, each kind in its own way.
+    constexpr int kVirtual = 2;
+    Out = RealTable();
+    std::map<int, std::string> mapKey;  // by their places in it, from 1
+    const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
+        Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
+                                            TextColumn(pRow, 2), NumberColumn(pRow, 4) != 0,
+                                            NumberColumn(pRow, 5) >= kVirtual});
+        mapKey[NumberColumn(pRow, 3)] = TextColumn(pRow, 0);
     });
-    for (const RealColumn* pColumn : vecKey) {
-        Real.vecKey.push_back(pColumn->strName);
+    mapKey.erase(0);  // columns outside of the key
+    for (const auto& Each : mapKey) {
+        Out.vecKey.push_back(Each.second);
     }
-    Real.strRowid = NameOfRowid(pDb, strTable, Real);
-    Out = std::move(Real);
-    return SQLITE_OK;
+    if (nResult == SQLITE_OK && !Out.vecColumns.empty()) {
+        Out.strRowid = NameOfRowid(pDb, strTable, Out);
+    }
+    return nResult;
+}
+
+int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes) {
+    int nLast = -1;
+    return ForEachRow(pDb, kIndexesSql, strTable, [&](const OwnStatement& pRow) {
+        if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
+            vecIndexes.push_back(RealIndex{TextColumn(pRow, 3), NumberColumn(pRow, 1) != 0, {}});
+        }
+        vecIndexes.back().vecColumns.push_back(TextColumn(pRow, 2));
+    });
+}
+
+int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken) {
+    blTaken = false;
+    return ForEachRow(pDb, kNameSql, strName, [&](const OwnStatement&) { blTaken = true; });
 }
 
 // A temporary one hides another of its name.

@@ -1,4 +1,4 @@
-// What the database itself says of a table.
+// What the database itself says of a table and its indexes.
 
 #ifndef VORN_TABLE_REAL_TABLE_H
 #define VORN_TABLE_REAL_TABLE_H
@@ -14,7 +14,6 @@ struct RealColumn {
     std::string strName;
     std::string strType;     // as declared
     std::string strDefault;  // as SQL; empty: none
-    int nKeyPlace;           // in the primary key, from 1; 0: not part of it
     bool blNotNull;
     bool blGenerated;
 };
@@ -25,8 +24,18 @@ struct RealTable {
     std::string strRowid;                // a name of the rowid that no column hides; empty: none
 };
 
-// Returns SQLite's result. A table that is not there is no failure.
+struct RealIndex {
+    std::string strSql;                   // its statement; empty: part of the table's own
+    bool blUnique;                        // among all rows
+    std::vector<std::string> vecColumns;  // empty texts: expressions
+};
+
+// All return SQLite's result. A table that is not there is no failure.
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
+int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes);
+
+// Whether a table, an index, a view or a trigger has that name, in any letter case.
+int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);
 
 // Whether the name is that of a view. Returns SQLite's result.
 int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);

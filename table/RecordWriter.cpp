@@ -40,7 +40,8 @@ std::string OnConflict(const Members& Of, bool blReplace) {
                             Other.strQuoted});
         }
     }
-    return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet.empty() ? "NOTHING" : strSet});
+    strSet.append(strSet.empty() ? "NOTHING" : "");
+    return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet});
 }
 
 // A record of nothing but its key changes nothing: "id" = "id" finds out whether it is there.
@@ -51,9 +52,11 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
             Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
-    const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
-    return Concat({"UPDATE ", Of.QuotedTable(), " SET ",
-                   strSet.empty() ? strKey + "=" + strKey : strSet, WhereKey(Of)});
+    if (strSet.empty()) {
+        const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
+        strSet = Concat({strKey, "=", strKey});
+    }
+    return Concat({"UPDATE ", Of.QuotedTable(), " SET ", strSet, WhereKey(Of)});
 }
 
 }  // namespace
@@ -163,7 +166,8 @@ Status RecordWriter::WithValues(const Status& Failed) const {
                    {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
         }
     }
-    return strMore.empty() ? Failed : Amended(Failed, Failed.Advice(), strMore + ")");
+    strMore.append(strMore.empty() ? "" : ")");
+    return Amended(Failed, Failed.Advice(), strMore);
 }
 
 }  // namespace vornjsondb

@@ -1,6 +1,9 @@
 #include "SqlWords.h"
 
 #include <algorithm>
+#include <cctype>
+
+#include <sqlite3.h>
 
 namespace vornjsondb {
 
@@ -14,13 +17,9 @@ struct Enclosure {
 constexpr Enclosure kEnclosures[] = {{"'", "'"}, {"\"", "\""}, {"`", "`"},
                                      {"[", "]"}, {"--", "\n"}, {"/*", "*/"}};
 
-char Upper(char c) {
-    return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c;
-}
-
 bool IsOfWord(char c) {
-    return (Upper(c) >= 'A' && Upper(c) <= 'Z') || (c >= '0' && c <= '9') || c == '_' || c == '$' ||
-           static_cast<unsigned char>(c) >= 0x80;
+    const auto nByte = static_cast<unsigned char>(c);
+    return std::isalnum(nByte) != 0 || c == '_' || c == '$' || nByte >= 0x80;
 }
 
 // Behind a quoted text or a comment that begins at nAt; nAt itself where none does. A doubled
@@ -39,23 +38,23 @@ size_t BehindEnclosure(const std::string& strSql, size_t nAt) {
 
 }  // namespace
 
-bool HoldsWord(const std::string& strSql, const std::string& strWord) {
+bool HoldsWord(const std::string& strSql, std::string_view strWord) {
     size_t nAt = 0;
     while (nAt < strSql.size()) {
         const size_t nBehind = BehindEnclosure(strSql, nAt);
-        const auto itBegin = strSql.begin() + static_cast<std::ptrdiff_t>(nAt);
-        const auto itEnd = std::find_if_not(itBegin, strSql.end(), IsOfWord);
         if (nBehind > nAt) {
             nAt = nBehind;
-        } else if (itEnd == itBegin) {
-            ++nAt;
-        } else {
-            const auto fnSame = [](char cLeft, char cRight) { return Upper(cLeft) == cRight; };
-            if (std::equal(itBegin, itEnd, strWord.begin(), strWord.end(), fnSame)) {
-                return true;
-            }
-            nAt = static_cast<size_t>(itEnd - strSql.begin());
+            continue;
         }
+        size_t nEnd = nAt;
+        while (nEnd < strSql.size() && IsOfWord(strSql[nEnd])) {
+            ++nEnd;
+        }
+        if (nEnd - nAt == strWord.size() &&
+            sqlite3_strnicmp(&strSql[nAt], strWord.data(), static_cast<int>(strWord.size())) == 0) {
+            return true;
+        }
+        nAt = std::max(nEnd, nAt + 1);
     }
     return false;
 }

@@ -2,12 +2,13 @@
 #define VORN_TABLE_SQL_WORDS_H
 
 #include <string>
+#include <string_view>
 
 namespace vornjsondb {
 
-// Whether the word, in capitals, stands in an SQL text in any letter case: outside of quotes,
+// Whether the word stands in an SQL text in any letter case: outside of quotes,
 // comments and other words.
-bool HoldsWord(const std::string& strSql, const std::string& strWord);
+bool HoldsWord(const std::string& strSql, std::string_view strWord);
 
 }  // namespace vornjsondb
 

@@ -28,8 +28,11 @@ int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnS
 }
 
 std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
-    const auto* pText = sqlite3_column_text(pStatement.get(), nColumn);
-    return pText == nullptr ? std::string() : reinterpret_cast<const char*>(pText);
+    std::string strText;
+    if (const auto* pText = sqlite3_column_text(pStatement.get(), nColumn)) {
+        strText = reinterpret_cast<const char*>(pText);
+    }
+    return strText;
 }
 
 Statement::Statement(Statement&& From) noexcept

@@ -41,13 +41,11 @@ Retry Status::Advice() const {
 }
 
 const std::string& Status::Message() const {
-    static const std::string s_strNone;
-    return m_pDetails ? m_pDetails->strMessage : s_strNone;
+    return m_pDetails ? m_pDetails->strMessage : vornjsondb::None<std::string>();
 }
 
 const FindingList& Status::Findings() const {
-    static const FindingList s_vecNone;
-    return m_pDetails ? m_pDetails->vecFindings : s_vecNone;
+    return m_pDetails ? m_pDetails->vecFindings : vornjsondb::None<FindingList>();
 }
 
 int Status::SqliteCode() const {

@@ -13,7 +13,6 @@ namespace {
 
 using vornjsondb::Callable;
 using vornjsondb::Doing;
-using vornjsondb::FailBySqlite;
 using vornjsondb::QueryPlan;
 using vornjsondb::QueryUse;
 using vornjsondb::Statement;
@@ -32,13 +31,10 @@ Status Run(Parts& Into, const Doing& What, const std::string& strShape,
         if (nResult == SQLITE_OK) {
             nResult = Lent.Finish();
         }
-        if (nResult != SQLITE_OK) {
-            return FailBySqlite(Into.pDb, nResult, What);
-        }
-        if (pnRows != nullptr) {
+        if (nResult == SQLITE_OK && pnRows != nullptr) {
             *pnRows = sqlite3_changes(Into.pDb);
         }
-        return {};
+        return vornjsondb::FromSqlite(Into.pDb, nResult, What);
     });
 }
 
@@ -52,79 +48,69 @@ std::string SetSql(const vornjsondb::Members& Of, const vornjsondb::RecordValues
     return strSet;
 }
 
-// The outcome of the statement, with the query's warnings where it succeeded.
-Status Join(const Status& Warned, const Status& Ran) {
-    return Ran.Ok() ? Warned : Ran;
+// Runs what a query with findings leads to; a success tells its warnings.
+template <typename Change>
+Status RunChecked(FindingList vecFindings, const Doing& What, Change&& fnChange) {
+    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
+    if (!Checked.Ok()) {
+        return Checked;
+    }
+    Status Ran = fnChange();
+    return Ran.Ok() ? Checked : Ran;
 }
 
 }  // namespace
 
 Status Table::Update(const Query& Which, const Json::Value& jMembers, std::int64_t* pnRows) {
-    constexpr char kDo[] = "update records of";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& Into = *m_pParts;
-    const Doing What = Into.Do(kDo);
-    FindingList vecFindings;
-    QueryPlan Plan(Into.Of, Into.Codec);
-    Plan.Resolve(Which, QueryUse::kChange, vecFindings);
-    FindingList vecMembers;
-    Into.Values.Take(jMembers, vecMembers);
-    vecFindings.insert(vecFindings.end(), vecMembers.begin(), vecMembers.end());
-    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
-    if (!Checked.Ok()) {
-        return Checked;
-    }
-    const auto fnSql = [&] {
-        std::string strSql = "UPDATE " + Into.Of.QuotedTable() + SetSql(Into.Of, Into.Values);
-        Plan.AppendWhere(strSql);
-        return strSql;
+    const auto fnUpdate = [&](Parts& Into, const Doing& What) {
+        FindingList vecFindings;
+        QueryPlan Plan(Into.Of, Into.Codec);
+        Plan.Resolve(Which, QueryUse::kChange, vecFindings);
+        FindingList vecMembers;
+        Into.Values.Take(jMembers, vecMembers);
+        vecFindings.insert(vecFindings.end(), vecMembers.begin(), vecMembers.end());
+        const auto fnSql = [&] {
+            std::string strSql = "UPDATE " + Into.Of.QuotedTable() + SetSql(Into.Of, Into.Values);
+            Plan.AppendWhere(strSql);
+            return strSql;
+        };
+        const auto fnBind = [&](sqlite3_stmt* pStatement) {
+            int nNext = 1;
+            const int nResult = Into.Values.BindGiven(pStatement, nNext, true);
+            return nResult == SQLITE_OK ? Plan.Bind(pStatement, nNext) : nResult;
+        };
+        return RunChecked(std::move(vecFindings), What, [&] {
+            return Run(Into, What, "S" + Into.Values.Given() + Plan.Shape(), fnSql, fnBind, pnRows);
+        });
     };
-    const auto fnBind = [&](sqlite3_stmt* pStatement) {
-        int nNext = 1;
-        const int nResult = Into.Values.BindGiven(pStatement, nNext, true);
-        return nResult == SQLITE_OK ? Plan.Bind(pStatement, nNext) : nResult;
-    };
-    return Join(Checked,
-                Run(Into, What, "S" + Into.Values.Given() + Plan.Shape(), fnSql, fnBind, pnRows));
+    return vornjsondb::Guarded(m_pParts.get(), "update records of", true, fnUpdate);
 }
 
 Status Table::Remove(const Query& Which, std::int64_t* pnRows) {
-    constexpr char kDo[] = "remove records from";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& Into = *m_pParts;
-    const Doing What = Into.Do(kDo);
-    FindingList vecFindings;
-    QueryPlan Plan(Into.Of, Into.Codec);
-    Plan.Resolve(Which, QueryUse::kChange, vecFindings);
-    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
-    if (!Checked.Ok()) {
-        return Checked;
-    }
-    const auto fnSql = [&] {
-        std::string strSql = "DELETE FROM " + Into.Of.QuotedTable();
-        Plan.AppendWhere(strSql);
-        return strSql;
+    const auto fnRemove = [&](Parts& Into, const Doing& What) {
+        FindingList vecFindings;
+        QueryPlan Plan(Into.Of, Into.Codec);
+        Plan.Resolve(Which, QueryUse::kChange, vecFindings);
+        const auto fnSql = [&] {
+            std::string strSql = "DELETE FROM " + Into.Of.QuotedTable();
+            Plan.AppendWhere(strSql);
+            return strSql;
+        };
+        const auto fnBind = [&](sqlite3_stmt* pStatement) { return Plan.Bind(pStatement, 1); };
+        return RunChecked(std::move(vecFindings), What, [&] {
+            return Run(Into, What, "D" + Plan.Shape(), fnSql, fnBind, pnRows);
+        });
     };
-    const auto fnBind = [&](sqlite3_stmt* pStatement) { return Plan.Bind(pStatement, 1); };
-    return Join(Checked, Run(Into, What, "D" + Plan.Shape(), fnSql, fnBind, pnRows));
+    return vornjsondb::Guarded(m_pParts.get(), "remove records from", true, fnRemove);
 }
 
 Status Table::RemoveAll(std::int64_t* pnRows) {
-    constexpr char kDo[] = "remove all records from";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
-    if (!State.Ok()) {
-        return State;
-    }
-    return Run(
-        *m_pParts, m_pParts->Do(kDo), "D",
-        [&] { return "DELETE FROM " + m_pParts->Of.QuotedTable(); },
-        [](sqlite3_stmt*) { return SQLITE_OK; }, pnRows);
+    const auto fnRemove = [&](Parts& Into, const Doing& What) {
+        return Run(
+            Into, What, "D", [&] { return "DELETE FROM " + Into.Of.QuotedTable(); },
+            [](sqlite3_stmt*) { return SQLITE_OK; }, pnRows);
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "remove all records from", true, fnRemove);
 }
 
 }  // namespace VORN_JSON_DB

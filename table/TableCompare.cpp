@@ -12,14 +12,10 @@ namespace vornjsondb {
 
 namespace {
 
-bool SameName(const std::string& strLeft, const std::string& strRight) {
-    return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
-}
-
 // In any order.
 bool SameNames(std::vector<std::string> vecLeft, const std::vector<std::string>& vecRight) {
     return vecLeft.size() == vecRight.size() &&
-           std::is_permutation(vecLeft.begin(), vecLeft.end(), vecRight.begin(), SameName);
+           std::is_permutation(vecLeft.begin(), vecLeft.end(), vecRight.begin(), IsSameColumn);
 }
 
 class TableCompare {
@@ -72,14 +68,14 @@ class TableCompare {
     const RealColumn* ColumnOf(const Member& Of) const {
         const auto itFound = std::find_if(
             m_Real.vecColumns.begin(), m_Real.vecColumns.end(),
-            [&Of](const RealColumn& Column) { return SameName(Column.strName, Of.strName); });
+            [&Of](const RealColumn& Column) { return IsSameColumn(Column.strName, Of.strName); });
         return itFound == m_Real.vecColumns.end() ? nullptr : &*itFound;
     }
 
     // The column that is the rowid never holds NULL.
     bool IsRowid(const RealColumn& Column) const {
-        return m_Real.vecKey == std::vector<std::string>{Column.strName} &&
-               !m_Real.strRowid.empty() && SameName(Column.strType, "INTEGER");
+        return m_Real.vecKey.size() == 1 && m_Real.vecKey[0] == Column.strName &&
+               sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
     }
 
     int CompareMember(size_t nMember) {
@@ -132,7 +128,8 @@ class TableCompare {
         } else if (m_pvecStatements == nullptr) {
             Add(FindingCode::kMissingColumn, Of, " has no column");
         } else {
-            const bool blNotNull = Of.blNotNull && !DefaultClause(Of).empty();
+            const std::string strDefault = DefaultClause(Of);
+            const bool blNotNull = Of.blNotNull && !strDefault.empty();
             m_pvecStatements->push_back("ALTER TABLE " + m_Of.QuotedTable() + " ADD COLUMN " +
                                         ColumnClause(Of, blNotNull));
             if (Of.blNotNull && !blNotNull) {

@@ -30,10 +30,10 @@ std::string Joined(const std::vector<std::string>& vecNames) {
 }
 
 Status ReadPlan(Parts& From, const Doing& What, Plan& Found) {
-    return vornjsondb::Attempt(From.pDb, From.How.nWaitMs, [&]() -> Status {
+    return vornjsondb::Attempt(From.pDb, From.How.nWaitMs, [&] {
         Found.vecSteps.clear();
         const int nResult = vornjsondb::ReadPlanSteps(From.pDb, Found.strSql, Found.vecSteps);
-        return nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(From.pDb, nResult, What);
+        return vornjsondb::FromSqlite(From.pDb, nResult, What);
     });
 }
 
@@ -53,11 +53,15 @@ Status CheckOne(Parts& From, const Doing& What, const std::string& strSql) {
     if (nResult != SQLITE_OK) {
         return vornjsondb::FailBySqlite(From.pDb, nResult, What);
     }
-    const bool blNul = std::strlen(strSql.c_str()) != strSql.size();
-    int nRest = SQLITE_OK;
+    bool blMore = std::strlen(strSql.c_str()) != strSql.size();
+    if (szTail != nullptr && !blMore) {
+        blMore = BehindFirst(From.pDb, szTail, nResult) != nullptr || nResult != SQLITE_OK;
+    }
+    if (nResult == SQLITE_NOMEM) {
+        return vornjsondb::FailBySqlite(From.pDb, nResult, What);
+    }
     FindingList vecFindings;
-    if (szTail == nullptr || blNul || BehindFirst(From.pDb, szTail, nRest) != nullptr ||
-        nRest != SQLITE_OK) {
+    if (szTail == nullptr || blMore) {
         vornjsondb::Report(
             vecFindings, FindingCode::kNotOneStatement, "",
             szTail == nullptr ? "the text holds no statement" : "more follows the first statement");
@@ -68,63 +72,56 @@ Status CheckOne(Parts& From, const Doing& What, const std::string& strSql) {
 }  // namespace
 
 Status Table::Explain(const Query& Which, Plan& Found) {
-    constexpr char kDo[] = "explain a query of";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& From = *m_pParts;
-    const Doing What = From.Do(kDo);
-    Plan Made;
-    vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
-    Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
-    Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
-    if (!Checked.Ok()) {
+    const auto fnExplain = [&](Parts& From, const Doing& What) {
+        Plan Made;
+        vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
+        Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
+        Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
+        if (!Checked.Ok()) {
+            return Checked;
+        }
+        Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns(From.WholeRow.Columns()));
+        Resolved.AppendWhere(Made.strSql);
+        Resolved.AppendTail(Made.strSql);
+        Status Outcome = ReadPlan(From, What, Made);
+        if (!Outcome.Ok()) {
+            return Outcome;
+        }
+        const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
+        if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
+            vornjsondb::Report(
+                Made.vecFindings, FindingCode::kFullScan, "/where",
+                "all records are looked at, which an index spares on " + Joined(vecAdvice));
+        }
+        Found = std::move(Made);
         return Checked;
-    }
-    Made.strSql = vornjsondb::SelectSql(From.Of, Resolved.Columns(From.WholeRow.Columns()));
-    Resolved.AppendWhere(Made.strSql);
-    Resolved.AppendTail(Made.strSql);
-    Status Outcome = ReadPlan(From, What, Made);
-    if (!Outcome.Ok()) {
-        return Outcome;
-    }
-    const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
-    if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
-        vornjsondb::Report(
-            Made.vecFindings, FindingCode::kFullScan, "/where",
-            "all records are looked at, which an index spares on " + Joined(vecAdvice));
-    }
-    Found = std::move(Made);
-    return Checked;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "explain a query of", false, fnExplain);
 }
 
 Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
-    constexpr char kDo[] = "explain a statement on";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& From = *m_pParts;
-    const Doing What = From.Do(kDo);
-    Plan Made;
-    Made.strSql = strSql;
-    Status Outcome = vornjsondb::Attempt(From.pDb, From.How.nWaitMs,
-                                         [&] { return CheckOne(From, What, strSql); });
-    if (Outcome.Ok()) {
-        Outcome = ReadPlan(From, What, Made);
-    }
-    if (!Outcome.Ok()) {
+    const auto fnExplain = [&](Parts& From, const Doing& What) {
+        Plan Made;
+        Made.strSql = strSql;
+        Status Outcome = vornjsondb::Attempt(From.pDb, From.How.nWaitMs,
+                                             [&] { return CheckOne(From, What, strSql); });
+        if (Outcome.Ok()) {
+            Outcome = ReadPlan(From, What, Made);
+        }
+        if (!Outcome.Ok()) {
+            return Outcome;
+        }
+        const bool blSearched =
+            vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
+        if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
+            vornjsondb::Report(
+                Made.vecFindings, FindingCode::kFullScan, "",
+                "all records are looked at; an index on what is compared may spare it");
+        }
+        Found = std::move(Made);
         return Outcome;
-    }
-    const bool blSearched =
-        vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
-    if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
-        vornjsondb::Report(Made.vecFindings, FindingCode::kFullScan, "",
-                           "all records are looked at; an index on what is compared may spare it");
-    }
-    Found = std::move(Made);
-    return {};
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "explain a statement on", false, fnExplain);
 }
 
 }  // namespace VORN_JSON_DB

@@ -53,30 +53,23 @@ int RunPlan(Parts& Into, const std::vector<IndexTerm>& vecTerms, bool blUnique, 
 
 Status Table::CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                           std::string* pstrSql) {
-    constexpr char kDo[] = "create an index on";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, true);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& Into = *m_pParts;
-    const Doing What = Into.Do(kDo);
-    FindingList vecFindings;
-    const std::vector<IndexTerm> vecTerms = TermsOf(Into.Of, vecMembers, vecFindings);
-    Status Checked = vornjsondb::FromFindings(std::move(vecFindings), What);
-    if (!Checked.Ok()) {
-        return Checked;
-    }
-    IndexPlan Plan;
-    Status Outcome =
-        vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, [&]() -> Status {
-            const int nResult = RunPlan(Into, vecTerms, blUnique, Plan);
-            return nResult == SQLITE_OK ? Status()
-                                        : vornjsondb::FailBySqlite(Into.pDb, nResult, What);
-        });
-    if (Outcome.Ok() && pstrSql != nullptr) {
-        *pstrSql = Plan.strSql;
-    }
-    return Outcome;
+    const auto fnCreate = [&](Parts& Into, const Doing& What) -> Status {
+        FindingList vecFindings;
+        const std::vector<IndexTerm> vecTerms = TermsOf(Into.Of, vecMembers, vecFindings);
+        Status Outcome = vornjsondb::FromFindings(std::move(vecFindings), What);
+        IndexPlan Plan;
+        if (Outcome.Ok()) {
+            Outcome = vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, [&] {
+                const int nResult = RunPlan(Into, vecTerms, blUnique, Plan);
+                return vornjsondb::FromSqlite(Into.pDb, nResult, What);
+            });
+        }
+        if (Outcome.Ok() && pstrSql != nullptr) {
+            *pstrSql = Plan.strSql;
+        }
+        return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "create an index on", true, fnCreate);
 }
 
 }  // namespace VORN_JSON_DB

@@ -1,6 +1,6 @@
 // A Table's life: opening, and what is the same for all of its operations.
 
-#include <cstring>
+#include <numeric>
 #include <utility>
 
 #include "Attempt.h"
@@ -21,16 +21,9 @@ using vornjsondb::FailBySqlite;
 using vornjsondb::OwnStatement;
 using vornjsondb::RealTable;
 
-const std::vector<std::string>& NoNames() {
-    static const std::vector<std::string> s_vecNone;
-    return s_vecNone;
-}
-
 std::vector<size_t> AllColumns(const vornjsondb::Members& Of) {
-    std::vector<size_t> vecAll;
-    for (size_t i = 0; i < Of.Size(); ++i) {
-        vecAll.push_back(i);
-    }
+    std::vector<size_t> vecAll(Of.Size());
+    std::iota(vecAll.begin(), vecAll.end(), size_t{0});
     return vecAll;
 }
 
@@ -44,16 +37,16 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     if (nResult != SQLITE_ROW) {
         return FailBySqlite(pDb, nResult, What);
     }
-    const auto* pEncoding = sqlite3_column_text(pStatement.get(), 0);
-    const char* szEncoding = reinterpret_cast<const char*>(pEncoding);
-    if (szEncoding != nullptr && std::strcmp(szEncoding, "UTF-8") != 0) {
+    const std::string strEncoding = vornjsondb::TextColumn(pStatement, 0);
+    if (strEncoding.compare(0, 6, "UTF-16") == 0) {
         return vornjsondb::Fail(
             StatusCode::kRefused, What,
-            vornjsondb::Concat({"the database is ", szEncoding, ", not UTF-8"}));
+            vornjsondb::Concat({"the database is ", strEncoding, ", not UTF-8"}));
     }
     return {};
 }
 
+// The reason is taken before what was begun is undone.
 Status RunWhole(Table::Parts& Into, const std::string& strSql, const Doing& What) {
     vornjsondb::Whole All(Into.pDb, Into.Kept);
     int nResult = All.Begin();
@@ -63,7 +56,7 @@ Status RunWhole(Table::Parts& Into, const std::string& strSql, const Doing& What
     if (nResult == SQLITE_OK) {
         nResult = All.Keep();
     }
-    return nResult == SQLITE_OK ? Status() : FailBySqlite(Into.pDb, nResult, What);
+    return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
 }  // namespace
@@ -88,9 +81,10 @@ Status Table::Parts::Meet() {
     int nResult = vornjsondb::ReadRealTable(pDb, Of.Table(), Real);
     const bool blCreate = How.blCreateTable || !How.strSqlCreate.empty();
     if (nResult == SQLITE_OK && Real.vecColumns.empty() && blCreate) {
-        const std::string strSql =
-            How.strSqlCreate.empty() ? vornjsondb::CreateTableSql(Of) : How.strSqlCreate;
-        Outcome = RunWhole(*this, strSql, What);
+        if (How.strSqlCreate.empty()) {
+            How.strSqlCreate = vornjsondb::CreateTableSql(Of);
+        }
+        Outcome = RunWhole(*this, How.strSqlCreate, What);
         if (!Outcome.Ok()) {
             return Outcome;
         }
@@ -162,8 +156,7 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
 }
 
 const std::string& Table::Name() const {
-    static const std::string s_strNone;
-    return m_pParts ? m_pParts->Of.Table() : s_strNone;
+    return m_pParts ? m_pParts->Of.Table() : vornjsondb::None<std::string>();
 }
 
 const Json::Value& Table::Definition() const {
@@ -171,11 +164,11 @@ const Json::Value& Table::Definition() const {
 }
 
 const std::vector<std::string>& Table::Members() const {
-    return m_pParts ? m_pParts->Of.Names() : NoNames();
+    return m_pParts ? m_pParts->Of.Names() : vornjsondb::None<std::vector<std::string>>();
 }
 
 const std::vector<std::string>& Table::KeyMembers() const {
-    return m_pParts ? m_pParts->vecKeyNames : NoNames();
+    return m_pParts ? m_pParts->vecKeyNames : vornjsondb::None<std::vector<std::string>>();
 }
 
 sqlite3* Table::Connection() const {
@@ -188,11 +181,11 @@ namespace vornjsondb {
 
 Status CheckVersion(int nVersion, const char* szVersion, const Doing& What) {
     constexpr int kOldest = 3035000;
-    return nVersion >= kOldest
-               ? Status()
-               : Fail(StatusCode::kRefused, What,
-                      vornjsondb::Concat(
-                          {"SQLite 3.35 or later is needed, and this is ", szVersion}));
+    if (nVersion < kOldest) {
+        return Fail(StatusCode::kRefused, What,
+                    Concat({"SQLite 3.35 or later is needed, and this is ", szVersion}));
+    }
+    return {};
 }
 
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
@@ -203,6 +196,12 @@ Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
         return Fail(StatusCode::kMisuse, pParts->Do(szDo), "a callback is reading from it");
     }
     return {};
+}
+
+Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
+               Callable<Status(Table::Parts&, const Doing&)> fnCall) {
+    Status State = CheckState(pParts, szDo, blChange);
+    return State.Ok() ? fnCall(*pParts, pParts->Do(szDo)) : State;
 }
 
 }  // namespace vornjsondb

@@ -11,6 +11,7 @@
 #include <sqlite3.h>
 
 #include "../src/base/JsonText.h"
+#include "Callable.h"
 #include "Members.h"
 #include "RecordValues.h"
 #include "RowReader.h"
@@ -55,6 +56,11 @@ Status CheckVersion(int nVersion, const char* szVersion, const Doing& What);
 
 // A failure when the Table is not open, or is to be changed by a callback that reads from it.
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
+
+// What each public call begins with: fnCall, with the parts and what they are about to do, where
+// the state allows it.
+Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
+               Callable<Status(Table::Parts&, const Doing&)> fnCall);
 
 }  // namespace vornjsondb
 

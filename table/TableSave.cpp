@@ -49,11 +49,10 @@ bool IsOneStatement(OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
 
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
     FindingList vecFindings;
-    bool blFits = Into.Values.Take(jRecord, vecFindings);
-    if (blFits && eOnDuplicate != OnDuplicate::kStop) {
-        blFits = Into.Values.HasKey(vecFindings);
+    if (Into.Values.Take(jRecord, vecFindings) && eOnDuplicate != OnDuplicate::kStop) {
+        Into.Values.HasKey(vecFindings);
     }
-    return blFits ? Status() : vornjsondb::FromFindings(std::move(vecFindings), What);
+    return vornjsondb::FromFindings(std::move(vecFindings), What);
 }
 
 Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What,
@@ -88,22 +87,20 @@ Status Table::Create(const Json::Value& jRecord, Json::Value* pjStored) {
 
 Status Table::Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate, Json::Value* pjStored,
                    Written* peWritten) {
-    constexpr char kDo[] = "save a record in";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, true);
-    if (!Outcome.Ok()) {
+    const auto fnSave = [&](Parts& Into, const Doing& What) {
+        Json::Value jStored;
+        Written eWritten = Written::kInserted;
+        Status Outcome = Write(Into, jRecord, eOnDuplicate, What,
+                               pjStored == nullptr ? nullptr : &jStored, eWritten);
+        if (Outcome.Ok() && pjStored != nullptr) {
+            pjStored->swapPayload(jStored);
+        }
+        if (Outcome.Ok() && peWritten != nullptr) {
+            *peWritten = eWritten;
+        }
         return Outcome;
-    }
-    Json::Value jStored;
-    Written eWritten = Written::kInserted;
-    Outcome = Write(*m_pParts, jRecord, eOnDuplicate, m_pParts->Do(kDo),
-                    pjStored == nullptr ? nullptr : &jStored, eWritten);
-    if (Outcome.Ok() && pjStored != nullptr) {
-        pjStored->swapPayload(jStored);
-    }
-    if (Outcome.Ok() && peWritten != nullptr) {
-        *peWritten = eWritten;
-    }
-    return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "save a record in", true, fnSave);
 }
 
 }  // namespace VORN_JSON_DB

@@ -27,58 +27,52 @@ Status Compare(Parts& With, const Doing& What, std::vector<std::string>* pvecSta
 }
 
 Status RunAll(Parts& Into, const Doing& What, const std::vector<std::string>& vecStatements) {
+    std::string strAll;
     for (const std::string& strSql : vecStatements) {
-        const int nResult = sqlite3_exec(Into.pDb, strSql.c_str(), nullptr, nullptr, nullptr);
-        if (nResult != SQLITE_OK) {
-            return FailBySqlite(Into.pDb, nResult, What);
-        }
+        strAll += strSql + ";";
     }
-    return {};
+    const int nResult = sqlite3_exec(Into.pDb, strAll.c_str(), nullptr, nullptr, nullptr);
+    return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
 }  // namespace
 
 Status Table::Lint(FindingList& vecFindings) {
-    constexpr char kDo[] = "compare the definition with";
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!State.Ok()) {
-        return State;
-    }
-    FindingList vecFound;
-    Status Outcome = vornjsondb::Attempt(m_pParts->pDb, m_pParts->How.nWaitMs, [&] {
-        vecFound.clear();
-        return Compare(*m_pParts, m_pParts->Do(kDo), nullptr, vecFound);
-    });
-    if (Outcome.Ok()) {
-        vecFindings = std::move(vecFound);
-    }
-    return Outcome;
+    const auto fnLint = [&](Parts& With, const Doing& What) {
+        FindingList vecFound;
+        Status Outcome = vornjsondb::Attempt(With.pDb, With.How.nWaitMs, [&] {
+            vecFound.clear();
+            return Compare(With, What, nullptr, vecFound);
+        });
+        if (Outcome.Ok()) {
+            vecFindings = std::move(vecFound);
+        }
+        return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "compare the definition with", false, fnLint);
 }
 
 // The table is read inside of the transaction that changes it: another process may be doing the
 // same.
 Status Table::Sync(SyncMode eMode, SyncReport& Report) {
-    constexpr char kDo[] = "bring the definition into";
     const bool blChange = eMode == SyncMode::kChange;
-    Status State = vornjsondb::CheckState(m_pParts.get(), kDo, blChange);
-    if (!State.Ok()) {
-        return State;
-    }
-    Parts& Into = *m_pParts;
-    const Doing What = Into.Do(kDo);
-    SyncReport Found;
-    const auto fnSteps = [&]() -> Status {
-        Found = SyncReport();
-        const Status Outcome = Compare(Into, What, &Found.vecStatements, Found.vecFindings);
-        return Outcome.Ok() && blChange ? RunAll(Into, What, Found.vecStatements) : Outcome;
+    const auto fnSync = [&](Parts& Into, const Doing& What) {
+        SyncReport Found;
+        const auto fnSteps = [&]() -> Status {
+            Found = SyncReport();
+            Status Outcome = Compare(Into, What, &Found.vecStatements, Found.vecFindings);
+            return Outcome.Ok() && blChange ? RunAll(Into, What, Found.vecStatements) : Outcome;
+        };
+        const int nWaitMs = Into.How.nWaitMs;
+        Status Outcome = blChange
+                             ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, nWaitMs, What, fnSteps)
+                             : vornjsondb::Attempt(Into.pDb, nWaitMs, fnSteps);
+        if (Outcome.Ok()) {
+            Report = std::move(Found);
+        }
+        return Outcome;
     };
-    Status Outcome =
-        blChange ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnSteps)
-                 : vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, fnSteps);
-    if (Outcome.Ok()) {
-        Report = std::move(Found);
-    }
-    return Outcome;
+    return vornjsondb::Guarded(m_pParts.get(), "bring the definition into", blChange, fnSync);
 }
 
 }  // namespace VORN_JSON_DB

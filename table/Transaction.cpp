@@ -93,7 +93,7 @@ Status Transaction::Commit() {
     }
     int nResult = Finish(m_pEnd);
     vornjsondb::Patience Left(m_nWaitMs);
-    while (nResult == SQLITE_BUSY && !m_blSavepoint && Left.Wait()) {
+    while (nResult == SQLITE_BUSY && Left.Wait()) {
         nResult = Finish(m_pEnd);
     }
     if (nResult == SQLITE_OK) {
@@ -101,9 +101,10 @@ Status Transaction::Commit() {
         return {};
     }
     const Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
-    return nResult == SQLITE_BUSY
-               ? vornjsondb::Amended(Failed, Retry::kCall, vornjsondb::WaitedText(m_nWaitMs))
-               : Failed;
+    if (nResult != SQLITE_BUSY) {
+        return Failed;
+    }
+    return vornjsondb::Amended(Failed, Retry::kCall, vornjsondb::WaitedText(m_nWaitMs));
 }
 
 Status Transaction::Rollback() {
@@ -112,8 +113,7 @@ Status Transaction::Rollback() {
         return NotOpen(What);
     }
     const int nResult = Undo();
-    Status Outcome =
-        nResult == SQLITE_OK ? Status() : vornjsondb::FailBySqlite(m_pDb, nResult, What);
+    Status Outcome = vornjsondb::FromSqlite(m_pDb, nResult, What);
     Close();
     return Outcome;
 }

@@ -61,6 +61,11 @@ TEST_F(IndexTest, StatementHasTheTextOfConditions) {
     EXPECT_EQ(Rows("SELECT count(*) FROM sqlite_schema WHERE type = 'index'"), "3");
 }
 
+TEST_F(IndexTest, StatementNeedNotBeAskedFor) {
+    EXPECT_EQ("ok", Text(m_Table.CreateIndex({"size"}, false)));
+    EXPECT_EQ("doc_size", Rows("SELECT name FROM sqlite_schema WHERE type = 'index'"));
+}
+
 TEST_F(IndexTest, SameIndexIsMadeOnce) {
     const std::string strSql = Index({"name"});
     EXPECT_EQ(strSql, R"(CREATE INDEX "doc_name" ON "doc" ("name" COLLATE BINARY))");
@@ -264,8 +269,9 @@ TEST(PlanStepsTest, StepsOfTheTableAsEachReleaseWritesThem) {
 }
 
 TEST(SqlWordsTest, WordsOutsideOfQuotesAndComments) {
-    for (const char* szSql : {"where", "SELECT 1 WHERE 1", "a\nWhere\nb", "'it''s' where",
-                              "(where)", "--x\nwhere", "/* x */where/* y */", "[a]where"}) {
+    for (const char* szSql :
+         {"where", "SELECT 1 WHERE 1", "a\nWhere\nb", "'it''s' where", "(where)", "~where{",
+          "--x\nwhere", "/* x */where/* y */", "[a]where"}) {
         EXPECT_TRUE(vornjsondb::HoldsWord(szSql, "WHERE")) << szSql;
     }
     for (const char* szSql : {"", "'where'", "\"where\"", "`where`", "[where]", "-- where",

@@ -356,6 +356,47 @@ TEST_F(LoaderTest, WithoutAStartNothingHappens) {
     EXPECT_EQ("misuse: cannot load records into: the table is not open", Text(Into.Start(Closed)));
 }
 
+TEST_F(LoaderTest, CommitWithoutARecordDoesNothing) {
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    EXPECT_EQ("ok", Text(Into.Commit()));
+    EXPECT_EQ("0 0 0 0 0 0", Counts(Into));
+}
+
+TEST_F(LoaderTest, NullForAGeneratedMemberIsRefusedToo) {
+    Options How;
+    How.strSqlCreate = "CREATE TABLE g (id INTEGER PRIMARY KEY, twice INTEGER AS (2 * id))";
+    Open(
+        R"({"g": {"key": "id", "member": {"id": {"cpptype": "int"}, "twice": {"cpptype": "int"}}}})",
+        How);
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table, With(OnDuplicate::kStop, true))));
+    Into.SetInteger(Into.MemberIndex("id"), 1);
+    Into.SetNull(Into.MemberIndex("twice"));
+    EXPECT_EQ(
+        "refused: cannot load record 1 into table \"g\": member \"twice\" is computed by the "
+        "table [generated /twice]",
+        Text(Into.EndRecord()));
+}
+
+TEST_F(LoaderTest, KeyOfTwoMembersIsFoundByBoth) {
+    Open(
+        R"({"pair": {"key": ["b", "a"], "member": {"a": {"cpptype": "int"}, "b": {"cpptype": "int"},
+                                                   "n": {"cpptype": "int"}}}})");
+    Loader Into;
+    for (const OnDuplicate eMode : {OnDuplicate::kReplace, OnDuplicate::kSkip}) {
+        EXPECT_EQ("ok", Text(Into.Start(m_Table, With(eMode, false))));
+        EXPECT_EQ("ok\nok", Add(Into, {R"({"a": 1, "b": 2, "n": 3})", R"({"a": 2, "b": 1})"}));
+        EXPECT_EQ("ok", Text(Into.Commit()));
+    }
+    EXPECT_EQ("2 0 0 2 0 2", Counts(Into));
+    EXPECT_EQ("1|2|3;2|1|NULL", Rows("SELECT a, b, n FROM pair ORDER BY a"));
+    EXPECT_EQ(
+        "duplicate: cannot save a record in table \"pair\": UNIQUE constraint failed: pair.b, "
+        "pair.a (a = 1, b = 2)",
+        Create(R"({"a": 1, "b": 2})"));
+}
+
 TEST_F(LoaderTest, GeneratedMembersAreNotWritten) {
     Options How;
     How.strSqlCreate = "CREATE TABLE g (id INTEGER PRIMARY KEY, twice INTEGER AS (2 * id))";

@@ -127,6 +127,9 @@ TEST_F(OldQueryLintTest, ValuesOfAnotherKindAreRefusedOrConverted) {
            "old-other-kind /id: member \"id\": true is converted: expected is a whole number from "
            "-2147483648 to 2147483647",
            "1");
+    EXPECT_EQ(Text(LintOldQuery("t", Parse(R"({"t": {"member": {"a": {"cpptype": "any"}}}})"),
+                                Parse(R"({"a": 5})"))),
+              "");
     Expect(R"({"map": "x"})",
            "old-other-kind /map: member \"map\": \"x\" is converted: expected is an object", "");
 }

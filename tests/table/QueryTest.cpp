@@ -441,6 +441,8 @@ TEST_F(Queries, FindingsOfNamesAndOperands) {
          "number-in-path /where/map.0: path \"map.0\": \"0\" would be a name, not an index"},
         {R"({"map[a]": 1})",
          "bad-path /where/map[a]: path \"map[a]\": an index is a whole number in brackets"},
+        {R"({"map[12": 1})",
+         "bad-path /where/map[12: path \"map[12\": an index is a whole number in brackets"},
         {R"({"map[1": 1})",
          "bad-path /where/map[1: path \"map[1\": an index is a whole number in brackets"},
         {R"({"map[]": 1})",
@@ -490,6 +492,11 @@ TEST_F(Queries, FindingsOfNamesAndOperands) {
          "wrong-operand /where/size/$gt: \"$gt\" takes a text or a number, not true"},
         {R"({"map.a": {"$gt": [1]}})",
          "wrong-operand /where/map.a/$gt: \"$gt\" takes a text or a number, not a list of 1"},
+        {R"({"size": {"$between": 1}})",
+         "wrong-operand /where/size/$between: \"$between\" takes a list of two texts or of two "
+         "numbers, not 1"},
+        {R"({"size": {"$between": [null, 1]}})",
+         "null-operand /where/size/$between: \"$between\": nothing is less or greater than null"},
         {R"({"size": {"$between": [1]}})",
          "wrong-operand /where/size/$between: \"$between\" takes a list of two texts or of two "
          "numbers, not a list of 1"},
@@ -535,6 +542,8 @@ TEST_F(Queries, FindingsOfValuesThatJsonTextCannotHold) {
     EXPECT_EQ("not-a-number /where/rate: member \"rate\": NaN is no number",
               Sql(Query().Where("rate", dNaN)));
     EXPECT_EQ(0U, Sql(Query().Where("json.a", dNaN)).find("not-a-number /where/json.a: "));
+    EXPECT_EQ("not-a-number /where/tags/$contains: JSON: NaN is no number",
+              Sql(Query().Where("tags", Op::kContains, dNaN)));
     const std::string strLong = "%" + std::string(50000, 'a');
     EXPECT_EQ("bad-pattern /where/name/$like: pattern \"%" + std::string(59, 'a') +
                   "\"... is longer than SQLite takes",
@@ -593,6 +602,12 @@ TEST_F(Queries, ChangesNeedAConditionAndNothingElse) {
         "the conditions select, in no order [paged-change ]",
         Change(R"({"where": {"id": 1}, "sort": ["id"]})"));
     EXPECT_EQ("1,2", Ids(Query().Sort("id")));
+    EXPECT_EQ(
+        "refused: cannot remove records from table \"doc\": a group holds no condition "
+        "[empty-group /where]",
+        Text(m_Table.Remove(Query().Where(Condition::All({})))));
+    EXPECT_EQ("ok", Text(m_Table.Update(Parse(R"({"where": {"id": {"$nin": [1, 2]}}})"),
+                                        Parse(R"({"size": 3})"))));
     EXPECT_EQ("ok [empty-nin /where/id/$nin]",
               Text(m_Table.Remove(Parse(R"({"where": {"id": {"$nin": []}, "size": 1}})"))));
     EXPECT_EQ("2", Ids(Query()));
@@ -631,6 +646,12 @@ TEST_F(Queries, HundredThousandNestedListsAreAFinding) {
     jSort.swapPayload(Deep.jList);
 }
 
+TEST_F(Queries, NestedListInTheCppFormIsAFinding) {
+    DeepList Deep(1001);
+    EXPECT_EQ("nested-too-deep /where: the conditions are nested too deep",
+              Sql(Query().Where("json", Deep.jList)));
+}
+
 TEST_F(Queries, HundredThousandNestedGroupsAreAFinding) {
     for (const bool blBelowMember : {false, true}) {
         DeepList Deep(0);
@@ -657,6 +678,8 @@ TEST_F(Queries, AThousandConditionsAndNoMore) {
     }
     EXPECT_EQ("too-many-conditions /where/$or/1000/id: the query has more than 1000 conditions",
               Text(Query(jQuery).vecFindings));
+    jQuery["where"]["$or"].append(Parse(R"({"id": 1})"));
+    EXPECT_EQ(1U, Query(jQuery).vecFindings.size());
     jQuery["where"]["$or"].resize(1000);
     EXPECT_EQ("", Text(Query(jQuery).vecFindings));
 }
@@ -667,6 +690,53 @@ TEST_F(Queries, FindingsEndAtAHundred) {
         jQuery["where"]["$or"].append(Json::Value(i));
     }
     EXPECT_EQ(100U, Query(jQuery).vecFindings.size());
+}
+
+// Whatever the bytes are, the record that holds them is found by them, alone and in a list.
+TEST_F(Queries, BytesThatAreNoUtf8AreFoundInLists) {
+    const char* const kTexts[] = {"\xe0\x9f\x80",
+                                  "\xe0\xa0\x80",
+                                  "\xed\x9f\xbf",
+                                  "\xed\xa0\x80",
+                                  "\xf0\x8f\x80\x80",
+                                  "\xf0\x90\x80\x80",
+                                  "\xf4\x8f\xbf\xbf",
+                                  "\xf4\x90\x80\x80",
+                                  "\xf5\x80\x80\x80",
+                                  "\xc3",
+                                  "\x80"};
+    Json::Value jAll(Json::arrayValue);
+    int nId = 0;
+    for (const char* szText : kTexts) {
+        Json::Value jRecord;
+        jRecord["id"] = ++nId;
+        jRecord["name"] = szText;
+        EXPECT_EQ("ok", Text(m_Table.Create(jRecord)));
+        Json::Value jOne(Json::arrayValue);
+        jOne.append(szText);
+        EXPECT_EQ(std::to_string(nId), Ids(Query().Where("name", Op::kIn, jOne)));
+        jAll.append(szText);
+    }
+    EXPECT_EQ("1,2,3,4,5,6,7,8,9,10,11", Ids(Query().Where("name", Op::kIn, jAll).Sort("id")));
+}
+
+TEST_F(Queries, FractionsInsideOfJsonAreFoundInLists) {
+    Fill("map", {R"({"a": 0.1})", R"({"a": 2})", R"({"a": "0.1"})"});
+    EXPECT_EQ("1", IdsWhere(R"({"map.a": {"$in": [0.1, 1.5]}})"));
+    EXPECT_EQ("1,2", IdsWhere(R"({"map.a": {"$in": [0.1, 2]}})"));
+}
+
+TEST_F(Queries, OffsetAloneIsCountedBehind) {
+    Fill("size", {"1", "2", "3"});
+    std::int64_t nRecords = 0;
+    EXPECT_EQ("ok", Text(m_Table.Count(Query().Offset(1), nRecords)));
+    EXPECT_EQ(2, nRecords);
+}
+
+TEST_F(Queries, SignsMayBeginANameInAPath) {
+    Fill("map", {R"({"+": 1})", R"({"-1": 2})"});
+    EXPECT_EQ("1", IdsWhere(R"({"map.+": 1})"));
+    EXPECT_EQ("2", IdsWhere(R"({"map.-1": 2})"));
 }
 
 }  // namespace VORN_JSON_DB

@@ -192,6 +192,25 @@ TEST_F(SyncTest, AddsColumnsAndUniqueIndexes) {
               "column takes NULL");
 }
 
+TEST_F(SyncTest, KeyThatIsUniqueByItselfGetsOneIndex) {
+    Meet("CREATE TABLE item (id INTEGER)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int", "unique": true}}})");
+    EXPECT_EQ(Sync(), "CREATE UNIQUE INDEX \"item_id\" ON \"item\" (\"id\")\n");
+    EXPECT_EQ(Sync(), "");
+}
+
+TEST_F(SyncTest, ColumnsThatAreNoMembersAreToldByWhatTheyNeed) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, a INT NOT NULL, b INT NOT NULL DEFAULT 1, c "
+        "INT)",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"}}})");
+    const std::string strTold = "\" is no member: a VornJsonDbApi cannot read back what it creates";
+    EXPECT_EQ(Lint(), "extra-column /item/member: column \"a" + strTold +
+                          ", and no record can be created without its value; "
+                          "extra-column /item/member: column \"b" +
+                          strTold + "; extra-column /item/member: column \"c" + strTold);
+}
+
 TEST_F(SyncTest, RowsThatClashChangeNothing) {
     Meet(
         "CREATE TABLE item (id INTEGER PRIMARY KEY, a TEXT);"

@@ -110,6 +110,9 @@ TEST_F(TypesTest, ValuesAreStoredByTypeAndRange) {
         {"any", "true", "wrong-kind"},
         {"any", "[]", "wrong-kind"},
         {"any", "18446744073709551615", "out-of-range"},
+        {"string", "5.5", "wrong-kind"},
+        {"double", "9223372036854775807", "out-of-range"},
+        {"long long", "-1e19", "out-of-range"},
     };
     for (const Case& Each : kCases) {
         EXPECT_EQ(Each.szExpected, Store(Each.szType, std::string(Each.szValue)))

@@ -1,0 +1,136 @@
+// What few callers meet, and each only once.
+
+#include "../../table/SqlWords.h"
+#include "QueryFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+class EdgesTest : public QueryTest {
+  protected:
+    // Another table, by another definition, in place of the one that is open.
+    void Meet(const std::string& strSql, const std::string& strEntry) {
+        Run(strSql);
+        m_Table = Table();
+        EXPECT_EQ(Text(m_Table.Open(m_pDb, "item", Parse("{\"item\": " + strEntry + "}"))), "ok");
+    }
+
+    std::string Lint() {
+        FindingList vecFindings;
+        const Status Outcome = m_Table.Lint(vecFindings);
+        return Outcome.Ok() ? Text(vecFindings) : Text(Outcome);
+    }
+};
+
+TEST_F(EdgesTest, InterruptedReadingTellsItAndStops) {
+    for (int i = 1; i <= 3; ++i) {
+        EXPECT_EQ(Text(m_Table.Create(Parse("{\"id\": " + std::to_string(i) + "}"))), "ok");
+    }
+    const std::string strInterrupted =
+        "interrupted: cannot read records of table \"doc\": interrupted";
+    int nCalls = 0;
+    const auto fnInterrupt = [&](const auto&) {
+        ++nCalls;
+        sqlite3_interrupt(m_pDb);
+        return true;
+    };
+    EXPECT_EQ(Text(m_Table.ForEach(Query(), fnInterrupt)), strInterrupted);
+    EXPECT_EQ(nCalls, 1);
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query(), fnInterrupt)), strInterrupted);
+    EXPECT_EQ(nCalls, 2);
+    EXPECT_EQ(Ids(Query().Sort("id")), "1,2,3");
+}
+
+TEST_F(EdgesTest, EmptyBlobIsReadAsAnEmptyText) {
+    Run("INSERT INTO doc (id, name) VALUES (1, x'')");
+    EXPECT_EQ(Get("1"), R"({"id":1,"name":""})");
+    std::string strText = "none";
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}),
+                                      [&](const Row& Each) {
+                                          strText = Each.Text(0);
+                                          return true;
+                                      })),
+              "ok");
+    EXPECT_EQ(strText, "");
+}
+
+TEST_F(EdgesTest, TextOfANullIsEmpty) {
+    Run("INSERT INTO doc (id) VALUES (1)");
+    std::string strText = "none";
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}),
+                                      [&](const Row& Each) {
+                                          strText = Each.Text(0);
+                                          return true;
+                                      })),
+              "ok");
+    EXPECT_EQ(strText, "");
+}
+
+TEST_F(EdgesTest, UnsignedNumbersAreNumbers) {
+    Json::Value jRecord;
+    jRecord["id"] = 1U;
+    jRecord["size"] = Json::UInt64{7};
+    EXPECT_EQ(Text(m_Table.Create(jRecord)), "ok");
+    EXPECT_EQ(Ids(Query().Where("size", 7U)), "1");
+}
+
+TEST_F(EdgesTest, DuplicateByADefaultOfTheTableHasNoValueToTell) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, code TEXT DEFAULT 'x' UNIQUE)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "code": {"cpptype": "string"}}})");
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 1})"))), "ok");
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))),
+              "duplicate: cannot save a record in table \"item\": UNIQUE constraint failed: "
+              "item.code");
+}
+
+TEST_F(EdgesTest, NumericColumnsKeepWholeNumbers) {
+    Meet("CREATE TABLE item (a NUMERIC, b TEXT)",
+         R"({"member": {"a": {"cpptype": "int"}, "b": {"cpptype": "bool"}}})");
+    EXPECT_EQ(Lint(),
+              "other-affinity /item/member/b: member \"b\" of type \"bool\": its column, declared "
+              "as \"TEXT\", has text affinity and changes what is stored");
+}
+
+TEST_F(EdgesTest, KeyThatIsNotTheRowidTakesNull) {
+    Meet("CREATE TABLE item (id INT PRIMARY KEY)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int", "notNull": true}}})");
+    EXPECT_EQ(Lint(),
+              "nullable-column /item/member/id: member \"id\" is \"notNull\", and its column takes "
+              "NULL");
+    Meet("DROP TABLE item; CREATE TABLE item (id INTEGER PRIMARY KEY)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int", "notNull": true}}})");
+    EXPECT_EQ(Lint(), "");
+}
+
+TEST_F(EdgesTest, EmptyNameIsNoNameOfSql) {
+    EXPECT_EQ(Text(LintDefinition("t", Parse(R"({"t": {"member": {"": {"cpptype": "string",
+                  "cppDefaultValue": "x"}}}})"))),
+              "old-name /t/member/: member \"\": a VornJsonDbApi writes names as they stand, and "
+              "SQL reads another thing");
+}
+
+TEST_F(EdgesTest, JsonOfALoaderMayBeForNoMemberAndMayBeAText) {
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
+    Into.SetInteger(Into.MemberIndex("id"), 1);
+    Into.SetJson(Into.MemberIndex("json"), "\"x\"");
+    Into.SetBoolean(Into.MemberIndex("done"), false);
+    EXPECT_EQ(Text(Into.EndRecord()), "ok");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
+    Into.SetJson(99, "1");
+    EXPECT_EQ(Text(Into.EndRecord()),
+              "refused: cannot load record 2 into table \"doc\": there is no member of number 99 "
+              "[unknown-member ]");
+    EXPECT_EQ(Rows("SELECT id, json, done FROM doc"), R"(1|"x"|0)");
+}
+
+TEST_F(EdgesTest, WordsGoOnInUnderscoresDollarsAndOtherAlphabets) {
+    for (const char* szSql : {"where_", "where$", "where\xc3\xa9", "$where", "9where"}) {
+        EXPECT_FALSE(vornjsondb::HoldsWord(szSql, "WHERE")) << szSql;
+    }
+}
+
+}  // namespace
+
+}  // namespace VORN_JSON_DB
