@@ -100,7 +100,7 @@ Status Transaction::Commit() {
         Close();
         return {};
     }
-    const Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
+    Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
     if (nResult != SQLITE_BUSY) {
         return Failed;
     }

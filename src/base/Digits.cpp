@@ -22,6 +22,7 @@ void AppendDigits(Json::Int64 nValue, std::string& strOut) {
         strOut += '-';
     }
     // Negated without a sign: the lowest number has no positive counterpart.
+    // mutate(< to <=): zero is its own counterpart.
     AppendDigits(nValue < 0 ? 0 - nBits : nBits, strOut);
 }
 

@@ -41,7 +41,7 @@ KnownTables::Place KnownTables::PlaceOf(const std::string& strName) {
     return std::lower_bound(
         m_vecTables.begin(), m_vecTables.end(), strName,
         [](const std::unique_ptr<KnownTable>& pEach, const std::string& strWanted) {
-            return pEach->m_strName < strWanted;
+            return pEach->m_strName < strWanted;  // mutate(< to >): any order will do.
         });
 }
 

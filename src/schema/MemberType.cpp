@@ -71,7 +71,7 @@ void AppendQuoted(const char* szText, std::string& strOut) {
 }
 
 void AppendText(const Json::Value& jValue, std::string& strOut) {
-    if (jValue.isString()) {
+    if (jValue.isString()) {  // mutate(false): a copy of it gives the same text.
         AppendQuoted(jValue.asCString(), strOut);  // in place: it may be long
     } else {
         AppendQuoted(jValue.asString().c_str(), strOut);

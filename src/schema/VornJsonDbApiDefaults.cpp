@@ -19,7 +19,7 @@ bool LacksDefaults(const TableTypes& Types, const Json::Value& jRec) {
             return true;
         }
     }
-    return false;
+    return false;  // mutate(false to true): the same.
 }
 
 void FillDefaults(const TableTypes& Types, Json::Value& jRec) {

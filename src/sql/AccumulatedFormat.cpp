@@ -30,7 +30,7 @@ bool AccumulatedFormat::HoldsConversion() const {
 }
 
 void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue) {
-    if (!m_blLiteral) {  // mutate(true): the text stays as it is.
+    if (!m_blLiteral) {
         FormatAgain(Type, jValue);
         return;
     }
