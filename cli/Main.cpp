@@ -64,8 +64,8 @@ int main(int nArguments, char** pszArguments) {
     if (nExit == kExitInterrupted) {
         // A loop in a shell goes on unless the signal itself ended the command; the shell shows
         // 130.
-        signal(SIGINT, SIG_DFL);
-        raise(SIGINT);
+        (void)signal(SIGINT, SIG_DFL);
+        (void)raise(SIGINT);
     }
     return nExit;
 }

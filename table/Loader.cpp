@@ -103,7 +103,7 @@ Status Loader::Parts::Commit() {
     if (All.IsOpen()) {
         const Status Outcome = vornjsondb::Within(Into.Do(kDo), All.Commit());
         if (!Outcome.Ok()) {
-            const bool blAgain = Outcome.Code() == StatusCode::kLocked && All.IsOpen();
+            const bool blAgain = Outcome.Code() == StatusCode::kLocked;  // it is open still
             return blAgain ? Outcome : End(Outcome);
         }
     }

@@ -41,7 +41,8 @@ int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);
 int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
 
 // Whether two SQL expressions without names have one value; as JSON, where both are JSON. What
-// SQLite cannot compute counts as the same. Returns SQLite's result.
+// SQLite cannot compute, or the second computes with a function, counts as the same. Returns
+// SQLite's result.
 int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& strRight, bool blJson,
                  bool& blSame);
 

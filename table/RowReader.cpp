@@ -24,7 +24,7 @@ std::string_view TextOf(sqlite3_stmt* pStatement, sqlite3_value* pValue) {
     const auto* pText = reinterpret_cast<const char*>(sqlite3_value_text(pValue));
     const int nBytes = sqlite3_value_bytes(pValue);
     if (pText == nullptr) {
-        if (nBytes != 0 || sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
+        if (sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
             throw std::bad_alloc();
         }
         return "";

@@ -129,7 +129,7 @@ class PlainReader {
         if (Skip('}')) {
             return jObject;
         }
-        while (m_blPlain) {
+        while (m_blPlain) {  // mutate(true): what is read on is thrown away.
             const char* pName = nullptr;
             if (*m_pNext != '"' || !SkipText(pName)) {
                 m_blPlain = false;

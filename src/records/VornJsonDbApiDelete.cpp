@@ -53,6 +53,7 @@ int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
         return err;
     };
     const int nResult = Delete();
+    // mutate(> to >=): where nothing failed, there is no error text.
     if (0 > nResult && !m_strSqlError.empty()) {
         VORN_LOG_PLAIN("sql error, err=%s, sql=%s", m_strSqlError.c_str(), strSqlRun.c_str());
     }

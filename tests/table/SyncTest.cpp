@@ -122,6 +122,32 @@ TEST_F(SyncTest, LintComparesDefaultsByTheirValues) {
         "'[1]'");
 }
 
+// The schema may come with a hostile file, and SQLite lets it call less than a statement may.
+TEST_F(SyncTest, LintCallsNothingThatADefaultCalls) {
+    int nCalls = 0;
+    const auto fnCount = [](sqlite3_context* pContext, int, sqlite3_value**) {
+        ++*static_cast<int*>(sqlite3_user_data(pContext));
+        sqlite3_result_int(pContext, 1);
+    };
+    ASSERT_EQ(
+        sqlite3_create_function(m_pDb, "spy", 1, SQLITE_UTF8, &nCalls, fnCount, nullptr, nullptr),
+        SQLITE_OK);
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, a INTEGER DEFAULT (spy(1)),"
+        " b TEXT DEFAULT ('x' || spy(1)), c TEXT DEFAULT (/*'*/ spy(1) /*'*/),"
+        " d TEXT DEFAULT ('it''s' || -spy(1)), e TEXT DEFAULT ('(spy') )",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "a": {"cpptype": "int", "cppDefaultValue": 3},
+             "b": {"cpptype": "string", "cppDefaultValue": "b"},
+             "c": {"cpptype": "string", "cppDefaultValue": "c"},
+             "d": {"cpptype": "string", "cppDefaultValue": "d"},
+             "e": {"cpptype": "string", "cppDefaultValue": "(shy"}}})");
+    EXPECT_EQ(Lint(),
+              "other-default /item/member/e: member \"e\" has the default '(shy', and its column "
+              "'(spy'");
+    EXPECT_EQ(nCalls, 0);
+}
+
 TEST_F(SyncTest, ViewIsToldFromATable) {
     Meet("CREATE TABLE behind (a INTEGER); CREATE VIEW Item AS SELECT a FROM behind",
          R"({"key": "a", "member": {"a": {"cpptype": "int", "notNull": true, "unique": true},
