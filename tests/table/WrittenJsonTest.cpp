@@ -89,7 +89,7 @@ class Maker {
   public:
     explicit Maker(unsigned nSeed) : m_Random(nSeed) {}
 
-    size_t Below(size_t nEnd) { return m_Random() % nEnd; }
+    size_t Below(size_t nEnd) { return static_cast<size_t>(m_Random() % nEnd); }
 
     Json::Value Value(int nLevels) {
         static const char* const s_aszTexts[] = {"",    "a",        "b",   "aa",
