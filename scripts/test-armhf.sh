@@ -17,7 +17,7 @@ export PKG_CONFIG_LIBDIR=$armhf_sysroot/usr/lib/arm-linux-gnueabihf/pkgconfig
 configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON "${together[@]}" \
     -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchain-armhf.cmake" \
     -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot" -DVORNJSONDB_COMMAND=OFF \
-    -DVORNJSONDB_CAMPAIGN_SCALE=20
+    -DVORNJSONDB_CAMPAIGN_SCALE=60
 build armhf
 
 # Emulated, each of these tests would take minutes, and the second handle's campaigns ten.
