@@ -140,7 +140,7 @@ class OldRecordLint {
         }
         const char* szFate = " holds NaN, which is stored as null";
         if (eMisfit == Misfit::kInfinite) {
-            szFate = " holds an infinity: it is stored, and not read back";
+            szFate = " holds an infinity: it is stored, and JsonCpp 1.9.5 does not read it back";
         } else if (eMisfit == Misfit::kDepth) {
             szFate = " is nested too deeply: it is stored, and only a part is read";
         }

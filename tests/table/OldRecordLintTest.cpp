@@ -173,9 +173,14 @@ TEST_F(OldRecordLintTest, JsonThatIsNotReadBackAsItWas) {
     Expect(jRecord, "old-json-changed /j: member \"j\" holds NaN, which is stored as null",
            R"(0 {"j":[null]})", "[null]");
     jRecord["j"][0] = std::numeric_limits<double>::infinity();
-    Expect(jRecord,
-           "old-json-changed /j: member \"j\" holds an infinity: it is stored, and not read back",
-           R"(0 {"j":[null]})", "[1e+9999]");
+    EXPECT_EQ(
+        Text(LintOldRecord(m_strName, m_jDefinition, jRecord)),
+        "old-json-changed /j: member \"j\" holds an infinity: it is stored, and JsonCpp 1.9.5 "
+        "does not read it back");
+    // What is read back depends on JsonCpp's version.
+    EXPECT_EQ(OldCreate(jRecord).substr(0, 2), "0 ");
+    EXPECT_EQ(AllRows(), "[1e+9999]");
+    Run("DELETE FROM " + m_strName);
     jRecord["j"] = Nested(1100);
     EXPECT_EQ(Text(LintOldRecord(m_strName, m_jDefinition, jRecord)),
               "old-json-changed /j: member \"j\" is nested too deeply: it is stored, and only a "
