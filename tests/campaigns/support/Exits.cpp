@@ -35,6 +35,7 @@ __attribute__((format(printf, 1, 0))) void Render(const char* szFormat, va_list 
 }
 
 constexpr long long kSecond = 1000000000;
+constexpr long long kMillisecond = 1000000;
 long long g_nPaused = 0;  // nanoseconds, of all pauses while there was a function for them
 
 timespec TimeOf(long long nNanoseconds) {
@@ -59,6 +60,10 @@ long long Pause(long long nNanoseconds) {
     return nLeft;
 }
 
+long long SleepOfSqlite(long long nNanoseconds) {
+    return g_blSkipSqliteSleeps ? 0 : RealSleep(nNanoseconds);
+}
+
 }  // namespace
 
 std::uint64_t LogLines() {
@@ -75,15 +80,15 @@ Pauses TakePauses() {
 // are not the library's.
 int Sleep(unsigned nMicroseconds) {
     const long long nNanoseconds = nMicroseconds * 1000LL;
-    if (nMicroseconds != kLibraryPauseUs) {
-        return g_blSkipSqliteSleeps || RealSleep(nNanoseconds) == 0 ? 0 : -1;
-    }
-    return Pause(nNanoseconds) == 0 ? 0 : -1;
+    const bool blOwn = nMicroseconds == kLibraryPauseUs;
+    return (blOwn ? Pause(nNanoseconds) : SleepOfSqlite(nNanoseconds)) == 0 ? 0 : -1;
 }
 
-// The second handle pauses by nanosleep.
+// The second handle pauses by nanosleep, for whole milliseconds; so does newer SQLite, for others.
 int Sleep(const timespec& wanted, timespec* pLeft) {
-    const long long nLeft = Pause(static_cast<long long>(wanted.tv_sec) * kSecond + wanted.tv_nsec);
+    const long long nNanoseconds = static_cast<long long>(wanted.tv_sec) * kSecond + wanted.tv_nsec;
+    const bool blOwn = nNanoseconds % kMillisecond == 0;
+    const long long nLeft = blOwn ? Pause(nNanoseconds) : SleepOfSqlite(nNanoseconds);
     if (pLeft != nullptr) {
         *pLeft = TimeOf(nLeft);
     }
