@@ -11,7 +11,7 @@ cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
 source scripts/build.sh
 
-largest='/1000000$'
+largest='/1000000(/|$)'
 measure=yes
 for argument; do
     case $argument in
