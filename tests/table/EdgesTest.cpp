@@ -21,6 +21,16 @@ class EdgesTest : public QueryTest {
         const Status Outcome = m_Table.Lint(vecFindings);
         return Outcome.Ok() ? Text(vecFindings) : Text(Outcome);
     }
+
+    std::string NameOfLastRow() {
+        std::string strName = "no row";
+        const auto fnRow = [&](const Row& Each) {
+            strName = Each.Text(0);
+            return true;
+        };
+        EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}), fnRow)), "ok");
+        return strName;
+    }
 };
 
 TEST_F(EdgesTest, InterruptedReadingTellsItAndStops) {
@@ -45,26 +55,12 @@ TEST_F(EdgesTest, InterruptedReadingTellsItAndStops) {
 TEST_F(EdgesTest, EmptyBlobIsReadAsAnEmptyText) {
     Run("INSERT INTO doc (id, name) VALUES (1, x'')");
     EXPECT_EQ(Get("1"), R"({"id":1,"name":""})");
-    std::string strText = "none";
-    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}),
-                                      [&](const Row& Each) {
-                                          strText = Each.Text(0);
-                                          return true;
-                                      })),
-              "ok");
-    EXPECT_EQ(strText, "");
+    EXPECT_EQ(NameOfLastRow(), "");
 }
 
 TEST_F(EdgesTest, TextOfANullIsEmpty) {
     Run("INSERT INTO doc (id) VALUES (1)");
-    std::string strText = "none";
-    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Members({"name"}),
-                                      [&](const Row& Each) {
-                                          strText = Each.Text(0);
-                                          return true;
-                                      })),
-              "ok");
-    EXPECT_EQ(strText, "");
+    EXPECT_EQ(NameOfLastRow(), "");
 }
 
 TEST_F(EdgesTest, UnsignedNumbersAreNumbers) {

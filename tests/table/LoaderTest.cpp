@@ -20,6 +20,15 @@ class LoaderTest : public TableTest {
         return How;
     }
 
+    // A table g, whose member "twice" is generated.
+    void OpenGenerated() {
+        Options How;
+        How.strSqlCreate = "CREATE TABLE g (id INTEGER PRIMARY KEY, twice INTEGER AS (2 * id))";
+        Open(
+            R"({"g": {"key": "id", "member": {"id": {"cpptype": "int"}, "twice": {"cpptype": "int"}}}})",
+            How);
+    }
+
     // What became of each record.
     std::string Add(Loader& Into, const std::vector<std::string>& vecRecords) {
         std::string strAll;
@@ -364,11 +373,7 @@ TEST_F(LoaderTest, CommitWithoutARecordDoesNothing) {
 }
 
 TEST_F(LoaderTest, NullForAGeneratedMemberIsRefusedToo) {
-    Options How;
-    How.strSqlCreate = "CREATE TABLE g (id INTEGER PRIMARY KEY, twice INTEGER AS (2 * id))";
-    Open(
-        R"({"g": {"key": "id", "member": {"id": {"cpptype": "int"}, "twice": {"cpptype": "int"}}}})",
-        How);
+    OpenGenerated();
     Loader Into;
     EXPECT_EQ("ok", Text(Into.Start(m_Table, With(OnDuplicate::kStop, true))));
     Into.SetInteger(Into.MemberIndex("id"), 1);
@@ -398,11 +403,7 @@ TEST_F(LoaderTest, KeyOfTwoMembersIsFoundByBoth) {
 }
 
 TEST_F(LoaderTest, GeneratedMembersAreNotWritten) {
-    Options How;
-    How.strSqlCreate = "CREATE TABLE g (id INTEGER PRIMARY KEY, twice INTEGER AS (2 * id))";
-    Open(
-        R"({"g": {"key": "id", "member": {"id": {"cpptype": "int"}, "twice": {"cpptype": "int"}}}})",
-        How);
+    OpenGenerated();
     Loader Into;
     EXPECT_EQ("ok", Text(Into.Start(m_Table, With(OnDuplicate::kReplace, true))));
     Into.SetInteger(Into.MemberIndex("id"), 1);
