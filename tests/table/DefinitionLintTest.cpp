@@ -16,10 +16,11 @@ class DefinitionLintTest : public OldHandleTest {
         return Text(LintDefinition("t", Parse("{\"t\": " + strEntry + "}")));
     }
 
-    // What an old handle lists of a table whose one column has that name and holds 5.
+    // What an old handle lists of a table whose one column has that name and holds 70,
+    // which is no hour of the day.
     std::string OldListOf(const std::string& strName) {
         Describe("{\"" + strName + "\": {\"cpptype\": \"int\"}}");
-        Run("INSERT INTO " + m_strName + " VALUES (5)");
+        Run("INSERT INTO " + m_strName + " VALUES (70)");
         return OldList(Json::Value(), strName.c_str());
     }
 };
@@ -70,13 +71,13 @@ TEST_F(DefinitionLintTest, NamesOfMembers) {
                             R"(": {"cpptype": "int", "cppDefaultValue": 0}})"),
                   std::string("old-name /t/member/") + szName + ": member \"" + szName + "\"" +
                       strOldName);
-        EXPECT_NE(OldListOf(szName), "5") << szName;
+        EXPECT_NE(OldListOf(szName), "70") << szName;
     }
     for (const char* szName : {"a", "_1", "key", "desc_", "Name", "\xc3\xa9", "replace"}) {
         EXPECT_EQ(OfMembers(std::string("{\"") + szName +
                             R"(": {"cpptype": "int", "cppDefaultValue": 0}})"),
                   "");
-        EXPECT_EQ(OldListOf(szName), "5") << szName;
+        EXPECT_EQ(OldListOf(szName), "70") << szName;
     }
     EXPECT_EQ(Text(LintDefinition("group", Parse(R"({"group": {"member": {
                   "a": {"cpptype": "int", "cppDefaultValue": 0}}}})"))),
