@@ -25,9 +25,11 @@ configure coverage -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_COVE
     -DVORNJSONDB_EXAMPLES=OFF "${together[@]}" -DVORNJSONDB_COMMAND=OFF
 # Counters of an earlier build do not fit, those of an earlier run would add up.
 find build/coverage -name '*.gcda' -delete
-build coverage
-
-(cd build/coverage && ctest --output-on-failure --parallel "$jobs" --label-exclude 'install|campaign')
+programs=(vornjsondb_tests table/vornjsondb_table_tests)
+build coverage "${programs[@]##*/}"
+for program in "${programs[@]}"; do
+    "build/coverage/tests/$program" --gtest_brief=1
+done
 
 # Counted is what the tests reach by themselves: in the shared library with every name visible, and of
 # table/ in the static one and in its tests, which bring some of its inline functions.

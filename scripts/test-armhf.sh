@@ -3,7 +3,8 @@
 #
 #    scripts/test-armhf.sh [CTEST-OPTION...]
 #
-# What is given goes to ctest: scripts/test-armhf.sh -R Runner
+# What is given goes to ctest. Each test program is one test of it, so that a single one is named
+# another way: GTEST_FILTER='Runner*' scripts/test-armhf.sh -R vornjsondb_tests
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -17,7 +18,7 @@ export PKG_CONFIG_LIBDIR=$armhf_sysroot/usr/lib/arm-linux-gnueabihf/pkgconfig
 configure armhf -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=ON "${together[@]}" \
     -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchain-armhf.cmake" \
     -DVORNJSONDB_ARMHF_SYSROOT="$armhf_sysroot" -DVORNJSONDB_COMMAND=OFF \
-    -DVORNJSONDB_CAMPAIGN_SCALE=60
+    -DVORNJSONDB_TESTS_BY_PROGRAM=ON -DVORNJSONDB_CAMPAIGN_SCALE=150
 build armhf
 
 # Emulated, each of these tests would take minutes, and the second handle's campaigns ten.

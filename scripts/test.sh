@@ -4,9 +4,9 @@
 #    scripts/test.sh [--asan] [CTEST-OPTION...]
 #    scripts/test.sh --tsan
 #
-# --asan builds with AddressSanitizer and UndefinedBehaviorSanitizer. What else is given goes to
-# ctest: scripts/test.sh -R Runner. --tsan builds VORN_JSON_DB::Table alone with ThreadSanitizer, and
-# runs the one test that has threads.
+# --asan builds with AddressSanitizer and UndefinedBehaviorSanitizer; each test program is then one
+# test. What else is given goes to ctest: scripts/test.sh -R Runner. --tsan builds
+# VORN_JSON_DB::Table alone with ThreadSanitizer, and runs the one test that has threads.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 source scripts/install-packages.sh
@@ -17,7 +17,7 @@ options=(-DCMAKE_BUILD_TYPE=Release)
 if [[ ${1:-} == --asan ]]; then
     shift
     name=asan
-    options=(-DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON)
+    options=(-DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON -DVORNJSONDB_TESTS_BY_PROGRAM=ON)
 fi
 
 if [[ ${1:-} == --tsan ]]; then

@@ -1,6 +1,7 @@
 // Out of memory: each public operation, with the Nth allocation failing, N rising until the
 // operation passes untouched.
 
+#include <algorithm>
 #include <memory>
 #include <new>
 #include <stdexcept>
@@ -238,11 +239,12 @@ int RunMemoryCampaign(const Options& options) {
           "allocations failed in a fresh process", "most allocations in one operation"}) {
         Figure(szFigure);
     }
+    const int nWide = std::max(40 / options.nScale, 8);
     for (const Operation& operation : kOperations) {
         ++Figure("operations");
         InChild(operation.szName, [&] {
             RunOperation(operation, 4, options.Count(8, kEvery));
-            RunOperation(operation, 40, options.Count(3, 60));
+            RunOperation(operation, nWide, options.Count(3, 60));
         });
     }
     for (const Operation& operation : kOperations) {
