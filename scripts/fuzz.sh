@@ -4,7 +4,7 @@
 #
 #    scripts/fuzz.sh [--seconds N | --long | --replay] [--record] [TARGET...]
 #
-# Each target runs its share of 140 seconds, N seconds, with --long 10 minutes, or not at all beyond the
+# Each target runs its share of 100 seconds, N seconds, with --long 10 minutes, or not at all beyond the
 # replay.
 # What a run finds new lies in build/fuzz/corpus/TARGET, an input that breaks a promise in
 # build/fuzz/findings. --record puts the figures of each target's last run into docs/reliability.md.
@@ -30,7 +30,7 @@ while (($# > 0)); do
 done
 # A target's file begins with a small letter, what the targets share with a capital one.
 mapfile -t all_targets < <(cd fuzz && printf '%s\n' [a-z]*.cpp | sed 's/\.cpp$//')
-seconds=${seconds:-$((140 / ${#all_targets[@]}))}
+seconds=${seconds:-$((100 / ${#all_targets[@]}))}
 if ((${#targets[@]} == 0)); then
     targets=("${all_targets[@]}")
 fi
