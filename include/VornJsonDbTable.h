@@ -227,13 +227,28 @@ struct Query {
     static Query ValuesOnly(const Json::Value& jQuery);
 
     // Each call adds: all conditions must hold, sort terms count in turn.
-    Query& Where(Condition Added);
-    Query& Where(std::string strMember, Json::Value jValue);
-    Query& Where(std::string strMember, Op eOp, Json::Value jOperand);
-    Query& Sort(std::string strTerm);
-    Query& Limit(std::int64_t nRows);
-    Query& Offset(std::int64_t nRows);
-    Query& Members(std::vector<std::string> vecNames);
+    Query& Where(Condition Added) &;
+    Query& Where(std::string strMember, Json::Value jValue) &;
+    Query& Where(std::string strMember, Op eOp, Json::Value jOperand) &;
+    Query& Sort(std::string strTerm) &;
+    Query& Limit(std::int64_t nRows) &;
+    Query& Offset(std::int64_t nRows) &;
+    Query& Members(std::vector<std::string> vecNames) &;
+
+    // The same for a chain that begins with Query(): what it is kept as takes it without a copy.
+    Query&& Where(Condition Added) && { return std::move(Where(std::move(Added))); }
+    Query&& Where(std::string strMember, Json::Value jValue) && {
+        return std::move(Where(std::move(strMember), std::move(jValue)));
+    }
+    Query&& Where(std::string strMember, Op eOp, Json::Value jOperand) && {
+        return std::move(Where(std::move(strMember), eOp, std::move(jOperand)));
+    }
+    Query&& Sort(std::string strTerm) && { return std::move(Sort(std::move(strTerm))); }
+    Query&& Limit(std::int64_t nRows) && { return std::move(Limit(nRows)); }
+    Query&& Offset(std::int64_t nRows) && { return std::move(Offset(nRows)); }
+    Query&& Members(std::vector<std::string> vecNames) && {
+        return std::move(Members(std::move(vecNames)));
+    }
 
     std::vector<Condition> vecWhere;
     std::vector<std::string> vecSort;

@@ -66,6 +66,8 @@ class ConditionWriter {
         WriteRest(All, nOpen, nParts, ") IS TRUE");
     }
 
+    void WriteOne(const Node& Leaf) { WriteLeaf(Leaf); }
+
   private:
     struct Chain {
         const std::vector<const Node*>& vecNodes;
@@ -154,6 +156,11 @@ class ConditionWriter {
 
 void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of, JsonCodec& Codec,
                       bool blChange, BoundSql& Out, FindingList& vecFindings) {
+    // One condition needs no list.
+    if (vecWhere.size() == 1 && vecWhere[0].Root().eKind == Kind::kLeaf) {
+        ConditionWriter(Of, Codec, blChange, 1, Out, vecFindings).WriteOne(vecWhere[0].Root());
+        return;
+    }
     size_t nLeaves = 0;
     std::vector<const Node*> vecNodes;
     vecNodes.reserve(vecWhere.size());

@@ -130,8 +130,7 @@ int BoundValue::Bind(sqlite3_stmt* pStatement, int nParameter) const {
 }
 
 Misfit FitBoolean(const MemberType& Type, bool blValue, BoundValue& Out) {
-    Out.eKind = BoundValue::Kind::kInteger;
-    Out.nValue = blValue ? 1 : 0;
+    Out.SetInteger(blValue ? 1 : 0);
     return Type.Bound.eKind == BoundKind::kBoolean ? Misfit::kNone : Misfit::kKind;
 }
 
@@ -144,8 +143,7 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
             Out.dValue < kTwoTo63 && static_cast<std::int64_t>(Out.dValue) == nValue;
         return blExact ? Readable(Type, blCompatible) : Misfit::kRange;
     }
-    Out.eKind = BoundValue::Kind::kInteger;
-    Out.nValue = nValue;
+    Out.SetInteger(nValue);
     if (Form.eKind == BoundKind::kAny) {
         return Readable(Type, blCompatible);
     }
@@ -187,8 +185,7 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
 Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompatible,
                BoundValue& Out) {
     const BoundKind eKind = Type.Bound.eKind;
-    Out.eKind = BoundValue::Kind::kText;
-    Out.strBytes = strValue;
+    Out.SetText(strValue);
     if (eKind != BoundKind::kText && eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }
@@ -205,8 +202,7 @@ Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompati
 
 Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompatible,
                   BoundValue& Out) {
-    Out.eKind = BoundValue::Kind::kText;
-    Out.strBytes = strJson;
+    Out.SetText(strJson);
     return TakesJson(Type, strJson[0]) ? Readable(Type, blCompatible) : Misfit::kKind;
 }
 

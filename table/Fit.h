@@ -23,6 +23,15 @@ struct BoundValue {
     double dValue = 0;
     std::string_view strBytes;
 
+    void SetInteger(std::int64_t nInteger) {
+        eKind = Kind::kInteger;
+        nValue = nInteger;
+    }
+    void SetText(std::string_view strText) {
+        eKind = Kind::kText;
+        strBytes = strText;
+    }
+
     int Bind(sqlite3_stmt* pStatement, int nParameter) const;  // SQLite's result
 };
 

@@ -25,17 +25,38 @@ Loader::Parts::Parts(Table::Parts& To, const LoadOptions& HowToLoad)
     : Into(To),
       How(HowToLoad),
       Values(To.Of, To.Codec, To.How.blCompatible, To.How.blIgnoreUnknown),
-      vecBytes(To.Of.Size()),
+      vecWrong(To.Of.Size() + 2),
       Writer(To, Values) {}
 
-Status Loader::Parts::BeginIfNone(const vornjsondb::Doing& What) {
-    if (!All.IsOpen()) {
-        blCallers = sqlite3_get_autocommit(Into.pDb) == 0;
-        return Within(What, All.Begin(Into.pDb, Transaction::Mode::kImmediate, Into.How.nWaitMs));
+void Loader::Parts::SetWrong(size_t nPlace, FindingList& vecFindings) {
+    SetRight(nPlace);
+    vecWrong[nPlace] = std::move(vecFindings[0]);
+    ++nWrong;
+}
+
+void Loader::Parts::SetRight(size_t nPlace) {
+    if (vecWrong[nPlace].szCode != nullptr) {
+        vecWrong[nPlace] = Finding();
+        --nWrong;
     }
-    return sqlite3_get_autocommit(Into.pDb) == 0
-               ? Status()
-               : vornjsondb::Fail(StatusCode::kMisuse, What, "its transaction was ended by others");
+}
+
+void Loader::Parts::TakeWrong(FindingList& vecFindings) {
+    vecFindings.reserve(nWrong);
+    for (size_t nPlace = 0; nWrong > 0; ++nPlace) {
+        if (vecWrong[nPlace].szCode != nullptr) {
+            vecFindings.push_back(std::move(vecWrong[nPlace]));
+            SetRight(nPlace);
+        }
+    }
+}
+
+Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
+    if (All.IsOpen()) {
+        return vornjsondb::Fail(StatusCode::kMisuse, What, "its transaction was ended by others");
+    }
+    blCallers = sqlite3_get_autocommit(Into.pDb) == 0;
+    return Within(What, All.Begin(Into.pDb, Transaction::Mode::kImmediate, Into.How.nWaitMs));
 }
 
 Status Loader::Parts::Write(FindingList& vecFindings) {
@@ -47,9 +68,13 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (!vecFindings.empty() || (blByKey && !Values.HasKey(vecFindings))) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
-    Status Outcome = BeginIfNone(What);
-    if (!Outcome.Ok()) {
-        return Outcome;
+    Status Outcome;
+    const bool blBegun = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) == 0;
+    if (!blBegun) {
+        Outcome = Begin(What);
+        if (!Outcome.Ok()) {
+            return Outcome;
+        }
     }
     Written eWritten = Written::kInserted;
     Outcome = Writer.Write(How.eOnDuplicate, What, eWritten);
@@ -140,7 +165,10 @@ Status Loader::Add(const Json::Value& jRecord) {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    m_pParts->mapWrong.clear();
+    if (m_pParts->nWrong > 0) {
+        m_pParts->TakeWrong(vecFindings);
+        vecFindings.clear();
+    }
     m_pParts->Values.Take(jRecord, vecFindings);
     return m_pParts->EndRecord(vecFindings);
 }
@@ -150,11 +178,8 @@ Status Loader::EndRecord() {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    if (!m_pParts->mapWrong.empty()) {
-        for (auto& Each : m_pParts->mapWrong) {
-            vecFindings.push_back(std::move(Each.second));
-        }
-        m_pParts->mapWrong.clear();
+    if (m_pParts->nWrong > 0) {
+        m_pParts->TakeWrong(vecFindings);
     }
     return m_pParts->EndRecord(vecFindings);
 }

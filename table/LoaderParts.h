@@ -3,9 +3,7 @@
 #ifndef VORN_TABLE_LOADER_PARTS_H
 #define VORN_TABLE_LOADER_PARTS_H
 
-#include <map>
 #include <memory>
-#include <string>
 #include <vector>
 
 #include "RecordWriter.h"
@@ -18,6 +16,14 @@ struct VORN_JSON_DB::Loader::Parts {
     bool IsReady() const { return Ended.Ok() && Into.nReading == 0; }
     Status State() const;
 
+    // What is wrong with the next record: with a member's last value, or at the two places behind
+    // the members' with no member.
+    size_t UnknownPlace() const { return Into.Of.Size(); }
+    size_t WholePlace() const { return Into.Of.Size() + 1; }
+    void SetWrong(size_t nPlace, FindingList& vecFindings);
+    void SetRight(size_t nPlace);
+    void TakeWrong(FindingList& vecFindings);
+
     // Writes what Values hold, if nothing is wrong with them, and starts the next record.
     Status EndRecord(FindingList& vecFindings);
     Status Commit();
@@ -25,18 +31,18 @@ struct VORN_JSON_DB::Loader::Parts {
     Table::Parts& Into;
     const LoadOptions How;
     vornjsondb::RecordValues Values;
-    std::vector<std::string> vecBytes;   // texts and blobs that Values point to
-    std::map<size_t, Finding> mapWrong;  // by member; those that are none of a member's come last
+    size_t nWrong = 0;                          // places with a finding
     std::unique_ptr<Json::CharReader> pReader;  // for SetJson, which makes it
     LoadCounts Now;
 
   private:
-    Status BeginIfNone(const vornjsondb::Doing& What);
+    Status Begin(const vornjsondb::Doing& What);
     Status Write(FindingList& vecFindings);
     Status Fail(const Status& Outcome);
     Status End(const Status& Outcome);
 
-    LoadCounts Kept;  // when it was committed last
+    FindingList vecWrong;  // by place; without a code where nothing is wrong
+    LoadCounts Kept;       // when it was committed last
     Status Ended;
     Transaction All;
     bool blCallers = false;  // whether it is inside of one of the caller's

@@ -13,61 +13,84 @@ namespace VORN_JSON_DB {
 
 namespace {
 
+using vornjsondb::BoundKind;
+using vornjsondb::BoundValue;
 using vornjsondb::FindingCode;
 using vornjsondb::Misfit;
 using Parts = Loader::Parts;
 
-// What is wrong and belongs to no member.
-constexpr size_t kUnknown = vornjsondb::Members::kNone - 1;
-constexpr size_t kWhole = vornjsondb::Members::kNone;
-
-Finding One(FindingCode eCode, std::string strPath, std::string strMessage) {
+void SetWrong(Parts& Of, size_t nPlace, FindingCode eCode, std::string strMessage) {
     FindingList vecFindings;
-    Report(vecFindings, eCode, std::move(strPath), std::move(strMessage));
-    return std::move(vecFindings[0]);
+    Report(vecFindings, eCode, "", std::move(strMessage));
+    Of.SetWrong(nPlace, vecFindings);
 }
 
 void SetUnknown(Parts& Of, int nMember) {
     if (!Of.Into.How.blIgnoreUnknown) {
-        Of.mapWrong[kUnknown] = One(FindingCode::kUnknownMember, "",
-                                    "there is no member of number " + std::to_string(nMember));
+        SetWrong(Of, Of.UnknownPlace(), FindingCode::kUnknownMember,
+                 "there is no member of number " + std::to_string(nMember));
     }
 }
 
 // What was wrong with a member's last value counts no more, but what is wrong with this one.
 void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const char* szShown) {
     const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
-    Of.mapWrong.erase(nPlace);
+    Of.SetRight(nPlace);
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
         FindingList vecFindings;
         ReportMisfit(eMisfit, Into, szShown != nullptr ? szShown : Shown(Of.Values.At(nPlace)),
                      vornjsondb::Below("", Into.strName), vecFindings);
-        Of.mapWrong[nPlace] = std::move(vecFindings[0]);
+        Of.SetWrong(nPlace, vecFindings);
     }
 }
 
-// Gives a member what fnFit makes of it; szShown shows it in messages where that does not. As short
-// as it can be where nothing is wrong: this runs for every value of a million records.
-template <typename Fit>
-void Set(Parts* pOf, int nMember, Fit&& fnFit, const char* szShown = nullptr) {
+enum class Passed { kNull, kBoolean, kInteger, kReal, kText, kBlob };
+
+// Gives a member any value, or notes what is wrong with it. nValue: also of a boolean.
+void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dValue = 0,
+         std::string_view strBytes = {}) {
     if (pOf == nullptr) {
         return;
     }
     const auto nPlace = static_cast<size_t>(nMember);
-    if (nPlace >= pOf->vecBytes.size()) {
+    if (nPlace >= pOf->Values.Size()) {
         SetUnknown(*pOf, nMember);
         return;
     }
-    const vornjsondb::Member& Into = pOf->Into.Of.At(nPlace);
-    const Misfit eMisfit = fnFit(*Into.pType, pOf->Values.Give(nPlace));
-    if (eMisfit != Misfit::kNone || Into.blGenerated || !pOf->mapWrong.empty()) {
-        Judge(*pOf, nPlace, eMisfit, szShown);
+    const vornjsondb::MemberType& Type = *pOf->Into.Of.At(nPlace).pType;
+    const bool blCompatible = pOf->Into.How.blCompatible;
+    BoundValue& Out = pOf->Values.Give(nPlace);
+    Misfit eMisfit = Misfit::kNone;
+    const char* szShown = nullptr;
+    switch (eKind) {
+        case Passed::kBoolean:
+            eMisfit = FitBoolean(Type, nValue != 0, Out);
+            szShown = nValue != 0 ? "true" : "false";
+            break;
+        case Passed::kInteger:
+            eMisfit = FitInteger(Type, nValue, blCompatible, Out);
+            break;
+        case Passed::kReal:
+            eMisfit = FitReal(Type, dValue, blCompatible, Out);
+            break;
+        case Passed::kText:
+            eMisfit = FitText(Type, pOf->Values.Copied(nPlace, strBytes), blCompatible, Out);
+            break;
+        case Passed::kBlob:
+            eMisfit = FitBlob(Type, pOf->Values.Copied(nPlace, strBytes), blCompatible, Out);
+            break;
+        default:
+            Out.eKind = BoundValue::Kind::kNull;
     }
+    Judge(*pOf, nPlace, eMisfit, szShown);
 }
 
-// The member's own copy of what was passed.
-std::string_view Copied(Parts& Of, int nMember, const char* pBytes, size_t nBytes) {
-    return Of.vecBytes[static_cast<size_t>(nMember)].assign(pBytes, nBytes);
+// The values of a started load that a member can simply be given: the member is there, and nothing
+// is wrong so far that a new value might put right.
+vornjsondb::RecordValues* Simply(Parts* pOf, int nMember) {
+    const bool blSimply =
+        pOf != nullptr && pOf->nWrong == 0 && static_cast<size_t>(nMember) < pOf->Values.Size();
+    return blSimply ? &pOf->Values : nullptr;
 }
 
 // JSON and nothing else: JsonCpp takes comments and what follows unless it is told otherwise. Of
@@ -105,54 +128,51 @@ int Loader::MemberIndex(std::string_view strMember) const {
 }
 
 void Loader::SetNull(int nMember) {
-    Set(m_pParts.get(), nMember, [](const auto&, vornjsondb::BoundValue& Out) {
-        Out.eKind = vornjsondb::BoundValue::Kind::kNull;
-        return Misfit::kNone;
-    });
+    Set(m_pParts.get(), nMember, Passed::kNull, 0);
 }
 
 void Loader::SetBoolean(int nMember, bool blValue) {
-    Set(
-        m_pParts.get(), nMember,
-        [blValue](const auto& Type, auto& Out) { return FitBoolean(Type, blValue, Out); },
-        blValue ? "true" : "false");
+    auto* const pInto = Simply(m_pParts.get(), nMember);
+    if (pInto == nullptr || !pInto->TakeBoolean(static_cast<size_t>(nMember), blValue)) {
+        Set(m_pParts.get(), nMember, Passed::kBoolean, blValue ? 1 : 0);
+    }
 }
 
 void Loader::SetInteger(int nMember, std::int64_t nValue) {
-    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
-        return FitInteger(Type, nValue, m_pParts->Into.How.blCompatible, Out);
-    });
+    auto* const pInto = Simply(m_pParts.get(), nMember);
+    if (pInto == nullptr || !pInto->TakeInteger(static_cast<size_t>(nMember), nValue)) {
+        Set(m_pParts.get(), nMember, Passed::kInteger, nValue);
+    }
 }
 
 void Loader::SetReal(int nMember, double dValue) {
-    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
-        return FitReal(Type, dValue, m_pParts->Into.How.blCompatible, Out);
-    });
+    Set(m_pParts.get(), nMember, Passed::kReal, 0, dValue);
 }
 
 void Loader::SetText(int nMember, std::string_view strText) {
-    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
-        return FitText(Type, Copied(*m_pParts, nMember, strText.data(), strText.size()),
-                       m_pParts->Into.How.blCompatible, Out);
-    });
+    auto* const pInto = Simply(m_pParts.get(), nMember);
+    const auto nPlace = static_cast<size_t>(nMember);
+    if (pInto != nullptr && pInto->FitsText(nPlace, strText)) {
+        pInto->Give(nPlace).SetText(pInto->Copied(nPlace, strText));
+    } else {
+        Set(m_pParts.get(), nMember, Passed::kText, 0, 0, strText);
+    }
 }
 
 void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
-    Set(m_pParts.get(), nMember, [&](const auto& Type, auto& Out) {
-        return FitBlob(Type, Copied(*m_pParts, nMember, static_cast<const char*>(pBytes), nBytes),
-                       m_pParts->Into.How.blCompatible, Out);
-    });
+    Set(m_pParts.get(), nMember, Passed::kBlob, 0, 0, {static_cast<const char*>(pBytes), nBytes});
 }
 
 void Loader::SetJson(int nMember, std::string_view strJson) {
     const auto nPlace = static_cast<size_t>(nMember);
-    if (!m_pParts || nPlace >= m_pParts->vecBytes.size()) {
+    if (!m_pParts || nPlace >= m_pParts->Values.Size()) {
         SetNull(nMember);  // which says what is wrong
         return;
     }
-    m_pParts->mapWrong.erase(nPlace);
-    // A NUL stands behind the copy.
-    strJson = Copied(*m_pParts, nMember, strJson.data(), strJson.size());
+    if (m_pParts->nWrong > 0) {
+        m_pParts->SetRight(nPlace);
+    }
+    strJson = m_pParts->Values.Copied(nPlace, strJson);
     if (SetWritten(*m_pParts, nPlace, strJson)) {
         return;
     }
@@ -179,13 +199,13 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
                "member " + Into.strQuoted + ": the JSON is nested too deeply");
     }
     if (!vecFindings.empty()) {
-        m_pParts->mapWrong[nPlace] = std::move(vecFindings[0]);
+        m_pParts->SetWrong(nPlace, vecFindings);
     }
 }
 
 void Loader::Reject(std::string strReason) {
     if (m_pParts) {
-        m_pParts->mapWrong[kWhole] = One(FindingCode::kRejected, "", std::move(strReason));
+        SetWrong(*m_pParts, m_pParts->WholePlace(), FindingCode::kRejected, std::move(strReason));
     }
 }
 

@@ -105,10 +105,17 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
 }
 
 size_t Members::Find(std::string_view strName) const {
-    const auto itFound = std::lower_bound(m_vecNames.begin(), m_vecNames.end(), strName);
-    return itFound != m_vecNames.end() && *itFound == strName
-               ? static_cast<size_t>(itFound - m_vecNames.begin())
-               : kNone;
+    size_t nFrom = 0;
+    size_t nTo = m_vecNames.size();
+    while (nFrom < nTo) {
+        const size_t nMiddle = nFrom + (nTo - nFrom) / 2;
+        const int nOrder = strName.compare(m_vecNames[nMiddle]);
+        if (nOrder == 0) {
+            return nMiddle;
+        }
+        (nOrder < 0 ? nTo : nFrom) = nOrder < 0 ? nMiddle : nMiddle + 1;
+    }
+    return kNone;
 }
 
 bool IsSameColumn(const std::string& strLeft, const std::string& strRight) {

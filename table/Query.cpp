@@ -48,7 +48,7 @@ using Node = Condition::Node;
 std::shared_ptr<const Node> Leaf(std::string& strMember, Op eOp, Json::Value& jOperand) {
     auto pNode = std::make_shared<Node>();
     pNode->eOp = eOp;
-    pNode->strMember.swap(strMember);
+    pNode->strMember = std::move(strMember);
     if (vornjsondb::IsTooDeep(jOperand)) {
         pNode->eKind = Node::Kind::kTooDeep;
     } else {
@@ -112,37 +112,37 @@ Query Query::ValuesOnly(const Json::Value& jQuery) {
     return vornjsondb::ParseQuery(jQuery, true);
 }
 
-Query& Query::Where(Condition Added) {
+Query& Query::Where(Condition Added) & {
     vecWhere.push_back(std::move(Added));
     return *this;
 }
 
-Query& Query::Where(std::string strMember, Json::Value jValue) {
+Query& Query::Where(std::string strMember, Json::Value jValue) & {
     vecWhere.emplace_back(Leaf(strMember, Op::kEqual, jValue));
     return *this;
 }
 
-Query& Query::Where(std::string strMember, Op eOp, Json::Value jOperand) {
+Query& Query::Where(std::string strMember, Op eOp, Json::Value jOperand) & {
     vecWhere.emplace_back(Leaf(strMember, eOp, jOperand));
     return *this;
 }
 
-Query& Query::Sort(std::string strTerm) {
+Query& Query::Sort(std::string strTerm) & {
     vecSort.push_back(std::move(strTerm));
     return *this;
 }
 
-Query& Query::Limit(std::int64_t nRows) {
+Query& Query::Limit(std::int64_t nRows) & {
     nLimit = nRows;
     return *this;
 }
 
-Query& Query::Offset(std::int64_t nRows) {
+Query& Query::Offset(std::int64_t nRows) & {
     nOffset = nRows;
     return *this;
 }
 
-Query& Query::Members(std::vector<std::string> vecNames) {
+Query& Query::Members(std::vector<std::string> vecNames) & {
     vecMembers = std::move(vecNames);
     return *this;
 }

@@ -100,23 +100,26 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
             Report(vecFindings, Why.eCode, Below("/sort", std::to_string(i)), Why.strMessage);
             continue;
         }
-        AppendSort(Where, blDescending);
+        AppendSort(Where.nMember, Where.strPath, blDescending);
         vecSorted.push_back(Where.strPath.empty() ? Where.nMember : Members::kNone);
     }
     for (const size_t nMember : m_Of.Key()) {
         const bool blSorted = std::count(vecSorted.begin(), vecSorted.end(), nMember) > 0;
         if (!blSorted && (blPaged || !vecSorted.empty())) {
-            AppendSort(Place{nMember, ""}, false);
+            AppendSort(nMember, {}, false);
         }
     }
 }
 
-void QueryPlan::AppendSort(const Place& Where, bool blDescending) {
-    const Member& Of = m_Of.At(Where.nMember);
-    const bool blPath = !Where.strPath.empty();
+void QueryPlan::AppendSort(size_t nMember, const std::string& strPath, bool blDescending) {
+    const Member& Of = m_Of.At(nMember);
     m_Sql.strSql += m_Sql.strSql.size() == m_nConditionEnd ? " ORDER BY " : ", ";
-    m_Sql.strSql += blPath ? ValueAt(Of.strColumn, Where.strPath) : Of.strColumn;
-    m_Sql.strSql += !blPath && IsOrderedAsText(Of) ? " COLLATE BINARY" : "";
+    if (!strPath.empty()) {
+        m_Sql.strSql += ValueAt(Of.strColumn, strPath);
+    } else {
+        m_Sql.strSql += Of.strColumn;
+        m_Sql.strSql += IsOrderedAsText(Of) ? " COLLATE BINARY" : "";
+    }
     m_Sql.strSql += blDescending ? " DESC" : "";
 }
 

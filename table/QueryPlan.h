@@ -61,7 +61,7 @@ class QueryPlan {
   private:
     void ResolveMembers(const VORN_JSON_DB::Query& Which, FindingList& vecFindings);
     void ResolveSort(const VORN_JSON_DB::Query& Which, bool blPaged, FindingList& vecFindings);
-    void AppendSort(const Place& Where, bool blDescending);
+    void AppendSort(size_t nMember, const std::string& strPath, bool blDescending);
     void AppendPage(const VORN_JSON_DB::Query& Which);
 
     const Members& m_Of;

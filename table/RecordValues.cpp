@@ -16,13 +16,24 @@ RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatibl
       m_Codec(Codec),
       m_blCompatible(blCompatible),
       m_blIgnoreUnknown(blIgnoreUnknown),
-      m_vecValues(Of.Size()),
-      m_vecJson(Of.Size()),
+      m_vecSlots(Of.Size()),
       m_strGiven(Of.Size(), '0') {
     for (size_t i = 0; i < Of.Size(); ++i) {
-        if (Of.At(i).pjDefault != nullptr) {
-            m_vecDefaults.push_back(i);
-        }
+        Prepare(i);
+    }
+}
+
+void RecordValues::Prepare(size_t nMember) {
+    const Member& Of = m_Of.At(nMember);
+    const Range& Fits = RangeOf(*Of.pType);
+    Slot& Into = m_vecSlots[nMember];
+    if (!Of.blGenerated && (!m_blCompatible || Of.pType->pfnRead != nullptr)) {
+        Into.eKind = Of.Kind();
+    }
+    Into.nLeast = Fits.nLeast;
+    Into.nMost = m_blCompatible ? Fits.nMostRead : Fits.nMost;
+    if (Of.pjDefault != nullptr) {
+        m_vecDefaults.push_back(nMember);
     }
 }
 
@@ -58,9 +69,34 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
 }
 
 void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
+    bool blTaken = false;
+    switch (jValue.type()) {
+        case Json::stringValue: {
+            const std::string_view strText = BytesOf(jValue);
+            blTaken = FitsText(nMember, strText);
+            if (blTaken) {
+                Give(nMember).SetText(strText);
+            }
+            break;
+        }
+        case Json::intValue:
+            blTaken = TakeInteger(nMember, jValue.asInt64());
+            break;
+        case Json::booleanValue:
+            blTaken = TakeBoolean(nMember, jValue.asBool());
+            break;
+        default:
+            break;
+    }
+    if (!blTaken) {
+        LookAtJson(nMember, jValue, vecFindings);
+    }
+}
+
+void RecordValues::LookAtJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
     const Member& Into = m_Of.At(nMember);
-    const Misfit eMisfit =
-        FitJson(*Into.pType, jValue, m_blCompatible, m_Codec, m_vecJson[nMember], Give(nMember));
+    const Misfit eMisfit = FitJson(*Into.pType, jValue, m_blCompatible, m_Codec,
+                                   m_vecSlots[nMember].strBytes, Give(nMember));
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
         Refuse(Into, eMisfit, jValue, vecFindings);
     }
@@ -74,6 +110,10 @@ void RecordValues::Refuse(const Member& Into, Misfit eMisfit, const Json::Value&
 void RecordValues::RefuseUnknown(const std::string& strName, FindingList& vecFindings) const {
     Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
            Concat({"there is no member ", ShownText(strName), Suggestion(strName, m_Of.Names())}));
+}
+
+void RecordValues::Grow(std::string& strOwn, size_t nBytes) {
+    strOwn.resize(nBytes);
 }
 
 bool RecordValues::FillDefaults(FindingList& vecFindings) {
@@ -100,20 +140,26 @@ bool RecordValues::HasKey(FindingList& vecFindings) const {
 }
 
 int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo) const {
-    for (size_t i = 0; i < m_vecValues.size(); ++i) {
-        if (Has(i) && (blKeyToo || !m_Of.At(i).blKey)) {
-            const int nResult = m_vecValues[i].Bind(pStatement, nNext++);
+    const char* pGiven = m_strGiven.data();
+    const Member* pMember = m_Of.All().data();
+    int nParameter = nNext;
+    for (const Slot& Each : m_vecSlots) {
+        if (*pGiven == '1' && (blKeyToo || !pMember->blKey)) {
+            const int nResult = Each.Value.Bind(pStatement, nParameter++);
             if (nResult != SQLITE_OK) {
                 return nResult;
             }
         }
+        ++pGiven;
+        ++pMember;
     }
+    nNext = nParameter;
     return SQLITE_OK;
 }
 
 int RecordValues::BindKey(sqlite3_stmt* pStatement, int& nNext) const {
     for (const size_t nMember : m_Of.Key()) {
-        const int nResult = m_vecValues[nMember].Bind(pStatement, nNext++);
+        const int nResult = At(nMember).Bind(pStatement, nNext++);
         if (nResult != SQLITE_OK) {
             return nResult;
         }

@@ -3,7 +3,9 @@
 #ifndef VORN_TABLE_RECORD_VALUES_H
 #define VORN_TABLE_RECORD_VALUES_H
 
+#include <cstdint>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include <json/json.h>
@@ -31,19 +33,60 @@ class RecordValues {
     BoundValue& Give(size_t nMember) {
         m_strGiven[nMember] = '1';
         m_blEmpty = false;
-        return m_vecValues[nMember];
+        return m_vecSlots[nMember].Value;
     }
     void SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
 
-    // Gives members that the record lacks the definition's defaults, which must fit like any value.
+    // A copy for a text that would not live as long as the value, followed by a NUL. There is one
+    // for each member, whose memory never becomes less.
+    std::string_view Copied(size_t nMember, std::string_view strBytes) {
+        std::string& strOwn = m_vecSlots[nMember].strBytes;
+        if (strOwn.size() < strBytes.size()) {
+            Grow(strOwn, strBytes.size());
+        }
+        strBytes.copy(strOwn.data(), strBytes.size());
+        strOwn.data()[strBytes.size()] = '\0';
+        return {strOwn.data(), strBytes.size()};
+    }
+
+    // Most values are of their member's own kind and fit. These find that out in a few steps; what
+    // they return false for is looked at by a Fit... function.
+    bool FitsText(size_t nMember, std::string_view strText) const {
+        return m_vecSlots[nMember].eKind == BoundKind::kText &&
+               (!m_blCompatible || strText.find('\0') == std::string_view::npos);
+    }
+    bool TakeInteger(size_t nMember, std::int64_t nValue) {
+        const Slot& Of = m_vecSlots[nMember];
+        const bool blFits =
+            Of.eKind == BoundKind::kInteger && nValue >= Of.nLeast && nValue <= Of.nMost;
+        if (blFits) {
+            Give(nMember).SetInteger(nValue);
+        }
+        return blFits;
+    }
+    bool TakeBoolean(size_t nMember, bool blValue) {
+        const bool blFits = m_vecSlots[nMember].eKind == BoundKind::kBoolean;
+        if (blFits) {
+            Give(nMember).SetInteger(blValue ? 1 : 0);
+        }
+        return blFits;
+    }
+
+    // From now on every value of the member is looked at.
+    void LookAlways(size_t nMember) { m_vecSlots[nMember].eKind = BoundKind::kNone; }
+
+    // Gives members that the record lacks the definition's defaults, if it has any, which must fit
+    // like any value.
+    bool HasDefaults() const { return !m_vecDefaults.empty(); }
     bool FillDefaults(FindingList& vecFindings);
 
     // Whether every member of the key has a value; those without are reported.
     bool HasKey(FindingList& vecFindings) const;
 
+    size_t Size() const { return m_strGiven.size(); }
     bool IsEmpty() const { return m_blEmpty; }
     bool Has(size_t nMember) const { return m_strGiven[nMember] == '1'; }
-    const BoundValue& At(size_t nMember) const { return m_vecValues[nMember]; }
+    const BoundValue& At(size_t nMember) const { return m_vecSlots[nMember].Value; }
 
     // One '1' or '0' a member: the shape of the statements that write the record.
     const std::string& Given() const { return m_strGiven; }
@@ -56,9 +99,20 @@ class RecordValues {
     int BindKey(sqlite3_stmt* pStatement, int& nNext) const;
 
   private:
+    struct Slot {
+        BoundValue Value;
+        std::string strBytes;
+        BoundKind eKind = BoundKind::kNone;  // of values that are taken without a look
+        std::int64_t nLeast = 0;             // of whole numbers among them
+        std::int64_t nMost = 0;
+    };
+    void Prepare(size_t nMember);
+    static void Grow(std::string& strOwn, size_t nBytes);
+
     // Apart, so that records that fit pass by them.
     void Refuse(const Member& Into, Misfit eMisfit, const Json::Value& jValue,
                 FindingList& vecFindings) const;
+    void LookAtJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
     void RefuseUnknown(const std::string& strName, FindingList& vecFindings) const;
 
     const Members& m_Of;
@@ -66,8 +120,7 @@ class RecordValues {
     bool m_blCompatible;
     bool m_blIgnoreUnknown;
     std::vector<size_t> m_vecDefaults;  // members that have one
-    std::vector<BoundValue> m_vecValues;
-    std::vector<std::string> m_vecJson;  // texts of JSON members
+    std::vector<Slot> m_vecSlots;
     std::string m_strGiven;
     bool m_blEmpty = true;
 };

@@ -84,28 +84,23 @@ std::string RecordWriter::Sql(Verb eVerb) const {
     }
 }
 
-int RecordWriter::Bind(Verb eVerb, sqlite3_stmt* pStatement) const {
-    int nNext = 1;
-    int nResult = SQLITE_OK;
-    if (eVerb != Verb::kFind) {
-        nResult = m_Values.BindGiven(pStatement, nNext, eVerb != Verb::kUpdate);
-    }
-    const bool blByKey = eVerb == Verb::kFind || eVerb == Verb::kUpdate;
-    return blByKey && nResult == SQLITE_OK ? m_Values.BindKey(pStatement, nNext) : nResult;
+// The statement for the members of this record, in the place of the last one.
+int RecordWriter::Take(Verb eVerb, Statement& Held) {
+    Held = Statement();
+    return m_Into.Kept.Take(
+        LetterOf(eVerb) + m_Values.Given(), [&] { return Sql(eVerb); }, Held);
 }
 
 // Runs one statement to its end. nRows: how many it found or changed.
 int RecordWriter::Run(Verb eVerb, int& nRows) {
-    const auto nVerb = static_cast<size_t>(eVerb);
-    Statement& Held = m_aHeld[nVerb];
-    int nResult = SQLITE_OK;
-    if (!Held.IsFor("INRUF"[nVerb], m_Values.Given())) {
-        Held = Statement();
-        nResult = m_Into.Kept.Take(
-            "INRUF"[nVerb] + m_Values.Given(), [&] { return Sql(eVerb); }, Held);
+    Statement& Held = m_aHeld[static_cast<size_t>(eVerb)];
+    int nResult = Held.IsFor(LetterOf(eVerb), m_Values.Given()) ? SQLITE_OK : Take(eVerb, Held);
+    int nNext = 1;
+    if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
+        nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate);
     }
-    if (nResult == SQLITE_OK) {
-        nResult = Bind(eVerb, Held.Get());
+    if (nResult == SQLITE_OK && (eVerb == Verb::kFind || eVerb == Verb::kUpdate)) {
+        nResult = m_Values.BindKey(Held.Get(), nNext);
     }
     if (nResult == SQLITE_OK) {
         nRows = 0;
@@ -136,9 +131,11 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
     }
     eWritten = nFound > 0 ? Now.eFound : Written::kInserted;
     if (nResult == SQLITE_OK && eWritten != Written::kUpdated) {
-        FindingList vecFindings;
-        if (!m_Values.FillDefaults(vecFindings)) {
-            return FromFindings(std::move(vecFindings), What);
+        if (m_Values.HasDefaults()) {
+            FindingList vecFindings;
+            if (!m_Values.FillDefaults(vecFindings)) {
+                return FromFindings(std::move(vecFindings), What);
+            }
         }
         int nChanged = 0;
         nResult = Run(Now.eThen, nChanged);

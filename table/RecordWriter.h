@@ -26,9 +26,10 @@ class RecordWriter {
 
   private:
     enum class Verb { kInsert, kInsertNew, kReplace, kUpdate, kFind };
+    static char LetterOf(Verb eVerb) { return "INRUF"[static_cast<size_t>(eVerb)]; }
 
     int Run(Verb eVerb, int& nRows);
-    int Bind(Verb eVerb, sqlite3_stmt* pStatement) const;
+    int Take(Verb eVerb, Statement& Held);
     std::string Sql(Verb eVerb) const;
     Status WithValues(const Status& Failed) const;
 

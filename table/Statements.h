@@ -51,9 +51,9 @@ class Statement {
     int Finish(int* pnRows = nullptr) const;
 
     // Whether its shape is the letter and the text.
-    bool IsFor(char cFirst, const std::string& strRest) const {
+    bool IsFor(char cFirst, std::string_view strRest) const {
         return m_strShape.size() == strRest.size() + 1 && m_strShape[0] == cFirst &&
-               m_strShape.compare(1, std::string::npos, strRest) == 0;
+               std::string_view(m_strShape).substr(1) == strRest;
     }
 
   private:

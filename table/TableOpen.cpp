@@ -112,6 +112,8 @@ void Table::Parts::Learn(const RealTable& Real) {
         const size_t nMember = Of.FindColumn(Column.strName);
         if (Column.blGenerated && nMember != vornjsondb::Members::kNone) {
             Of.SetGenerated(nMember);
+            Values.LookAlways(nMember);
+            Wanted.LookAlways(nMember);
         }
     }
 }

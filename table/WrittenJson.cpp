@@ -17,12 +17,12 @@ const char* BehindText(const char* p) {
     if (*p != '"') {
         return nullptr;
     }
-    for (++p; *p != '"'; ++p) {
-        if (*p == '\\' || static_cast<unsigned char>(*p) < ' ') {
-            return nullptr;
-        }
-    }
-    return p + 1;
+    unsigned char c = 0;
+    do {
+        c = static_cast<unsigned char>(*++p);
+        // Small letters, and all that are none of ASCII's, are known by the first of these.
+    } while (c > '\\' || (c > '"' && c < '\\') || c == ' ' || c == '!');
+    return c == '"' ? p + 1 : nullptr;
 }
 
 const char* BehindWord(const char* p, std::string_view strWord) {
@@ -71,7 +71,8 @@ const char* BehindList(const char* p, int nLevel) {
     return p != nullptr && *p == ']' ? p + 1 : nullptr;
 }
 
-const char* BehindNested(const char* p, int nLevel) {
+// Apart: what is not nested then needs no place on the stack.
+__attribute__((noinline)) const char* BehindNested(const char* p, int nLevel) {
     const bool blObject = *p == '{';
     if (nLevel > kMostLevels) {
         return nullptr;

@@ -444,6 +444,31 @@ TEST_F(LoaderTest, BytesOfAnyKindAreStoredAsTheyAre) {
     EXPECT_EQ("1048576", Rows("SELECT length(text) FROM b WHERE id = 3"));
 }
 
+// A member's texts lie in one place, one after the other: nothing of the last one is left.
+TEST_F(LoaderTest, ShortTextFollowsALongOneAndALongOneAShort) {
+    Open(
+        R"({"t": {"key": "id", "member": {"id": {"cpptype": "int"}, "list": {"cpptype": "Json::arrayValue"},
+             "text": {"cpptype": "string"}}}})");
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
+    const int nList = Into.MemberIndex("list");
+    const int nText = Into.MemberIndex("text");
+    for (const size_t nLength : {3, 400, 2, 0, 40}) {
+        Into.SetText(nText, std::string(nLength, 'x') + "!");
+        Into.SetText(nText, std::string(nLength, 'y'));
+        Into.SetJson(nList, "[\"" + std::string(nLength, 'z') + "\"]");
+        EXPECT_EQ(Text(Into.EndRecord()), "ok");
+    }
+    EXPECT_EQ(Text(Into.Add(Parse(R"({"list": [2.5], "text": "of a value"})"))), "ok");
+    Into.SetText(nText, "between");
+    Into.SetJson(nList, "[ 0.5 ]");
+    EXPECT_EQ(Text(Into.EndRecord()), "ok");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
+    EXPECT_EQ(Rows("SELECT length(CAST(text AS BLOB)), trim(text, 'y'), length(list), trim(list, "
+                   "'[\"z]') FROM t"),
+              "3||7|;400||404|;2||6|;0||4|;40||44|;10|of a value|5|2.5;7|between|5|0.5");
+}
+
 TEST_F(LoaderTest, FullDiskEndsTheLoad) {
     Run("PRAGMA max_page_count = 10");
     Loader Into;
