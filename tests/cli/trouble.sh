@@ -34,6 +34,20 @@ same 'exit without a temporary folder' $? 7
 same 'no temporary folder' "$(cat err)" \
     'error: standard input: cannot copy it to read it twice: No such file or directory; set TMPDIR to a folder with space (nothing is stored)'
 
+# --errors empties no file that the call needs.
+echo '[{"id": 1}]' >one.json
+ln -s one.json link.json
+echo '{"t": {"key": "id", "member": {"id": {"cpptype": "int"}}}}' >t.def
+cp all.db whole.db
+cksum whole.db one.json t.def >sums
+for file in whole.db one.json ./link.json t.def; do
+    expect 2 '' "error: --errors: $file is read or written by this call itself; name another file (nothing is stored)" \
+        -- insert whole.db t one.json --def t.def --errors "$file"
+done
+"$VORNJSONDB" insert whole.db t - --errors one.json <one.json 2>err
+same 'exit with --errors into standard input' $? 2
+same 'all files are what they were' "$(cksum whole.db one.json t.def)" "$(cat sums)"
+
 # Permissions, which count for the superuser only without these two rights.
 restricted=$VORNJSONDB
 if [[ $(id -u) -eq 0 ]]; then
