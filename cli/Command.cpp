@@ -83,7 +83,7 @@ std::string OneLine(const std::string& strText) {
 }  // namespace
 
 void Fail(int nExit, const std::string& strLine) {
-    throw Error{nExit, OneLine(strLine)};
+    throw Error{nExit, OneLine(strLine), {}};
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
@@ -127,7 +127,8 @@ std::string LineOf(const Status& Outcome) {
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     if (!Outcome.Ok()) {
-        Fail(ExitOf(Outcome.Code(), nRefused), strWhere + ": " + LineOf(Outcome));
+        throw Error{ExitOf(Outcome.Code(), nRefused), OneLine(strWhere + ": " + LineOf(Outcome)),
+                    Outcome.Findings()};
     }
 }
 

@@ -105,13 +105,18 @@ struct Described {
 };
 
 Described Describe(const Context& Call, sqlite3* pDb) {
-    const std::string& strTable = Call.TableName();
-    const std::vector<std::string> vecCreate =
-        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
-    if (vecCreate.empty() || vecCreate[0].compare(0, 15, "CREATE VIRTUAL ") == 0) {
-        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + strTable +
+    const std::vector<std::string> vecFound = Texts(
+        pDb,
+        "SELECT name FROM sqlite_master WHERE type = 'table' AND name = ?1 COLLATE NOCASE AND "
+        "sql NOT LIKE 'CREATE VIRTUAL %'",
+        Call.TableName());
+    if (vecFound.empty()) {
+        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() +
                                 "\" that can be dumped; see vornjsondb tables");
     }
+    const std::string& strTable = vecFound[0];
+    const std::vector<std::string> vecCreate =
+        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
     Described Found;
     Json::Value& jHeader = Found.jHeader;
     jHeader["format"] = kStreamFormat;

@@ -108,6 +108,21 @@ Json::Value DefinitionFromWords(const Context& Call) {
     return jDefinition;
 }
 
+// What keeps a table from being opened is a finding like others, and not the end.
+FindingList FindingsOf(const Context& Call) {
+    FindingList vecFindings;
+    try {
+        OpenTable Open(Call, Access::kRead, KnownDefinition);
+        Check(Open.Records.Lint(vecFindings), Call.Db());
+    } catch (const Error& Failed) {
+        if (Failed.vecFindings.empty()) {
+            throw;
+        }
+        vecFindings = Failed.vecFindings;
+    }
+    return vecFindings;
+}
+
 }  // namespace
 
 int RunTables(Context& Call) {
@@ -158,6 +173,7 @@ int RunInit(Context& Call) {
     if (blFile == (Call.vecWords.size() > 2)) {
         Fail(kExitUsage, "init takes member:type words or --def FILE; give one of them");
     }
+    CheckNewName(Call.TableName());
     Json::Value jDefinition;
     if (!blFile) {
         jDefinition = DefinitionFromWords(Call);
@@ -255,10 +271,7 @@ int RunLint(Context& Call) {
     for (const std::string& strTable : vecTables) {
         Call.vecWords.resize(1);
         Call.vecWords.push_back(strTable);
-        OpenTable Open(Call, Access::kRead);
-        FindingList vecFindings;
-        Check(Open.Records.Lint(vecFindings), Call.Db());
-        AppendFindings(vecFindings, strTable, jFindings);
+        AppendFindings(FindingsOf(Call), strTable, jFindings);
     }
     bool blError = false;
     for (const Json::Value& jFinding : jFindings) {
@@ -274,7 +287,7 @@ int RunLint(Context& Call) {
 
 int RunSync(Context& Call) {
     const bool blLook = Call.Has("--dry-run");
-    OpenTable Open(Call, blLook ? Access::kRead : Access::kChange);
+    OpenTable Open(Call, blLook ? Access::kRead : Access::kChange, KnownDefinition);
     SyncReport Done;
     Transaction All;
     if (!blLook) {

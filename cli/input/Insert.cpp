@@ -173,7 +173,10 @@ void Import::OpenFile() {
 
 void Import::FindDefinition() {
     m_blTableThere = TableExists(m_pDb.get(), m_strTable);
-    m_jDefinition = KnownDefinition(m_Call, m_pDb.get(), m_strTable);
+    if (!m_blTableThere) {
+        CheckNewName(m_strTable);
+    }
+    m_jDefinition = CurrentDefinition(m_Call, m_pDb.get(), m_strTable);
     m_blKept = !m_jDefinition.isNull();
     m_blToKeep = m_Call.Has("--def");
     if (m_blTableThere && !m_blKept) {
