@@ -60,4 +60,19 @@ done
 expect 2 '' 'error: the name of the new table is empty; give it one (nothing is stored)' -- \
     insert shop.db '' more.json
 expect 2 '' 'error: the name of the new table is empty; give it one' -- init shop.db '' a:int
+
+# Who holds a database that nobody else can read is what doctor is for.
+mkfifo go
+(
+    echo 'BEGIN EXCLUSIVE; SELECT 1;'
+    cat go
+) | sqlite3 shop.db >held &
+until [[ -s held ]]; do :; done
+"$VORNJSONDB" doctor shop.db --wait 10 >out 2>err
+same 'exit of doctor' $? 6
+same 'who holds it' "$(sed 's/[0-9]\+ (/N (/' out | grep writes)" 'lock   process N (sqlite3) writes, and nobody else may read'
+same 'doctor waited' "$(cat err)" \
+    'error: shop.db: database is locked (waited 10 ms); try again, or wait longer with --wait MS'
+: >go
+wait
 finish
