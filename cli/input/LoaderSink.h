@@ -57,6 +57,7 @@ class LoaderSink : public Sink {
     void Set(const Column& Into, const Value& Given);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
+    void SetObject(const Column& Into, std::string_view strJson);
     void SetWide(const Column& Into, std::string_view strNumber);
     void NotStored(const Place& Where, const std::string& strReason);
 
