@@ -24,7 +24,7 @@ struct ExitRow {
 constexpr ExitRow kExits[] = {
     {StatusCode::kNotFound, kExitNotFound, ""},
     {StatusCode::kDuplicate, kExitDuplicate, ""},
-    {StatusCode::kConstraint, kExitBadData, ""},
+    {StatusCode::kConstraint, kExitBadData, "; vornjsondb schema shows what the table demands"},
     {StatusCode::kLocked, kExitLocked, "; try again, or wait longer with --wait MS"},
     {StatusCode::kReadOnly, kExitIo, "; check the permissions of the file and of its folder"},
     {StatusCode::kDiskFull, kExitIo, "; free some space"},
@@ -46,6 +46,7 @@ constexpr RemedyRow kRemedies[] = {
     {"missing-column", "vornjsondb sync adds it"},
     {"missing-unique", "vornjsondb sync adds a unique index"},
     {"no-condition", "give a condition; delete --all removes all records"},
+    {"no-key", "name the key in a definition, given by --def; or insert --key MEMBER"},
     {"unknown-member", "correct the name, or add the member by insert --add-members"},
     {"unknown-operator", "see vornjsondb list --help"},
     {"unknown-type", "see vornjsondb init --help"},

@@ -171,7 +171,7 @@ void ParseWords(std::vector<std::string> vecWords, Context& Call) {
             std::string(Row.szName) + (*Row.szShort == '\0' ? "" : ",") + Row.szShort;
         CLI::Option* const pMade =
             *Row.szValue == '\0' ? App.add_flag(strName) : App.add_option(strName);
-        if (Row.blRepeat) {
+        if (*Row.szValue != '\0') {
             pMade->take_all()->allow_extra_args(false);
         }
         vecMade.emplace_back(Row, pMade);
@@ -188,6 +188,9 @@ void ParseWords(std::vector<std::string> vecWords, Context& Call) {
     for (const auto& [Row, pMade] : vecMade) {
         if (pMade->count() > 0) {
             Call.mapOptions[Row.szName] = Unmarked(pMade->results());
+            if (*Row.szValue != '\0' && !Row.blRepeat && pMade->count() > 1) {
+                FailUsage(std::string(Row.szName) + " is given more than once", "; give it once");
+            }
             CheckChoice(Row, Call.mapOptions[Row.szName]);
         }
     }

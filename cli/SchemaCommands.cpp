@@ -77,31 +77,41 @@ Json::Value DefinitionFromWords(const Context& Call) {
         if (nColon == std::string::npos || nColon == 0) {
             Fail(kExitUsage, "\"" + strWord + "\" is no member; write member:type");
         }
-        jMembers[strWord.substr(0, nColon)]["cpptype"] = strWord.substr(nColon + 1);
+        const std::string strName = strWord.substr(0, nColon);
+        if (jMembers.isMember(strName)) {
+            Fail(kExitUsage, "the member \"" + strName + "\" is there twice; name it once");
+        }
+        jMembers[strName]["cpptype"] = strWord.substr(nColon + 1);
     }
-    const auto Member = [&jMembers](const std::string& strName) -> Json::Value& {
+    const auto Member = [&jMembers](const char* szOption,
+                                    const std::string& strName) -> Json::Value& {
         if (!jMembers.isMember(strName)) {
-            Fail(kExitUsage, "there is no member \"" + strName + "\"" +
-                                 NearestHint(strName, jMembers.getMemberNames()));
+            const std::string strHint = NearestHint(strName, jMembers.getMemberNames());
+            Fail(kExitUsage, std::string(szOption) + ": there is no member \"" + strName + "\"" +
+                                 (strHint.empty() ? "; add it as member:type" : strHint));
         }
         return jMembers[strName];
     };
     for (const std::string& strName : Call.Names("--not-null")) {
-        Member(strName)["notNull"] = true;
+        Member("--not-null", strName)["notNull"] = true;
     }
     for (const std::string& strName : Call.Names("--unique")) {
-        Member(strName)["unique"] = true;
+        Member("--unique", strName)["unique"] = true;
     }
     for (const std::string& strName : Call.Names("--key")) {
-        Member(strName);
+        Member("--key", strName);
         jTable["key"].append(strName);
     }
     for (const std::string& strWord : Call.List("--default")) {
-        const std::size_t nEquals = std::min(strWord.find('='), strWord.size());
-        Json::Value& jMember = Member(strWord.substr(0, nEquals));
-        const std::string strText = nEquals < strWord.size() ? strWord.substr(nEquals + 1) : "";
-        jMember["cppDefaultValue"] =
-            jMember["cpptype"] == "string" ? Json::Value(strText) : ParseJson(strText, strWord);
+        const std::size_t nEquals = strWord.find('=');
+        if (nEquals == std::string::npos) {
+            Fail(kExitUsage, "--default: \"" + strWord + "\" is not of the form member=value");
+        }
+        Json::Value& jMember = Member("--default", strWord.substr(0, nEquals));
+        const std::string strText = strWord.substr(nEquals + 1);
+        jMember["cppDefaultValue"] = jMember["cpptype"] == "string"
+                                         ? Json::Value(strText)
+                                         : ParseJson(strText, "--default " + strWord, kExitUsage);
     }
     Json::Value jDefinition;
     jDefinition[Call.TableName()] = jTable;

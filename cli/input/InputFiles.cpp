@@ -44,7 +44,8 @@ ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
     if (!How.strDelimiter.empty()) {
         if (How.strDelimiter.size() != 1 || How.strDelimiter.find_first_of("\"\r\n") == 0) {
             Fail(kExitUsage,
-                 "--delimiter: it must be one ASCII character, and no quote or newline");
+                 "--delimiter: it must be one ASCII character, and no quote or newline; for tabs "
+                 "there is --format tsv");
         }
         Found.eFormat = Format::kSeparated;
         Found.cDelimiter = How.strDelimiter[0];

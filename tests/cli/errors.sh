@@ -13,7 +13,17 @@ expect 2 '' 'error: --format: unknown value "xml"; it is one of json|jsonl|csv|t
     list shop.db product --format xml
 expect 2 '' 'error: table "product" has no member "nmae"; did you mean "name"?' -- \
     count shop.db product nmae=x
-expect 2 '' 'error: "[1,2]" sets no member; write member=value' -- list shop.db product '[1,2]'
+expect 2 '' 'error: "[1,2]" is not of the form member=value' -- list shop.db product '[1,2]'
+expect 2 '' 'error: "price>1" is not of the form member=value; write --where '"'{\"price\": {\"\$gt\": 1}}'" -- \
+    list shop.db product 'price>1'
+expect 2 '' 'error: "name!=tea" is not of the form member=value; write --where '"'{\"name\": {\"\$ne\": \"tea\"}}'" -- \
+    count shop.db product 'name!=tea'
+expect 2 '' 'error: "tags[0]<=b" is not of the form member=value; write --where '"'{\"tags[0]\": {\"\$lte\": \"b\"}}'" -- \
+    count shop.db product 'tags[0]<=b'
+expect 0 0 '' -- count shop.db product 'tags[0]=a>b'
+expect 2 '' 'error: --limit is given more than once; give it once' -- list shop.db product --limit 1 -l 2
+expect 0 '[{"id":1,"name":"tea, \"green\""}]' '' -- \
+    list shop.db product --members id --members name --sort name,id --sort -price --limit 1 --offset 1
 expect 2 '' 'error: --where: "size=5" is no JSON object; write {"size": 5}, or size=5 without --where' -- \
     list shop.db product --where size=5
 expect 2 '' 'error: --where: Line 1, Column 8: Missing '"','"' or '"'}'"' in object declaration; it must be JSON' \
@@ -70,6 +80,16 @@ expect 2 '' 'error: shop.db: cannot remove records from table "product": the que
 "$VORNJSONDB" init shop.db price product:int country:string --key product,country --quiet
 expect 2 '' 'error: key "{"product": 1}": it must be an object with just these members: product, country' -- \
     get shop.db price '{"product": 1}'
+expect 2 '' 'error: key "x": it must be an object with just these members: product, country' -- \
+    get shop.db price x
+sqlite3 shop.db 'CREATE TABLE heap (a)'
+expect 3 '' 'error: shop.db: cannot save a record in table "heap": the table has no key that tells records apart; name the key in a definition, given by --def; or insert --key MEMBER' \
+    -- upsert shop.db heap a=1
+echo '[{"ID": 9, "size": 3}]' >near.json
+expect 3 '' 'error: near.json:1: the table has no member "ID"; did you mean "id"? or add it by --add-members (nothing is stored)' \
+    -- insert shop.db product near.json
+expect 2 '' 'error: --delimiter: it must be one ASCII character, and no quote or newline; for tabs there is --format tsv' \
+    -- insert shop.db product near.json --delimiter '\t'
 
 # What a message quotes does not steer the terminal.
 expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \

@@ -106,6 +106,7 @@ expect 3 '' 'error: in: JSON: no record has a member to make a table from (nothi
 
 # CSV.
 bad 3 'the row has 1 cell, but there are 2 columns' 'a,b\n1,2\n3\n'
+bad 2 'the row has 2 cells, but there is 1 column' 'a\n1,2\n'
 bad 3 'the row has 3 cells, but there are 2 columns' 'a,b\n1,2\n"x\ny",3,4\n'
 bad 2 'the quotes that begin in this row never end' 'a,b\n1,"x\n'
 quote='a quote stands inside of a cell that is not in quotes, or a cell goes on after its end quote;'

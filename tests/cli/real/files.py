@@ -52,7 +52,7 @@ REFUSED = [
      ':2: the row has 8 cells, but there are 7 columns'),
     (STATS + 'tsa/tests/results/arima212_forecast.csv',
      ':3: the row has 5 cells, but there are 6 columns'),
-    ('tzdata/usr/share/zoneinfo/zone1970.tab', ':11: the row has 2 cells, but there are 1 columns'),
+    ('tzdata/usr/share/zoneinfo/zone1970.tab', ':11: the row has 2 cells, but there is 1 column'),
     ('unicode-data/usr/share/unicode/UnicodeData.txt', ':1: column 6 has no name; --no-header is for input without names'),
 ]
 
