@@ -136,8 +136,11 @@ void CheckOptionName(const std::string& strWord, const Command& Of) {
         vecNames.emplace_back(Row.szName);
     }
     const std::string strName = strWord.substr(0, strWord.find('='));
-    FailUsage("unknown option \"" + strName + "\" of " + Of.szName, NearestHint(strName, vecNames),
-              &Of);
+    const std::string strHint = NearestHint(strName, vecNames);
+    FailUsage("unknown option \"" + strName + "\" of " + Of.szName,
+              strHint.empty() ? std::string("; see vornjsondb ") + Of.szName +
+                                    " --help, and put -- before words that begin with a dash"
+                              : strHint);
 }
 
 // The names of Command::szWords say how many words there may be.

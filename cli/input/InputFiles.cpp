@@ -59,6 +59,12 @@ ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
 
 }  // namespace
 
+void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& strReason,
+            const char* szRemedy) {
+    Fail(kExitBadData, strInput + ":" + std::to_string(nLine) + ": " + strReason +
+                           (strReason.find("; ") == std::string::npos ? szRemedy : ""));
+}
+
 InputFiles::InputFiles(const InsertOptions& How) {
     for (const std::string& strPath : How.vecFiles) {
         m_vecInputs.push_back(std::make_unique<Input>());
@@ -76,8 +82,7 @@ bool InputFiles::ReadOne(Input& Now, Sink& To) {
         FailBySystem(Now.From);
     }
     if (Result.eEnd == ReadOutcome::End::kFailed) {
-        Fail(kExitBadData,
-             Now.From.Name() + ":" + std::to_string(Result.nLine) + ": " + Result.strReason);
+        FailAt(Now.From.Name(), Result.nLine, Result.strReason, "; correct the input");
     }
     Now.strListName = Result.strListName;
     return Result.eEnd == ReadOutcome::End::kDone;

@@ -70,7 +70,7 @@ class TypesSink : public Inference {
 
     bool BadRecord(const Place& Where, const std::string& strReason) override {
         if (!m_blGoOn) {
-            Fail(kExitBadData, m_strInput + ":" + std::to_string(Where.nLine) + ": " + strReason);
+            FailAt(m_strInput, Where.nLine, strReason, kLeaveOut);
         }
         return Inference::BadRecord(Where, strReason);
     }
@@ -92,6 +92,8 @@ class Import {
     void OpenFile();
     void FindDefinition();
     void LearnTypes();
+    Options Settings() const;
+    std::vector<std::string> Statements();
     int ShowDryRun();
     void CheckColumns() const;
     void Prepare();
@@ -240,16 +242,41 @@ void Import::CheckColumns() const {
     }
 }
 
-int Import::ShowDryRun() {
+// What would make the table, or extend the one that is there.
+std::vector<std::string> Import::Statements() {
     std::string strSql;
-    Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
+    if (!m_blTableThere) {
+        Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
+        return {strSql};
+    }
+    SyncReport Report;
+    if (m_blAdded) {
+        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, Settings()), m_Call.Db(),
+              kExitBadData);
+        Check(m_Table.Sync(SyncMode::kLook, Report), m_Call.Db());
+    }
+    return Report.vecStatements;
+}
+
+int Import::ShowDryRun() {
+    const std::vector<std::string> vecStatements = Statements();
     if (m_Call.Json()) {
         Json::Value jShown;
         jShown["definition"] = m_jDefinition;
-        jShown["create"] = strSql;
+        if (m_blTableThere) {
+            jShown["alter"] = Json::Value(Json::arrayValue);
+            for (const std::string& strSql : vecStatements) {
+                jShown["alter"].append(strSql);
+            }
+        } else {
+            jShown["create"] = vecStatements[0];
+        }
         Put(Pretty(jShown) + "\n");
     } else {
-        Put(Pretty(m_jDefinition) + "\n" + strSql + ";\n");
+        Put(Pretty(m_jDefinition) + "\n");
+        for (const std::string& strSql : vecStatements) {
+            Put(strSql + ";\n");
+        }
     }
     for (const std::string& strNote : m_vecNotes) {
         m_Call.Say(strNote);
@@ -261,12 +288,17 @@ void Import::Begin() {
     Check(m_All.Begin(m_pDb.get(), Transaction::Mode::kImmediate, m_Call.WaitMs()), m_Call.Db());
 }
 
-// The table, its definition and the first records come to be at once.
-void Import::Prepare() {
+Options Import::Settings() const {
     Options How;
     How.blCompatible = false;
     How.blCreateTable = true;
     How.nWaitMs = m_Call.WaitMs();
+    return How;
+}
+
+// The table, its definition and the first records come to be at once.
+void Import::Prepare() {
+    const Options How = Settings();
     Begin();
     // The names come from the records.
     Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db(), kExitBadData);

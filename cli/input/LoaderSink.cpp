@@ -6,6 +6,7 @@
 
 #include "../Command.h"
 #include "../JsonCells.h"
+#include "InputFiles.h"
 #include "JsonQuote.h"
 #include "Numbers.h"
 #include "Utf8.h"
@@ -194,7 +195,7 @@ void LoaderSink::SetCell(const Column& Into, std::string_view strCell) {
 
 void LoaderSink::NotStored(const Place& Where, const std::string& strReason) {
     if (m_pErrors == nullptr) {
-        Fail(kExitBadData, At(m_strInput, Where) + ": " + strReason);
+        FailAt(m_strInput, Where.nLine, strReason, kLeaveOut);
     }
     m_pErrors->Add(m_strInput, Where, strReason);
 }

@@ -40,6 +40,19 @@ same 'one definition is kept' "$(sqlite3 shop.db 'SELECT count(*) FROM vornjsond
 "$VORNJSONDB" dump shop.db product | cmp - dump
 same 'dump in another letter case' $? 0
 
+# --dry-run shows what makes the table, or extends the one that is there.
+echo '[{"id": 9, "name": "x", "size": 5}]' >size.json
+"$VORNJSONDB" insert shop.db product size.json --add-members --dry-run >out
+same 'exit of --dry-run' $? 0
+same 'what would be added' "$(tail -n 1 out)" 'ALTER TABLE "product" ADD COLUMN "size" INTEGER;'
+"$VORNJSONDB" insert shop.db product more.json --add-members --dry-run >out
+same 'what needs nothing' "$(tail -n 1 out)" '}'
+"$VORNJSONDB" insert shop.db product size.json --add-members --dry-run --json >out
+same 'what would be added, in JSON' "$(python3 -c 'import json; print(json.load(open("out"))["alter"])')" \
+    "['ALTER TABLE \"product\" ADD COLUMN \"size\" INTEGER']"
+expect 2 '' 'error: table "product" has no member "size"; see vornjsondb schema' -- \
+    count shop.db product size=5
+
 # One table that cannot be opened does not hide the others from lint.
 sqlite3 shop.db 'CREATE TABLE odd ("$x"); CREATE TABLE zoo (a INTEGER)'
 echo '{"zoo": {"member": {"a": {"cpptype": "int"}, "b": {"cpptype": "int"}}}}' >zoo.def

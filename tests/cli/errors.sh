@@ -6,6 +6,10 @@ make_shop
 expect 2 '' 'error: unknown subcommand "lst"; did you mean "list"?' -- lst shop.db
 expect 2 '' 'error: unknown option "--limt" of list; did you mean "--limit"?' -- \
     list shop.db product --limt 5
+sqlite3 shop.db 'CREATE TABLE heap (a TEXT PRIMARY KEY)'
+expect 2 '' 'error: unknown option "-x" of get; see vornjsondb get --help, and put -- before words that begin with a dash' \
+    -- get shop.db product -x
+expect 5 '' 'error: shop.db: table "heap" has no record with the key "-x"' -- get shop.db heap -- -x
 expect 2 '' 'error: list lacks TABLE; usage: vornjsondb list DB TABLE [member=value]...' -- list shop.db
 expect 2 '' 'error: --limit: "x" is no whole number; give one from 0' -- \
     list shop.db product --limit x
@@ -82,7 +86,7 @@ expect 2 '' 'error: key "{"product": 1}": it must be an object with just these m
     get shop.db price '{"product": 1}'
 expect 2 '' 'error: key "x": it must be an object with just these members: product, country' -- \
     get shop.db price x
-sqlite3 shop.db 'CREATE TABLE heap (a)'
+sqlite3 shop.db 'DROP TABLE heap; CREATE TABLE heap (a)'
 expect 3 '' 'error: shop.db: cannot save a record in table "heap": the table has no key that tells records apart; name the key in a definition, given by --def; or insert --key MEMBER' \
     -- upsert shop.db heap a=1
 echo '[{"ID": 9, "size": 3}]' >near.json
