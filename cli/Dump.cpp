@@ -173,7 +173,9 @@ class LineReader {
     }
 
     const std::string& Line() const { return m_strLine; }
-    std::string Place() const { return m_strFile + ":" + std::to_string(m_nLine); }
+    std::string Place() const {
+        return (m_strFile == "-" ? "standard input" : m_strFile) + ":" + std::to_string(m_nLine);
+    }
     Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
 
     [[noreturn]] void FailHere(const std::string& strWhat) const {
@@ -357,7 +359,8 @@ int RunLoad(Context& Call) {
     Check(All.Commit(), Call.Db());
     Json::Value jResult;
     jResult["loaded"] = Json::Int64(nRows);
-    Call.Report("loaded " + std::to_string(nRows) + " rows into table \"" + strTable + "\"",
+    Call.Report("loaded " + std::to_string(nRows) + (nRows == 1 ? " row" : " rows") +
+                    " into table \"" + strTable + "\"",
                 jResult);
     return kExitFine;
 }

@@ -81,6 +81,20 @@ expect 3 '' 'error: shop.db: cannot make a statement for table "shelf": member "
 expect 2 '' 'error: shop.db: cannot remove records from table "product": the query has no condition and would reach every record; give a condition; delete --all removes all records' \
     -- delete shop.db product --where '{}'
 
+expect 2 '' "$refused"'"tags[0]" is a path; name members of the table, parted by commas' -- \
+    list shop.db product --members 'tags[0]'
+expect 2 '' "$refused"'pattern "50\x" has a \ before something else than %, _ and \; put \ before a %, _ or \ that stands for itself' \
+    -- list shop.db product --where '{"name": {"$like": "50\\x"}}'
+sqlite3 shop.db 'CREATE TABLE dollar ("$x", a); INSERT INTO dollar VALUES (1, 2); CREATE TABLE amount (a NUMERIC)'
+expect 3 '' 'error: shop.db: cannot open table "dollar": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def' \
+    -- list shop.db dollar
+echo '{"dollar": {"member": {"a": {"cpptype": "int"}}}}' >dollar.def
+expect 0 '[{"a":2}]' '' -- list shop.db dollar --def dollar.def
+"$VORNJSONDB" lint shop.db amount --format tsv >found
+same 'lint of a numeric column' "$(tail -n 1 found | cut -f 3,6)" \
+    $'other-affinity\tgive the member a type that fits its column, or copy the rows into a new table'
+expect 3 '' 'error: standard input:1: it is empty; dump the table again' -- load shop.db
+
 "$VORNJSONDB" init shop.db price product:int country:string --key product,country --quiet
 expect 2 '' 'error: key "{"product": 1}": it must be an object with just these members: product, country' -- \
     get shop.db price '{"product": 1}'

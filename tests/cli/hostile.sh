@@ -166,7 +166,7 @@ case_error='error: bad.db: cannot open table "t": "a" is another member'\''s col
 printf '[{"a": 1, "A": 2}]' >in
 expect 3 '' "$case_error" -- insert bad.db t in
 printf '[{"$x": 1}]' >in
-expect 3 '' 'error: bad.db: cannot open table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; give the member another name (nothing is stored)' \
+expect 3 '' 'error: bad.db: cannot open table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def (nothing is stored)' \
     -- insert bad.db t in
 
 # Bad records are left out and kept where that is asked for.
