@@ -90,6 +90,7 @@ class Import {
 
   private:
     void OpenFile();
+    void RemoveNewFile();
     void FindDefinition();
     void LearnTypes();
     Options Settings() const;
@@ -97,6 +98,7 @@ class Import {
     int ShowDryRun();
     void CheckColumns() const;
     void Prepare();
+    void CheckKey();
     void Load();
     bool AfterRecord();
     void Begin();
@@ -140,13 +142,22 @@ int Import::Run() {
         return Finish();
     } catch (Error& Failed) {
         m_pProgress.reset();
-        if (m_blNewFile && m_nStored == 0) {
-            unlink(m_Call.Db().c_str());
-        }
+        RemoveNewFile();
         if (!m_How.blDryRun) {
             Failed.strLine += WhatIsStored();
         }
         throw;
+    }
+}
+
+// Of a database that this call made and stored nothing in. Another program may have done so since.
+void Import::RemoveNewFile() {
+    if (m_All.IsOpen()) {
+        m_All.Rollback().Ignore();
+    }
+    struct stat Now {};
+    if (m_blNewFile && m_nStored == 0 && stat(m_Call.Db().c_str(), &Now) == 0 && Now.st_size == 0) {
+        unlink(m_Call.Db().c_str());
     }
 }
 
@@ -300,6 +311,10 @@ Options Import::Settings() const {
 void Import::Prepare() {
     const Options How = Settings();
     Begin();
+    if (!m_blTableThere && TableExists(m_pDb.get(), m_strTable)) {
+        Fail(kExitDuplicate, m_Call.Db() + ": another program has just made the table \"" +
+                                 m_strTable + "\"; try again, into that table");
+    }
     // The names come from the records.
     Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db(), kExitBadData);
     if (m_blAdded) {
@@ -311,6 +326,7 @@ void Import::Prepare() {
         Fail(kExitUsage, m_Call.Db() + ": --skip, --replace and --upsert need a key, and table \"" +
                              m_strTable + "\" has none; name it with --key MEMBER");
     }
+    CheckKey();
     if (m_blToKeep) {
         KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
         m_blKept = true;
@@ -320,6 +336,25 @@ void Import::Prepare() {
     HowToLoad.nRowsPerTransaction = 0;
     HowToLoad.blGoOnAfterBad = !m_How.strErrors.empty();
     Check(m_Into.Start(m_Table, HowToLoad), m_Call.Db());
+}
+
+// SQLite finds a record by its key only where no two can have the same.
+void Import::CheckKey() {
+    FindingList vecFindings;
+    if (m_How.eOnDuplicate == OnDuplicate::kSkip || m_How.eOnDuplicate == OnDuplicate::kReplace) {
+        Check(m_Table.Lint(vecFindings), m_Call.Db());
+    }
+    std::string strWords;
+    for (const std::string& strMember : m_Table.KeyMembers()) {
+        strWords += " " + strMember;
+    }
+    for (const Finding& Found : vecFindings) {
+        if (std::string_view("key-not-unique") == Found.szCode) {
+            Fail(kExitBadData, m_Call.Db() + ": " + Found.strMessage +
+                                   "; make it so by vornjsondb index " + m_Call.Db() + " " +
+                                   m_strTable + strWords + " --unique");
+        }
+    }
 }
 
 void Import::Load() {
@@ -336,7 +371,8 @@ void Import::Load() {
         pErrors = std::make_unique<ErrorFile>(m_How.strErrors);
     }
     Prepare();
-    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(),
+    const bool blMode = m_How.eOnDuplicate != OnDuplicate::kStop;
+    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(), blMode,
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {

@@ -69,11 +69,12 @@ void ErrorFile::Close() {
     }
 }
 
-LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors,
+LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
                        std::function<bool()> fnAfter)
     : m_Of(Of),
       m_Into(Into),
       m_pErrors(pErrors),
+      m_blMode(blMode),
       m_fnAfter(std::move(fnAfter)),
       m_vecNulls(Of.Members().size()) {}
 
@@ -212,10 +213,12 @@ bool LoaderSink::EndRecord(const Place& Where) {
     const Status Outcome = m_Into.EndRecord();
     if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome))) {
         const bool blDuplicate = Outcome.Code() == StatusCode::kDuplicate;
-        const std::string strHint =
-            blDuplicate ? "; --skip, --replace or --upsert tells what to do with it" : "";
+        const char* const szHint = !blDuplicate ? ""
+                                   : m_blMode
+                                       ? "; correct it, or leave it out by --errors FILE"
+                                       : "; --skip, --replace or --upsert tells what to do with it";
         Fail(ExitOf(Outcome.Code(), kExitBadData),
-             At(m_strInput, Where) + ": " + LineOf(Outcome) + strHint);
+             At(m_strInput, Where) + ": " + LineOf(Outcome) + szHint);
     }
     if (!Outcome.Ok()) {
         NotStored(Where, Outcome.Message());

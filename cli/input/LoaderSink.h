@@ -35,7 +35,9 @@ class LoaderSink : public Sink {
   public:
     // The first bad record is an Error, unless pErrors takes it. fnAfter is called after each
     // record and says whether to go on.
-    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, std::function<bool()> fnAfter);
+    // blMode: the call says what to do with a key that is there.
+    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
+               std::function<bool()> fnAfter);
 
     void BeginInput(const std::string& strName, bool blCells);
 
@@ -64,6 +66,7 @@ class LoaderSink : public Sink {
     const Table& m_Of;
     Loader& m_Into;
     ErrorFile* const m_pErrors;
+    const bool m_blMode;
     const std::function<bool()> m_fnAfter;
     std::string m_strInput;
     bool m_blCells = false;

@@ -154,6 +154,26 @@ END
 same 'ended by the signal' \
     "$(python3 interrupt.py "$VORNJSONDB" insert all.db t feed --format jsonl)" -2
 
+# A file that is new to one call may hold what another has stored since: the second waits for its input
+# until then. It neither removes the file nor stores into a table that has other types.
+mkfifo slow
+"$VORNJSONDB" insert both.db t slow --key id 2>err &
+pid=$!
+exec 3>slow
+until [[ -e both.db ]]; do :; done
+expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert both.db t lines --key id
+echo '{"id": 1, "text": 5}' >&3
+exec 3>&-
+wait "$pid"
+same 'exit of the second' $? 4
+same 'the second' "$(cat err)" \
+    'error: both.db: another program has just made the table "t"; try again, into that table (nothing is stored)'
+expect 0 2000 '' -- count both.db t
+echo '[{"id": 1}, {"id": null}' >broken.json
+expect 3 '' 'error: broken.json:1: the input ends inside of the list, after record 2; correct the input (nothing is stored)' \
+    -- insert fresh.db t broken.json
+same 'no file is left' "$(ls fresh.db 2>/dev/null)" ''
+
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go
 (

@@ -16,6 +16,19 @@ expect 0 '{"id":2,"name":"cup","price":0.1}' '' -- get shop.db product 2
 expect 3 '' 'error: shop.db: cannot save a record in table "product": NOT NULL constraint failed: product.name; vornjsondb schema shows what the table demands' \
     -- upsert shop.db product id=7
 
+# Keys that SQLite does not keep apart, and other members that are unique.
+sqlite3 shop.db 'CREATE TABLE heap (id INTEGER, code TEXT UNIQUE); INSERT INTO heap VALUES (1, 5)'
+echo '[{"id": 2, "code": "5"}]' >heap.json
+for mode in --skip --replace; do
+    expect 3 '' 'error: shop.db: the table can hold several rows with one key; make it so by vornjsondb index shop.db heap id --unique (nothing is stored)' \
+        -- insert shop.db heap heap.json --key id $mode
+done
+"$VORNJSONDB" index shop.db heap id --unique --quiet
+for mode in --skip --upsert; do
+    expect 4 '' 'error: heap.json:1: cannot load record 1 into table "heap": UNIQUE constraint failed: heap.code (code = "5"); correct it, or leave it out by --errors FILE (nothing is stored)' \
+        -- insert shop.db heap heap.json --key id $mode
+done
+
 expect 0 '{"updated":2}' '' -- update shop.db product 1 2 price=9.75 --json
 expect 5 '' 'error: shop.db: table "product" has no record with the key "99"; nothing was changed' \
     -- update shop.db product 1 99 price=1
