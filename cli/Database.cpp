@@ -237,6 +237,15 @@ void CheckNewName(const std::string& strTable) {
     }
 }
 
+void CheckDefaults(const std::string& strTable, const Json::Value& jDefinition) {
+    for (const Finding& Found : LintDefinition(strTable, jDefinition)) {
+        if (std::strcmp(Found.szCode, "bad-default") == 0) {
+            Fail(kExitBadData, "default of table \"" + strTable + "\": " + Found.strMessage +
+                                   "; give one that the type can hold");
+        }
+    }
+}
+
 Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable) {
     const std::string strFile = Call.Text("--def");
     if (!strFile.empty()) {

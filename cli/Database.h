@@ -39,6 +39,9 @@ bool TableExists(sqlite3* pDb, const std::string& strTable);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
 
+// A default that its member's type cannot hold would be left out of a new table without a word.
+void CheckDefaults(const std::string& strTable, const Json::Value& jDefinition);
+
 // A statement of the command's own.
 struct FinalizeStatement {
     void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }

@@ -192,6 +192,7 @@ int RunInit(Context& Call) {
     }
     std::string strSql;
     Check(CreateStatement(Call.TableName(), jDefinition, strSql), Call.Db(), kExitBadData);
+    CheckDefaults(Call.TableName(), jDefinition);
     if (Call.Has("--dry-run")) {
         Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
         return kExitFine;

@@ -237,6 +237,7 @@ void Import::LearnTypes() {
         Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
     }
     m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
     }

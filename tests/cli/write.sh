@@ -29,6 +29,15 @@ for mode in --skip --upsert; do
         -- insert shop.db heap heap.json --key id $mode
 done
 
+# A key that is given twice is one record, and a default that does not fit is no default.
+expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
+expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x
+expect 0 '' 'deleted 1 record' -- delete shop.db product 70 70
+expect 3 '' 'error: default of table "b": member "id" cannot be 1.5: expected is a whole number from -2147483648 to 2147483647; give one that the type can hold' \
+    -- init shop.db b id:int --default id=1.5
+expect 3 '' 'error: default of table "b": member "id" cannot be 1.5: expected is a whole number from -9223372036854775808 to 9223372036854775807; give one that the type can hold (nothing is stored)' \
+    -- insert shop.db b heap.json --default id=1.5
+
 expect 0 '{"updated":2}' '' -- update shop.db product 1 2 price=9.75 --json
 expect 5 '' 'error: shop.db: table "product" has no record with the key "99"; nothing was changed' \
     -- update shop.db product 1 99 price=1
