@@ -218,10 +218,12 @@ int RunIndex(Context& Call) {
     OpenTable Open(Call, vecMembers.empty() ? Access::kRead : Access::kChange);
     if (!vecMembers.empty()) {
         std::string strSql;
+        const std::size_t nBefore = CreateStatements(Open.pDb.get(), Call.TableName()).size();
         Check(Open.Records.CreateIndex(vecMembers, Call.Has("--unique"), &strSql), Call.Db());
+        const bool blMade = CreateStatements(Open.pDb.get(), Call.TableName()).size() != nBefore;
         Json::Value jResult;
         jResult["sql"] = strSql;
-        Call.Report(strSql, jResult);
+        Call.Report((blMade ? "" : "there already: ") + strSql, jResult);
         return kExitFine;
     }
     const Statement pLook = Prepare(

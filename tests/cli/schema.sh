@@ -11,6 +11,8 @@ expect 0 'CREATE TABLE "product" ("id" INTEGER PRIMARY KEY, "name" TEXT NOT NULL
     '' -- schema shop.db product
 expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
     index shop.db product name
+expect 0 '' 'there already: CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
+    index shop.db product name
 expect 0 '[{"index":"product_name","unique":false,"members":"name"}]' '' -- \
     index shop.db product --json
 expect 0 'SELECT "product"."id" FROM "product" WHERE "product"."price" IS ?
