@@ -24,7 +24,7 @@ struct ExitRow {
 constexpr ExitRow kExits[] = {
     {StatusCode::kNotFound, kExitNotFound, ""},
     {StatusCode::kDuplicate, kExitDuplicate, ""},
-    {StatusCode::kConstraint, kExitBadData, ""},
+    {StatusCode::kConstraint, kExitBadData, "; vornjsondb schema shows what the table demands"},
     {StatusCode::kLocked, kExitLocked, "; try again, or wait longer with --wait MS"},
     {StatusCode::kReadOnly, kExitIo, "; check the permissions of the file and of its folder"},
     {StatusCode::kDiskFull, kExitIo, "; free some space"},
@@ -41,11 +41,19 @@ struct RemedyRow {
 };
 
 constexpr RemedyRow kRemedies[] = {
+    {"bad-members", "name members of the table, parted by commas"},
+    {"bad-name", "rename it, or give a definition without it by --def"},
+    {"bad-pattern", R"(put \ before a %, _ or \ that stands for itself)"},
     {"full-scan", "create one by vornjsondb index, where the table is or gets large"},
+    {"hides-query-key", "give the member another name where a VornJsonDbApi reads the table"},
     {"key-not-unique", "vornjsondb sync adds a unique index"},
     {"missing-column", "vornjsondb sync adds it"},
     {"missing-unique", "vornjsondb sync adds a unique index"},
     {"no-condition", "give a condition; delete --all removes all records"},
+    {"no-key", "name the key in a definition, given by --def; or insert --key MEMBER"},
+    {"old-type", "use another type where a VornJsonDbApi works on the table"},
+    {"other-affinity",
+     "give the member a type that fits its column, or copy the rows into a new table"},
     {"unknown-member", "correct the name, or add the member by insert --add-members"},
     {"unknown-operator", "see vornjsondb list --help"},
     {"unknown-type", "see vornjsondb init --help"},
@@ -83,7 +91,7 @@ std::string OneLine(const std::string& strText) {
 }  // namespace
 
 void Fail(int nExit, const std::string& strLine) {
-    throw Error{nExit, OneLine(strLine)};
+    throw Error{nExit, OneLine(strLine), {}};
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
@@ -127,7 +135,8 @@ std::string LineOf(const Status& Outcome) {
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     if (!Outcome.Ok()) {
-        Fail(ExitOf(Outcome.Code(), nRefused), strWhere + ": " + LineOf(Outcome));
+        throw Error{ExitOf(Outcome.Code(), nRefused), OneLine(strWhere + ": " + LineOf(Outcome)),
+                    Outcome.Findings()};
     }
 }
 

@@ -37,6 +37,7 @@ const std::vector<ExitMeaning>& AllExits();
 struct Error {
     int nExit;
     std::string strLine;
+    FindingList vecFindings;  // of a Status that the line stands for
 };
 
 [[noreturn]] void Fail(int nExit, const std::string& strLine);

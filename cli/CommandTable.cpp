@@ -8,10 +8,10 @@ namespace VORN_JSON_DB::Cli {
 namespace {
 
 const Option kWhere{"--where", "-w", "JSON", R"(conditions, such as {"size": {"$gte": 5}})"};
-const Option kSort{"--sort", "-s", "MEMBERS", "parted by commas; -size is descending"};
+const Option kSort{"--sort", "-s", "MEMBERS", "parted by commas; -size is descending", true};
 const Option kLimit{"--limit", "-l", "N", "at most so many records"};
 const Option kOffset{"--offset", "-o", "N", "leave out so many records first"};
-const Option kMembers{"--members", "-m", "MEMBERS", "only these, parted by commas"};
+const Option kMembers{"--members", "-m", "MEMBERS", "only these, parted by commas", true};
 const Option kFormat{"--format", "-f", "json|jsonl|csv|tsv|table",
                      "table is what a terminal gets, json all else"};
 const Option kNulls{"--nulls", "", "omit|keep",

@@ -1,8 +1,10 @@
 #include "Conditions.h"
 
 #include <algorithm>
+#include <cstring>
 
 #include "Database.h"
+#include "JsonCells.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -56,6 +58,28 @@ Json::Value TypedValue(const Table& Of, const std::string& strMember, const std:
                                   : Json::Value(strText);
 }
 
+struct SignRow {
+    const char* szSign;
+    const char* szOperator;
+};
+constexpr SignRow kSigns[] = {{">=", "$gte"}, {"<=", "$lte"}, {"!=", "$ne"},
+                              {"<>", "$ne"},  {">", "$gt"},   {"<", "$lt"}};
+
+// "price>5" looks like a condition, and --where takes it.
+void CheckSigns(const Table& Of, const std::string& strWord) {
+    for (const SignRow& Row : kSigns) {
+        const std::size_t nAt = strWord.find(Row.szSign);
+        if (nAt > strWord.find('=') || !IsMember(Of, BaseOf(Of, strWord.substr(0, nAt)))) {
+            continue;
+        }
+        const std::string strText = strWord.substr(nAt + std::strlen(Row.szSign));
+        const Json::Value jText(strText);
+        Fail(kExitUsage, "\"" + strWord + "\" is not of the form member=value; write --where '{\"" +
+                             strWord.substr(0, nAt) + "\": {\"" + Row.szOperator + "\": " +
+                             (LooksLikeJson(strText) ? strText : CompactJson(jText)) + "}}'");
+    }
+}
+
 Json::Value ParseWhere(const std::string& strText) {
     if (strText.find_first_of("{[") == std::string::npos) {
         Fail(kExitUsage,
@@ -80,8 +104,11 @@ Assignment ParseAssignment(const Table& Of, const std::string& strWord) {
             break;
         }
     }
+    if (nEquals == std::string::npos || !IsMember(Of, strWord.substr(0, nEquals))) {
+        CheckSigns(Of, strWord);
+    }
     if (nEquals == std::string::npos) {
-        Fail(kExitUsage, "\"" + strWord + "\" sets no member; write member=value");
+        Fail(kExitUsage, "\"" + strWord + "\" is not of the form member=value");
     }
     const std::string strMember = strWord.substr(0, nEquals);
     const std::string strText = strWord.substr(nEquals + 1);
@@ -115,7 +142,10 @@ Json::Value ParseKey(const Table& Of, const std::string& strWord) {
     if (vecKey.size() == 1) {
         return TypedValue(Of, vecKey[0], strWord);
     }
-    Json::Value jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
+    Json::Value jKey;
+    if (strWord.compare(0, 1, "{") == 0) {
+        jKey = ParseJson(strWord, "key \"" + strWord + "\"", kExitUsage);
+    }
     bool blFits = jKey.isObject() && jKey.size() == vecKey.size();
     std::string strNames;
     for (const std::string& strMember : vecKey) {

@@ -3,6 +3,7 @@
 #include <fcntl.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <sstream>
@@ -61,6 +62,10 @@ std::string FileOf(sqlite3* pDb) {
 }
 
 void CheckFile(const std::string& strFile, Access eAccess) {
+    // SQLite takes these for databases that end with the call, and all that it stored.
+    if (strFile.empty() || strFile == ":memory:") {
+        Fail(kExitUsage, "\"" + strFile + "\" names no file; name the file of a database");
+    }
     if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
         const std::size_t nSlash = strFile.rfind('/');
         const std::string strFolder =
@@ -75,6 +80,39 @@ void CheckFile(const std::string& strFile, Access eAccess) {
         Fail(kExitIo, strFile + ": " + std::strerror(nError) +
                           (nError == ENOENT ? "; check the name, or make it with init or insert"
                                             : "; check its permissions"));
+    }
+}
+
+bool SameName(const std::string& strOne, const std::string& strOther) {
+    return sqlite3_stricmp(strOne.c_str(), strOther.c_str()) == 0;
+}
+
+bool HasName(const std::vector<std::string>& vecNames, const std::string& strName) {
+    return std::any_of(vecNames.begin(), vecNames.end(),
+                       [&](const std::string& strOther) { return SameName(strOther, strName); });
+}
+
+// Members without a column go; columns that are no member come, but those that can be none.
+void GoByColumns(const Json::Value& jColumns, Json::Value& jTable) {
+    const std::vector<std::string> vecColumns = jColumns.getMemberNames();
+    const std::vector<std::string> vecMembers = jTable["member"].getMemberNames();
+    for (const std::string& strMember : vecMembers) {
+        if (!HasName(vecColumns, strMember)) {
+            jTable["member"].removeMember(strMember);
+        }
+    }
+    for (const std::string& strColumn : vecColumns) {
+        if (!HasName(vecMembers, strColumn) && strColumn.compare(0, 1, "$") != 0) {
+            jTable["member"][strColumn] = jColumns[strColumn];
+        }
+    }
+    // Without all of its members there is none; that of the real table counts.
+    const Json::Value jKey = jTable.get("key", Json::Value());
+    const auto fnGone = [&jTable](const Json::Value& jName) {
+        return jName.isString() && !jTable["member"].isMember(jName.asString());
+    };
+    if (fnGone(jKey) || (jKey.isArray() && std::any_of(jKey.begin(), jKey.end(), fnGone))) {
+        jTable.removeMember("key");
     }
 }
 
@@ -193,6 +231,21 @@ bool TableExists(sqlite3* pDb, const std::string& strTable) {
     return Step(pLook.get());
 }
 
+void CheckNewName(const std::string& strTable) {
+    if (strTable.empty()) {
+        Fail(kExitUsage, "the name of the new table is empty; give it one");
+    }
+}
+
+void CheckDefaults(const std::string& strTable, const Json::Value& jDefinition) {
+    for (const Finding& Found : LintDefinition(strTable, jDefinition)) {
+        if (std::strcmp(Found.szCode, "bad-default") == 0) {
+            Fail(kExitBadData, "default of table \"" + strTable + "\": " + Found.strMessage +
+                                   "; give one that the type can hold");
+        }
+    }
+}
+
 Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable) {
     const std::string strFile = Call.Text("--def");
     if (!strFile.empty()) {
@@ -206,34 +259,57 @@ Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string
     if (!TableExists(pDb, kKeptTable)) {
         return {};
     }
-    const Statement pLook = Prepare(pDb, std::string("SELECT definition FROM ") + kKeptTable +
+    const Statement pLook = Prepare(pDb, std::string("SELECT name, definition FROM ") + kKeptTable +
                                              " WHERE name = ?1 COLLATE NOCASE");
     sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
     if (!Step(pLook.get())) {
         return {};
     }
-    return ParseJson(ColumnText(pLook.get(), 0),
-                     Call.Db() + ": the kept definition of \"" + strTable + "\"");
+    const Json::Value jKept = ParseJson(
+        ColumnText(pLook.get(), 1), Call.Db() + ": the kept definition of \"" + strTable + "\"");
+    // To SQLite a table is the same in any letter case.
+    const std::string strKept = ColumnText(pLook.get(), 0);
+    Json::Value jDefinition;
+    jDefinition[strTable] =
+        jKept.isObject() && jKept.isMember(strKept) ? jKept[strKept] : Json::Value();
+    return jDefinition;
+}
+
+Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable) {
+    Json::Value jDefinition = KnownDefinition(Call, pDb, strTable);
+    Json::Value jReal;
+    const bool blKept = !jDefinition.isNull() && !Call.Has("--def") &&
+                        jDefinition[strTable].isObject() &&
+                        jDefinition[strTable]["member"].isObject();
+    if (blKept && DefinitionOf(pDb, strTable, jReal).Ok()) {
+        GoByColumns(jReal[strTable]["member"], jDefinition[strTable]);
+    }
+    return jDefinition;
 }
 
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition) {
     Run(pDb, std::string("CREATE TABLE IF NOT EXISTS ") + kKeptTable +
                  " (name TEXT PRIMARY KEY NOT NULL, definition TEXT NOT NULL)");
+    const Statement pDelete =
+        Prepare(pDb, std::string("DELETE FROM ") + kKeptTable + " WHERE name = ?1 COLLATE NOCASE");
     const Statement pWrite =
-        Prepare(pDb, std::string("INSERT OR REPLACE INTO ") + kKeptTable + " VALUES (?1, ?2)");
+        Prepare(pDb, std::string("INSERT INTO ") + kKeptTable + " VALUES (?1, ?2)");
     Json::Value jKept;
     jKept[strTable] = jDefinition[strTable];
     const std::string strText = CompactJson(jKept);
+    sqlite3_bind_text(pDelete.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
     sqlite3_bind_text(pWrite.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
     sqlite3_bind_text(pWrite.get(), 2, strText.c_str(), -1, SQLITE_TRANSIENT);
+    Step(pDelete.get());
     Step(pWrite.get());
 }
 
-OpenTable::OpenTable(const Context& Call, Access eAccess) : pDb(OpenDatabase(Call, eAccess)) {
+OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition)
+    : pDb(OpenDatabase(Call, eAccess)) {
     Options How;
     How.blCompatible = false;
     How.nWaitMs = Call.WaitMs();
-    const Json::Value jDefinition = KnownDefinition(Call, pDb.get(), Call.TableName());
+    const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), Call.TableName());
     const Status Opened = Records.Open(pDb.get(), Call.TableName(), jDefinition, How);
     if (Opened.Code() == StatusCode::kNotFound) {
         std::vector<std::string> vecTables;

@@ -29,10 +29,18 @@ Json::Value ParseJson(const std::string& strText, const std::string& strWhere,
 
 // The definition of a table: from --def, else what the database keeps, else null.
 Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable);
+// The same, but what the database keeps goes by the columns: another program may have added,
+// renamed or dropped some since.
+Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable);
 // Keeps it in the database, in the table vornjsondb_definition. For a transaction of the caller's.
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition);
 
 bool TableExists(sqlite3* pDb, const std::string& strTable);
+// Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
+void CheckNewName(const std::string& strTable);
+
+// A default that its member's type cannot hold would be left out of a new table without a word.
+void CheckDefaults(const std::string& strTable, const Json::Value& jDefinition);
 
 // A statement of the command's own.
 struct FinalizeStatement {
@@ -47,7 +55,9 @@ std::string Quoted(const std::string& strName);  // as an SQL name
 
 // A database with one table open, which is what most subcommands work on.
 struct OpenTable {
-    OpenTable(const Context& Call, Access eAccess);
+    using Definition = Json::Value (*)(const Context& Call, sqlite3* pDb,
+                                       const std::string& strTable);
+    OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition = CurrentDefinition);
 
     Database pDb;
     Table Records;

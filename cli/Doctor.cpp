@@ -18,7 +18,8 @@ std::string Pragma(sqlite3* pDb, const std::string& strPragma) {
     return Step(pLook.get()) ? ColumnText(pLook.get(), 0) : "";
 }
 
-// The bytes that SQLite locks: in the database file, and in the -shm file beside it.
+// The bytes that SQLite locks: in the database file, and in the -shm file beside it. Locks of a
+// process that touch are one to the system, so the first row that has room for a lock counts.
 struct LockRow {
     const char* szFile;
     long long nFirst, nLast;
@@ -28,10 +29,12 @@ constexpr LockRow kLocks[] = {
     {"", 1073741824, 1073741824, "is about to write"},
     {"", 1073741825, 1073741825, "writes"},
     {"", 1073741826, 1073742335, "reads"},
+    {"", 1073741824, 1073742335, "writes, and nobody else may read"},
     {"-shm", 120, 120, "writes"},
     {"-shm", 121, 121, "makes a checkpoint"},
     {"-shm", 122, 122, "recovers"},
     {"-shm", 123, 127, "reads"},
+    {"-shm", 120, 127, "writes"},
 };
 
 std::string ProcessName(const std::string& strPid) {
@@ -52,21 +55,22 @@ void AppendLocks(const std::string& strFile, const char* szSuffix, Json::Value& 
     for (std::string strLine; std::getline(Locks, strLine);) {
         std::istringstream Words(strLine);
         std::string strNumber, strClass, strKind, strMode, strPid, strPlace;
-        long long nFirst = -1;
-        Words >> strNumber >> strClass >> strKind >> strMode >> strPid >> strPlace >> nFirst;
+        long long nFirst = -1, nLast = -1;
+        Words >> strNumber >> strClass >> strKind >> strMode >> strPid >> strPlace >> nFirst >>
+            nLast;
         const std::size_t nColon = strPlace.rfind(':');
         if (nColon == std::string::npos ||
             strPlace.substr(nColon + 1) != std::to_string(Is.st_ino)) {
             continue;
         }
         for (const LockRow& Row : kLocks) {
-            if (std::string(Row.szFile) == szSuffix && nFirst >= Row.nFirst &&
-                nFirst <= Row.nLast) {
+            if (std::string(Row.szFile) == szSuffix && nFirst >= Row.nFirst && nLast <= Row.nLast) {
                 Json::Value jRow;
                 jRow["check"] = "lock";
                 jRow["result"] =
                     "process " + strPid + " (" + ProcessName(strPid) + ") " + Row.szMeaning;
                 jRows.append(std::move(jRow));
+                break;
             }
         }
     }
@@ -83,7 +87,8 @@ int RunDoctor(Context& Call) {
         jRows.append(std::move(jRow));
     };
     bool blSound = false;
-    {
+    Error Locked{kExitFine, "", {}};
+    try {
         const Database pDb = OpenDatabase(Call, Access::kRead);
         const std::string strIntegrity = Pragma(pDb.get(), "integrity_check(1)");
         const std::string strForeign = Pragma(pDb.get(), "foreign_key_check");
@@ -94,10 +99,18 @@ int RunDoctor(Context& Call) {
         Add("encoding", Pragma(pDb.get(), "encoding"));
         Add("pages", Pragma(pDb.get(), "page_count"));
         Add("free pages", Pragma(pDb.get(), "freelist_count"));
+    } catch (const Error& Failed) {
+        if (Failed.nExit != kExitLocked) {
+            throw;
+        }
+        Locked = Failed;  // by whom is what is asked for
     }
     AppendLocks(Call.Db(), "", jRows);
     AppendLocks(Call.Db(), "-shm", jRows);
     WriteObjects(Call, jRows, {"check", "result"});
+    if (Locked.nExit != kExitFine) {
+        throw Locked;
+    }
     return blSound ? kExitFine : kExitBadData;
 }
 

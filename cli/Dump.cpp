@@ -105,13 +105,18 @@ struct Described {
 };
 
 Described Describe(const Context& Call, sqlite3* pDb) {
-    const std::string& strTable = Call.TableName();
-    const std::vector<std::string> vecCreate =
-        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
-    if (vecCreate.empty() || vecCreate[0].compare(0, 15, "CREATE VIRTUAL ") == 0) {
-        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + strTable +
+    const std::vector<std::string> vecFound = Texts(
+        pDb,
+        "SELECT name FROM sqlite_master WHERE type = 'table' AND name = ?1 COLLATE NOCASE AND "
+        "sql NOT LIKE 'CREATE VIRTUAL %'",
+        Call.TableName());
+    if (vecFound.empty()) {
+        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() +
                                 "\" that can be dumped; see vornjsondb tables");
     }
+    const std::string& strTable = vecFound[0];
+    const std::vector<std::string> vecCreate =
+        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
     Described Found;
     Json::Value& jHeader = Found.jHeader;
     jHeader["format"] = kStreamFormat;
@@ -168,7 +173,9 @@ class LineReader {
     }
 
     const std::string& Line() const { return m_strLine; }
-    std::string Place() const { return m_strFile + ":" + std::to_string(m_nLine); }
+    std::string Place() const {
+        return (m_strFile == "-" ? "standard input" : m_strFile) + ":" + std::to_string(m_nLine);
+    }
     Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
 
     [[noreturn]] void FailHere(const std::string& strWhat) const {
@@ -352,7 +359,8 @@ int RunLoad(Context& Call) {
     Check(All.Commit(), Call.Db());
     Json::Value jResult;
     jResult["loaded"] = Json::Int64(nRows);
-    Call.Report("loaded " + std::to_string(nRows) + " rows into table \"" + strTable + "\"",
+    Call.Report("loaded " + std::to_string(nRows) + (nRows == 1 ? " row" : " rows") +
+                    " into table \"" + strTable + "\"",
                 jResult);
     return kExitFine;
 }

@@ -136,8 +136,11 @@ void CheckOptionName(const std::string& strWord, const Command& Of) {
         vecNames.emplace_back(Row.szName);
     }
     const std::string strName = strWord.substr(0, strWord.find('='));
-    FailUsage("unknown option \"" + strName + "\" of " + Of.szName, NearestHint(strName, vecNames),
-              &Of);
+    const std::string strHint = NearestHint(strName, vecNames);
+    FailUsage("unknown option \"" + strName + "\" of " + Of.szName,
+              strHint.empty() ? std::string("; see vornjsondb ") + Of.szName +
+                                    " --help, and put -- before words that begin with a dash"
+                              : strHint);
 }
 
 // The names of Command::szWords say how many words there may be.
@@ -171,7 +174,7 @@ void ParseWords(std::vector<std::string> vecWords, Context& Call) {
             std::string(Row.szName) + (*Row.szShort == '\0' ? "" : ",") + Row.szShort;
         CLI::Option* const pMade =
             *Row.szValue == '\0' ? App.add_flag(strName) : App.add_option(strName);
-        if (Row.blRepeat) {
+        if (*Row.szValue != '\0') {
             pMade->take_all()->allow_extra_args(false);
         }
         vecMade.emplace_back(Row, pMade);
@@ -188,6 +191,9 @@ void ParseWords(std::vector<std::string> vecWords, Context& Call) {
     for (const auto& [Row, pMade] : vecMade) {
         if (pMade->count() > 0) {
             Call.mapOptions[Row.szName] = Unmarked(pMade->results());
+            if (*Row.szValue != '\0' && !Row.blRepeat && pMade->count() > 1) {
+                FailUsage(std::string(Row.szName) + " is given more than once", "; give it once");
+            }
             CheckChoice(Row, Call.mapOptions[Row.szName]);
         }
     }

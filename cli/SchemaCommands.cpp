@@ -77,35 +77,60 @@ Json::Value DefinitionFromWords(const Context& Call) {
         if (nColon == std::string::npos || nColon == 0) {
             Fail(kExitUsage, "\"" + strWord + "\" is no member; write member:type");
         }
-        jMembers[strWord.substr(0, nColon)]["cpptype"] = strWord.substr(nColon + 1);
+        const std::string strName = strWord.substr(0, nColon);
+        if (jMembers.isMember(strName)) {
+            Fail(kExitUsage, "the member \"" + strName + "\" is there twice; name it once");
+        }
+        jMembers[strName]["cpptype"] = strWord.substr(nColon + 1);
     }
-    const auto Member = [&jMembers](const std::string& strName) -> Json::Value& {
+    const auto Member = [&jMembers](const char* szOption,
+                                    const std::string& strName) -> Json::Value& {
         if (!jMembers.isMember(strName)) {
-            Fail(kExitUsage, "there is no member \"" + strName + "\"" +
-                                 NearestHint(strName, jMembers.getMemberNames()));
+            const std::string strHint = NearestHint(strName, jMembers.getMemberNames());
+            Fail(kExitUsage, std::string(szOption) + ": there is no member \"" + strName + "\"" +
+                                 (strHint.empty() ? "; add it as member:type" : strHint));
         }
         return jMembers[strName];
     };
     for (const std::string& strName : Call.Names("--not-null")) {
-        Member(strName)["notNull"] = true;
+        Member("--not-null", strName)["notNull"] = true;
     }
     for (const std::string& strName : Call.Names("--unique")) {
-        Member(strName)["unique"] = true;
+        Member("--unique", strName)["unique"] = true;
     }
     for (const std::string& strName : Call.Names("--key")) {
-        Member(strName);
+        Member("--key", strName);
         jTable["key"].append(strName);
     }
     for (const std::string& strWord : Call.List("--default")) {
-        const std::size_t nEquals = std::min(strWord.find('='), strWord.size());
-        Json::Value& jMember = Member(strWord.substr(0, nEquals));
-        const std::string strText = nEquals < strWord.size() ? strWord.substr(nEquals + 1) : "";
-        jMember["cppDefaultValue"] =
-            jMember["cpptype"] == "string" ? Json::Value(strText) : ParseJson(strText, strWord);
+        const std::size_t nEquals = strWord.find('=');
+        if (nEquals == std::string::npos) {
+            Fail(kExitUsage, "--default: \"" + strWord + "\" is not of the form member=value");
+        }
+        Json::Value& jMember = Member("--default", strWord.substr(0, nEquals));
+        const std::string strText = strWord.substr(nEquals + 1);
+        jMember["cppDefaultValue"] = jMember["cpptype"] == "string"
+                                         ? Json::Value(strText)
+                                         : ParseJson(strText, "--default " + strWord, kExitUsage);
     }
     Json::Value jDefinition;
     jDefinition[Call.TableName()] = jTable;
     return jDefinition;
+}
+
+// What keeps a table from being opened is a finding like others, and not the end.
+FindingList FindingsOf(const Context& Call) {
+    FindingList vecFindings;
+    try {
+        OpenTable Open(Call, Access::kRead, KnownDefinition);
+        Check(Open.Records.Lint(vecFindings), Call.Db());
+    } catch (const Error& Failed) {
+        if (Failed.vecFindings.empty()) {
+            throw;
+        }
+        vecFindings = Failed.vecFindings;
+    }
+    return vecFindings;
 }
 
 }  // namespace
@@ -158,6 +183,7 @@ int RunInit(Context& Call) {
     if (blFile == (Call.vecWords.size() > 2)) {
         Fail(kExitUsage, "init takes member:type words or --def FILE; give one of them");
     }
+    CheckNewName(Call.TableName());
     Json::Value jDefinition;
     if (!blFile) {
         jDefinition = DefinitionFromWords(Call);
@@ -166,6 +192,7 @@ int RunInit(Context& Call) {
     }
     std::string strSql;
     Check(CreateStatement(Call.TableName(), jDefinition, strSql), Call.Db(), kExitBadData);
+    CheckDefaults(Call.TableName(), jDefinition);
     if (Call.Has("--dry-run")) {
         Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
         return kExitFine;
@@ -191,10 +218,12 @@ int RunIndex(Context& Call) {
     OpenTable Open(Call, vecMembers.empty() ? Access::kRead : Access::kChange);
     if (!vecMembers.empty()) {
         std::string strSql;
+        const std::size_t nBefore = CreateStatements(Open.pDb.get(), Call.TableName()).size();
         Check(Open.Records.CreateIndex(vecMembers, Call.Has("--unique"), &strSql), Call.Db());
+        const bool blMade = CreateStatements(Open.pDb.get(), Call.TableName()).size() != nBefore;
         Json::Value jResult;
         jResult["sql"] = strSql;
-        Call.Report(strSql, jResult);
+        Call.Report((blMade ? "" : "there already: ") + strSql, jResult);
         return kExitFine;
     }
     const Statement pLook = Prepare(
@@ -255,10 +284,7 @@ int RunLint(Context& Call) {
     for (const std::string& strTable : vecTables) {
         Call.vecWords.resize(1);
         Call.vecWords.push_back(strTable);
-        OpenTable Open(Call, Access::kRead);
-        FindingList vecFindings;
-        Check(Open.Records.Lint(vecFindings), Call.Db());
-        AppendFindings(vecFindings, strTable, jFindings);
+        AppendFindings(FindingsOf(Call), strTable, jFindings);
     }
     bool blError = false;
     for (const Json::Value& jFinding : jFindings) {
@@ -274,7 +300,7 @@ int RunLint(Context& Call) {
 
 int RunSync(Context& Call) {
     const bool blLook = Call.Has("--dry-run");
-    OpenTable Open(Call, blLook ? Access::kRead : Access::kChange);
+    OpenTable Open(Call, blLook ? Access::kRead : Access::kChange, KnownDefinition);
     SyncReport Done;
     Transaction All;
     if (!blLook) {

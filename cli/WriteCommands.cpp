@@ -1,5 +1,7 @@
 // update, delete, upsert: records by key and by query.
 
+#include <set>
+
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
@@ -26,9 +28,14 @@ std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std
     Transaction All;
     Check(All.Begin(Open.pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
     std::int64_t nRecords = 0;
+    std::set<Json::Value> setDone;  // a record whose key is given twice is one record
     for (const std::string& strKey : vecKeys) {
+        const Json::Value jKey = ParseKey(Open.Records, strKey);
+        if (!setDone.insert(jKey).second) {
+            continue;
+        }
         std::int64_t nChanged = 0;
-        const Query Which = KeyQuery(Open.Records, ParseKey(Open.Records, strKey));
+        const Query Which = KeyQuery(Open.Records, jKey);
         Check(fnChange(Which, nChanged), Call.Db());
         if (nChanged == 0) {
             Fail(kExitNotFound, Call.Db() + ": table \"" + Call.TableName() +

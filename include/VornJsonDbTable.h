@@ -348,9 +348,11 @@ class Table {
     Table(const Table&) = delete;
     Table& operator=(const Table&) = delete;
 
-    // Must come first. Copies its arguments but the connection. A null definition is made from the
-    // real table. kNotFound: there is no such table and Options do not say how to make one.
-    // Columns that the table lacks, or has more, are no failure: see Lint and Sync.
+    // Must come first; a table that is open already becomes another one, but not in a callback of
+    // its own nor while a Loader works on it. Copies its arguments but the connection. A null
+    // definition is made from the real table. kNotFound: there is no such table and Options do not
+    // say how to make one. Columns that the table lacks, or has more, are no failure: see Lint and
+    // Sync.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 
@@ -376,7 +378,8 @@ class Table {
     Status Exists(const Query& Which, bool& blExists);
 
     // One row at a time, in constant memory, until the callback returns false. In it the table can
-    // be read, but calls that change it return kMisuse.
+    // be read, but calls that change it, and Open, return kMisuse; and it must not be moved or
+    // destroyed.
     Status ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord);
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 

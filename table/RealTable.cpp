@@ -80,14 +80,17 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
 }  // namespace
 
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
-    // Generated columns are hidden, each kind in its own way.
-    constexpr int kVirtual = 2;
+    // Hidden columns of virtual tables are no part of a row; generated ones are, of either kind.
+    constexpr int kHidden = 1;
     Out = RealTable();
     std::map<int, std::string> mapKey;  // by their places in it, from 1
     const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
+        if (NumberColumn(pRow, 5) == kHidden) {
+            return;
+        }
         Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
                                             TextColumn(pRow, 2), NumberColumn(pRow, 4) != 0,
-                                            NumberColumn(pRow, 5) >= kVirtual});
+                                            NumberColumn(pRow, 5) > kHidden});
         mapKey[NumberColumn(pRow, 3)] = TextColumn(pRow, 0);
     });
     mapKey.erase(0);  // columns outside of the key

@@ -125,6 +125,9 @@ Table& Table::operator=(Table&& From) noexcept = default;
 
 Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                    const Options& How) {
+    if (m_pParts && m_pParts->nReading > 0) {
+        return vornjsondb::CheckState(m_pParts.get(), "open anew", true);
+    }
     m_pParts.reset();
     const Doing What{"open", &strName};
     if (pDb == nullptr) {

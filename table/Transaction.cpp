@@ -87,8 +87,8 @@ Status Transaction::Commit() {
     }
     if (sqlite3_get_autocommit(m_pDb) != 0) {
         Close();
-        const Status Gone =
-            vornjsondb::Fail(StatusCode::kMisuse, What, "an earlier failure has undone it");
+        const Status Gone = vornjsondb::Fail(
+            StatusCode::kMisuse, What, "a failure has undone it, or a statement has ended it");
         return vornjsondb::Amended(Gone, Retry::kTransaction, "");
     }
     int nResult = Finish(m_pEnd);

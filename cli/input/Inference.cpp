@@ -15,6 +15,7 @@ constexpr unsigned kText = 32;
 constexpr unsigned kObject = 64;
 constexpr unsigned kList = 128;
 constexpr unsigned kInexact = 256;  // an integer that no double equals for sure
+constexpr unsigned kBlob = 512;
 
 unsigned OfInteger(std::int64_t nValue) {
     return nValue > kMostExact || nValue < -kMostExact ? kInteger | kInexact : kInteger;
@@ -35,6 +36,9 @@ unsigned KindsOf(const Value& Given) {
         case Value::Kind::kText:
             return kText;
         default:
+            if (Given.strText.substr(0, kBlobBegin.size()) == kBlobBegin) {
+                return kBlob;
+            }
             return Given.strText[0] == '{' ? kObject : kList;
     }
 }
@@ -46,7 +50,7 @@ struct TypeRow {
 
 // The first that fits. A list, an object or a boolean beside something else is kept as JSON text,
 // so that 5, "5" and true stay apart.
-constexpr unsigned kTextsAndNumbers = kText | kWide | kInteger | kInexact | kReal;
+constexpr unsigned kTextsAndNumbers = kText | kWide | kInteger | kInexact | kReal | kBlob;
 constexpr TypeRow kTypes[] = {
     {0, "string"},
     {kText | kWide, "string"},
@@ -131,7 +135,8 @@ std::vector<std::string> Inference::Notes() const {
         if ((Each.nKinds & kWide) != 0) {
             vecNotes.push_back(strMember + "numbers beyond 64 bits are kept as texts");
         }
-        if (strType == "any" || strType == "Json::Value") {
+        const bool blBlobs = (Each.nKinds & ~kNull) == kBlob;
+        if ((strType == "any" && !blBlobs) || strType == "Json::Value") {
             vecNotes.push_back(strMember + "values of several kinds");
         }
         if (Each.nValues > 0 && Each.nValues < m_nRecords && (Each.nKinds & kNull) != 0) {

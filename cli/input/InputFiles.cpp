@@ -44,7 +44,8 @@ ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
     if (!How.strDelimiter.empty()) {
         if (How.strDelimiter.size() != 1 || How.strDelimiter.find_first_of("\"\r\n") == 0) {
             Fail(kExitUsage,
-                 "--delimiter: it must be one ASCII character, and no quote or newline");
+                 "--delimiter: it must be one ASCII character, and no quote or newline; for tabs "
+                 "there is --format tsv");
         }
         Found.eFormat = Format::kSeparated;
         Found.cDelimiter = How.strDelimiter[0];
@@ -57,6 +58,12 @@ ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
 }
 
 }  // namespace
+
+void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& strReason,
+            const char* szRemedy) {
+    Fail(kExitBadData, strInput + ":" + std::to_string(nLine) + ": " + strReason +
+                           (strReason.find("; ") == std::string::npos ? szRemedy : ""));
+}
 
 InputFiles::InputFiles(const InsertOptions& How) {
     for (const std::string& strPath : How.vecFiles) {
@@ -75,8 +82,7 @@ bool InputFiles::ReadOne(Input& Now, Sink& To) {
         FailBySystem(Now.From);
     }
     if (Result.eEnd == ReadOutcome::End::kFailed) {
-        Fail(kExitBadData,
-             Now.From.Name() + ":" + std::to_string(Result.nLine) + ": " + Result.strReason);
+        FailAt(Now.From.Name(), Result.nLine, Result.strReason, "; correct the input");
     }
     Now.strListName = Result.strListName;
     return Result.eEnd == ReadOutcome::End::kDone;

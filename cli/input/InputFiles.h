@@ -14,6 +14,12 @@
 
 namespace VORN_JSON_DB::Cli {
 
+// Ends the call for what is wrong in an input: "FILE:LINE: reason; remedy". Some reasons have a
+// remedy of their own.
+[[noreturn]] void FailAt(const std::string& strInput, std::int64_t nLine,
+                         const std::string& strReason, const char* szRemedy);
+constexpr char kLeaveOut[] = "; correct it, or leave it out by --errors FILE";
+
 class InputFiles {
   public:
     // Opens all of them, and finds out their formats; an Error, if one cannot be opened.

@@ -1,5 +1,6 @@
 #include "Insert.h"
 
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -26,6 +27,32 @@ std::string Pretty(const Json::Value& jValue) {
     return Json::writeString(Builder, jValue);
 }
 
+// What a name leads to; standard input's "-", too.
+bool LooksAt(const std::string& strPath, struct stat& Found) {
+    return (strPath == "-" ? fstat(STDIN_FILENO, &Found) : stat(strPath.c_str(), &Found)) == 0;
+}
+
+// --errors begins with an empty file, whatever was in it.
+void CheckErrorFile(const Context& Call, const InsertOptions& How) {
+    std::vector<std::string> vecNeeded = How.vecFiles;
+    vecNeeded.push_back(Call.Text("--def"));
+    for (const char* const szSuffix : {"", "-journal", "-wal", "-shm"}) {
+        vecNeeded.push_back(Call.Db() + szSuffix);
+    }
+    struct stat Errors {};
+    if (stat(How.strErrors.c_str(), &Errors) != 0 || !S_ISREG(Errors.st_mode)) {
+        return;
+    }
+    for (const std::string& strPath : vecNeeded) {
+        struct stat Needed {};
+        if (LooksAt(strPath, Needed) && Needed.st_dev == Errors.st_dev &&
+            Needed.st_ino == Errors.st_ino) {
+            Fail(kExitUsage, "--errors: " + How.strErrors +
+                                 " is read or written by this call itself; name another file");
+        }
+    }
+}
+
 // The first look at all records. Bad ones are an Error unless they are to be left out later.
 class TypesSink : public Inference {
   public:
@@ -43,7 +70,7 @@ class TypesSink : public Inference {
 
     bool BadRecord(const Place& Where, const std::string& strReason) override {
         if (!m_blGoOn) {
-            Fail(kExitBadData, m_strInput + ":" + std::to_string(Where.nLine) + ": " + strReason);
+            FailAt(m_strInput, Where.nLine, strReason, kLeaveOut);
         }
         return Inference::BadRecord(Where, strReason);
     }
@@ -63,11 +90,15 @@ class Import {
 
   private:
     void OpenFile();
+    void RemoveNewFile();
     void FindDefinition();
     void LearnTypes();
+    Options Settings() const;
+    std::vector<std::string> Statements();
     int ShowDryRun();
     void CheckColumns() const;
     void Prepare();
+    void CheckKey();
     void Load();
     bool AfterRecord();
     void Begin();
@@ -111,13 +142,22 @@ int Import::Run() {
         return Finish();
     } catch (Error& Failed) {
         m_pProgress.reset();
-        if (m_blNewFile && m_nStored == 0) {
-            unlink(m_Call.Db().c_str());
-        }
+        RemoveNewFile();
         if (!m_How.blDryRun) {
             Failed.strLine += WhatIsStored();
         }
         throw;
+    }
+}
+
+// Of a database that this call made and stored nothing in. Another program may have done so since.
+void Import::RemoveNewFile() {
+    if (m_All.IsOpen()) {
+        m_All.Rollback().Ignore();
+    }
+    struct stat Now {};
+    if (m_blNewFile && m_nStored == 0 && stat(m_Call.Db().c_str(), &Now) == 0 && Now.st_size == 0) {
+        unlink(m_Call.Db().c_str());
     }
 }
 
@@ -146,7 +186,10 @@ void Import::OpenFile() {
 
 void Import::FindDefinition() {
     m_blTableThere = TableExists(m_pDb.get(), m_strTable);
-    m_jDefinition = KnownDefinition(m_Call, m_pDb.get(), m_strTable);
+    if (!m_blTableThere) {
+        CheckNewName(m_strTable);
+    }
+    m_jDefinition = CurrentDefinition(m_Call, m_pDb.get(), m_strTable);
     m_blKept = !m_jDefinition.isNull();
     m_blToKeep = m_Call.Has("--def");
     if (m_blTableThere && !m_blKept) {
@@ -194,6 +237,7 @@ void Import::LearnTypes() {
         Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
     }
     m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
     }
@@ -210,16 +254,41 @@ void Import::CheckColumns() const {
     }
 }
 
-int Import::ShowDryRun() {
+// What would make the table, or extend the one that is there.
+std::vector<std::string> Import::Statements() {
     std::string strSql;
-    Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
+    if (!m_blTableThere) {
+        Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
+        return {strSql};
+    }
+    SyncReport Report;
+    if (m_blAdded) {
+        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, Settings()), m_Call.Db(),
+              kExitBadData);
+        Check(m_Table.Sync(SyncMode::kLook, Report), m_Call.Db());
+    }
+    return Report.vecStatements;
+}
+
+int Import::ShowDryRun() {
+    const std::vector<std::string> vecStatements = Statements();
     if (m_Call.Json()) {
         Json::Value jShown;
         jShown["definition"] = m_jDefinition;
-        jShown["create"] = strSql;
+        if (m_blTableThere) {
+            jShown["alter"] = Json::Value(Json::arrayValue);
+            for (const std::string& strSql : vecStatements) {
+                jShown["alter"].append(strSql);
+            }
+        } else {
+            jShown["create"] = vecStatements[0];
+        }
         Put(Pretty(jShown) + "\n");
     } else {
-        Put(Pretty(m_jDefinition) + "\n" + strSql + ";\n");
+        Put(Pretty(m_jDefinition) + "\n");
+        for (const std::string& strSql : vecStatements) {
+            Put(strSql + ";\n");
+        }
     }
     for (const std::string& strNote : m_vecNotes) {
         m_Call.Say(strNote);
@@ -231,13 +300,22 @@ void Import::Begin() {
     Check(m_All.Begin(m_pDb.get(), Transaction::Mode::kImmediate, m_Call.WaitMs()), m_Call.Db());
 }
 
-// The table, its definition and the first records come to be at once.
-void Import::Prepare() {
+Options Import::Settings() const {
     Options How;
     How.blCompatible = false;
     How.blCreateTable = true;
     How.nWaitMs = m_Call.WaitMs();
+    return How;
+}
+
+// The table, its definition and the first records come to be at once.
+void Import::Prepare() {
+    const Options How = Settings();
     Begin();
+    if (!m_blTableThere && TableExists(m_pDb.get(), m_strTable)) {
+        Fail(kExitDuplicate, m_Call.Db() + ": another program has just made the table \"" +
+                                 m_strTable + "\"; try again, into that table");
+    }
     // The names come from the records.
     Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db(), kExitBadData);
     if (m_blAdded) {
@@ -249,6 +327,7 @@ void Import::Prepare() {
         Fail(kExitUsage, m_Call.Db() + ": --skip, --replace and --upsert need a key, and table \"" +
                              m_strTable + "\" has none; name it with --key MEMBER");
     }
+    CheckKey();
     if (m_blToKeep) {
         KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
         m_blKept = true;
@@ -258,6 +337,25 @@ void Import::Prepare() {
     HowToLoad.nRowsPerTransaction = 0;
     HowToLoad.blGoOnAfterBad = !m_How.strErrors.empty();
     Check(m_Into.Start(m_Table, HowToLoad), m_Call.Db());
+}
+
+// SQLite finds a record by its key only where no two can have the same.
+void Import::CheckKey() {
+    FindingList vecFindings;
+    if (m_How.eOnDuplicate == OnDuplicate::kSkip || m_How.eOnDuplicate == OnDuplicate::kReplace) {
+        Check(m_Table.Lint(vecFindings), m_Call.Db());
+    }
+    std::string strWords;
+    for (const std::string& strMember : m_Table.KeyMembers()) {
+        strWords += " " + strMember;
+    }
+    for (const Finding& Found : vecFindings) {
+        if (std::string_view("key-not-unique") == Found.szCode) {
+            Fail(kExitBadData, m_Call.Db() + ": " + Found.strMessage +
+                                   "; make it so by vornjsondb index " + m_Call.Db() + " " +
+                                   m_strTable + strWords + " --unique");
+        }
+    }
 }
 
 void Import::Load() {
@@ -270,10 +368,12 @@ void Import::Load() {
     }
     std::unique_ptr<ErrorFile> pErrors;
     if (!m_How.strErrors.empty()) {
+        CheckErrorFile(m_Call, m_How);
         pErrors = std::make_unique<ErrorFile>(m_How.strErrors);
     }
     Prepare();
-    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(),
+    const bool blMode = m_How.eOnDuplicate != OnDuplicate::kStop;
+    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(), blMode,
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {

@@ -58,7 +58,8 @@ std::vector<Option> InsertOptionRows() {
         {"--empty", "", "null|text", "what a bare empty cell of CSV is (null)"},
         {"--batch", "", "N", "commit after each N records; 0: all or nothing"},
         {"--errors", "", "FILE", "write bad records there, and go on without them"},
-        {"--dry-run", "-n", "", "show definition and CREATE statement, and change nothing"},
+        {"--dry-run", "-n", "",
+         "show the definition and what makes or extends the table; change nothing"},
     };
 }
 

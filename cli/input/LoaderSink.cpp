@@ -5,6 +5,8 @@
 #include <utility>
 
 #include "../Command.h"
+#include "../JsonCells.h"
+#include "InputFiles.h"
 #include "JsonQuote.h"
 #include "Numbers.h"
 #include "Utf8.h"
@@ -67,11 +69,12 @@ void ErrorFile::Close() {
     }
 }
 
-LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors,
+LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
                        std::function<bool()> fnAfter)
     : m_Of(Of),
       m_Into(Into),
       m_pErrors(pErrors),
+      m_blMode(blMode),
       m_fnAfter(std::move(fnAfter)),
       m_vecNulls(Of.Members().size()) {}
 
@@ -120,10 +123,27 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
         case Value::Kind::kWide:
             return SetWide(Into, Given.strText);
         case Value::Kind::kJson:
-            return m_Into.SetJson(Into.nLoader, Given.strText);
+            return SetObject(Into, Given.strText);
         default:
             return m_Into.SetText(Into.nLoader, Given.strText);
     }
+}
+
+// A member of type "any" takes bytes; else a list or an object is refused there.
+void LoaderSink::SetObject(const Column& Into, std::string_view strJson) {
+    bool blBytes = Into.eKind == BoundKind::kAny && strJson.size() > kBlobBegin.size() + 1 &&
+                   strJson.substr(0, kBlobBegin.size()) == kBlobBegin;
+    if (blBytes) {
+        strJson.remove_suffix(2);  // of the text and of the object
+        const std::string strBytes =
+            FromBase64(std::string(strJson.substr(kBlobBegin.size())), blBytes);
+        if (blBytes) {
+            return m_Into.SetBlob(Into.nLoader, strBytes.data(), strBytes.size());
+        }
+        m_Into.Reject("member \"" + Into.strName + "\": its \"encoded\" is no base64");
+        return;
+    }
+    m_Into.SetJson(Into.nLoader, strJson);
 }
 
 // Into a real column the nearest double; else the digits.
@@ -176,7 +196,7 @@ void LoaderSink::SetCell(const Column& Into, std::string_view strCell) {
 
 void LoaderSink::NotStored(const Place& Where, const std::string& strReason) {
     if (m_pErrors == nullptr) {
-        Fail(kExitBadData, At(m_strInput, Where) + ": " + strReason);
+        FailAt(m_strInput, Where.nLine, strReason, kLeaveOut);
     }
     m_pErrors->Add(m_strInput, Where, strReason);
 }
@@ -184,16 +204,21 @@ void LoaderSink::NotStored(const Place& Where, const std::string& strReason) {
 bool LoaderSink::EndRecord(const Place& Where) {
     if (m_blUnknown) {
         m_blUnknown = false;
+        const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members());
         return BadRecord(Where,
-                         "the table has no member \"" + m_strUnknown + "\"; --add-members adds it");
+                         "the table has no member \"" + m_strUnknown + "\"" +
+                             (strNearest.empty() ? "; --add-members adds it"
+                                                 : strNearest + " or add it by --add-members"));
     }
     const Status Outcome = m_Into.EndRecord();
     if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome))) {
         const bool blDuplicate = Outcome.Code() == StatusCode::kDuplicate;
-        const std::string strHint =
-            blDuplicate ? "; --skip, --replace or --upsert tells what to do with it" : "";
+        const char* const szHint = !blDuplicate ? ""
+                                   : m_blMode
+                                       ? "; correct it, or leave it out by --errors FILE"
+                                       : "; --skip, --replace or --upsert tells what to do with it";
         Fail(ExitOf(Outcome.Code(), kExitBadData),
-             At(m_strInput, Where) + ": " + LineOf(Outcome) + strHint);
+             At(m_strInput, Where) + ": " + LineOf(Outcome) + szHint);
     }
     if (!Outcome.Ok()) {
         NotStored(Where, Outcome.Message());

@@ -35,7 +35,9 @@ class LoaderSink : public Sink {
   public:
     // The first bad record is an Error, unless pErrors takes it. fnAfter is called after each
     // record and says whether to go on.
-    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, std::function<bool()> fnAfter);
+    // blMode: the call says what to do with a key that is there.
+    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
+               std::function<bool()> fnAfter);
 
     void BeginInput(const std::string& strName, bool blCells);
 
@@ -57,12 +59,14 @@ class LoaderSink : public Sink {
     void Set(const Column& Into, const Value& Given);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
+    void SetObject(const Column& Into, std::string_view strJson);
     void SetWide(const Column& Into, std::string_view strNumber);
     void NotStored(const Place& Where, const std::string& strReason);
 
     const Table& m_Of;
     Loader& m_Into;
     ErrorFile* const m_pErrors;
+    const bool m_blMode;
     const std::function<bool()> m_fnAfter;
     std::string m_strInput;
     bool m_blCells = false;

@@ -189,7 +189,9 @@ void SeparatedReader::Row() {
     }
     if (nCells != m_vecNames.size()) {
         Blame("the row has " + std::to_string(nCells) + (nCells == 1 ? " cell" : " cells") +
-              ", but there are " + std::to_string(m_vecNames.size()) + " columns");
+              (m_vecNames.size() == 1
+                   ? ", but there is 1 column"
+                   : ", but there are " + std::to_string(m_vecNames.size()) + " columns"));
     }
     const Place Where{++m_nRecord, m_nRowLine, m_strText};
     const bool blGoOn =

@@ -26,6 +26,9 @@ struct Value {
     std::string_view strText;  // lives as long as the call that it is passed to
 };
 
+// How bytes that are no text begin in JSON: {"$base64":true,"encoded":"..."}, as list writes them.
+constexpr std::string_view kBlobBegin = R"({"$base64":true,"encoded":")";
+
 // Where a record is.
 struct Place {
     std::int64_t nRecord = 0;  // from 1 in each input

@@ -6,6 +6,10 @@ make_shop
 expect 2 '' 'error: unknown subcommand "lst"; did you mean "list"?' -- lst shop.db
 expect 2 '' 'error: unknown option "--limt" of list; did you mean "--limit"?' -- \
     list shop.db product --limt 5
+sqlite3 shop.db 'CREATE TABLE heap (a TEXT PRIMARY KEY)'
+expect 2 '' 'error: unknown option "-x" of get; see vornjsondb get --help, and put -- before words that begin with a dash' \
+    -- get shop.db product -x
+expect 5 '' 'error: shop.db: table "heap" has no record with the key "-x"' -- get shop.db heap -- -x
 expect 2 '' 'error: list lacks TABLE; usage: vornjsondb list DB TABLE [member=value]...' -- list shop.db
 expect 2 '' 'error: --limit: "x" is no whole number; give one from 0' -- \
     list shop.db product --limit x
@@ -13,7 +17,17 @@ expect 2 '' 'error: --format: unknown value "xml"; it is one of json|jsonl|csv|t
     list shop.db product --format xml
 expect 2 '' 'error: table "product" has no member "nmae"; did you mean "name"?' -- \
     count shop.db product nmae=x
-expect 2 '' 'error: "[1,2]" sets no member; write member=value' -- list shop.db product '[1,2]'
+expect 2 '' 'error: "[1,2]" is not of the form member=value' -- list shop.db product '[1,2]'
+expect 2 '' 'error: "price>1" is not of the form member=value; write --where '"'{\"price\": {\"\$gt\": 1}}'" -- \
+    list shop.db product 'price>1'
+expect 2 '' 'error: "name!=tea" is not of the form member=value; write --where '"'{\"name\": {\"\$ne\": \"tea\"}}'" -- \
+    count shop.db product 'name!=tea'
+expect 2 '' 'error: "tags[0]<=b" is not of the form member=value; write --where '"'{\"tags[0]\": {\"\$lte\": \"b\"}}'" -- \
+    count shop.db product 'tags[0]<=b'
+expect 0 0 '' -- count shop.db product 'tags[0]=a>b'
+expect 2 '' 'error: --limit is given more than once; give it once' -- list shop.db product --limit 1 -l 2
+expect 0 '[{"id":1,"name":"tea, \"green\""}]' '' -- \
+    list shop.db product --members id --members name --sort name,id --sort -price --limit 1 --offset 1
 expect 2 '' 'error: --where: "size=5" is no JSON object; write {"size": 5}, or size=5 without --where' -- \
     list shop.db product --where size=5
 expect 2 '' 'error: --where: Line 1, Column 8: Missing '"','"' or '"'}'"' in object declaration; it must be JSON' \
@@ -67,9 +81,33 @@ expect 3 '' 'error: shop.db: cannot make a statement for table "shelf": member "
 expect 2 '' 'error: shop.db: cannot remove records from table "product": the query has no condition and would reach every record; give a condition; delete --all removes all records' \
     -- delete shop.db product --where '{}'
 
+expect 2 '' "$refused"'"tags[0]" is a path; name members of the table, parted by commas' -- \
+    list shop.db product --members 'tags[0]'
+expect 2 '' "$refused"'pattern "50\x" has a \ before something else than %, _ and \; put \ before a %, _ or \ that stands for itself' \
+    -- list shop.db product --where '{"name": {"$like": "50\\x"}}'
+sqlite3 shop.db 'CREATE TABLE dollar ("$x", a); INSERT INTO dollar VALUES (1, 2); CREATE TABLE amount (a NUMERIC)'
+expect 3 '' 'error: shop.db: cannot open table "dollar": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def' \
+    -- list shop.db dollar
+echo '{"dollar": {"member": {"a": {"cpptype": "int"}}}}' >dollar.def
+expect 0 '[{"a":2}]' '' -- list shop.db dollar --def dollar.def
+"$VORNJSONDB" lint shop.db amount --format tsv >found
+same 'lint of a numeric column' "$(tail -n 1 found | cut -f 3,6)" \
+    $'other-affinity\tgive the member a type that fits its column, or copy the rows into a new table'
+expect 3 '' 'error: standard input:1: it is empty; dump the table again' -- load shop.db
+
 "$VORNJSONDB" init shop.db price product:int country:string --key product,country --quiet
 expect 2 '' 'error: key "{"product": 1}": it must be an object with just these members: product, country' -- \
     get shop.db price '{"product": 1}'
+expect 2 '' 'error: key "x": it must be an object with just these members: product, country' -- \
+    get shop.db price x
+sqlite3 shop.db 'DROP TABLE heap; CREATE TABLE heap (a)'
+expect 3 '' 'error: shop.db: cannot save a record in table "heap": the table has no key that tells records apart; name the key in a definition, given by --def; or insert --key MEMBER' \
+    -- upsert shop.db heap a=1
+echo '[{"ID": 9, "size": 3}]' >near.json
+expect 3 '' 'error: near.json:1: the table has no member "ID"; did you mean "id"? or add it by --add-members (nothing is stored)' \
+    -- insert shop.db product near.json
+expect 2 '' 'error: --delimiter: it must be one ASCII character, and no quote or newline; for tabs there is --format tsv' \
+    -- insert shop.db product near.json --delimiter '\t'
 
 # What a message quotes does not steer the terminal.
 expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \

@@ -2,13 +2,21 @@
 # Input that is wrong, huge or odd: what is said of it, and that nothing is stored of it.
 source "$(dirname "$0")/Check.sh"
 
-# bad LINE REASON BYTES [OPTION...]: an insert of these bytes ends with the reason in that line.
-bad() {
+# broken LINE REASON BYTES [OPTION...]: an insert of these bytes ends with the reason in that line.
+broken() {
     local line=$1 reason=$2 bytes=$3
     shift 3
+    [[ $reason == *'; '* ]] || reason+='; correct the input'
     printf '%b' "$bytes" >in
     expect 3 '' "error: in:$line: $reason (nothing is stored)" -- insert bad.db t in "$@"
     same "no database after: $bytes" "$(ls bad.db 2>/dev/null)" ''
+}
+
+# The same, where it is one record that is bad.
+bad() {
+    local reason=$2
+    [[ $reason == *'; '* ]] || reason+='; correct it, or leave it out by --errors FILE'
+    broken "$1" "$reason" "${@:3}"
 }
 
 # good OUTPUT BYTES [OPTION...]: these bytes come back as JSON Lines.
@@ -36,27 +44,27 @@ bad 1 "$no_utf8" '[{"a": "\0377"}]'
 bad 1 "$no_utf8" '[{"a": "\0355\0240\0200"}]'
 bad 1 "$no_utf8" '[{"a": "\0300\0257"}]'
 bad 2 "$no_utf8" '[{"a": 1},\n{"\0360\0237": 1}]'
-bad 1 "$half" '[{"a": "\\ud800"}]'
+broken 1 "$half" '[{"a": "\\ud800"}]'
 bad 1 "$half" '[{"a": "\\udc00"}]'
-bad 1 "$half" '[{"a": ["\\udc00\\ud800"]}]'
-bad 1 "$escape" '[{"a": "x\ny"}]'
-bad 1 "$escape" '[{"a": "\\x"}]'
-bad 1 '\u needs four hexadecimal digits' '[{"a": "\\u12"}]'
-bad 1 'there is a NUL byte' '[{"a": "x\0000y"}]'
-bad 1 'there is a NUL byte' '[{"a": 1}\0000]'
+broken 1 "$half" '[{"a": ["\\udc00\\ud800"]}]'
+broken 1 "$escape" '[{"a": "x\ny"}]'
+broken 1 "$escape" '[{"a": "\\x"}]'
+broken 1 '\u needs four hexadecimal digits' '[{"a": "\\u12"}]'
+broken 1 'there is a NUL byte' '[{"a": "x\0000y"}]'
+broken 1 'there is a NUL byte' '[{"a": 1}\0000]'
 bad 1 'there is a NUL byte' '{"a": 1}\0000\n{"a": 2}\n'
 good '{"a":"x\u0000y😀"}' '[{"a": "x\\u0000y\\ud83d\\ude00"}]'
 good '{"a":1}' '\0357\0273\0277[{"a": 1}]'
 bad 1 'the input is UTF-16; convert it with iconv -f UTF-16 -t UTF-8' '\0377\0376[\0000{\0000'
 
 # Numbers.
-bad 1 'a number is greater than any double' '[{"a": 1e400}]'
-bad 1 'a number is greater than any double' '[{"a": [-1e400]}]'
-bad 1 'a comma or } is missing after a member' '[{"a": 01}]'
-bad 1 'a number has no digit after the point' '[{"a": 1.}]'
-bad 1 'a number has no digit in the exponent' '[{"a": 1e}]'
+broken 1 'a number is greater than any double' '[{"a": 1e400}]'
+broken 1 'a number is greater than any double' '[{"a": [-1e400]}]'
+broken 1 'a comma or } is missing after a member' '[{"a": 01}]'
+broken 1 'a number has no digit after the point' '[{"a": 1.}]'
+broken 1 'a number has no digit in the exponent' '[{"a": 1e}]'
 for number in .5 - +1 NaN Infinity; do
-    bad 1 "$no_value" "[{\"a\": $number}]"
+    broken 1 "$no_value" "[{\"a\": $number}]"
 done
 good '{"a":9223372036854775807}
 {"a":-9223372036854775808}' '{"a": 9223372036854775807}\n{"a": -9223372036854775808}\n'
@@ -73,26 +81,26 @@ expect 0 '{"a":"18446744073709551616"}
 
 # Structure.
 bad 1 'the member "a" is there twice' '[{"a": 1, "a": 2}]'
-bad 2 'the input ends inside of record 2' '[{"a": 1},\n{"a": 2'
-bad 1 'the input ends inside of record 1' '[{"a": "xy'
-bad 1 'the input ends inside of the list, after record 1' '[{"a": 1}'
-bad 1 "$no_value" '[{"a": 1},]'
-bad 1 'a comma or ] is missing after an element' '[{"a": 1} {"a": 2}]'
-bad 1 "a colon is missing after a member's name" '[{"a" 1}]'
-bad 1 "a member's name in quotes is missing" "[{'a': 1}]"
-bad 2 'something follows the list' '[{"a": 1}]\n[{"a": 2}]'
+broken 2 'the input ends inside of record 2' '[{"a": 1},\n{"a": 2'
+broken 1 'the input ends inside of record 1' '[{"a": "xy'
+broken 1 'the input ends inside of the list, after record 1' '[{"a": 1}'
+broken 1 "$no_value" '[{"a": 1},]'
+broken 1 'a comma or ] is missing after an element' '[{"a": 1} {"a": 2}]'
+broken 1 "a colon is missing after a member's name" '[{"a" 1}]'
+broken 1 "a member's name in quotes is missing" "[{'a': 1}]"
+broken 2 'something follows the list' '[{"a": 1}]\n[{"a": 2}]'
 bad 1 'the record is a number, not an object' '[1]'
 bad 2 'the line ends inside of the record' '{"a": 1}\n{"a":\n{"a": 3}\n'
 deep='lists and objects are nested more than 1000 levels deep'
-bad 1 "$deep" "$(repeat '[' 100000)"
-bad 1 "$deep" "$(repeat '{"a":' 100000)"
-bad 1 "$deep" "[{\"a\": $(repeat '[' 100000)$(repeat ']' 100000)}]"
+broken 1 "$deep" "$(repeat '[' 100000)"
+broken 1 "$deep" "$(repeat '{"a":' 100000)"
+broken 1 "$deep" "[{\"a\": $(repeat '[' 100000)$(repeat ']' 100000)}]"
 good "{\"a\":$(repeat '[' 999)$(repeat ']' 999)}" "{\"a\": $(repeat '[' 999)$(repeat ']' 999)}"
 (
     printf '[{"a": "'
     head -c 17000000 /dev/zero | tr '\0' x
 ) >in
-expect 3 '' 'error: in:1: record 1 is longer than 16777216 bytes (nothing is stored)' -- insert bad.db t in
+expect 3 '' 'error: in:1: record 1 is longer than 16777216 bytes; correct the input (nothing is stored)' -- insert bad.db t in
 for text in '' '  \n ' '[]'; do
     printf '%b' "$text" >in
     "$VORNJSONDB" insert bad.db t in 2>err
@@ -106,8 +114,9 @@ expect 3 '' 'error: in: JSON: no record has a member to make a table from (nothi
 
 # CSV.
 bad 3 'the row has 1 cell, but there are 2 columns' 'a,b\n1,2\n3\n'
+bad 2 'the row has 2 cells, but there is 1 column' 'a\n1,2\n'
 bad 3 'the row has 3 cells, but there are 2 columns' 'a,b\n1,2\n"x\ny",3,4\n'
-bad 2 'the quotes that begin in this row never end' 'a,b\n1,"x\n'
+broken 2 'the quotes that begin in this row never end' 'a,b\n1,"x\n'
 quote='a quote stands inside of a cell that is not in quotes, or a cell goes on after its end quote;'
 quote+=' double the quotes, or use --quote none'
 bad 2 "$quote" 'a,b\n1,x"y\n'
@@ -135,7 +144,7 @@ expect 3 '' 'error: the records have 2001 different members, and a table has at 
 seq -s , -f 'm%g' 2000 >in && seq -s , 2000 >>in
 expect 0 '' '' -- insert good.db wide in --quiet
 expect 0 1 '' -- count good.db wide m2000=2000
-bad 1 'the records have more different members than the 32767 that a table can have columns' \
+broken 1 'the records have more different members than the 32767 that a table can have columns' \
     "[{\"a\": 1$(seq -s '' -f ', "m%g": 1' 40000)}]"
 
 # Names of members.
@@ -157,7 +166,7 @@ case_error='error: bad.db: cannot open table "t": "a" is another member'\''s col
 printf '[{"a": 1, "A": 2}]' >in
 expect 3 '' "$case_error" -- insert bad.db t in
 printf '[{"$x": 1}]' >in
-expect 3 '' 'error: bad.db: cannot open table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; give the member another name (nothing is stored)' \
+expect 3 '' 'error: bad.db: cannot open table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def (nothing is stored)' \
     -- insert bad.db t in
 
 # Bad records are left out and kept where that is asked for.

@@ -33,4 +33,29 @@ expect 5 '' 'error: shop.db: table "product" has no record with the key "9"' -- 
 
 expect 0 3 '' -- count shop.db product
 expect 0 2 '' -- count shop.db product --where '{"id": {"$gte": 1}}'
+
+# Bytes go out and come in as they are, into a new table and into one that is there.
+sqlite3 bytes.db "CREATE TABLE t (id INTEGER PRIMARY KEY, b); INSERT INTO t VALUES (1, x'00ff'), (2, x''), (3, 'x'), (4, 5)"
+"$VORNJSONDB" list bytes.db t --format jsonl >bytes.jsonl
+same 'bytes in JSON' "$(head -n 2 bytes.jsonl)" '{"id":1,"b":{"$base64":true,"encoded":"AP8="}}
+{"id":2,"b":{"$base64":true,"encoded":""}}'
+head -n 2 bytes.jsonl >only.jsonl
+expect 0 '' '2 inserted, 0 replaced, 0 skipped, 0 failed (only.jsonl: JSON Lines)' -- insert only.db t only.jsonl
+expect 0 '' '0 inserted, 4 replaced, 0 skipped, 0 failed (bytes.jsonl: JSON Lines)' -- \
+    insert bytes.db t bytes.jsonl --upsert
+values='SELECT id, quote(b) FROM t'
+same 'bytes come back' "$(sqlite3 bytes.db "$values"; sqlite3 only.db "$values")" "1|X'00FF'
+2|X''
+3|'x'
+4|5
+1|X'00FF'
+2|X''"
+echo '{"id": 5, "b": {"$base64": true, "encoded": "A"}}' >odd.json
+expect 3 '' 'error: odd.json:1: cannot load record 1 into table "t": member "b": its "encoded" is no base64; correct the record where it comes from (nothing is stored)' \
+    -- insert bytes.db t odd.json
+echo '{"id": 5, "b": {"$base64": true, "encoded": "AA==", "x": 1}}' >odd.json
+"$VORNJSONDB" insert bytes.db t odd.json 2>err
+same 'exit of bytes with something beside them' $? 3
+sqlite3 bytes.db "CREATE VIRTUAL TABLE words USING fts5(title, body); INSERT INTO words VALUES ('a', 'b')"
+expect 0 '[{"title":"a","body":"b"}]' '' -- list bytes.db words
 finish

@@ -11,6 +11,8 @@ expect 0 'CREATE TABLE "product" ("id" INTEGER PRIMARY KEY, "name" TEXT NOT NULL
     '' -- schema shop.db product
 expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
     index shop.db product name
+expect 0 '' 'there already: CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
+    index shop.db product name
 expect 0 '[{"index":"product_name","unique":false,"members":"name"}]' '' -- \
     index shop.db product --json
 expect 0 'SELECT "product"."id" FROM "product" WHERE "product"."price" IS ?
@@ -48,6 +50,9 @@ all="SELECT rowid, typeof(a), hex(a), quote(a), typeof(b), hex(b), b FROM odd"
 same 'odd values' "$(sqlite3 other.db "$all")" "$(sqlite3 shop.db "$all")"
 same 'indexes' "$(sqlite3 other.db .schema\ product)" "$(sqlite3 shop.db .schema\ product)"
 
+"$VORNJSONDB" init shop.db single a:int --quiet && "$VORNJSONDB" insert shop.db single - --quiet <<<'{"a": 1}'
+"$VORNJSONDB" dump shop.db single >single.dump
+expect 0 '' 'loaded 1 row into table "single"' -- load other.db single.dump
 head -n 2 dump >cut
 expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
 sed 's/,1\.0\]/,2.0]/' dump >changed

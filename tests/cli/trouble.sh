@@ -34,6 +34,20 @@ same 'exit without a temporary folder' $? 7
 same 'no temporary folder' "$(cat err)" \
     'error: standard input: cannot copy it to read it twice: No such file or directory; set TMPDIR to a folder with space (nothing is stored)'
 
+# --errors empties no file that the call needs.
+echo '[{"id": 1}]' >one.json
+ln -s one.json link.json
+echo '{"t": {"key": "id", "member": {"id": {"cpptype": "int"}}}}' >t.def
+cp all.db whole.db
+cksum whole.db one.json t.def >sums
+for file in whole.db one.json ./link.json t.def; do
+    expect 2 '' "error: --errors: $file is read or written by this call itself; name another file (nothing is stored)" \
+        -- insert whole.db t one.json --def t.def --errors "$file"
+done
+"$VORNJSONDB" insert whole.db t - --errors one.json <one.json 2>err
+same 'exit with --errors into standard input' $? 2
+same 'all files are what they were' "$(cksum whole.db one.json t.def)" "$(cat sums)"
+
 # Permissions, which count for the superuser only without these two rights.
 restricted=$VORNJSONDB
 if [[ $(id -u) -eq 0 ]]; then
@@ -139,6 +153,26 @@ with open('feed', 'w') as feed:
 END
 same 'ended by the signal' \
     "$(python3 interrupt.py "$VORNJSONDB" insert all.db t feed --format jsonl)" -2
+
+# A file that is new to one call may hold what another has stored since: the second waits for its input
+# until then. It neither removes the file nor stores into a table that has other types.
+mkfifo slow
+"$VORNJSONDB" insert both.db t slow --key id 2>err &
+pid=$!
+exec 3>slow
+until [[ -e both.db ]]; do :; done
+expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert both.db t lines --key id
+echo '{"id": 1, "text": 5}' >&3
+exec 3>&-
+wait "$pid"
+same 'exit of the second' $? 4
+same 'the second' "$(cat err)" \
+    'error: both.db: another program has just made the table "t"; try again, into that table (nothing is stored)'
+expect 0 2000 '' -- count both.db t
+echo '[{"id": 1}, {"id": null}' >broken.json
+expect 3 '' 'error: broken.json:1: the input ends inside of the list, after record 2; correct the input (nothing is stored)' \
+    -- insert fresh.db t broken.json
+same 'no file is left' "$(ls fresh.db 2>/dev/null)" ''
 
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go

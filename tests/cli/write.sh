@@ -5,11 +5,38 @@ make_shop
 
 expect 4 '' 'error: shop.db: there is a table "product" already; extend it with vornjsondb sync' -- \
     init shop.db product id:int
-expect 2 '' 'error: there is no member "idd"; did you mean "id"?' -- init shop.db b id:int --key idd
+expect 2 '' 'error: --key: there is no member "idd"; did you mean "id"?' -- init shop.db b id:int --key idd
+expect 2 '' 'error: --key: there is no member "x"; add it as member:type' -- init shop.db b id:int --key x
+expect 2 '' 'error: the member "id" is there twice; name it once' -- init shop.db b id:int id:string
+expect 2 '' 'error: --default: "id" is not of the form member=value' -- init shop.db b id:int --default id
+expect 2 '' 'error: --default id=x: Line 1, Column 1: Syntax error: value, object or array expected.; it must be JSON' \
+    -- init shop.db b id:int --default id=x
 expect 0 '' 'updated 1 record' -- upsert shop.db product id=2 name=cup
 expect 0 '{"id":2,"name":"cup","price":0.1}' '' -- get shop.db product 2
-expect 3 '' 'error: shop.db: cannot save a record in table "product": NOT NULL constraint failed: product.name' \
+expect 3 '' 'error: shop.db: cannot save a record in table "product": NOT NULL constraint failed: product.name; vornjsondb schema shows what the table demands' \
     -- upsert shop.db product id=7
+
+# Keys that SQLite does not keep apart, and other members that are unique.
+sqlite3 shop.db 'CREATE TABLE heap (id INTEGER, code TEXT UNIQUE); INSERT INTO heap VALUES (1, 5)'
+echo '[{"id": 2, "code": "5"}]' >heap.json
+for mode in --skip --replace; do
+    expect 3 '' 'error: shop.db: the table can hold several rows with one key; make it so by vornjsondb index shop.db heap id --unique (nothing is stored)' \
+        -- insert shop.db heap heap.json --key id $mode
+done
+"$VORNJSONDB" index shop.db heap id --unique --quiet
+for mode in --skip --upsert; do
+    expect 4 '' 'error: heap.json:1: cannot load record 1 into table "heap": UNIQUE constraint failed: heap.code (code = "5"); correct it, or leave it out by --errors FILE (nothing is stored)' \
+        -- insert shop.db heap heap.json --key id $mode
+done
+
+# A key that is given twice is one record, and a default that does not fit is no default.
+expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
+expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x
+expect 0 '' 'deleted 1 record' -- delete shop.db product 70 70
+expect 3 '' 'error: default of table "b": member "id" cannot be 1.5: expected is a whole number from -2147483648 to 2147483647; give one that the type can hold' \
+    -- init shop.db b id:int --default id=1.5
+expect 3 '' 'error: default of table "b": member "id" cannot be 1.5: expected is a whole number from -9223372036854775808 to 9223372036854775807; give one that the type can hold (nothing is stored)' \
+    -- insert shop.db b heap.json --default id=1.5
 
 expect 0 '{"updated":2}' '' -- update shop.db product 1 2 price=9.75 --json
 expect 5 '' 'error: shop.db: table "product" has no record with the key "99"; nothing was changed' \

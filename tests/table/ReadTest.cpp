@@ -143,6 +143,8 @@ TEST_F(ReadTest, CallbackMayReadButNotWrite) {
         EXPECT_EQ("misuse: cannot remove records from" + strReading,
                   Text(m_Table.Remove(Query().Where("id", 1))));
         EXPECT_EQ("misuse: cannot remove all records from" + strReading, Text(m_Table.RemoveAll()));
+        EXPECT_EQ("misuse: cannot open anew" + strReading,
+                  Text(m_Table.Open(m_pDb, "task", Json::Value())));
         return true;
     };
     EXPECT_EQ("ok", Text(m_Table.ForEach(Query(), [&](const Json::Value&) { return fnInside(); })));

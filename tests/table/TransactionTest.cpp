@@ -54,8 +54,10 @@ TEST_F(TransactionTest, TransactionThatAFailureHasUndoneSaysSo) {
     EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
     Run("ROLLBACK");
     const Status Outcome = All.Commit();
-    EXPECT_EQ("misuse: cannot commit a transaction: an earlier failure has undone it",
-              Text(Outcome));
+    EXPECT_EQ(
+        "misuse: cannot commit a transaction: a failure has undone it, or a "
+        "statement has ended it",
+        Text(Outcome));
     EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
     EXPECT_FALSE(All.IsOpen());
     EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
@@ -102,8 +104,10 @@ TEST_F(TransactionTest, FullDiskUndoesTheCallersTransactionAndIsTold) {
         "transaction is undone",
         Text(m_Table.Update(Query().Where("id", 1), jRecord)));
     const Status Outcome = All.Commit();
-    EXPECT_EQ("misuse: cannot commit a transaction: an earlier failure has undone it",
-              Text(Outcome));
+    EXPECT_EQ(
+        "misuse: cannot commit a transaction: a failure has undone it, or a "
+        "statement has ended it",
+        Text(Outcome));
     EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
     EXPECT_EQ("disk-full: cannot save a record in table \"task\": database or disk is full",
               Text(m_Table.Create(jRecord)));

@@ -162,8 +162,8 @@ TEST_F(Insert, DuplicatesAreSkippedReplacedOrChanged) {
     EXPECT_EQ(Rows(), "1|'d'|'r';2|'u'|'z';3|'d'|'n';4|'d'|'r'");
     // Skipping is for keys alone.
     EXPECT_EQ(Run("[{\"id\":5,\"a\":\"x\"}]", {"--skip"}),
-              "3 F:1: cannot load record 1 into table \"t\": NOT NULL constraint failed: t.b "
-              "(nothing is stored)");
+              "3 F:1: cannot load record 1 into table \"t\": NOT NULL constraint failed: t.b; "
+              "vornjsondb schema shows what the table demands (nothing is stored)");
 }
 
 TEST_F(Insert, UnknownMembersAreBadOrAdded) {

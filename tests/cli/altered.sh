@@ -1,0 +1,91 @@
+#!/usr/bin/env bash
+# Tables that another program altered since their definition was kept, or that need care.
+source "$(dirname "$0")/Check.sh"
+make_shop
+
+# The columns count, with what is kept of them.
+sqlite3 shop.db 'ALTER TABLE product RENAME COLUMN name TO label; ALTER TABLE product DROP COLUMN price;
+    ALTER TABLE product ADD COLUMN size INTEGER DEFAULT 5'
+expect 0 '{"id":1,"label":"tea, \"green\"","on":true,"tags":["a","b"],"size":5}' '' -- get shop.db product 1
+expect 0 '' 'updated 1 record' -- upsert shop.db product id=1 size=6
+echo '[{"id": 8, "label": "new", "size": 7}]' >new.json
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (new.json: JSON)' -- insert shop.db product new.json
+expect 0 1 '' -- count shop.db product size=7
+# lint and sync still compare it with what is kept; sync with the present one keeps that.
+"$VORNJSONDB" lint shop.db --format tsv >found
+same 'lint' "$(cut -f 3,4 found)" 'code	path
+missing-column	/product/member/name
+missing-column	/product/member/price
+extra-column	/product/member
+extra-column	/product/member'
+"$VORNJSONDB" schema shop.db product --json >present.def
+expect 0 '' 'nothing to do' -- sync shop.db product --def present.def
+expect 0 '' 'no findings' -- lint shop.db
+# Another table of the same name, without the member of the key.
+sqlite3 shop.db 'DROP TABLE product; CREATE TABLE product (code TEXT PRIMARY KEY, x); INSERT INTO product VALUES (7, 8)'
+expect 0 '[{"code":"7","x":8}]' '' -- list shop.db product
+expect 0 '{"code":"7","x":8}' '' -- get shop.db product 7
+
+# To SQLite a table is the same in any letter case.
+make_shop 2>/dev/null
+rm shop.db
+make_shop
+expect 0 '{"id":1,"name":"tea, \"green\"","on":true,"price":5.0,"tags":["a","b"]}' '' -- get shop.db PRODUCT 1
+echo '{"id": 9, "name": "x", "more": [1]}' >more.json
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (more.json: JSON)' -- \
+    insert shop.db Product more.json --add-members
+expect 0 '[{"more":[1]}]' '' -- list shop.db product id=9 --members more
+same 'one definition is kept' "$(sqlite3 shop.db 'SELECT count(*) FROM vornjsondb_definition')" 1
+"$VORNJSONDB" dump shop.db Product >dump
+"$VORNJSONDB" dump shop.db product | cmp - dump
+same 'dump in another letter case' $? 0
+
+# --dry-run shows what makes the table, or extends the one that is there.
+echo '[{"id": 9, "name": "x", "size": 5}]' >size.json
+"$VORNJSONDB" insert shop.db product size.json --add-members --dry-run >out
+same 'exit of --dry-run' $? 0
+same 'what would be added' "$(tail -n 1 out)" 'ALTER TABLE "product" ADD COLUMN "size" INTEGER;'
+"$VORNJSONDB" insert shop.db product more.json --add-members --dry-run >out
+same 'what needs nothing' "$(tail -n 1 out)" '}'
+"$VORNJSONDB" insert shop.db product size.json --add-members --dry-run --json >out
+same 'what would be added, in JSON' "$(python3 -c 'import json; print(json.load(open("out"))["alter"])')" \
+    "['ALTER TABLE \"product\" ADD COLUMN \"size\" INTEGER']"
+expect 2 '' 'error: table "product" has no member "size"; see vornjsondb schema' -- \
+    count shop.db product size=5
+
+# One table that cannot be opened does not hide the others from lint.
+sqlite3 shop.db 'CREATE TABLE odd ("$x"); CREATE TABLE zoo (a INTEGER)'
+echo '{"zoo": {"member": {"a": {"cpptype": "int"}, "b": {"cpptype": "int"}}}}' >zoo.def
+sqlite3 shop.db "INSERT INTO vornjsondb_definition VALUES ('zoo', readfile('zoo.def'))"
+"$VORNJSONDB" lint shop.db --format tsv >found
+same 'exit of lint' $? 3
+same 'lint goes on' "$(cut -f 1,3,4 found)" 'table	code	path
+odd	bad-name	/odd/member/$x
+zoo	missing-column	/zoo/member/b'
+
+# A variable that is not set makes neither a database that is gone afterwards nor a table without a name.
+for database in '' :memory:; do
+    for words in 'insert more.json' 'list'; do
+        expect 2 '' "error: \"$database\" names no file; name the file of a database" -- \
+            "${words% *}" "$database" t ${words#"${words% *}"}
+    done
+done
+expect 2 '' 'error: the name of the new table is empty; give it one (nothing is stored)' -- \
+    insert shop.db '' more.json
+expect 2 '' 'error: the name of the new table is empty; give it one' -- init shop.db '' a:int
+
+# Who holds a database that nobody else can read is what doctor is for.
+mkfifo go
+(
+    echo 'BEGIN EXCLUSIVE; SELECT 1;'
+    cat go
+) | sqlite3 shop.db >held &
+until [[ -s held ]]; do :; done
+"$VORNJSONDB" doctor shop.db --wait 10 >out 2>err
+same 'exit of doctor' $? 6
+same 'who holds it' "$(sed 's/[0-9]\+ (/N (/' out | grep writes)" 'lock   process N (sqlite3) writes, and nobody else may read'
+same 'doctor waited' "$(cat err)" \
+    'error: shop.db: database is locked (waited 10 ms); try again, or wait longer with --wait MS'
+: >go
+wait
+finish
