@@ -50,7 +50,7 @@ std::string DefaultClause(const Member& Declared) {
     char szReal[32];
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            return Concat({" DEFAULT ", std::to_string(Value.nValue)});
+            return Concat({" DEFAULT ", DigitsOf(Value.nValue)});
         case BoundValue::Kind::kReal:
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
             return Concat({" DEFAULT ", szReal});

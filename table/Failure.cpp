@@ -81,7 +81,7 @@ Retry RetryOf(int nSqlite, bool blInTransaction) {
 std::string Doing::Text() const {
     std::string strText = std::string("cannot ") + szDo;
     if (nRecord != 0) {
-        strText.replace(strText.find('#'), 1, std::to_string(nRecord));
+        strText.replace(strText.find('#'), 1, DigitsOf(nRecord));
     }
     if (pstrTable != nullptr) {
         Append(strText, {" table ", Quoted(*pstrTable)});
