@@ -79,7 +79,7 @@ Retry RetryOf(int nSqlite, bool blInTransaction) {
 }  // namespace
 
 std::string Doing::Text() const {
-    std::string strText = std::string("cannot ") + szDo;
+    std::string strText = Concat({"cannot ", szDo});
     if (nRecord != 0) {
         strText.replace(strText.find('#'), 1, DigitsOf(nRecord));
     }

@@ -99,7 +99,7 @@ bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, Ope
     for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
         Operand Each;
         if (!Reader.Read(Where, jList[i], Each, Why)) {
-            Why.strStep = "/" + DigitsOf(i);
+            Why.strStep = Concat({"/", DigitsOf(i)});
             return false;
         }
         Add(Each, blOneByOne, Out.Kinds[static_cast<size_t>(Each.eKind)]);
