@@ -28,7 +28,7 @@ bool Patience::Wait() {
 }
 
 std::string WaitedText(int nWaitMs) {
-    return Concat({" (waited ", std::to_string(nWaitMs), " ms)"});
+    return Concat({" (waited ", DigitsOf(nWaitMs), " ms)"});
 }
 
 Status InTransaction(sqlite3* pDb, const Status& Outcome) {

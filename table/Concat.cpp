@@ -1,5 +1,7 @@
 #include "Concat.h"
 
+#include "../src/base/Digits.h"
+
 namespace vornjsondb {
 
 std::string Concat(std::initializer_list<std::string_view> listParts) {
@@ -20,6 +22,12 @@ void Append(std::string& strTo, std::initializer_list<std::string_view> listPart
     for (const std::string_view strPart : listParts) {
         strTo.append(strPart);
     }
+}
+
+std::string DigitsOf(std::int64_t nValue) {
+    std::string strDigits;
+    AppendDigits(Json::Int64{nValue}, strDigits);
+    return strDigits;
 }
 
 }  // namespace vornjsondb

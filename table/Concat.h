@@ -4,6 +4,7 @@
 #ifndef VORN_TABLE_CONCAT_H
 #define VORN_TABLE_CONCAT_H
 
+#include <cstdint>
 #include <initializer_list>
 #include <string>
 #include <string_view>
@@ -12,6 +13,9 @@ namespace vornjsondb {
 
 std::string Concat(std::initializer_list<std::string_view> listParts);
 void Append(std::string& strTo, std::initializer_list<std::string_view> listParts);
+
+// The number in decimal digits; one function for numbers of all sizes.
+std::string DigitsOf(std::int64_t nValue);
 
 }  // namespace vornjsondb
 

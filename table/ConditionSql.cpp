@@ -4,6 +4,8 @@
 #include <limits>
 #include <utility>
 
+#include "Concat.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -129,7 +131,7 @@ class ConditionWriter {
     void WriteLeaf(const Node& Leaf) {
         Problem Why;
         if (!m_Leaf.Write(Leaf, Why)) {
-            Report(m_vecFindings, Why.eCode, PathOf(Leaf) + Why.strStep, Why.strMessage);
+            Report(m_vecFindings, Why.eCode, Concat({PathOf(Leaf), Why.strStep}), Why.strMessage);
         } else if (m_blChange && Leaf.eOp == VORN_JSON_DB::Op::kNotIn && Leaf.jOperand.empty()) {
             Report(m_vecFindings, FindingCode::kEmptyNin, PathOf(Leaf),
                    "\"$nin\" of no values is true for every record");

@@ -50,7 +50,7 @@ std::string DefaultClause(const Member& Declared) {
     char szReal[32];
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            return Concat({" DEFAULT ", std::to_string(Value.nValue)});
+            return Concat({" DEFAULT ", DigitsOf(Value.nValue)});
         case BoundValue::Kind::kReal:
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
             return Concat({" DEFAULT ", szReal});
@@ -72,9 +72,10 @@ std::string CreateTableSql(const Members& Of) {
     for (const Member& Declared : Of.All()) {
         const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
-        strSql += blRowid ? Concat({szBefore, Declared.strQuoted, " INTEGER PRIMARY KEY"})
-                          : szBefore + ColumnClause(Declared, Declared.blNotNull || Declared.blKey);
-        strSql += Declared.blUnique && !blRowid ? " UNIQUE" : "";
+        Append(strSql, {szBefore,
+                        blRowid ? Concat({Declared.strQuoted, " INTEGER PRIMARY KEY"})
+                                : ColumnClause(Declared, Declared.blNotNull || Declared.blKey),
+                        Declared.blUnique && !blRowid ? " UNIQUE" : ""});
         szBefore = ", ";
     }
     if (!Of.Key().empty() && !Of.HasRowidKey()) {
@@ -86,7 +87,8 @@ std::string CreateTableSql(const Members& Of) {
         }
         strSql += ")";
     }
-    return strSql + ")";
+    strSql += ")";
+    return strSql;
 }
 
 }  // namespace vornjsondb

@@ -9,8 +9,8 @@
 #include "../src/schema/TableDefinition.h"
 #include "Abilities.h"
 #include "BareNames.h"
-#include "FindingCodes.h"
 #include "Fit.h"
+#include "LintCodes.h"
 #include "Members.h"
 #include "Nearest.h"
 #include "OldKeys.h"
@@ -31,7 +31,7 @@ void LintKeys(const Json::Value& jEntry, const char* const (&aszKeys)[nKeys],
     for (const std::string& strKey : jEntry.getMemberNames()) {
         const std::string strSuggestion = Suggestion(strKey, vecKnown);
         if (std::count(vecKnown.begin(), vecKnown.end(), strKey) == 0 && !strSuggestion.empty()) {
-            Report(vecFindings, FindingCode::kMisspeltKey, Below(strPath, strKey),
+            Report(vecFindings, LintCode::kMisspeltKey, Below(strPath, strKey),
                    ShownText(strKey) + " is no key of a definition" + strSuggestion);
         }
     }
@@ -68,7 +68,7 @@ class DefinitionLint {
     }
 
     void AddOldName(const std::string& strPath, const std::string& strWhat) {
-        Report(m_vecFindings, FindingCode::kOldName, strPath,
+        Report(m_vecFindings, LintCode::kOldName, strPath,
                strWhat +
                    ": a VornJsonDbApi writes names as they stand, and SQL reads another "
                    "thing");
@@ -95,7 +95,7 @@ class DefinitionLint {
         for (const char* szFlag : {"notNull", "nullSeen", "unique"}) {
             const Json::Value* pjFlag = FindMember(jEntry, szFlag);
             if (pjFlag != nullptr && !pjFlag->isBool()) {
-                Report(m_vecFindings, FindingCode::kBadFlag, Below(strPath, szFlag),
+                Report(m_vecFindings, LintCode::kBadFlag, Below(strPath, szFlag),
                        Quoted(szFlag) + " is " + Shown(*pjFlag) + ", not true or false");
             }
         }
@@ -106,14 +106,14 @@ class DefinitionLint {
             AddOldName(strPath, "member " + ShownText(strName));
         }
         if (IsOldKey(strName)) {
-            Report(m_vecFindings, FindingCode::kHidesQueryKey, strPath,
+            Report(m_vecFindings, LintCode::kHidesQueryKey, strPath,
                    "member " + Quoted(strName) + ": a VornJsonDbApi takes this key of a query " +
                        "for more than a condition");
         }
         // As the table's key of one whole number the column is the rowid itself.
         const bool blRowid = m_Of.HasRowidKey() && m_Of.Key()[0] == m_Of.Find(strName);
         if (sqlite3_stricmp(strName.c_str(), "rowid") == 0 && !blRowid) {
-            Report(m_vecFindings, FindingCode::kRowidName, strPath,
+            Report(m_vecFindings, LintCode::kRowidName, strPath,
                    "member " + Quoted(strName) + " hides the row number by which a VornJsonDbApi " +
                        "reads back what it has stored");
         }
@@ -122,7 +122,7 @@ class DefinitionLint {
     void LintType(const std::string& strName, const MemberType& Type, const std::string& strPath) {
         const std::string strLacking = Lacking(OldAbilities(Type));
         if (!strLacking.empty()) {
-            Report(m_vecFindings, FindingCode::kOldType, Below(strPath, "cpptype"),
+            Report(m_vecFindings, LintCode::kOldType, Below(strPath, "cpptype"),
                    "member " + Quoted(strName) + " of type " + Quoted(Type.szName) +
                        ": a VornJsonDbApi cannot " + strLacking);
         }
@@ -134,11 +134,11 @@ class DefinitionLint {
         std::string strJson;
         BoundValue Value;
         if (jDefault.isNull()) {
-            Report(m_vecFindings, FindingCode::kNullDefault, strPath,
+            Report(m_vecFindings, LintCode::kNullDefault, strPath,
                    "member " + Quoted(strName) + ": a VornJsonDbApi refuses the records that it " +
                        "gives this default");
         } else if (FitJson(Type, jDefault, false, Codec, strJson, Value) != Misfit::kNone) {
-            Report(m_vecFindings, FindingCode::kBadDefault, strPath,
+            Report(m_vecFindings, LintCode::kBadDefault, strPath,
                    "member " + Quoted(strName) + " cannot be " + Shown(jDefault) +
                        ": expected is " + Expected(Type));
         }
@@ -147,7 +147,7 @@ class DefinitionLint {
     void LintLast() {
         const std::string strLast = m_jMembers.getMemberNames().back();
         if (FindMember(m_jMembers[strLast], "cppDefaultValue") == nullptr) {
-            Report(m_vecFindings, FindingCode::kNoLastDefault, PathOf(strLast),
+            Report(m_vecFindings, LintCode::kNoLastDefault, PathOf(strLast),
                    "member " + ShownText(strLast) + " comes last: a VornJsonDbApi refuses every " +
                        "record without it");
         }

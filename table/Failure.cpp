@@ -79,9 +79,9 @@ Retry RetryOf(int nSqlite, bool blInTransaction) {
 }  // namespace
 
 std::string Doing::Text() const {
-    std::string strText = std::string("cannot ") + szDo;
+    std::string strText = Concat({"cannot ", szDo});
     if (nRecord != 0) {
-        strText.replace(strText.find('#'), 1, std::to_string(nRecord));
+        strText.replace(strText.find('#'), 1, DigitsOf(nRecord));
     }
     if (pstrTable != nullptr) {
         Append(strText, {" table ", Quoted(*pstrTable)});

@@ -1,5 +1,6 @@
 #include "FindingCodes.h"
 
+#include <cstring>
 #include <utility>
 
 #include "Concat.h"
@@ -8,18 +9,8 @@ namespace vornjsondb {
 
 namespace {
 
-struct FindingRow {
-    const char* szCode;
-    Severity eSeverity;
-    const char* szRemedy;
-};
-
-constexpr FindingRow kFindingRows[] = {
-#define VORN_FINDING_ROW(kConstant, szCode, kSeverity, szRemedy) \
-    {szCode, Severity::kSeverity, szRemedy},
-    VORN_FINDING_CODES(VORN_FINDING_ROW)
-#undef VORN_FINDING_ROW
-};
+constexpr char kFindingTexts[] = VORN_FINDING_CODES(VORN_FINDING_TEXTS);
+constexpr std::uint8_t kFindingSeverities[] = {VORN_FINDING_CODES(VORN_FINDING_SEVERITY)};
 
 struct RefusalRow {
     const char* szWords;
@@ -50,19 +41,29 @@ std::string_view Cut(std::string_view strText) {
 }  // namespace
 
 Finding RowOf(FindingCode eCode) {
-    const FindingRow& Row = kFindingRows[static_cast<size_t>(eCode)];
-    return Finding{Row.eSeverity, Row.szCode, "", "", Row.szRemedy};
+    return RowAt(static_cast<size_t>(eCode), kFindingTexts, kFindingSeverities);
 }
 
-void Report(FindingList& vecFindings, FindingCode eCode, std::string strPath,
-            std::string strMessage) {
-    if (vecFindings.size() >= kMostFindings) {
-        return;
+Finding RowAt(size_t nRow, const char* szTexts, const std::uint8_t* pSeverities) {
+    const auto Next = [](const char* szText) { return szText + std::strlen(szText) + 1; };
+    for (size_t i = 0; i < nRow; ++i) {
+        szTexts = Next(Next(szTexts));
     }
-    Finding Found = RowOf(eCode);
-    Found.strPath = std::move(strPath);
-    Found.strMessage = std::move(strMessage);
-    vecFindings.push_back(std::move(Found));
+    return Finding{static_cast<Severity>(pSeverities[nRow]), szTexts, "", "", Next(szTexts)};
+}
+
+void Report(FindingList& vecFindings, FindingCode eCode, std::string_view strPath,
+            std::string_view strMessage) {
+    Report(vecFindings, RowOf(eCode), strPath, strMessage);
+}
+
+void Report(FindingList& vecFindings, Finding Row, std::string_view strPath,
+            std::string_view strMessage) {
+    if (vecFindings.size() < kMostFindings) {
+        Row.strPath = strPath;
+        Row.strMessage = strMessage;
+        vecFindings.push_back(std::move(Row));
+    }
 }
 
 void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings) {
@@ -95,9 +96,9 @@ std::string Below(const std::string& strPath, std::string_view strStep) {
 std::string Shown(const Json::Value& jValue) {
     switch (jValue.type()) {
         case Json::arrayValue:
-            return Concat({"a list of ", std::to_string(jValue.size())});
+            return Concat({"a list of ", DigitsOf(jValue.size())});
         case Json::objectValue:
-            return Concat({"an object of ", std::to_string(jValue.size())});
+            return Concat({"an object of ", DigitsOf(jValue.size())});
         case Json::stringValue:
             return ShownText(BytesOf(jValue));
         case Json::realValue: {

@@ -1,8 +1,10 @@
-// Every finding's code, severity and remedy, in one list. docs/findings.md explains each.
+// The code, severity and remedy of each finding that an operation can have, in one list;
+// LintCodes.h has those that only looking has. docs/findings.md explains each.
 
 #ifndef VORN_TABLE_FINDING_CODES_H
 #define VORN_TABLE_FINDING_CODES_H
 
+#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -19,39 +21,6 @@
     X(kSameColumn, "same-column", kError, "give one of the two another name")                     \
     X(kUnknownKey, "unknown-key", kError, "name members of the definition in \"key\"")            \
     X(kNoKey, "no-key", kError, "name the key in the definition: {\"key\": \"<member>\"}")        \
-    X(kBadDefault, "bad-default", kError, "give a \"cppDefaultValue\" that the type can hold")    \
-    X(kMisspeltKey, "misspelt-key", kWarning, "correct the key: what is not known is ignored")    \
-    X(kBadFlag, "bad-flag", kWarning, "write true or false: all else counts as false")            \
-    X(kHidesQueryKey, "hides-query-key", kWarning,                                                \
-      "give the member another name, or sort and page by ToOldQuery")                             \
-    X(kOldName, "old-name", kWarning,                                                             \
-      "use letters, digits and underscores, and no word of SQL")                                  \
-    X(kRowidName, "rowid-name", kWarning, "give the member another name")                         \
-    X(kOldType, "old-type", kWarning, "use a type of which AbilitiesOf says that it can do all")  \
-    X(kNoLastDefault, "no-last-default", kWarning,                                                \
-      "give the member a \"cppDefaultValue\", or every record a value for it")                    \
-    X(kNullDefault, "null-default", kWarning, "leave the default out, or give it a value")        \
-    /* definitions against real tables */                                                         \
-    X(kMissingColumn, "missing-column", kError, "call Sync, which adds it")                       \
-    X(kMissingKeyColumn, "missing-key-column", kError,                                            \
-      "correct the key, or copy the rows into a new table")                                       \
-    X(kExtraColumn, "extra-column", kWarning, "describe it in the definition")                    \
-    X(kOtherCase, "other-case", kWarning, "spell the member as the table does")                   \
-    X(kOtherAffinity, "other-affinity", kWarning,                                                 \
-      "declare the member as DefinitionOf does, or copy the rows into a new table")               \
-    X(kNullableColumn, "nullable-column", kWarning,                                               \
-      "give the member a value in every record, or copy the rows into a new table")               \
-    X(kOtherDefault, "other-default", kWarning,                                                   \
-      "declare the default that the column has, or copy the rows into a new table")               \
-    X(kView, "view", kWarning,                                                                    \
-      "open the table that the view reads, or give it INSTEAD OF triggers")                       \
-    X(kWithoutRowid, "without-rowid", kWarning,                                                   \
-      "create the table without WITHOUT ROWID where a VornJsonDbApi writes it")                   \
-    X(kKeyNotUnique, "key-not-unique", kWarning, "call Sync, which adds a unique index")          \
-    X(kMissingUnique, "missing-unique", kWarning, "call Sync, which adds a unique index")         \
-    /* plans */                                                                                   \
-    X(kFullScan, "full-scan", kWarning, "call CreateIndex, where the table is or gets large")     \
-    X(kNotOneStatement, "not-one-statement", kError, "pass the text of one statement")            \
     /* records */                                                                                 \
     X(kNotARecord, "not-a-record", kError, "pass an object with at least one member")             \
     X(kUnknownMember, "unknown-member", kError,                                                   \
@@ -95,34 +64,7 @@
     X(kBadCount, "bad-count", kError, "pass a whole number from 0, or leave it out")              \
     X(kNoCondition, "no-condition", kError, "give a condition; RemoveAll removes all records")    \
     X(kPagedChange, "paged-change", kError, "list what to change, then change it by its key")     \
-    X(kEmptyNin, "empty-nin", kWarning, "make sure that no values means all records")             \
-    /* records for old handles */                                                                 \
-    X(kOldDropsMember, "old-drops-member", kWarning, "correct the name, or leave the member out") \
-    X(kOldCannotWrite, "old-cannot-write", kError, "write the record by a Table")                 \
-    X(kMissingLastMember, "missing-last-member", kError, "give the member a value")               \
-    X(kPercentHalved, "percent-halved", kWarning,                                                 \
-      "write the record by a Table, or set the member by recUpdateByFilter")                      \
-    X(kPercentRefused, "percent-refused", kError,                                                 \
-      "write the record by a Table, or set the member by recUpdateByFilter")                      \
-    X(kNulCut, "nul-cut", kWarning, "encode binary data, in base64 for example")                  \
-    X(kOldReadsOther, "old-reads-other", kWarning, "declare the member as \"long long\"")         \
-    X(kOldJsonChanged, "old-json-changed", kWarning,                                              \
-      "leave NaN out, and store flatter JSON: its reader stops at some depth")                    \
-    /* queries for old handles */                                                                 \
-    X(kOldIgnoresMember, "old-ignores-member", kWarning, "correct the name")                      \
-    X(kOldIgnoresKey, "old-ignores-key", kWarning, "pass both keys or none")                      \
-    X(kOldSelectsAll, "old-selects-all", kNote, "give a condition, unless every record is meant") \
-    X(kOldReadingOnly, "old-reading-only", kNote,                                                 \
-      "leave the key out where recUpdateByFilter or recDelete gets the query")                    \
-    X(kRawSql, "raw-sql", kNote, "let no part of the text come from outside: ToOldQuery does")    \
-    X(kOldRefuses, "old-refuses", kError, "pass a value of the kind that is expected")            \
-    X(kBareText, "bare-text", kError, "pass the number itself, not a text")                       \
-    X(kOldNull, "old-null", kWarning, "ask for NULL by ToOldQuery: {\"<member>\": null}")         \
-    X(kOldOtherKind, "old-other-kind", kWarning, "pass a value of the member's type")             \
-    X(kEmptyList, "empty-list", kError, "leave the call out: no value selects nothing")           \
-    X(kRunTogether, "run-together", kError, "ask for several values by ToOldQuery and $in")       \
-    X(kOldMembership, "old-membership", kWarning, "ask for the whole value by ToOldQuery")        \
-    X(kSortsNothing, "sorts-nothing", kWarning, "sort by ToOldQuery")
+    X(kEmptyNin, "empty-nin", kWarning, "make sure that no values means all records")
 // clang-format on
 
 namespace vornjsondb {
@@ -137,12 +79,21 @@ enum class FindingCode {
 // Its row, for tests and lists; szCode, eSeverity and strRemedy are set.
 Finding RowOf(FindingCode eCode);
 
+// Rows as constants without a pointer, which would cost three times its size where a program is
+// loaded at any address: the severities, and one text in which a NUL ends each code and remedy.
+#define VORN_FINDING_TEXTS(kConstant, szCode, kSeverity, szRemedy) szCode "\0" szRemedy "\0"
+#define VORN_FINDING_SEVERITY(kConstant, szCode, kSeverity, szRemedy) \
+    static_cast<std::uint8_t>(Severity::kSeverity),
+Finding RowAt(size_t nRow, const char* szTexts, const std::uint8_t* pSeverities);
+
 // A list of findings grows no longer: what makes so many comes from no person.
 constexpr size_t kMostFindings = 100;
 
 // Adds one.
-void Report(FindingList& vecFindings, FindingCode eCode, std::string strPath,
-            std::string strMessage);
+void Report(FindingList& vecFindings, FindingCode eCode, std::string_view strPath,
+            std::string_view strMessage);
+void Report(FindingList& vecFindings, Finding Row, std::string_view strPath,
+            std::string_view strMessage);
 
 // Reports a definition that has no members for the table.
 void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings);

@@ -235,7 +235,7 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
 std::string Shown(const BoundValue& Value) {
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            return std::to_string(Value.nValue);
+            return DigitsOf(Value.nValue);
         case BoundValue::Kind::kReal:
             return Shown(Json::Value(Value.dValue));
         case BoundValue::Kind::kText:
@@ -255,8 +255,8 @@ std::string Expected(const MemberType& Type) {
         case BoundKind::kBoolean:
             return "true or false";
         case BoundKind::kInteger:
-            return Concat({"a whole number from ", std::to_string(Of.nLeast), " to ",
-                           std::to_string(Of.nMost)});
+            return Concat(
+                {"a whole number from ", DigitsOf(Of.nLeast), " to ", DigitsOf(Of.nMost)});
         case BoundKind::kReal:
             return "a number";
         case BoundKind::kObject:

@@ -30,9 +30,10 @@ bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
     }
 }
 
-Problem WrongOperand(const Operator& Row, const Json::Value& jOperand) {
-    return {FindingCode::kWrongOperand, Concat({Quoted(Row.szName), " takes ", Expected(Row.eForm),
-                                                ", not ", Shown(jOperand)})};
+bool RefuseOperand(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
+    return Why.Tell(
+        FindingCode::kWrongOperand,
+        Concat({Quoted(Row.szName), " takes ", Expected(Row.eForm), ", not ", Shown(jOperand)}));
 }
 
 }  // namespace
@@ -66,16 +67,13 @@ bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
     m_blPath = !m_Where.strPath.empty();
     const Operator& Row = RowOf(Leaf.eOp);
     if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
-        Why = {FindingCode::kWrongOperator,
-               Concat({Quoted(Row.szName), " is not for member ", Quoted(m_pMember->strName),
-                       " of type ", Quoted(m_pMember->pType->szName)})};
-        return false;
+        return Why.Tell(
+            FindingCode::kWrongOperator,
+            Concat({Quoted(Row.szName), " is not for member ", Quoted(m_pMember->strName),
+                    " of type ", Quoted(m_pMember->pType->szName)}));
     }
-    if (!IsOfForm(Row.eForm, Leaf.jOperand)) {
-        Why = WrongOperand(Row, Leaf.jOperand);
-        return false;
-    }
-    return WriteOperator(Row, Leaf.jOperand, Why);
+    return IsOfForm(Row.eForm, Leaf.jOperand) ? WriteOperator(Row, Leaf.jOperand, Why)
+                                              : RefuseOperand(Row, Leaf.jOperand, Why);
 }
 
 bool LeafSql::WriteOperator(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
@@ -182,12 +180,10 @@ bool LeafSql::ReadOrdered(const Operator& Row, const Json::Value& jValue, Operan
         return m_Reader.Read(m_Where, jValue, Out, Why);
     }
     if (jValue.isNull()) {
-        Why = {FindingCode::kNullOperand,
-               Concat({Quoted(Row.szName), ": nothing is less or greater than null"})};
-    } else {
-        Why = WrongOperand(Row, jValue);
+        return Why.Tell(FindingCode::kNullOperand,
+                        Concat({Quoted(Row.szName), ": nothing is less or greater than null"}));
     }
-    return false;
+    return RefuseOperand(Row, jValue, Why);
 }
 
 bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
@@ -217,13 +213,11 @@ bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Proble
         return false;
     }
     if (Least.eKind != Most.eKind) {
-        Why = WrongOperand(Row, jPair);
-        return false;
+        return RefuseOperand(Row, jPair, Why);
     }
     if (IsLess(jPair[1], jPair[0])) {
-        Why = {FindingCode::kSwappedEnds,
-               Concat({"nothing lies between ", Shown(jPair[0]), " and ", Shown(jPair[1])})};
-        return false;
+        return Why.Tell(FindingCode::kSwappedEnds, Concat({"nothing lies between ", Shown(jPair[0]),
+                                                           " and ", Shown(jPair[1])}));
     }
     OpenJson();
     AddLeft(Least.eKind);

@@ -58,7 +58,7 @@ bool LeafSql::WriteContains(const Json::Value& jElement, Problem& Why) {
         return false;
     }
     // A name that no table of the statement has.
-    const std::string strElement = Quoted(m_Of.Table() + "[]");
+    const std::string strElement = Quoted(Concat({m_Of.Table(), "[]"}));
     Append(m_strSql,
            {"EXISTS (SELECT 1 FROM json_each(", ElementsAt(m_pMember->strColumn, m_Where.strPath),
             ") AS ", strElement, " WHERE "});

@@ -52,8 +52,8 @@ BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
 // With a bare parameter SQLite would prepare the statement again for each pattern.
 bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
     if (const char* szFault = PatternFault(BytesOf(jPattern))) {
-        Why = {FindingCode::kBadPattern, Concat({"pattern ", Shown(jPattern), " ", szFault})};
-        return false;
+        return Why.Tell(FindingCode::kBadPattern,
+                        Concat({"pattern ", Shown(jPattern), " ", szFault}));
     }
     m_strSql += '(';
     AddLeft(ValueKind::kNull);

@@ -1,7 +1,6 @@
-#include <charconv>
 #include <cmath>
-#include <iterator>
 
+#include "../src/base/Digits.h"
 #include "Concat.h"
 #include "Operand.h"
 
@@ -38,11 +37,6 @@ size_t CharacterBytes(std::string_view strText) {
     return blBad ? 0 : nBytes;
 }
 
-void AppendInteger(std::int64_t nValue, std::string& strJson) {
-    char szDigits[24];
-    strJson.append(szDigits, std::to_chars(szDigits, std::end(szDigits), nValue).ptr);
-}
-
 void AppendJsonText(std::string_view strText, std::string& strJson) {
     static constexpr char kHex[] = "0123456789abcdef";
     strJson += '"';
@@ -62,13 +56,13 @@ bool AppendExact(const Operand& Each, std::string& strJson) {
     const BoundValue& Value = Each.Value;
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            AppendInteger(Value.nValue, strJson);
+            AppendDigits(Json::Int64{Value.nValue}, strJson);
             return true;
         case BoundValue::Kind::kReal: {
             const bool blWhole =
                 std::fabs(Value.dValue) <= kTwoTo53 && std::trunc(Value.dValue) == Value.dValue;
             if (blWhole) {
-                AppendInteger(static_cast<std::int64_t>(Value.dValue), strJson);
+                AppendDigits(static_cast<Json::Int64>(Value.dValue), strJson);
             }
             return blWhole;
         }
@@ -99,14 +93,13 @@ void Add(const Operand& Each, bool blOneByOne, ListOperand::OneKind& Into) {
 bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, OperandReader& Reader,
               ListOperand& Out, Problem& Why) {
     if (jList.size() > kMostValues) {
-        Why = {FindingCode::kTooManyValues,
-               Concat({"a list may have 100000 values, not ", std::to_string(jList.size())})};
-        return false;
+        return Why.Tell(FindingCode::kTooManyValues,
+                        Concat({"a list may have 100000 values, not ", DigitsOf(jList.size())}));
     }
     for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
         Operand Each;
         if (!Reader.Read(Where, jList[i], Each, Why)) {
-            Why.strStep = "/" + std::to_string(i);
+            Why.strStep = Concat({"/", DigitsOf(i)});
             return false;
         }
         Add(Each, blOneByOne, Out.Kinds[static_cast<size_t>(Each.eKind)]);

@@ -24,7 +24,7 @@ bool IsSet(const Json::Value& jEntry, const char* szFlag) {
 }
 
 bool IsUsableName(const std::string& strName) {
-    return strName.find('\0') == std::string::npos && strName.compare(0, 1, "$") != 0;
+    return strName.find('\0') == std::string::npos && strName[0] != '$';
 }
 
 }  // namespace
@@ -86,13 +86,10 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
 // One name, or a list of them.
 void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "key");
-    Json::Value jNames = jKey;
-    if (!jKey.isArray()) {
-        jNames = Json::Value(Json::arrayValue);
-        jNames.append(jKey);
-    }
     std::vector<std::string> vecNames;
-    for (const Json::Value& jName : jNames) {
+    const Json::ArrayIndex nNames = jKey.isArray() ? jKey.size() : 1;
+    for (Json::ArrayIndex i = 0; i < nNames; ++i) {
+        const Json::Value& jName = jKey.isArray() ? jKey[i] : jKey;
         const std::string strName = jName.isString() ? jName.asString() : std::string();
         if (Find(strName) == kNone) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,

@@ -5,8 +5,8 @@
 #include "../src/base/JsonMember.h"
 #include "../src/schema/MemberType.h"
 #include "../src/schema/TableDefinition.h"
-#include "FindingCodes.h"
 #include "Fit.h"
+#include "LintCodes.h"
 #include "Nearest.h"
 #include "OldKeys.h"
 
@@ -46,7 +46,7 @@ class OldQueryLint {
             blCondition = LintMember(strName, m_jQuery[strName]) || blCondition;
         }
         if (!blCondition) {
-            Report(m_vecFindings, FindingCode::kOldSelectsAll, "",
+            Report(m_vecFindings, LintCode::kOldSelectsAll, "",
                    "there is no condition: recList lists all records, recUpdateByFilter and " +
                        std::string("recDelete refuse"));
         }
@@ -64,14 +64,14 @@ class OldQueryLint {
         const Json::Value* pjMember = FindMember(m_jMembers, strName);
         if (pjMember == nullptr) {
             if (!IsOldKey(strName)) {
-                Report(m_vecFindings, FindingCode::kOldIgnoresMember, strPath,
+                Report(m_vecFindings, LintCode::kOldIgnoresMember, strPath,
                        "there is no member " + ShownText(strName) + ", and the query goes " +
                            "without it" + Suggestion(strName, m_jMembers.getMemberNames()));
             }
             return false;
         }
         if (IsOldKey(strName)) {
-            Report(m_vecFindings, FindingCode::kHidesQueryKey, strPath,
+            Report(m_vecFindings, LintCode::kHidesQueryKey, strPath,
                    Quoted(strName) + " is a condition and a key of the query at once");
         }
         m_strMember = "member " + ShownText(strName);
@@ -86,24 +86,24 @@ class OldQueryLint {
 
     void LintFilter(const Json::Value& jFilter, const std::string& strPath) {
         if (!jFilter.isString() || BytesOf(jFilter).empty()) {
-            Report(m_vecFindings, FindingCode::kOldRefuses, strPath,
+            Report(m_vecFindings, LintCode::kOldRefuses, strPath,
                    Shown(jFilter) + " is no condition: expected is a text of SQL");
         } else {
-            Report(m_vecFindings, FindingCode::kRawSql, strPath,
+            Report(m_vecFindings, LintCode::kRawSql, strPath,
                    "the text goes into the statement as SQL");
         }
     }
 
     void LintList(const MemberType& Type, const Json::Value& jList, const std::string& strPath) {
         if (jList.empty()) {
-            Report(m_vecFindings, FindingCode::kEmptyList, strPath,
+            Report(m_vecFindings, LintCode::kEmptyList, strPath,
                    m_strMember + ": an empty list makes a statement that SQLite refuses");
         } else if (jList.size() > 1) {
-            Report(m_vecFindings, FindingCode::kRunTogether, strPath,
+            Report(m_vecFindings, LintCode::kRunTogether, strPath,
                    m_strMember + ": " + std::to_string(jList.size()) +
                        " values run together into one");
         } else if (Type.eCondition == ConditionForm::kQuotedJson) {
-            Report(m_vecFindings, FindingCode::kOldMembership, strPath,
+            Report(m_vecFindings, LintCode::kOldMembership, strPath,
                    m_strMember + ": asks for records whose value is the list's element");
         } else {
             const bool blFlag = Type.eCondition == ConditionForm::kBoolean;
@@ -115,22 +115,22 @@ class OldQueryLint {
     void LintValue(const MemberType& Type, ConditionForm eForm, const Json::Value& jValue,
                    const std::string& strPath) {
         if (jValue.isNull()) {
-            Report(m_vecFindings, FindingCode::kOldNull, strPath,
+            Report(m_vecFindings, LintCode::kOldNull, strPath,
                    m_strMember + ": null " + OfNull(eForm));
         } else if (IsRefused(eForm, jValue)) {
             Report(
-                m_vecFindings, FindingCode::kOldRefuses, strPath,
+                m_vecFindings, LintCode::kOldRefuses, strPath,
                 m_strMember + ": " + Shown(jValue) + " cannot be compared with " + Expected(Type));
         } else if (eForm == ConditionForm::kBareText && jValue.isString()) {
-            Report(m_vecFindings, FindingCode::kBareText, strPath,
+            Report(m_vecFindings, LintCode::kBareText, strPath,
                    m_strMember + ": " + Shown(jValue) + " goes into the statement as SQL");
         } else if (!IsOfKind(Type.Bound.eKind, jValue)) {
-            Report(m_vecFindings, FindingCode::kOldOtherKind, strPath,
+            Report(m_vecFindings, LintCode::kOldOtherKind, strPath,
                    m_strMember + ": " + Shown(jValue) + " is converted: expected is " +
                        Expected(Type));
         } else if (eForm == ConditionForm::kQuotedText &&
                    BytesOf(jValue).find('\0') != std::string_view::npos) {
-            Report(m_vecFindings, FindingCode::kNulCut, strPath,
+            Report(m_vecFindings, LintCode::kNulCut, strPath,
                    m_strMember + ": compared is the text before its NUL byte");
         }
     }
@@ -161,10 +161,10 @@ class OldQueryLint {
         const Json::Value* pjSort = FindMember(m_jQuery, kOldSort);
         if (pjSort != nullptr && pjSort->isString()) {
             Report(
-                m_vecFindings, FindingCode::kSortsNothing, Below("", kOldSort),
+                m_vecFindings, LintCode::kSortsNothing, Below("", kOldSort),
                 Shown(*pjSort) + " is compared as a constant: the order stays that of the table");
         } else if (pjSort != nullptr) {
-            Report(m_vecFindings, FindingCode::kOldRefuses, Below("", kOldSort),
+            Report(m_vecFindings, LintCode::kOldRefuses, Below("", kOldSort),
                    Shown(*pjSort) + " is no member's name");
         }
         LintPair(kOldDirection, kOldSort);
@@ -177,7 +177,7 @@ class OldQueryLint {
 
     void LintPair(const char* szKey, const char* szNeeded) {
         if (FindMember(m_jQuery, szKey) != nullptr && FindMember(m_jQuery, szNeeded) == nullptr) {
-            Report(m_vecFindings, FindingCode::kOldIgnoresKey, Below("", szKey),
+            Report(m_vecFindings, LintCode::kOldIgnoresKey, Below("", szKey),
                    Quoted(szKey) + " counts only beside " + Quoted(szNeeded));
         }
     }
@@ -191,7 +191,7 @@ class OldQueryLint {
             Report(m_vecFindings, FindingCode::kBadCount, Below("", szKey),
                    Quoted(szKey) + " is " + Shown(*pjCount) + ", no whole number");
         } else {
-            Report(m_vecFindings, FindingCode::kOldReadingOnly, Below("", szKey),
+            Report(m_vecFindings, LintCode::kOldReadingOnly, Below("", szKey),
                    Quoted(szKey) + " counts for recList and recGetOne alone");
         }
     }

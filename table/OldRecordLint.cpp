@@ -8,8 +8,8 @@
 #include "../src/base/JsonText.h"
 #include "../src/schema/MemberType.h"
 #include "../src/schema/TableDefinition.h"
-#include "FindingCodes.h"
 #include "Fit.h"
+#include "LintCodes.h"
 #include "Nearest.h"
 
 namespace vornjsondb {
@@ -59,7 +59,7 @@ class OldRecordLint {
             }
         }
         if (ValueOf(vecNames.back()) == nullptr) {
-            Report(m_vecFindings, FindingCode::kMissingLastMember, Below("", vecNames.back()),
+            Report(m_vecFindings, LintCode::kMissingLastMember, Below("", vecNames.back()),
                    "member " + ShownText(vecNames.back()) +
                        " is missing: recCreate refuses a record without the last one");
         }
@@ -75,7 +75,7 @@ class OldRecordLint {
     void LintNames() {
         for (const std::string& strName : m_jRecord.getMemberNames()) {
             if (FindMember(m_jMembers, strName) == nullptr) {
-                Report(m_vecFindings, FindingCode::kOldDropsMember, Below("", strName),
+                Report(m_vecFindings, LintCode::kOldDropsMember, Below("", strName),
                        "there is no member " + ShownText(strName) + ", and recCreate drops it" +
                            Suggestion(strName, m_jMembers.getMemberNames()));
             }
@@ -87,7 +87,7 @@ class OldRecordLint {
         const std::string strPath = Below("", strName);
         const std::string strMember = "member " + ShownText(strName);
         if (Type.pfnFits == nullptr || Type.pfnAppend == nullptr) {
-            Report(m_vecFindings, FindingCode::kOldCannotWrite, strPath,
+            Report(m_vecFindings, LintCode::kOldCannotWrite, strPath,
                    strMember + ": recCreate refuses every value of type " + Quoted(Type.szName));
         } else if (!Type.pfnFits(jValue)) {
             Report(m_vecFindings, FindingCode::kWrongKind, strPath,
@@ -111,7 +111,7 @@ class OldRecordLint {
                 strMember + ": " + Shown(jValue) + " is beyond 63 bits, which recCreate refuses");
         } else if (jValue.asInt64() < RangeOf(Type).nLeast ||
                    jValue.asInt64() > RangeOf(Type).nMostRead) {
-            Report(m_vecFindings, FindingCode::kOldReadsOther, strPath,
+            Report(m_vecFindings, LintCode::kOldReadsOther, strPath,
                    strMember + ": " + Shown(jValue) +
                        " is stored, and a VornJsonDbApi reads another number: expected is " +
                        Expected(Type));
@@ -122,7 +122,7 @@ class OldRecordLint {
                   const std::string& strPath, size_t nLater) {
         const std::string strStored = strText.substr(0, strText.find('\0'));
         if (strStored.size() < strText.size()) {
-            Report(m_vecFindings, FindingCode::kNulCut, strPath,
+            Report(m_vecFindings, LintCode::kNulCut, strPath,
                    strMember + ": " + ShownText(strStored) +
                        " is stored, and what follows the NUL byte is not");
         }
@@ -144,18 +144,18 @@ class OldRecordLint {
         } else if (eMisfit == Misfit::kDepth) {
             szFate = " is nested too deeply: it is stored, and only a part is read";
         }
-        Report(m_vecFindings, FindingCode::kOldJsonChanged, strPath, strMember + szFate);
+        Report(m_vecFindings, LintCode::kOldJsonChanged, strPath, strMember + szFate);
     }
 
     void LintPercents(const std::string& strMember, const std::string& strText,
                       const std::string& strPath, size_t nLater) {
         const Percents eFate = FateOf(strText, nLater);
         if (eFate == Percents::kHalved) {
-            Report(m_vecFindings, FindingCode::kPercentHalved, strPath,
+            Report(m_vecFindings, LintCode::kPercentHalved, strPath,
                    strMember + ": each %% is stored as %, because other members follow");
         } else if (eFate == Percents::kRefused) {
             Report(
-                m_vecFindings, FindingCode::kPercentRefused, strPath,
+                m_vecFindings, LintCode::kPercentRefused, strPath,
                 strMember + ": recCreate refuses the percent sign, because other members follow");
         }
     }

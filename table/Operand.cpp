@@ -23,12 +23,12 @@ constexpr MisfitRow kMisfits[] = {
     {Misfit::kKind, FindingCode::kWrongKind, "is no value of it"},
 };
 
-Problem ProblemOf(Misfit eMisfit, const std::string& strOf, const Json::Value& jValue) {
+bool RefuseMisfit(Misfit eMisfit, std::string_view strOf, const Json::Value& jValue, Problem& Why) {
     const MisfitRow* pRow = std::begin(kMisfits);
     while (pRow->eMisfit != eMisfit) {
         ++pRow;
     }
-    return {pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason})};
+    return Why.Tell(pRow->eCode, Concat({strOf, ": ", Shown(jValue), " ", pRow->szReason}));
 }
 
 ValueKind KindOf(const BoundValue& Value) {
@@ -63,15 +63,14 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
     }
     const std::string strMember = Concat({"member ", Quoted(Of.strName)});
     if (eMisfit == Misfit::kKind && Of.Kind() == BoundKind::kList) {
-        Why = {FindingCode::kListMember,
-               Concat({strMember, " is a list, and ", Shown(jValue), " is none"})};
-    } else if (eMisfit == Misfit::kKind) {
-        Why = {FindingCode::kWrongKind,
-               Concat({strMember, " is ", Expected(*Of.pType), ", not ", Shown(jValue)})};
-    } else {
-        Why = ProblemOf(eMisfit, strMember, jValue);
+        return Why.Tell(FindingCode::kListMember,
+                        Concat({strMember, " is a list, and ", Shown(jValue), " is none"}));
     }
-    return false;
+    if (eMisfit == Misfit::kKind) {
+        return Why.Tell(FindingCode::kWrongKind,
+                        Concat({strMember, " is ", Expected(*Of.pType), ", not ", Shown(jValue)}));
+    }
+    return RefuseMisfit(eMisfit, strMember, jValue, Why);
 }
 
 bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& Why) {
@@ -89,9 +88,9 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
         Out.eKind = ValueKind::kText;
         Out.Value = BoundText(BytesOf(jValue));
         if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
-            Why = {FindingCode::kNulInJson,
-                   "JSON: " + Shown(jValue) + " holds a NUL byte, where SQLite may end it"};
-            return false;
+            return Why.Tell(
+                FindingCode::kNulInJson,
+                Concat({"JSON: ", Shown(jValue), " holds a NUL byte, where SQLite may end it"}));
         }
         return true;
     }
@@ -106,8 +105,7 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     const MemberType& Any = FindMemberType(std::begin(kAnyJson), std::end(kAnyJson) - 1);
     const Misfit eMisfit = FitJson(Any, jValue, false, m_Codec, strJson, Out.Value);
     if (eMisfit != Misfit::kNone) {
-        Why = ProblemOf(eMisfit, "JSON", jValue);
-        return false;
+        return RefuseMisfit(eMisfit, "JSON", jValue, Why);
     }
     Out.Value = Keep(std::move(strJson));
     return true;

@@ -27,17 +27,14 @@ bool IsReachable(std::string_view strName) {
 bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const std::string_view strName = strSteps.substr(1, strSteps.find_first_of(".[", 1) - 1);
     if (strName.empty()) {
-        Why = {FindingCode::kBadPath, "a name is missing in it"};
-        return false;
+        return Why.Tell(FindingCode::kBadPath, "a name is missing in it");
     }
     if (!IsReachable(strName)) {
-        Why = {FindingCode::kBadPath, Concat({"no path leads to ", ShownText(strName)})};
-        return false;
+        return Why.Tell(FindingCode::kBadPath, Concat({"no path leads to ", ShownText(strName)}));
     }
     if (IsNumber(strName)) {
-        Why = {FindingCode::kNumberInPath,
-               Concat({ShownText(strName), " would be a name, not an index"})};
-        return false;
+        return Why.Tell(FindingCode::kNumberInPath,
+                        Concat({ShownText(strName), " would be a name, not an index"}));
     }
     strOut.append(".\"");
     for (const char c : strName) {
@@ -53,8 +50,7 @@ bool TakeIndex(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const size_t nEnd = std::min(strSteps.find(']'), strSteps.size() - 1);
     const std::string_view strDigits = strSteps.substr(1, nEnd - 1);
     if (!IsNumber(strDigits) || strDigits.size() > kMostIndexDigits || strSteps[nEnd] != ']') {
-        Why = {FindingCode::kBadPath, "an index is a whole number in brackets"};
-        return false;
+        return Why.Tell(FindingCode::kBadPath, "an index is a whole number in brackets");
     }
     strOut.append(strSteps.substr(0, nEnd + 1));
     strSteps.remove_prefix(nEnd + 1);
@@ -65,8 +61,7 @@ bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
     strOut = "'$";
     while (!strSteps.empty()) {
         if (strSteps[0] != '.' && strSteps[0] != '[') {
-            Why = {FindingCode::kBadPath, "a point or a bracket is missing in it"};
-            return false;
+            return Why.Tell(FindingCode::kBadPath, "a point or a bracket is missing in it");
         }
         if (!(strSteps[0] == '.' ? TakeName : TakeIndex)(strSteps, strOut, Why)) {
             return false;
@@ -84,6 +79,12 @@ std::string Guarded(const char* szFunction, const std::string& strColumn,
 
 }  // namespace
 
+bool Problem::Tell(FindingCode eWrong, std::string_view strText) {
+    eCode = eWrong;
+    strMessage = strText;
+    return false;
+}
+
 bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem& Why) {
     Out.nMember = Of.Find(strName);
     Out.strPath.clear();
@@ -97,30 +98,24 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     }
     if (Out.nMember == Members::kNone) {
         const std::string_view strFirst = strName.substr(0, strName.find_first_of(".["));
-        Why = {FindingCode::kUnknownMember,
-               Concat({"table ", Of.QuotedTable(), " has no member ", ShownText(strFirst),
-                       Suggestion(strFirst, Of.Names())})};
-        return false;
+        return Why.Tell(FindingCode::kUnknownMember,
+                        Concat({"table ", Of.QuotedTable(), " has no member ", ShownText(strFirst),
+                                Suggestion(strFirst, Of.Names())}));
     }
     if (nEnd == strName.size()) {
         return true;
     }
     const Member& Base = Of.At(Out.nMember);
     if (!Base.IsJson()) {
-        Why = {FindingCode::kNoJsonMember,
-               Concat({"member ", ShownText(Base.strName), " of type \"", Base.pType->szName,
-                       "\" has nothing inside"})};
-        return false;
+        return Why.Tell(FindingCode::kNoJsonMember,
+                        Concat({"member ", ShownText(Base.strName), " of type \"",
+                                Base.pType->szName, "\" has nothing inside"}));
     }
-    const bool blTooLong = strName.size() > kMostPathBytes;
-    if (blTooLong) {
-        Why = {FindingCode::kBadPath, "it is too long"};
-    }
-    if (blTooLong || !TakeSteps(strName.substr(nEnd), Out.strPath, Why)) {
-        Why.strMessage = Concat({"path ", ShownText(strName), ": ", Why.strMessage});
-        return false;
-    }
-    return true;
+    const bool blGood = strName.size() > kMostPathBytes
+                            ? Why.Tell(FindingCode::kBadPath, "it is too long")
+                            : TakeSteps(strName.substr(nEnd), Out.strPath, Why);
+    return blGood ||
+           Why.Tell(Why.eCode, Concat({"path ", ShownText(strName), ": ", Why.strMessage}));
 }
 
 std::string ValueAt(const std::string& strColumn, const std::string& strPath) {

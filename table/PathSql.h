@@ -16,6 +16,9 @@ struct Problem {
     FindingCode eCode = FindingCode::kCount;
     std::string strMessage;
     std::string strStep{};  // from the operand to what is wrong in it
+
+    // Tells what. Returns false, for a caller that returns whether nothing is wrong.
+    bool Tell(FindingCode eWrong, std::string_view strText);
 };
 
 struct Place {

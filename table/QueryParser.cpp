@@ -25,7 +25,7 @@ void ReadNames(const Json::Value& jNames, const char* szPath, FindingCode eCode,
         if (jNames[i].isString()) {
             vecNames.push_back(jNames[i].asString());
         } else {
-            Report(vecFindings, eCode, Below(szPath, std::to_string(i)),
+            Report(vecFindings, eCode, Below(szPath, DigitsOf(i)),
                    Concat({"a name belongs here, not ", Shown(jNames[i])}));
         }
     }

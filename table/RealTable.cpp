@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <map>
 #include <utility>
 
 #include "Concat.h"
@@ -83,7 +82,6 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     // Hidden columns of virtual tables are no part of a row; generated ones are, of either kind.
     constexpr int kHidden = 1;
     Out = RealTable();
-    std::map<int, std::string> mapKey;  // by their places in it, from 1
     const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
         if (NumberColumn(pRow, 5) == kHidden) {
             return;
@@ -91,12 +89,13 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
                                             TextColumn(pRow, 2), NumberColumn(pRow, 4) != 0,
                                             NumberColumn(pRow, 5) > kHidden});
-        mapKey[NumberColumn(pRow, 3)] = TextColumn(pRow, 0);
+        // From 1; 0: outside of the key.
+        const auto nPlaceInKey = static_cast<size_t>(NumberColumn(pRow, 3));
+        if (nPlaceInKey > 0) {
+            Out.vecKey.resize(std::max(Out.vecKey.size(), nPlaceInKey));
+            Out.vecKey[nPlaceInKey - 1] = Out.vecColumns.back().strName;
+        }
     });
-    mapKey.erase(0);  // columns outside of the key
-    for (const auto& Each : mapKey) {
-        Out.vecKey.push_back(Each.second);
-    }
     if (nResult == SQLITE_OK && !Out.vecColumns.empty()) {
         Out.strRowid = NameOfRowid(pDb, strTable, Out);
     }

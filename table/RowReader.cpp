@@ -82,14 +82,15 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
         const Member& Shown = Of.At(m_vecColumns[i]);
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
                                 (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
-        m_vecInKeyOrder.push_back(
-            Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
+        // Members are numbered in the order of their names.
+        const auto itPlace =
+            std::upper_bound(m_vecInKeyOrder.begin(), m_vecInKeyOrder.end(), m_vecColumns[i],
+                             [](size_t nNew, const Column& Each) { return nNew < Each.nMember; });
+        m_vecInKeyOrder.insert(
+            itPlace, Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
         m_vecNames.push_back(Shown.strName);
     }
-    // Members are numbered in the order of their names.
-    std::sort(m_vecInKeyOrder.begin(), m_vecInKeyOrder.end(),
-              [](const Column& Left, const Column& Right) { return Left.nMember < Right.nMember; });
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 

@@ -4,8 +4,8 @@
 
 #include "Affinity.h"
 #include "CreateStatement.h"
-#include "FindingCodes.h"
 #include "IndexSql.h"
+#include "LintCodes.h"
 #include "RealTable.h"
 
 namespace vornjsondb {
@@ -61,7 +61,7 @@ class TableCompare {
   private:
     std::string PathOf(const Member& Of) const { return Below(m_strPath, Of.strName); }
 
-    void Add(FindingCode eCode, const Member& Of, const std::string& strMessage) {
+    void Add(LintCode eCode, const Member& Of, const std::string& strMessage) {
         Report(m_vecFindings, eCode, PathOf(Of), "member " + Of.strQuoted + strMessage);
     }
 
@@ -86,19 +86,19 @@ class TableCompare {
             return SQLITE_OK;
         }
         if (pColumn->strName != Of.strName) {
-            Add(FindingCode::kOtherCase, Of,
+            Add(LintCode::kOtherCase, Of,
                 " is the column " + Quoted(pColumn->strName) +
                     ", which a VornJsonDbApi does not know by this name");
         }
         const Affinity eAffinity = AffinityOf(pColumn->strType);
         if (!Keeps(eAffinity, Of.Kind())) {
-            Add(FindingCode::kOtherAffinity, Of,
+            Add(LintCode::kOtherAffinity, Of,
                 " of type " + Quoted(Of.pType->szName) + ": its column, declared as " +
                     Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
                     " affinity and changes what is stored");
         }
         if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn) && !m_blView) {
-            Add(FindingCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
+            Add(LintCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
         }
         return CompareDefault(Of, *pColumn);
     }
@@ -114,7 +114,7 @@ class TableCompare {
         bool blSame = false;
         const int nResult = HaveOneValue(m_pDb, strDefault, Column.strDefault, Of.IsJson(), blSame);
         if (nResult == SQLITE_OK && !blSame) {
-            Add(FindingCode::kOtherDefault, Of,
+            Add(LintCode::kOtherDefault, Of,
                 " has the default " + strDefault + ", and its column " + Column.strDefault);
         }
         return nResult;
@@ -123,17 +123,17 @@ class TableCompare {
     // SQLite adds NOT NULL only beside a default, which the rows that are there get.
     void CompareMissing(const Member& Of) {
         if (Of.blKey) {
-            Add(FindingCode::kMissingKeyColumn, Of,
+            Add(LintCode::kMissingKeyColumn, Of,
                 " of the key has no column, and the rows that are there would get no key");
         } else if (m_pvecStatements == nullptr) {
-            Add(FindingCode::kMissingColumn, Of, " has no column");
+            Add(LintCode::kMissingColumn, Of, " has no column");
         } else {
             const std::string strDefault = DefaultClause(Of);
             const bool blNotNull = Of.blNotNull && !strDefault.empty();
             m_pvecStatements->push_back("ALTER TABLE " + m_Of.QuotedTable() + " ADD COLUMN " +
                                         ColumnClause(Of, blNotNull));
             if (Of.blNotNull && !blNotNull) {
-                Add(FindingCode::kNullableColumn, Of,
+                Add(LintCode::kNullableColumn, Of,
                     " is \"notNull\" without a default, so that its new column takes NULL");
             }
         }
@@ -143,17 +143,17 @@ class TableCompare {
         for (const RealColumn& Column : m_Real.vecColumns) {
             if (m_Of.FindColumn(Column.strName) == Members::kNone) {
                 const bool blNeeded = Column.blNotNull && Column.strDefault.empty();
-                Report(m_vecFindings, FindingCode::kExtraColumn, m_strPath,
+                Report(m_vecFindings, LintCode::kExtraColumn, m_strPath,
                        "column " + Quoted(Column.strName) + " is no member: a VornJsonDbApi " +
                            "cannot read back what it creates" +
                            (blNeeded ? ", and no record can be created without its value" : ""));
             }
         }
         if (m_blView) {
-            Report(m_vecFindings, FindingCode::kView, Below("", m_Of.Table()),
+            Report(m_vecFindings, LintCode::kView, Below("", m_Of.Table()),
                    m_Of.QuotedTable() + " is a view");
         } else if (m_Real.strRowid.empty()) {
-            Report(m_vecFindings, FindingCode::kWithoutRowid, Below("", m_Of.Table()),
+            Report(m_vecFindings, LintCode::kWithoutRowid, Below("", m_Of.Table()),
                    "the table has no rowid: a VornJsonDbApi cannot read back what it creates");
         }
     }
@@ -186,10 +186,10 @@ class TableCompare {
 
     void ReportNotUnique(size_t nMember, bool blKey) {
         if (blKey) {
-            Report(m_vecFindings, FindingCode::kKeyNotUnique, Below(Below("", m_Of.Table()), "key"),
+            Report(m_vecFindings, LintCode::kKeyNotUnique, Below(Below("", m_Of.Table()), "key"),
                    "the table can hold several rows with one key");
         } else {
-            Add(FindingCode::kMissingUnique, m_Of.At(nMember),
+            Add(LintCode::kMissingUnique, m_Of.At(nMember),
                 " is \"unique\", and several rows can have one value");
         }
     }

@@ -4,8 +4,8 @@
 #include <utility>
 
 #include "Attempt.h"
-#include "FindingCodes.h"
 #include "IndexAdvice.h"
+#include "LintCodes.h"
 #include "PlanSteps.h"
 #include "QueryPlan.h"
 #include "SelectSql.h"
@@ -17,7 +17,7 @@ namespace VORN_JSON_DB {
 namespace {
 
 using vornjsondb::Doing;
-using vornjsondb::FindingCode;
+using vornjsondb::LintCode;
 using vornjsondb::OwnStatement;
 using Parts = Table::Parts;
 
@@ -63,7 +63,7 @@ Status CheckOne(Parts& From, const Doing& What, const std::string& strSql) {
     FindingList vecFindings;
     if (szTail == nullptr || blMore) {
         vornjsondb::Report(
-            vecFindings, FindingCode::kNotOneStatement, "",
+            vecFindings, LintCode::kNotOneStatement, "",
             szTail == nullptr ? "the text holds no statement" : "more follows the first statement");
     }
     return vornjsondb::FromFindings(std::move(vecFindings), What);
@@ -90,7 +90,7 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
         if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
             vornjsondb::Report(
-                Made.vecFindings, FindingCode::kFullScan, "/where",
+                Made.vecFindings, LintCode::kFullScan, "/where",
                 "all records are looked at, which an index spares on " + Joined(vecAdvice));
         }
         Found = std::move(Made);
@@ -115,7 +115,7 @@ Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
             vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
         if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
             vornjsondb::Report(
-                Made.vecFindings, FindingCode::kFullScan, "",
+                Made.vecFindings, LintCode::kFullScan, "",
                 "all records are looked at; an index on what is compared may spare it");
         }
         Found = std::move(Made);

@@ -155,7 +155,7 @@ class WhereParser {
         }
         Conditions vecParts;
         for (Json::ArrayIndex i = 0; i < jParts.size(); ++i) {
-            const std::string strBelow = Below(strPath, std::to_string(i));
+            const std::string strBelow = Below(strPath, DigitsOf(i));
             if (!IsEmpty(jParts[i], strBelow)) {
                 vecParts.push_back(Condition::All(Read(jParts[i], strBelow, nLevel + 1)));
             }

@@ -15,6 +15,19 @@ namespace vornjsondb {
 
 namespace {
 
+#ifdef VORN_TYPES_WITHOUT_TREATMENTS
+
+// A handle that binds values asks which treatments a type has, and calls none.
+void NoRead(const char*, Json::Value&) {}
+void NoAppend(const Json::Value&, std::string&) {}
+
+constexpr auto ReadText = NoRead, ReadInt = NoRead, ReadInt64 = NoRead, ReadBool = NoRead,
+               ReadJson = NoRead;
+constexpr auto AppendText = NoAppend, AppendJson = NoAppend, AppendSigned = NoAppend,
+               AppendUnsigned = NoAppend, AppendFloat = NoAppend, AppendDouble = NoAppend;
+
+#else
+
 // ---- column text into a value ----
 
 // Swaps the payload alone: half the cost of an assignment, which also moves comments and offsets
@@ -57,6 +70,8 @@ void ReadInt64(const char* szText, Json::Value& jOut) {
 void ReadBool(const char* szText, Json::Value& jOut) {
     Set(jOut, ReadNumber(szText, std::strtol) == 1);
 }
+
+constexpr auto ReadJson = FromString;
 
 // ---- value into a value list ----
 
@@ -115,6 +130,8 @@ void AppendDouble(const Json::Value& jValue, std::string& strOut) {
     AppendReal(jValue.asDouble(), strOut);
 }
 
+#endif  // VORN_TYPES_WITHOUT_TREATMENTS
+
 // ---- whether a value fits ----
 
 template <bool (Json::Value::*pfnIs)() const>
@@ -149,9 +166,9 @@ constexpr MemberType kMemberTypes[] = {
     {"int",                ReadInt,    Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false, kInt32},
     {"long long",          ReadInt64,  Fits<&Value::isIntegral>, AppendSigned,   "%lld",  kBare, false, kInt64},
     {"bool",               ReadBool,   Fits<&Value::isBool>,     AppendSigned,   "%lld",  kFlag, false, kBool},
-    {"Json::objectValue",  FromString, Fits<&Value::isObject>,   AppendJson,     "%Q",    kJson, false, kObject},
-    {"Json::arrayValue",   FromString, Fits<&Value::isArray>,    AppendJson,     "%Q",    kJson, false, kList},
-    {"Json::Value",        FromString, nullptr,                  nullptr,        nullptr, kJson, false, kAnyJson},
+    {"Json::objectValue",  ReadJson,   Fits<&Value::isObject>,   AppendJson,     "%Q",    kJson, false, kObject},
+    {"Json::arrayValue",   ReadJson,   Fits<&Value::isArray>,    AppendJson,     "%Q",    kJson, false, kList},
+    {"Json::Value",        ReadJson,   nullptr,                  nullptr,        nullptr, kJson, false, kAnyJson},
     {"unsigned int",       ReadInt,    nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt32},
     {"unsigned long long", ReadInt64,  nullptr,                  AppendUnsigned, "%llu",  kBare, false, kUInt63},
     {"long",               nullptr,    nullptr,                  AppendSigned,   "%lld",  kBare, false, kInt64},

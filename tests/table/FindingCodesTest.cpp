@@ -6,6 +6,7 @@
 #include <sstream>
 
 #include "../../table/FindingCodes.h"
+#include "../../table/LintCodes.h"
 #include "QueryFixture.h"
 
 namespace VORN_JSON_DB {
@@ -13,6 +14,7 @@ namespace VORN_JSON_DB {
 namespace {
 
 using vornjsondb::FindingCode;
+using vornjsondb::LintCode;
 
 enum class Call {
     kDefinition,  // a definition of table t
@@ -260,17 +262,23 @@ const char* Word(Severity eSeverity) {
     return kWords[static_cast<size_t>(eSeverity)];
 }
 
+constexpr size_t kFindings = static_cast<size_t>(FindingCode::kCount);
+constexpr size_t kRows = kFindings + static_cast<size_t>(LintCode::kCount);
+
+// Those of operations, then those of Lint.
 std::vector<Finding> AllRows() {
     std::vector<Finding> vecRows;
-    for (size_t i = 0; i < static_cast<size_t>(FindingCode::kCount); ++i) {
-        vecRows.push_back(RowOf(static_cast<FindingCode>(i)));
+    for (size_t i = 0; i < kRows; ++i) {
+        vecRows.push_back(i < kFindings ? RowOf(static_cast<FindingCode>(i))
+                                        : RowOf(static_cast<LintCode>(i - kFindings)));
     }
     return vecRows;
 }
 
-// "code|severity|remedy" of each line of the page's tables.
-std::string PageLines(std::istream& Page) {
-    std::string strLines, strLine;
+// "code|severity|remedy" of each line of the page's tables, which have the reader's order.
+std::multiset<std::string> PageLines(std::istream& Page) {
+    std::multiset<std::string> setLines;
+    std::string strLine;
     while (std::getline(Page, strLine)) {
         std::vector<std::string> vecCells;
         std::istringstream Cells(strLine);
@@ -279,10 +287,10 @@ std::string PageLines(std::istream& Page) {
         }
         if (vecCells.size() == 5 && vecCells[1].compare(0, 2, " `") == 0) {
             EXPECT_GT(vecCells[3].size(), 10U) << strLine;
-            strLines += vecCells[1] + "|" + vecCells[2] + "|" + vecCells[4] + "\n";
+            setLines.insert(vecCells[1] + "|" + vecCells[2] + "|" + vecCells[4]);
         }
     }
-    return strLines;
+    return setLines;
 }
 
 }  // namespace
@@ -310,18 +318,18 @@ TEST_F(FindingCodesTest, EachIsProducedWithItsSeverityMessageAndRemedy) {
         setAll.insert(Row.szCode);
     }
     EXPECT_EQ(setProduced, setAll);
-    EXPECT_EQ(setAll.size(), static_cast<size_t>(FindingCode::kCount)) << "a code comes twice";
+    EXPECT_EQ(setAll.size(), kRows) << "a code comes twice";
 }
 
 TEST_F(FindingCodesTest, PageHasALineForEach) {
-    std::string strExpected;
+    std::multiset<std::string> setExpected;
     for (const Finding& Row : AllRows()) {
-        strExpected += std::string(" `") + Row.szCode + "` | " + Word(Row.eSeverity) + " | " +
-                       Replaced(Row.strRemedy, "<", "\\<") + " \n";
+        setExpected.insert(std::string(" `") + Row.szCode + "` | " + Word(Row.eSeverity) + " | " +
+                           Replaced(Row.strRemedy, "<", "\\<") + " ");
     }
     std::ifstream Page(VORN_FINDINGS_PAGE);
     ASSERT_TRUE(Page.is_open());
-    EXPECT_EQ(PageLines(Page), strExpected);
+    EXPECT_EQ(PageLines(Page), setExpected);
 }
 
 }  // namespace VORN_JSON_DB
