@@ -95,8 +95,11 @@ Status Loader::Parts::EndRecord(FindingList& vecFindings) {
     if (!blFull) {
         return Outcome;
     }
-    const Status Committed = Commit();
-    return Committed.Ok() || !Ended.Ok() ? Committed : End(Committed);
+    Outcome = Commit();
+    if (Outcome.Ok() || !Ended.Ok()) {
+        return Outcome;
+    }
+    return End(Outcome);
 }
 
 Status Loader::Parts::Commit() {

@@ -99,7 +99,7 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
     const auto nVerb = static_cast<size_t>(eVerb);
     Statement& Held = m_aHeld[nVerb];
     int nResult = SQLITE_OK;
-    if (!Held.IsFor("INRUF"[nVerb], m_Values.Given())) {
+    if (!Held.IsFor(m_Values.Given())) {
         Held = Statement();
         nResult = m_Into.Kept.Take(
             "INRUF"[nVerb] + m_Values.Given(), [&] { return Sql(eVerb); }, Held);

@@ -99,6 +99,22 @@ TEST_F(EdgesTest, KeyThatIsNotTheRowidTakesNull) {
     EXPECT_EQ(Lint(), "");
 }
 
+// The comparison of the two defaults is the one statement that is longer than SQLite takes now.
+TEST_F(EdgesTest, DefaultThatCannotBeComparedEndsTheComparison) {
+    const std::string strLong = "'" + std::string(2000, 'x') + "'";
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, note TEXT DEFAULT " + strLong + ")",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "note": {"cpptype": "string", "cppDefaultValue": "x"}, "other": {"cpptype": "int"}}})");
+    const int nLength = sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, 2000);
+    EXPECT_EQ(Lint(),
+              "refused: cannot compare the definition with table \"item\": string or blob too big");
+    sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, nLength);
+    EXPECT_EQ(
+        Lint(),
+        "other-default /item/member/note: member \"note\" has the default 'x', and its column " +
+            strLong + "; missing-column /item/member/other: member \"other\" has no column");
+}
+
 TEST_F(EdgesTest, EmptyNameIsNoNameOfSql) {
     EXPECT_EQ(Text(LintDefinition("t", Parse(R"({"t": {"member": {"": {"cpptype": "string",
                   "cppDefaultValue": "x"}}}})"))),
