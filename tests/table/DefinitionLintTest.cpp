@@ -65,7 +65,7 @@ TEST_F(DefinitionLintTest, NamesOfMembers) {
                             "a": {"cpptype": "int", "cppDefaultValue": 0}})"),
               "same-column /t/member/a: \"a\" is another member's column: letter case makes no "
               "difference");
-    for (const char* szName : {"order", "a b", "1st", "a.b", "null", "current_time", "a'", "a--"}) {
+    for (const char* szName : {"order", "a b", "1st", "a.b", "null", "current_date", "a'", "a--"}) {
         EXPECT_EQ(OfMembers(std::string("{\"") + szName +
                             R"(": {"cpptype": "int", "cppDefaultValue": 0}})"),
                   std::string("old-name /t/member/") + szName + ": member \"" + szName + "\"" +

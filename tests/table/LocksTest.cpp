@@ -166,6 +166,26 @@ TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
     EXPECT_EQ(1, Into.Counts().nCommitted);
 }
 
+// Nobody would call again with the record that filled the transaction.
+TEST_F(LocksTest, LoaderEndsWhenAFullTransactionCannotBeCommitted) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time;
+    LoadOptions How;
+    How.nRowsPerTransaction = 2;
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table, How)));
+    EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
+    const std::string strLocked =
+        "locked: cannot load records into table \"task\": cannot commit a transaction: database is "
+        "locked (waited 5000 ms)";
+    EXPECT_EQ(strLocked, Text(Into.Add(Parse(R"({"id": 2})"))));
+    EXPECT_EQ(0, Into.Counts().nInserted);
+    Other("COMMIT");
+    EXPECT_EQ(strLocked, Text(Into.Commit()));
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ(R"({"done":false,"id":1})", Text(m_jStored));
+}
+
 TEST_F(LocksTest, LoaderThatCannotBeginNamesTheTable) {
     Other("BEGIN IMMEDIATE");
     const FakeTime Time;
