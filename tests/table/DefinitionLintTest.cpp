@@ -83,6 +83,12 @@ TEST_F(DefinitionLintTest, NamesOfMembers) {
               "old-name /group: table \"group\"" + strOldName);
 }
 
+TEST_F(DefinitionLintTest, NothingOfSqliteStaysOpen) {
+    const sqlite3_int64 nBytes = sqlite3_memory_used();
+    EXPECT_EQ(OfMembers(R"({"a": {"cpptype": "int", "cppDefaultValue": 0}})"), "");
+    EXPECT_EQ(sqlite3_memory_used(), nBytes);
+}
+
 TEST_F(DefinitionLintTest, NamesThatAQueryHasAnotherMeaningFor) {
     for (const char* szName : {"offset", "sort_by", "sort_direction", "vornSqlWhereFilter"}) {
         EXPECT_EQ(OfMembers(std::string("{\"") + szName +

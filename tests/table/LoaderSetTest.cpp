@@ -40,6 +40,23 @@ TEST_F(LoaderSetTest, WrittenJsonIsStoredAsItIs) {
               R"([1,{"a":"b"}]|NULL;NULL|{"a":[]};NULL|{"a":[]})");
 }
 
+// The text is the caller's again as soon as the call returns.
+TEST_F(LoaderSetTest, TextsAreCopied) {
+    std::string strList = "[1]";
+    std::string strName = R"("a\u00e9")";
+    m_Into.SetJson(m_Into.MemberIndex("list"), strList);
+    m_Into.SetJson(m_Into.MemberIndex("name"), strName);
+    strList = "[2]";
+    strName = "gone away";
+    EXPECT_EQ(Text(m_Into.EndRecord()), "ok");
+    EXPECT_EQ(Rows("SELECT list, name FROM item"), "[1]|a\xc3\xa9");
+}
+
+TEST_F(LoaderSetTest, OfANameThatComesTwiceTheLastOneCounts) {
+    EXPECT_EQ(Add("map", R"({"a": 1.5, "a": 2.5})"), "ok");
+    EXPECT_EQ(Rows("SELECT map FROM item"), R"({"a":2.5})");
+}
+
 TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
     const auto Refused = [](const std::string& strRest) {
         return "refused: cannot load record " + strRest;

@@ -88,6 +88,21 @@ TEST_F(LocksTest, ReaderThatStandsInTheWayOfACommitIsWaitedFor) {
     EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
 }
 
+// The first try inserts, with the default of "done", the second one finds the other's record.
+TEST_F(LocksTest, FurtherTryWritesOnlyWhatWasGiven) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 2) {
+            Other("COMMIT; INSERT INTO task (id, done) VALUES (1, 1)");
+        }
+    });
+    Written eWritten = Written::kInserted;
+    EXPECT_EQ("ok", Text(m_Table.Save(Parse(R"({"id": 1, "name": "a"})"), OnDuplicate::kUpsert,
+                                      &m_jStored, &eWritten)));
+    EXPECT_EQ(R"({"done":true,"id":1,"name":"a"})", Text(m_jStored));
+    EXPECT_EQ(Written::kUpdated, eWritten);
+}
+
 TEST_F(LocksTest, InsideOfATransactionThereIsNoWaiting) {
     EXPECT_EQ("ok", Create(1));
     Transaction All;

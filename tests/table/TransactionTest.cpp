@@ -123,6 +123,20 @@ TEST_F(TransactionTest, OtherFailuresLeaveTheCallersTransaction) {
     EXPECT_EQ("1", Rows("SELECT count(*) FROM task"));
 }
 
+TEST_F(TransactionTest, WhatFailsLeavesNoSavepoint) {
+    Open();
+    Run("BEGIN; INSERT INTO task (id) VALUES (1)");
+    Json::Value jStored;
+    EXPECT_EQ(m_Table.Create(Parse(R"({"id": 1})"), &jStored).Code(), StatusCode::kDuplicate);
+    EXPECT_EQ(sqlite3_exec(m_pDb, "RELEASE vornjsondb", nullptr, nullptr, nullptr), SQLITE_ERROR);
+    Transaction Inner;
+    EXPECT_EQ(Text(Inner.Begin(m_pDb)), "ok");
+    EXPECT_EQ(Text(Inner.Rollback()), "ok");
+    EXPECT_EQ(sqlite3_exec(m_pDb, "RELEASE vornjsondb", nullptr, nullptr, nullptr), SQLITE_ERROR);
+    Run("COMMIT");
+    EXPECT_EQ(Rows("SELECT id FROM task"), "1");
+}
+
 }  // namespace
 
 }  // namespace VORN_JSON_DB
