@@ -44,6 +44,7 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
         Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
     }
     const bool blByKey = How.eOnDuplicate != OnDuplicate::kStop;
+    // mutate(exchanged): what the key lacks is a finding that nobody reads then.
     if (!vecFindings.empty() || (blByKey && !Values.HasKey(vecFindings))) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
@@ -68,12 +69,14 @@ Status Loader::Parts::Fail(const Status& Outcome) {
     const bool blBad = eCode == StatusCode::kRefused || eCode == StatusCode::kDuplicate ||
                        eCode == StatusCode::kConstraint;
     Now.nFailed += blBad ? 1 : 0;
+    // mutate(exchanged): both only look.
     const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
     return blBad && !blGone && How.blGoOnAfterBad ? Outcome : End(Outcome);
 }
 
 Status Loader::Parts::End(const Status& Outcome) {
     Ended = Outcome;
+    // mutate(true, hoisted, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
         All.Rollback().Ignore();
     }

@@ -64,7 +64,6 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     // Generated columns are hidden, each kind in its own way.
     constexpr int kVirtual = 2;
-    Out = RealTable();
     std::map<int, std::string> mapKey;  // by their places in it, from 1
     const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
         Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
@@ -103,7 +102,7 @@ int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
         "SELECT type = 'view' FROM (SELECT name, type FROM sqlite_temp_master UNION ALL"
         " SELECT name, type FROM sqlite_master)"
         " WHERE name = ?1 COLLATE NOCASE AND type IN ('table', 'view') LIMIT 1";
-    blView = false;
+    blView = false;  // mutate(dropped): it is so before the one call.
     return ForEachRow(pDb, kSql, strTable,
                       [&](const OwnStatement& pRow) { blView = NumberColumn(pRow, 0) != 0; });
 }

@@ -115,6 +115,15 @@ TEST_F(EdgesTest, DefaultThatCannotBeComparedEndsTheComparison) {
             strLong + "; missing-column /item/member/other: member \"other\" has no column");
 }
 
+// "-m." could be the path "." into "-m", which is none, or "m." the other way round.
+TEST_F(EdgesTest, SortTermIsWhatTheTableHas) {
+    Meet(R"(CREATE TABLE item (id INTEGER PRIMARY KEY, "-m" TEXT, "m." TEXT))",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "-m": {"cpptype": "Json::Value"},
+             "m.": {"cpptype": "string"}}})");
+    Run("INSERT INTO item VALUES (1, '1', 'a'), (2, '2', 'c'), (3, '3', 'b')");
+    EXPECT_EQ(Ids(Query().Sort("-m.")), "2,3,1");
+}
+
 TEST_F(EdgesTest, EmptyNameIsNoNameOfSql) {
     EXPECT_EQ(Text(LintDefinition("t", Parse(R"({"t": {"member": {"": {"cpptype": "string",
                   "cppDefaultValue": "x"}}}})"))),

@@ -50,6 +50,25 @@ TEST_F(LoaderAnewTest, WholeRecordTakesTheWrongsOfTheStepsBefore) {
     EXPECT_EQ(Text(m_Into.Commit()), "ok");
 }
 
+TEST_F(LoaderAnewTest, MembersAreThoseOfOneRecord) {
+    Start();
+    m_Into.SetInteger(m_Into.MemberIndex("id"), 1);
+    EXPECT_EQ(Text(m_Into.EndRecord()), "ok");
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 2 into table \"task\": the record has no members "
+              "[not-a-record ]");
+}
+
+// Records of two shapes in turn prepare two statements, and not one for each record.
+TEST_F(LoaderAnewTest, StatementsOfEachShapeAreKept) {
+    Start();
+    EXPECT_EQ(Add(R"({"id": 1})"), "ok");
+    sqlite3_stmt* const pFirst = sqlite3_next_stmt(m_pDb, nullptr);
+    EXPECT_EQ(Add(R"({"id": 2, "name": "a"})"), "ok");
+    EXPECT_EQ(sqlite3_next_stmt(m_pDb, sqlite3_next_stmt(m_pDb, nullptr)), pFirst);
+    EXPECT_EQ(Text(m_Into.Commit()), "ok");
+}
+
 TEST_F(LoaderAnewTest, FailureTakesBackWhatWasReplacedOrSkipped) {
     for (const auto eMode : {OnDuplicate::kReplace, OnDuplicate::kSkip}) {
         Run("DELETE FROM task");

@@ -72,6 +72,7 @@ TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
                       "value: expected is a text [wrong-kind /name]"));
     EXPECT_EQ(Add("made", "[1]"), Refused("4 into table \"item\": member \"made\" is computed by "
                                           "the table [generated /made]"));
+    EXPECT_NE(sqlite3_get_autocommit(m_pDb), 0);
     EXPECT_EQ(Rows("SELECT count(*) FROM item"), "0");
 }
 
