@@ -43,9 +43,10 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (vecFindings.empty() && Values.IsEmpty()) {
         Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
     }
-    const bool blByKey = How.eOnDuplicate != OnDuplicate::kStop;
-    // mutate(exchanged): what the key lacks is a finding that nobody reads then.
-    if (!vecFindings.empty() || (blByKey && !Values.HasKey(vecFindings))) {
+    if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
+        Values.HasKey(vecFindings);
+    }
+    if (!vecFindings.empty()) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
     Status Outcome = BeginIfNone(What);
@@ -78,10 +79,10 @@ Status Loader::Parts::End(const Status& Outcome) {
     Ended = Outcome;
     // mutate(true, hoisted, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
-        All.Rollback().Ignore();
+        All.Rollback().Ignore();  // mutate(doubled): a second time there is nothing to undo.
     }
-    Now.nInserted = Kept.nInserted;
-    Now.nReplaced = Kept.nReplaced;
+    Now.nInserted = Kept.nInserted;  // mutate(exchanged): in any order.
+    Now.nReplaced = Kept.nReplaced;  // mutate(exchanged): in any order.
     Now.nSkipped = Kept.nSkipped;
     return Ended;
 }

@@ -76,6 +76,15 @@ TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
     EXPECT_EQ(Rows("SELECT count(*) FROM item"), "0");
 }
 
+TEST_F(LoaderSetTest, MembersOfABadRecordAreForgotten) {
+    m_Into.SetText(m_Into.MemberIndex("name"), "a");
+    EXPECT_EQ(Add("list", "{}"),
+              "refused: cannot load record 1 into table \"item\": member \"list\": an object of 0 "
+              "is another kind of value: expected is a list [wrong-kind /list]");
+    EXPECT_EQ(Add("map", "{}"), "ok");
+    EXPECT_EQ(Rows("SELECT name, list, map FROM item"), "NULL|NULL|{}");
+}
+
 TEST_F(LoaderSetTest, ValueThatFitsReplacesOneThatDidNot) {
     m_Into.SetJson(m_Into.MemberIndex("list"), "{}");
     EXPECT_EQ(Add("list", "[2]"), "ok");
