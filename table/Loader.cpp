@@ -147,7 +147,7 @@ Status Loader::Add(const Json::Value& jRecord) {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    m_pParts->mapWrong.clear();
+    m_pParts->mapWrong.clear();  // mutate(exchanged): in any order.
     m_pParts->Values.Take(jRecord, vecFindings);
     return m_pParts->EndRecord(vecFindings);
 }
@@ -157,6 +157,7 @@ Status Loader::EndRecord() {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
+    // mutate(true, hoisted, sunk): the longer way gives the same.
     if (!m_pParts->mapWrong.empty()) {
         for (auto& Each : m_pParts->mapWrong) {
             vecFindings.push_back(std::move(Each.second));

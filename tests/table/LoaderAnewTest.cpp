@@ -40,6 +40,16 @@ TEST_F(LoaderAnewTest, StartThatFailsUndoesTheLoadBefore) {
     EXPECT_NE(sqlite3_get_autocommit(m_pDb), 0);
 }
 
+TEST_F(LoaderAnewTest, RefusedStartIsNone) {
+    Run("CREATE TABLE keyless (a INTEGER)");
+    Table Keyless;
+    EXPECT_EQ(Text(Keyless.Open(m_pDb, "keyless", Json::Value())), "ok");
+    LoadOptions How;
+    How.eOnDuplicate = OnDuplicate::kSkip;
+    EXPECT_EQ(m_Into.Start(Keyless, How).Code(), StatusCode::kRefused);
+    EXPECT_EQ(Add(R"({"a": 1})"), "misuse: cannot load records: the loader is not started");
+}
+
 TEST_F(LoaderAnewTest, WholeRecordTakesTheWrongsOfTheStepsBefore) {
     Start();
     m_Into.Reject("no good");
