@@ -48,7 +48,7 @@ std::string OnConflict(const Members& Of, bool blReplace) {
 std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     std::string strSet;
     for (size_t i = 0; i < Of.Size(); ++i) {
-        if (Values.Has(i) && !Of.At(i).blKey) {
+        if (Values.Has(i) && !Of.At(i).blKey) {  // mutate(exchanged): both only look.
             Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
@@ -161,6 +161,7 @@ Status RecordWriter::WithValues(const Status& Failed) const {
         const std::string strName = Concat({Of.Table(), ".", Of.At(i).strName});
         const size_t nFound = strMessage.rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
+        // mutate(exchanged): both only look.
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
             Append(strMore,
                    {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
