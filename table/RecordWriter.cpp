@@ -161,7 +161,6 @@ Status RecordWriter::WithValues(const Status& Failed) const {
         const std::string strName = Concat({Of.Table(), ".", Of.At(i).strName});
         const size_t nFound = strMessage.rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
-        // mutate(exchanged): both only look.
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
             Append(strMore,
                    {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
