@@ -36,10 +36,12 @@ std::string OnConflict(const Members& Of, bool blReplace) {
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
         if (blReplace && !Other.blKey && !Other.blGenerated) {
+            // mutate(doubled): a column may be set twice.
             Append(strSet, {strSet.empty() ? "UPDATE SET " : ", ", Other.strQuoted, "=excluded.",
                             Other.strQuoted});
         }
     }
+    // mutate(doubled): the second one adds nothing.
     strSet.append(strSet.empty() ? "NOTHING" : "");
     return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet});
 }
@@ -87,6 +89,7 @@ std::string RecordWriter::Sql(Verb eVerb) const {
 int RecordWriter::Bind(Verb eVerb, sqlite3_stmt* pStatement) const {
     int nNext = 1;
     int nResult = SQLITE_OK;
+    // mutate(exchanged): the next line needs nothing of it.
     if (eVerb != Verb::kFind) {
         nResult = m_Values.BindGiven(pStatement, nNext, eVerb != Verb::kUpdate);
     }
@@ -99,6 +102,7 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
     const auto nVerb = static_cast<size_t>(eVerb);
     Statement& Held = m_aHeld[nVerb];
     int nResult = SQLITE_OK;
+    // mutate(true, hoisted): it is taken again from those that are kept, which only takes longer.
     if (!Held.IsFor(m_Values.Given())) {
         Held = Statement();
         nResult = m_Into.Kept.Take(
