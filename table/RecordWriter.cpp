@@ -97,7 +97,7 @@ int RecordWriter::Bind(Verb eVerb, sqlite3_stmt* pStatement) const {
     return blByKey && nResult == SQLITE_OK ? m_Values.BindKey(pStatement, nNext) : nResult;
 }
 
-// Runs one statement to its end. nRows: how many it found or changed.
+// Runs one statement to its end. nRows, 0 before: how many it found or changed.
 int RecordWriter::Run(Verb eVerb, int& nRows) {
     const auto nVerb = static_cast<size_t>(eVerb);
     Statement& Held = m_aHeld[nVerb];
@@ -112,7 +112,6 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
         nResult = Bind(eVerb, Held.Get());
     }
     if (nResult == SQLITE_OK) {
-        nRows = 0;
         nResult = Held.Finish(&nRows);
     }
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {

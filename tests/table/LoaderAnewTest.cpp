@@ -75,7 +75,10 @@ TEST_F(LoaderAnewTest, StatementsOfEachShapeAreKept) {
     EXPECT_EQ(Add(R"({"id": 1})"), "ok");
     sqlite3_stmt* const pFirst = sqlite3_next_stmt(m_pDb, nullptr);
     EXPECT_EQ(Add(R"({"id": 2, "name": "a"})"), "ok");
-    EXPECT_EQ(sqlite3_next_stmt(m_pDb, sqlite3_next_stmt(m_pDb, nullptr)), pFirst);
+    sqlite3_stmt* const pSecond = sqlite3_next_stmt(m_pDb, nullptr);
+    EXPECT_EQ(sqlite3_next_stmt(m_pDb, pSecond), pFirst);
+    EXPECT_EQ(Add(R"({"id": 3, "name": "b"})"), "ok");
+    EXPECT_EQ(sqlite3_next_stmt(m_pDb, nullptr), pSecond);
     EXPECT_EQ(Text(m_Into.Commit()), "ok");
 }
 
