@@ -37,14 +37,7 @@ target_link_options(vornjsondb_build_flags INTERFACE ${VORNJSONDB_INSTRUMENT_FLA
 
 # ---- for the library alone -------------------------------------------------------------------
 add_library(vornjsondb_hardening INTERFACE)
-# A frame smaller than a page cannot step over the guard page of the stack. On 32-bit ARM the compiler
-# probes the stack in every function all the same, which is a twentieth of the code; there the limit
-# below stands for the probes.
-set(VORNJSONDB_PROTECTIONS -fstack-protector-strong)
-if(NOT (CMAKE_SYSTEM_PROCESSOR MATCHES "^arm" AND CMAKE_SIZEOF_VOID_P EQUAL 4))
-    list(APPEND VORNJSONDB_PROTECTIONS -fstack-clash-protection)
-endif()
-foreach(VORNJSONDB_FLAG ${VORNJSONDB_PROTECTIONS})
+foreach(VORNJSONDB_FLAG -fstack-protector-strong -fstack-clash-protection)
     string(MAKE_C_IDENTIFIER "VORNJSONDB_HAS${VORNJSONDB_FLAG}" VORNJSONDB_HAS_FLAG)
     check_cxx_compiler_flag(${VORNJSONDB_FLAG} ${VORNJSONDB_HAS_FLAG})
     if(${VORNJSONDB_HAS_FLAG})
@@ -63,7 +56,20 @@ if(NOT VORNJSONDB_SANITIZE)
             $<OR:$<CONFIG:Release>,$<CONFIG:RelWithDebInfo>,$<CONFIG:MinSizeRel>>)
     endif()
     target_compile_options(vornjsondb_hardening INTERFACE
-        "$<${VORNJSONDB_OPTIMISED}:-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=2>"
-        "$<${VORNJSONDB_OPTIMISED}:-Wframe-larger-than=2048;-Wvla>")
+        "$<${VORNJSONDB_OPTIMISED}:-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=2>")
     target_link_options(vornjsondb_hardening INTERFACE LINKER:-z,defs)
+endif()
+
+# ---- for the libraries, after the hardening ----------------------------------------------------
+# A frame smaller than a page cannot step over the guard page of the stack. On 32-bit ARM the compiler
+# probes the stack in every function all the same, which is a twentieth of the code; there the limit,
+# which holds in every optimised build, stands for the probes.
+add_library(vornjsondb_small_frames INTERFACE)
+if(NOT VORNJSONDB_SANITIZE)
+    target_compile_options(vornjsondb_small_frames INTERFACE
+        "$<${VORNJSONDB_OPTIMISED}:-Wframe-larger-than=2048;-Wvla>")
+    if(CMAKE_SYSTEM_PROCESSOR MATCHES "^arm" AND CMAKE_SIZEOF_VOID_P EQUAL 4)
+        target_compile_options(vornjsondb_small_frames INTERFACE
+            "$<${VORNJSONDB_OPTIMISED}:-fno-stack-clash-protection>")
+    endif()
 endif()

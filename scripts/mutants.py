@@ -45,7 +45,7 @@ OTHER = {
 CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TEXT) ?\(")
 # Calls that change nothing when they are made twice.
 TWICE_IS_ONCE = re.compile(
-    r"(?:clear|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
+    r"(?:clear|Clear|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
     r"|Set|Fill|FillDefaults|pfnRead|Read)$"
 )
 # Log lines may come of these, and a name that nobody knew is known afterwards.

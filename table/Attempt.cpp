@@ -32,6 +32,7 @@ std::string WaitedText(int nWaitMs) {
 }
 
 Status InTransaction(sqlite3* pDb, const Status& Outcome) {
+    // mutate(exchanged): both only look.
     const bool blGone = !Outcome.Ok() && sqlite3_get_autocommit(pDb) != 0;
     return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
 }
@@ -65,6 +66,7 @@ int Whole::Begin() {
     if (nResult == SQLITE_OK) {
         nResult = Take(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE", First);
     }
+    // mutate(exchanged): a transaction that did not begin is not undone either way.
     if (nResult == SQLITE_OK) {
         nResult = First.Finish();
     }
@@ -81,12 +83,12 @@ int Whole::Keep() {
 // A full disk and an interrupt may have undone the whole transaction already; a ROLLBACK would then
 // fail and hide the reason.
 Whole::~Whole() {
-    if (!m_blOpen || sqlite3_get_autocommit(m_pDb) != 0) {
-        return;
-    }
-    m_Undo.Finish();
-    if (m_blSavepoint) {
-        m_End.Finish();
+    // mutate(exchanged): both only look.
+    if (m_blOpen && sqlite3_get_autocommit(m_pDb) == 0) {
+        m_Undo.Finish();  // mutate(doubled): a second time there is nothing to undo.
+        if (m_blSavepoint) {
+            m_End.Finish();
+        }
     }
 }
 

@@ -147,8 +147,10 @@ Status Retold(const Status& Outcome, Retry eRetry, std::string strMessage) {
 }  // namespace
 
 Status Within(const Doing& What, const Status& Step) {
-    return Step.Ok() ? Step
-                     : Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
+    if (Step.Ok()) {
+        return Step;
+    }
+    return Retold(Step, Step.Advice(), Concat({What.Text(), ": ", Step.Message()}));
 }
 
 Status Amended(const Status& Outcome, Retry eRetry, std::string_view strMore) {

@@ -64,8 +64,10 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (vecFindings.empty() && Values.IsEmpty()) {
         Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
     }
-    const bool blByKey = How.eOnDuplicate != OnDuplicate::kStop;
-    if (!vecFindings.empty() || (blByKey && !Values.HasKey(vecFindings))) {
+    if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
+        Values.HasKey(vecFindings);
+    }
+    if (!vecFindings.empty()) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
     Status Outcome;
@@ -93,17 +95,19 @@ Status Loader::Parts::Fail(const Status& Outcome) {
     const bool blBad = eCode == StatusCode::kRefused || eCode == StatusCode::kDuplicate ||
                        eCode == StatusCode::kConstraint;
     Now.nFailed += blBad ? 1 : 0;
+    // mutate(exchanged): both only look.
     const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
     return blBad && !blGone && How.blGoOnAfterBad ? Outcome : End(Outcome);
 }
 
 Status Loader::Parts::End(const Status& Outcome) {
     Ended = Outcome;
+    // mutate(true, hoisted, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
-        All.Rollback().Ignore();
+        All.Rollback().Ignore();  // mutate(doubled): a second time there is nothing to undo.
     }
-    Now.nInserted = Kept.nInserted;
-    Now.nReplaced = Kept.nReplaced;
+    Now.nInserted = Kept.nInserted;  // mutate(exchanged): in any order.
+    Now.nReplaced = Kept.nReplaced;  // mutate(exchanged): in any order.
     Now.nSkipped = Kept.nSkipped;
     return Ended;
 }
@@ -120,8 +124,11 @@ Status Loader::Parts::EndRecord(FindingList& vecFindings) {
     if (!blFull) {
         return Outcome;
     }
-    const Status Committed = Commit();
-    return Committed.Ok() || !Ended.Ok() ? Committed : End(Committed);
+    Outcome = Commit();
+    if (Outcome.Ok() || !Ended.Ok()) {
+        return Outcome;
+    }
+    return End(Outcome);
 }
 
 Status Loader::Parts::Commit() {

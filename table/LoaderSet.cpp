@@ -37,9 +37,12 @@ void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const char* szShown) {
     const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
     Of.SetRight(nPlace);
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
+        std::string strShown = Shown(Of.Values.At(nPlace));
+        if (szShown != nullptr) {
+            strShown = szShown;
+        }
         FindingList vecFindings;
-        ReportMisfit(eMisfit, Into, szShown != nullptr ? szShown : Shown(Of.Values.At(nPlace)),
-                     vornjsondb::Below("", Into.strName), vecFindings);
+        ReportMisfit(eMisfit, Into, strShown, vornjsondb::Below("", Into.strName), vecFindings);
         Of.SetWrong(nPlace, vecFindings);
     }
 }

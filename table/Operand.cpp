@@ -75,9 +75,8 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
 
 bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& Why) {
     static constexpr char kAnyJson[] = "Json::Value";
-    Out.Value = BoundValue();
     if (jValue.isNull()) {
-        Out.eKind = ValueKind::kNull;
+        Out.eKind = ValueKind::kNull;  // mutate(dropped): a new one is of this kind.
         return true;
     }
     if (jValue.isBool()) {

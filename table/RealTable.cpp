@@ -43,24 +43,6 @@ int NumberColumn(const OwnStatement& pStatement, int nColumn) {
     return sqlite3_column_int(pStatement.get(), nColumn);
 }
 
-// Binds the text, where one is given, and gives the first column of the first row as a number; no
-// row and NULL give 0.
-int ReadNumber(const OwnStatement& pStatement, const std::string* pstrText, int& nOut) {
-    int nResult = SQLITE_OK;
-    if (pstrText != nullptr) {
-        nResult = sqlite3_bind_text(pStatement.get(), 1, pstrText->data(),
-                                    static_cast<int>(pstrText->size()), SQLITE_STATIC);
-    }
-    if (nResult == SQLITE_OK) {
-        nResult = sqlite3_step(pStatement.get());
-    }
-    if (nResult != SQLITE_ROW) {
-        return nResult == SQLITE_DONE ? SQLITE_OK : nResult;
-    }
-    nOut = sqlite3_column_int(pStatement.get(), 0);
-    return SQLITE_OK;
-}
-
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
@@ -81,7 +63,6 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     // Hidden columns of virtual tables are no part of a row; generated ones are, of either kind.
     constexpr int kHidden = 1;
-    Out = RealTable();
     const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
         if (NumberColumn(pRow, 5) == kHidden) {
             return;
@@ -122,15 +103,10 @@ int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
     static constexpr char kSql[] =
         "SELECT type = 'view' FROM (SELECT name, type FROM sqlite_temp_master UNION ALL"
         " SELECT name, type FROM sqlite_master)"
-        " WHERE name = ?1 COLLATE NOCASE AND type IN ('table', 'view')";
-    OwnStatement pStatement;
-    int nView = 0;
-    int nResult = Prepare(pDb, kSql, pStatement);
-    if (nResult == SQLITE_OK) {
-        nResult = ReadNumber(pStatement, &strTable, nView);
-    }
-    blView = nView != 0;
-    return nResult;
+        " WHERE name = ?1 COLLATE NOCASE AND type IN ('table', 'view') LIMIT 1";
+    blView = false;  // mutate(dropped): it is so before the one call.
+    return ForEachRow(pDb, kSql, strTable,
+                      [&](const OwnStatement& pRow) { blView = NumberColumn(pRow, 0) != 0; });
 }
 
 namespace {
@@ -159,20 +135,19 @@ int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& st
         blSame = true;
         return SQLITE_OK;
     }
-    const std::string strJson =
-        "json_valid(" + strRight + ") THEN json(" + strLeft + ") IS json(" + strRight + ") WHEN ";
-    OwnStatement pStatement;
-    int nSame = 0;
-    int nResult = Prepare(pDb,
-                          "SELECT CASE WHEN " + (blJson ? strJson : "") + "1 THEN (" + strLeft +
-                              ") IS (" + strRight + ") END",
-                          pStatement);
-    if (nResult == SQLITE_OK) {
-        nResult = ReadNumber(pStatement, nullptr, nSame);
+    std::string strSql = "SELECT CASE WHEN ";
+    if (blJson) {
+        Append(strSql, {"json_valid(", strRight, ") THEN json(", strLeft, ") IS json(", strRight,
+                        ") WHEN "});
     }
-    const bool blUnknown = nResult == SQLITE_ERROR;
-    blSame = blUnknown || nSame != 0;
-    return blUnknown ? SQLITE_OK : nResult;
+    Append(strSql, {"1 THEN (", strLeft, ") IS (", strRight, ") END"});
+    OwnStatement pStatement;
+    int nResult = Prepare(pDb, strSql, pStatement);
+    if (nResult == SQLITE_OK) {
+        nResult = sqlite3_step(pStatement.get());
+    }
+    blSame = nResult != SQLITE_ROW || NumberColumn(pStatement, 0) != 0;
+    return nResult == SQLITE_ROW || nResult == SQLITE_ERROR ? SQLITE_OK : nResult;
 }
 
 }  // namespace vornjsondb

@@ -36,10 +36,12 @@ std::string OnConflict(const Members& Of, bool blReplace) {
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
         if (blReplace && !Other.blKey && !Other.blGenerated) {
+            // mutate(doubled): a column may be set twice.
             Append(strSet, {strSet.empty() ? "UPDATE SET " : ", ", Other.strQuoted, "=excluded.",
                             Other.strQuoted});
         }
     }
+    // mutate(doubled): the second one adds nothing.
     strSet.append(strSet.empty() ? "NOTHING" : "");
     return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet});
 }
@@ -48,7 +50,7 @@ std::string OnConflict(const Members& Of, bool blReplace) {
 std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     std::string strSet;
     for (size_t i = 0; i < Of.Size(); ++i) {
-        if (Values.Has(i) && !Of.At(i).blKey) {
+        if (Values.Has(i) && !Of.At(i).blKey) {  // mutate(exchanged): both only look.
             Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
@@ -91,10 +93,10 @@ int RecordWriter::Take(Verb eVerb, Statement& Held) {
         LetterOf(eVerb) + m_Values.Given(), [&] { return Sql(eVerb); }, Held);
 }
 
-// Runs one statement to its end. nRows: how many it found or changed.
+// Runs one statement to its end. nRows, 0 before: how many it found or changed.
 int RecordWriter::Run(Verb eVerb, int& nRows) {
     Statement& Held = m_aHeld[static_cast<size_t>(eVerb)];
-    int nResult = Held.IsFor(LetterOf(eVerb), m_Values.Given()) ? SQLITE_OK : Take(eVerb, Held);
+    int nResult = Held.IsFor(m_Values.Given()) ? SQLITE_OK : Take(eVerb, Held);
     int nNext = 1;
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
         nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate);
@@ -103,7 +105,6 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
         nResult = m_Values.BindKey(Held.Get(), nNext);
     }
     if (nResult == SQLITE_OK) {
-        nRows = 0;
         nResult = Held.Finish(&nRows);
     }
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {

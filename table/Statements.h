@@ -50,9 +50,9 @@ class Statement {
     // reset.
     int Finish(int* pnRows = nullptr) const;
 
-    // Whether its shape is the letter and the text.
-    bool IsFor(char cFirst, std::string_view strRest) const {
-        return m_strShape.size() == strRest.size() + 1 && m_strShape[0] == cFirst &&
+    // Whether its shape is a letter and the text.
+    bool IsFor(std::string_view strRest) const {
+        return m_strShape.size() == strRest.size() + 1 &&
                std::string_view(m_strShape).substr(1) == strRest;
     }
 

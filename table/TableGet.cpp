@@ -33,6 +33,7 @@ Status FirstStep(Table::Parts& From, const Doing& What, std::string_view strShap
                  Callable<std::string()> fnSql, Callable<int(sqlite3_stmt*)> fnBind,
                  Statement& Lent, int& nResult) {
     return Attempt(From.pDb, From.How.nWaitMs, [&]() -> Status {
+        // mutate(dropped): the same follows, only that the statement of the try before is not kept.
         Lent = Statement();
         nResult = From.Kept.Take(strShape, fnSql, Lent);
         if (nResult == SQLITE_OK) {
@@ -59,7 +60,6 @@ bool TakeKey(Parts& Of, const Json::Value& jKey, FindingList& vecFindings) {
     const std::vector<size_t>& vecKey = Of.Of.Key();
     if (vecKey.size() == 1 &&
         vornjsondb::FindMember(jKey, Of.Of.At(vecKey[0]).strName) == nullptr) {
-        Of.Wanted.Clear();
         Of.Wanted.SetJson(vecKey[0], jKey, vecFindings);
     } else {
         Of.Wanted.Take(jKey, vecFindings);

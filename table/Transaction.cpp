@@ -52,7 +52,7 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     if (nPrepared != SQLITE_OK) {
         return vornjsondb::FailBySqlite(pDb, nPrepared, What);
     }
-    return vornjsondb::Attempt(pDb, nWaitMs, [&]() -> Status {
+    const auto fnBegin = [&]() -> Status {
         const int nResult = Finish(pFirst.get());
         if (nResult != SQLITE_OK) {
             return vornjsondb::FailBySqlite(pDb, nResult, What);
@@ -61,7 +61,8 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
         m_pUndo = pUndo.release();
         m_pEnd = pEnd.release();
         return {};
-    });
+    };
+    return vornjsondb::Attempt(pDb, nWaitMs, fnBegin);
 }
 
 int Transaction::Undo() {

@@ -80,7 +80,7 @@ mkfifo go
     echo 'BEGIN EXCLUSIVE; SELECT 1;'
     cat go
 ) | sqlite3 shop.db >held &
-until [[ -s held ]]; do :; done
+until [[ -s held ]]; do sleep 0.01; done
 "$VORNJSONDB" doctor shop.db --wait 10 >out 2>err
 same 'exit of doctor' $? 6
 same 'who holds it' "$(sed 's/[0-9]\+ (/N (/' out | grep writes)" 'lock   process N (sqlite3) writes, and nobody else may read'

@@ -160,9 +160,9 @@ mkfifo slow
 "$VORNJSONDB" insert both.db t slow --key id 2>err &
 pid=$!
 exec 3>slow
-until [[ -e both.db ]]; do :; done
-expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert both.db t lines --key id
 echo '{"id": 1, "text": 5}' >&3
+until [[ -e both.db ]]; do sleep 0.01; done
+expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert both.db t lines --key id
 exec 3>&-
 wait "$pid"
 same 'exit of the second' $? 4
@@ -170,7 +170,7 @@ same 'the second' "$(cat err)" \
     'error: both.db: another program has just made the table "t"; try again, into that table (nothing is stored)'
 expect 0 2000 '' -- count both.db t
 echo '[{"id": 1}, {"id": null}' >broken.json
-expect 3 '' 'error: broken.json:1: the input ends inside of the list, after record 2; correct the input (nothing is stored)' \
+expect 3 '' 'error: broken.json:2: the input ends inside of the list, after record 2; correct the input (nothing is stored)' \
     -- insert fresh.db t broken.json
 same 'no file is left' "$(ls fresh.db 2>/dev/null)" ''
 
@@ -180,7 +180,7 @@ mkfifo go
     echo 'BEGIN IMMEDIATE; SELECT 1;'
     cat go
 ) | sqlite3 all.db >held &
-until [[ -s held ]]; do :; done
+until [[ -s held ]]; do sleep 0.01; done
 locked='database is locked (waited 10 ms); try again, or wait longer with --wait MS'
 expect 0 0 '' -- count all.db t
 expect 6 '' "error: all.db: cannot begin a transaction: $locked (nothing is stored)" -- \

@@ -66,7 +66,7 @@ TEST_F(DefinitionLintTest, NamesOfMembers) {
                             "a": {"cpptype": "int", "cppDefaultValue": 0}})"),
               "same-column /t/member/a: \"a\" is another member's column: letter case makes no "
               "difference");
-    for (const char* szName : {"order", "a b", "1st", "a.b", "null", "current_time", "a'", "a--"}) {
+    for (const char* szName : {"order", "a b", "1st", "a.b", "null", "current_date", "a'", "a--"}) {
         EXPECT_EQ(OfMembers(std::string("{\"") + szName +
                             R"(": {"cpptype": "int", "cppDefaultValue": 0}})"),
                   std::string("old-name /t/member/") + szName + ": member \"" + szName + "\"" +
@@ -82,6 +82,12 @@ TEST_F(DefinitionLintTest, NamesOfMembers) {
     EXPECT_EQ(Text(LintDefinition("group", Parse(R"({"group": {"member": {
                   "a": {"cpptype": "int", "cppDefaultValue": 0}}}})"))),
               "old-name /group: table \"group\"" + strOldName);
+}
+
+TEST_F(DefinitionLintTest, NothingOfSqliteStaysOpen) {
+    const sqlite3_int64 nBytes = sqlite3_memory_used();
+    EXPECT_EQ(OfMembers(R"({"a": {"cpptype": "int", "cppDefaultValue": 0}})"), "");
+    EXPECT_EQ(sqlite3_memory_used(), nBytes);
 }
 
 TEST_F(DefinitionLintTest, NamesThatAQueryHasAnotherMeaningFor) {

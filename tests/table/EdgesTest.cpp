@@ -99,6 +99,31 @@ TEST_F(EdgesTest, KeyThatIsNotTheRowidTakesNull) {
     EXPECT_EQ(Lint(), "");
 }
 
+// The comparison of the two defaults is the one statement that is longer than SQLite takes now.
+TEST_F(EdgesTest, DefaultThatCannotBeComparedEndsTheComparison) {
+    const std::string strLong = "'" + std::string(2000, 'x') + "'";
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, note TEXT DEFAULT " + strLong + ")",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "note": {"cpptype": "string", "cppDefaultValue": "x"}, "other": {"cpptype": "int"}}})");
+    const int nLength = sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, 2000);
+    EXPECT_EQ(Lint(),
+              "refused: cannot compare the definition with table \"item\": string or blob too big");
+    sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, nLength);
+    EXPECT_EQ(
+        Lint(),
+        "other-default /item/member/note: member \"note\" has the default 'x', and its column " +
+            strLong + "; missing-column /item/member/other: member \"other\" has no column");
+}
+
+// "-m." could be the path "." into "-m", which is none, or "m." the other way round.
+TEST_F(EdgesTest, SortTermIsWhatTheTableHas) {
+    Meet(R"(CREATE TABLE item (id INTEGER PRIMARY KEY, "-m" TEXT, "m." TEXT))",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "-m": {"cpptype": "Json::Value"},
+             "m.": {"cpptype": "string"}}})");
+    Run("INSERT INTO item VALUES (1, '1', 'a'), (2, '2', 'c'), (3, '3', 'b')");
+    EXPECT_EQ(Ids(Query().Sort("-m.")), "2,3,1");
+}
+
 TEST_F(EdgesTest, EmptyNameIsNoNameOfSql) {
     EXPECT_EQ(Text(LintDefinition("t", Parse(R"({"t": {"member": {"": {"cpptype": "string",
                   "cppDefaultValue": "x"}}}})"))),

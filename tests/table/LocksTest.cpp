@@ -88,6 +88,21 @@ TEST_F(LocksTest, ReaderThatStandsInTheWayOfACommitIsWaitedFor) {
     EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
 }
 
+// The first try inserts, with the default of "done", the second one finds the other's record.
+TEST_F(LocksTest, FurtherTryWritesOnlyWhatWasGiven) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time([this](int nPause) {
+        if (nPause == 2) {
+            Other("COMMIT; INSERT INTO task (id, done) VALUES (1, 1)");
+        }
+    });
+    Written eWritten = Written::kInserted;
+    EXPECT_EQ("ok", Text(m_Table.Save(Parse(R"({"id": 1, "name": "a"})"), OnDuplicate::kUpsert,
+                                      &m_jStored, &eWritten)));
+    EXPECT_EQ(R"({"done":true,"id":1,"name":"a"})", Text(m_jStored));
+    EXPECT_EQ(Written::kUpdated, eWritten);
+}
+
 TEST_F(LocksTest, InsideOfATransactionThereIsNoWaiting) {
     EXPECT_EQ("ok", Create(1));
     Transaction All;
@@ -164,6 +179,26 @@ TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
     Other("COMMIT");
     EXPECT_EQ("ok", Text(Into.Commit()));
     EXPECT_EQ(1, Into.Counts().nCommitted);
+}
+
+// Nobody would call again with the record that filled the transaction.
+TEST_F(LocksTest, LoaderEndsWhenAFullTransactionCannotBeCommitted) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time;
+    LoadOptions How;
+    How.nRowsPerTransaction = 2;
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table, How)));
+    EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
+    const std::string strLocked =
+        "locked: cannot load records into table \"task\": cannot commit a transaction: database is "
+        "locked (waited 5000 ms)";
+    EXPECT_EQ(strLocked, Text(Into.Add(Parse(R"({"id": 2})"))));
+    EXPECT_EQ(0, Into.Counts().nInserted);
+    Other("COMMIT");
+    EXPECT_EQ(strLocked, Text(Into.Commit()));
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ(R"({"done":false,"id":1})", Text(m_jStored));
 }
 
 TEST_F(LocksTest, LoaderThatCannotBeginNamesTheTable) {

@@ -133,6 +133,19 @@ TEST_F(TableMemoryTest, WhatWritesOneRecord) {
     Try([&](Table& Into) { return End(Into.Create(m_jRecord)); });
 }
 
+// So deep that the reader is asked how many levels it takes.
+TEST_F(TableMemoryTest, WhatWritesManyLevels) {
+    Json::Value jDeep;
+    for (int i = 0; i < 130; ++i) {
+        Json::Value jOuter(Json::arrayValue);
+        jOuter.append(jDeep);
+        jDeep = jOuter;
+    }
+    Json::Value jRecord;
+    jRecord["tags"] = jDeep;
+    Try([&](Table& Into) { return End(Into.Create(jRecord)); });
+}
+
 TEST_F(TableMemoryTest, WhatReads) {
     const Query Some = Query(Parse(R"({"where": {"name": {"$ne": "x"}, "tags[0]": {"$in":
         [1, null, "a text that is longer than what a string holds by itself"]}},

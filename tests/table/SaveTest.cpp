@@ -243,6 +243,15 @@ TEST_F(SaveTest, ColumnCalledRowidIsNotTheRowid) {
     EXPECT_EQ(R"({"oid":5,"rowid":"a"})", Create(R"({"rowid": "a", "oid": 5})"));
 }
 
+// A trigger on the key has nothing to do with a change of other members.
+TEST_F(SaveTest, UpsertLeavesTheKeyAlone) {
+    Open();
+    Run("INSERT INTO task (id, name) VALUES (1, 'a');"
+        "CREATE TRIGGER t BEFORE UPDATE OF id ON task BEGIN SELECT RAISE(ABORT, 'key'); END");
+    EXPECT_EQ(Save(R"({"id": 1, "name": "b"})", OnDuplicate::kUpsert),
+              R"(updated {"done":false,"id":1,"name":"b"})");
+}
+
 }  // namespace
 
 }  // namespace VORN_JSON_DB

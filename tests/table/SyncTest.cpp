@@ -371,6 +371,20 @@ TEST_F(SyncOfFileTest, ReadsTheTableAgainOnceItHasTheLock) {
     EXPECT_EQ(sqlite3_close(pOther), SQLITE_OK);
 }
 
+// All is done again, because a COMMIT that fails undoes it.
+TEST_F(SyncOfFileTest, EachStatementIsToldOnceHoweverOftenItRan) {
+    sqlite3* pOther = nullptr;
+    OpenDb(pOther);
+    Run(pOther, "BEGIN; SELECT * FROM item");
+    const FakeTime Time([&](int nPause) {
+        if (nPause == 2) {
+            Run(pOther, "COMMIT");
+        }
+    });
+    EXPECT_EQ(SyncBy(m_pDb), "ok 2");
+    EXPECT_EQ(sqlite3_close(pOther), SQLITE_OK);
+}
+
 TEST_F(SyncOfFileTest, OfSeveralProcessesOneChangesTheTable) {
     std::vector<pid_t> vecChildren;
     for (int i = 0; i < 4; ++i) {

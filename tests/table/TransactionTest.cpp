@@ -127,6 +127,39 @@ TEST_F(TransactionTest, OtherFailuresLeaveTheCallersTransaction) {
     EXPECT_EQ("1", Rows("SELECT count(*) FROM task"));
 }
 
+TEST_F(TransactionTest, WhatFailsLeavesNoSavepoint) {
+    Open();
+    Run("BEGIN; INSERT INTO task (id) VALUES (1)");
+    Json::Value jStored;
+    EXPECT_EQ(m_Table.Create(Parse(R"({"id": 1})"), &jStored).Code(), StatusCode::kDuplicate);
+    EXPECT_EQ(sqlite3_exec(m_pDb, "RELEASE vornjsondb", nullptr, nullptr, nullptr), SQLITE_ERROR);
+    Transaction Inner;
+    EXPECT_EQ(Text(Inner.Begin(m_pDb)), "ok");
+    EXPECT_EQ(Text(Inner.Rollback()), "ok");
+    EXPECT_EQ(sqlite3_exec(m_pDb, "RELEASE vornjsondb", nullptr, nullptr, nullptr), SQLITE_ERROR);
+    Run("COMMIT");
+    EXPECT_EQ(Rows("SELECT id FROM task"), "1");
+}
+
+TEST_F(TransactionTest, NothingBeginsThatCouldNotBeUndone) {
+    Options How;
+    How.nStatements = 0;
+    Open(kTasks, How);
+    const auto fnNoRollback = [](void*, int nAction, const char* szWhat, const char*, const char*,
+                                 const char*) {
+        const bool blRollback = nAction == SQLITE_TRANSACTION && std::string(szWhat) == "ROLLBACK";
+        return blRollback ? SQLITE_DENY : SQLITE_OK;
+    };
+    sqlite3_set_authorizer(m_pDb, fnNoRollback, nullptr);
+    Json::Value jStored;
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 1})"), &jStored)),
+              "refused: cannot save a record in table \"task\": not authorized");
+    Transaction All;
+    EXPECT_EQ(Text(All.Begin(m_pDb)), "refused: cannot begin a transaction: not authorized");
+    EXPECT_NE(sqlite3_get_autocommit(m_pDb), 0);
+    EXPECT_EQ(Rows("SELECT count(*) FROM task"), "0");
+}
+
 }  // namespace
 
 }  // namespace VORN_JSON_DB
