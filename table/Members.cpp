@@ -110,7 +110,11 @@ size_t Members::Find(std::string_view strName) const {
         if (nOrder == 0) {
             return nMiddle;
         }
-        (nOrder < 0 ? nTo : nFrom) = nOrder < 0 ? nMiddle : nMiddle + 1;
+        if (nOrder < 0) {
+            nTo = nMiddle;
+        } else {
+            nFrom = nMiddle + 1;
+        }
     }
     return kNone;
 }

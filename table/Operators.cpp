@@ -77,7 +77,10 @@ std::string OperatorSuggestion(std::string_view strName) {
             return Concat({" (did you mean \"", szPair[1], "\"?)"});
         }
     }
-    std::vector<std::string> vecNames = {"$and", "$or", "$not"};
+    std::vector<std::string> vecNames;
+    for (const char* szName : {"$and", "$or", "$not"}) {
+        vecNames.emplace_back(szName);
+    }
     for (const Operator& Row : kOperators) {
         vecNames.emplace_back(Row.szName);
     }

@@ -114,8 +114,10 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
     const bool blGood = strName.size() > kMostPathBytes
                             ? Why.Tell(FindingCode::kBadPath, "it is too long")
                             : TakeSteps(strName.substr(nEnd), Out.strPath, Why);
-    return blGood ||
-           Why.Tell(Why.eCode, Concat({"path ", ShownText(strName), ": ", Why.strMessage}));
+    if (blGood) {
+        return true;
+    }
+    return Why.Tell(Why.eCode, Concat({"path ", ShownText(strName), ": ", Why.strMessage}));
 }
 
 std::string ValueAt(const std::string& strColumn, const std::string& strPath) {

@@ -76,6 +76,22 @@ TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
     EXPECT_EQ(Rows("SELECT count(*) FROM item"), "0");
 }
 
+TEST_F(LoaderSetTest, BooleansAreForMembersOfTheirKind) {
+    m_Into.SetBoolean(m_Into.MemberIndex("name"), false);
+    EXPECT_EQ(
+        Text(m_Into.EndRecord()),
+        "refused: cannot load record 1 into table \"item\": member \"name\": false is another "
+        "kind of value: expected is a text [wrong-kind /name]");
+    m_Into.SetBoolean(-1, false);
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 2 into table \"item\": there is no member of number -1 "
+              "[unknown-member ]");
+    Loader NotStarted;
+    NotStarted.SetBoolean(0, true);
+    EXPECT_EQ(Text(NotStarted.EndRecord()),
+              "misuse: cannot load records: the loader is not started");
+}
+
 TEST_F(LoaderSetTest, MembersOfABadRecordAreForgotten) {
     m_Into.SetText(m_Into.MemberIndex("name"), "a");
     EXPECT_EQ(Add("list", "{}"),
