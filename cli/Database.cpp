@@ -83,13 +83,13 @@ void CheckFile(const std::string& strFile, Access eAccess) {
     }
 }
 
-bool SameName(const std::string& strOne, const std::string& strOther) {
-    return sqlite3_stricmp(strOne.c_str(), strOther.c_str()) == 0;
+bool SameName(const std::string& strLeft, const std::string& strRight) {
+    return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
 }
 
 bool HasName(const std::vector<std::string>& vecNames, const std::string& strName) {
     return std::any_of(vecNames.begin(), vecNames.end(),
-                       [&](const std::string& strOther) { return SameName(strOther, strName); });
+                       [&](const std::string& strEach) { return SameName(strEach, strName); });
 }
 
 // Members without a column go; columns that are no member come, but those that can be none.

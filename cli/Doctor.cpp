@@ -109,7 +109,7 @@ int RunDoctor(Context& Call) {
     AppendLocks(Call.Db(), "-shm", jRows);
     WriteObjects(Call, jRows, {"check", "result"});
     if (Locked.nExit != kExitFine) {
-        throw Locked;
+        throw Error(Locked);
     }
     return blSound ? kExitFine : kExitBadData;
 }

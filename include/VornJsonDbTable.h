@@ -463,7 +463,8 @@ class Loader {
     void SetText(int nMember, std::string_view strText);
     void SetJson(int nMember, std::string_view strJson);  // is checked, and stored in compact form
     void SetBlob(int nMember, const void* pBytes, size_t nBytes);  // for members of type "any"
-    void Reject(std::string strReason);  // the record is bad for a reason that the caller knows
+    void Reject(
+        const std::string& strReason);  // the record is bad for a reason that the caller knows
     Status EndRecord();
 
     // Needed at the end; useful between, where a stop must not lose what was done. After kLocked

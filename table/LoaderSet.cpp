@@ -19,9 +19,9 @@ using vornjsondb::FindingCode;
 using vornjsondb::Misfit;
 using Parts = Loader::Parts;
 
-void SetWrong(Parts& Of, size_t nPlace, FindingCode eCode, std::string strMessage) {
+void SetWrong(Parts& Of, size_t nPlace, FindingCode eCode, std::string_view strMessage) {
     FindingList vecFindings;
-    Report(vecFindings, eCode, "", std::move(strMessage));
+    Report(vecFindings, eCode, "", strMessage);
     Of.SetWrong(nPlace, vecFindings);
 }
 
@@ -206,9 +206,9 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
     }
 }
 
-void Loader::Reject(std::string strReason) {
+void Loader::Reject(const std::string& strReason) {
     if (m_pParts) {
-        SetWrong(*m_pParts, m_pParts->WholePlace(), FindingCode::kRejected, std::move(strReason));
+        SetWrong(*m_pParts, m_pParts->WholePlace(), FindingCode::kRejected, strReason);
     }
 }
 

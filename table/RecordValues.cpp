@@ -168,7 +168,7 @@ int RecordValues::BindKey(sqlite3_stmt* pStatement, int& nNext) const {
 }
 
 void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShown,
-                  std::string strPath, FindingList& vecFindings) {
+                  std::string_view strPath, FindingList& vecFindings) {
     struct MisfitRow {
         Misfit eMisfit;
         FindingCode eCode;
@@ -185,7 +185,7 @@ void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShow
          " could not be read back by a VornJsonDbApi, although it is "},
     };
     if (eMisfit == Misfit::kNone) {
-        Report(vecFindings, FindingCode::kGenerated, std::move(strPath),
+        Report(vecFindings, FindingCode::kGenerated, strPath,
                Concat({"member ", Into.strQuoted, " is computed by the table"}));
         return;
     }
@@ -194,7 +194,7 @@ void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShow
         ++pRow;
     }
     Report(
-        vecFindings, pRow->eCode, std::move(strPath),
+        vecFindings, pRow->eCode, strPath,
         Concat({"member ", Into.strQuoted, ": ", strShown, pRow->szReason, Expected(*Into.pType)}));
 }
 

@@ -45,7 +45,7 @@ class RecordValues {
             Grow(strOwn, strBytes.size());
         }
         strBytes.copy(strOwn.data(), strBytes.size());
-        strOwn.data()[strBytes.size()] = '\0';
+        strOwn[strBytes.size()] = '\0';
         return {strOwn.data(), strBytes.size()};
     }
 
@@ -127,7 +127,7 @@ class RecordValues {
 
 // What a misfit means to the caller; kNone: the table computes the member.
 void ReportMisfit(Misfit eMisfit, const Member& Into, const std::string& strShown,
-                  std::string strPath, FindingList& vecFindings);
+                  std::string_view strPath, FindingList& vecFindings);
 
 }  // namespace vornjsondb
 

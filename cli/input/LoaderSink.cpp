@@ -140,7 +140,7 @@ void LoaderSink::SetObject(const Column& Into, std::string_view strJson) {
         if (blBytes) {
             return m_Into.SetBlob(Into.nLoader, strBytes.data(), strBytes.size());
         }
-        m_Into.Reject("member \"" + Into.strName + "\": its \"encoded\" is no base64");
+        m_Into.Reject("member \"" + Into.strName + R"(": its "encoded" is no base64)");
         return;
     }
     m_Into.SetJson(Into.nLoader, strJson);
