@@ -58,7 +58,9 @@ class ConditionWriter {
         const auto itDeepest = std::max_element(
             vecNodes.begin(), vecNodes.end(),
             [](const Node* pLeft, const Node* pRight) { return pLeft->nLevels < pRight->nLevels; });
-        std::rotate(vecNodes.begin(), itDeepest, itDeepest + 1);
+        const Node* pDeepest = *itDeepest;
+        std::move_backward(vecNodes.begin(), itDeepest, itDeepest + 1);
+        vecNodes.front() = pDeepest;
         const Chain All{vecNodes, eKind == Kind::kAll ? " AND " : " OR ", nLevel + 1, blOpen};
         const size_t nParts = vecNodes.size();
         const size_t nOpen = blOpen && eKind == Kind::kAll ? std::min(nParts, kOpenParts) : nParts;

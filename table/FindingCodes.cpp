@@ -73,7 +73,7 @@ void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings) {
 
 void ReportRefusal(const std::string& strWords, FindingList& vecFindings) {
     for (const RefusalRow& Row : kRefusals) {
-        if (strWords.find(Row.szWords) != std::string::npos) {
+        if (std::strstr(strWords.c_str(), Row.szWords) != nullptr) {
             Report(vecFindings, Row.eCode, "/where", Row.szMessage);
         }
     }

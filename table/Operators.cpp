@@ -1,6 +1,7 @@
 #include "Operators.h"
 
 #include <iterator>
+#include <utility>
 #include <vector>
 
 #include "Concat.h"
@@ -82,7 +83,8 @@ std::string OperatorSuggestion(std::string_view strName) {
         vecNames.emplace_back(szName);
     }
     for (const Operator& Row : kOperators) {
-        vecNames.emplace_back(Row.szName);
+        std::string strOne = Row.szName;
+        vecNames.push_back(std::move(strOne));
     }
     return Suggestion(strName, vecNames);
 }

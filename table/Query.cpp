@@ -71,8 +71,9 @@ Condition Group(Node::Kind eKind, std::vector<Condition> vecParts) {
         pNode->nLeaves += Each.nLeaves;
         pNode->nLevels = std::max(pNode->nLevels, Each.nLevels + (blSame ? 0 : 1));
         if (blSame) {
-            pNode->vecParts.insert(pNode->vecParts.end(), Each.vecParts.begin(),
-                                   Each.vecParts.end());
+            for (Condition Inner : Each.vecParts) {
+                pNode->vecParts.push_back(std::move(Inner));
+            }
         } else {
             pNode->vecParts.push_back(std::move(Part));
         }

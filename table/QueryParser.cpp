@@ -1,6 +1,7 @@
 #include "QueryParser.h"
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "../src/base/JsonMember.h"
@@ -84,7 +85,8 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
     }
     std::vector<std::string> vecKeys;
     for (const QueryKey& Key : kKeys) {
-        vecKeys.emplace_back(Key.szKey);
+        std::string strOne = Key.szKey;
+        vecKeys.push_back(std::move(strOne));
     }
     const std::string strKey(Name.pBegin, Name.pEnd);
     Report(Out.vecFindings, FindingCode::kUnknownQueryKey, Below("", strKey),

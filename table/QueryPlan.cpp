@@ -45,7 +45,7 @@ void CheckPage(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
 }  // namespace
 
 void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
-    vecFindings.insert(vecFindings.end(), Which.vecFindings.begin(), Which.vecFindings.end());
+    vecFindings = Which.vecFindings;
     if (HasError(vecFindings)) {
         return;
     }
@@ -63,11 +63,13 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
     }
     m_nTailEnd = m_Sql.strSql.size();
     for (const size_t nMember : m_vecColumns) {
-        m_Sql.strSql += " " + std::to_string(nMember);
+        Append(m_Sql.strSql, {" ", DigitsOf(nMember)});
     }
 }
 
+// Any number of names in any order, the same ones too: each member once, in the members' order.
 void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
+    std::string strNamed(Which.vecMembers.empty() ? 0 : m_Of.Size(), '0');
     for (size_t i = 0; i < Which.vecMembers.size(); ++i) {
         Place Where;
         Problem Why;
@@ -76,12 +78,16 @@ void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
                    Concat({ShownText(Which.vecMembers[i]), " is a path"})};
         }
         if (!Why.strMessage.empty()) {
-            Report(vecFindings, Why.eCode, Below("/members", std::to_string(i)), Why.strMessage);
+            Report(vecFindings, Why.eCode, Below("/members", DigitsOf(i)), Why.strMessage);
+            continue;
         }
-        m_vecColumns.push_back(Where.nMember);
+        strNamed[Where.nMember] = '1';
     }
-    std::sort(m_vecColumns.begin(), m_vecColumns.end());
-    m_vecColumns.erase(std::unique(m_vecColumns.begin(), m_vecColumns.end()), m_vecColumns.end());
+    for (size_t i = 0; i < strNamed.size(); ++i) {
+        if (strNamed[i] == '1') {
+            m_vecColumns.push_back(i);
+        }
+    }
 }
 
 // The key comes last, so that pages follow each other without gaps, whatever sorting leaves open.
@@ -92,12 +98,12 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
         Place Where;
         Problem Why;
         bool blFound = FindPlace(m_Of, strTerm, Where, Why);
-        const bool blDescending = !blFound && strTerm.compare(0, 1, "-") == 0;
+        const bool blDescending = !blFound && strTerm[0] == '-';
         if (blDescending) {
             blFound = FindPlace(m_Of, std::string_view(strTerm).substr(1), Where, Why);
         }
         if (!blFound) {
-            Report(vecFindings, Why.eCode, Below("/sort", std::to_string(i)), Why.strMessage);
+            Report(vecFindings, Why.eCode, Below("/sort", DigitsOf(i)), Why.strMessage);
             continue;
         }
         AppendSort(Where.nMember, Where.strPath, blDescending);

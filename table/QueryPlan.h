@@ -33,7 +33,7 @@ class QueryPlan {
     ~QueryPlan() = default;
 
     // Comes first, and once. What is wrong with the query, its own findings included, goes to
-    // vecFindings; after an error nothing else may be called.
+    // vecFindings, empty before; after an error nothing else may be called.
     void Resolve(const VORN_JSON_DB::Query& Which, QueryUse eUse, FindingList& vecFindings);
 
     // Alike only for queries that give the same SQL, whatever their values: a key for the

@@ -27,7 +27,7 @@ std::string KeyList(const Members& Of) {
     for (const size_t nMember : Of.Key()) {
         Append(strList, {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted});
     }
-    return strList + ")";
+    return strList.append(")");
 }
 
 // What the INSERT does with a key that is there already: all other members anew, or nothing.
@@ -78,7 +78,8 @@ std::string RecordWriter::Sql(Verb eVerb) const {
             return InsertSql(m_Into.Of, m_Values);
         case Verb::kInsertNew:
         case Verb::kReplace:
-            return InsertSql(m_Into.Of, m_Values) + OnConflict(m_Into.Of, eVerb == Verb::kReplace);
+            return Concat(
+                {InsertSql(m_Into.Of, m_Values), OnConflict(m_Into.Of, eVerb == Verb::kReplace)});
         case Verb::kUpdate:
             return UpdateSql(m_Into.Of, m_Values);
         default:
