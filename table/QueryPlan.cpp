@@ -63,7 +63,7 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
     }
     m_nTailEnd = m_Sql.strSql.size();
     for (const size_t nMember : m_vecColumns) {
-        Append(m_Sql.strSql, {" ", DigitsOf(nMember)});
+        Append(m_Sql.strSql, {" ", DigitsOf(static_cast<std::int64_t>(nMember))});
     }
 }
 
@@ -78,7 +78,8 @@ void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
                    Concat({ShownText(Which.vecMembers[i]), " is a path"})};
         }
         if (!Why.strMessage.empty()) {
-            Report(vecFindings, Why.eCode, Below("/members", DigitsOf(i)), Why.strMessage);
+            Report(vecFindings, Why.eCode,
+                   Below("/members", DigitsOf(static_cast<std::int64_t>(i))), Why.strMessage);
             continue;
         }
         strNamed[Where.nMember] = '1';
@@ -103,7 +104,8 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
             blFound = FindPlace(m_Of, std::string_view(strTerm).substr(1), Where, Why);
         }
         if (!blFound) {
-            Report(vecFindings, Why.eCode, Below("/sort", DigitsOf(i)), Why.strMessage);
+            Report(vecFindings, Why.eCode, Below("/sort", DigitsOf(static_cast<std::int64_t>(i))),
+                   Why.strMessage);
             continue;
         }
         AppendSort(Where.nMember, Where.strPath, blDescending);
