@@ -32,7 +32,11 @@ void CheckValue(TableHost& Host, const std::string& strName, const Json::Value& 
     } else if (jGiven.isBool()) {
         Require(jStored == jGiven, "a boolean is stored");
     } else if (jGiven.isIntegral() && jGiven.type() != Json::realValue && strName != "f") {
-        Require(jStored.isNumeric() && jStored.asDouble() == jGiven.asDouble(),
+        // As digits, where it is no fraction: JsonCpp rounds an unsigned number that becomes a
+        // double otherwise than one with a sign.
+        const bool blReal = jStored.type() == Json::realValue;
+        Require(jStored.isNumeric() && (blReal ? jStored.asDouble() == jGiven.asDouble()
+                                               : jStored.asString() == jGiven.asString()),
                 "a number is stored");
     } else if (jGiven.isObject() || jGiven.isArray()) {
         Require(Host.Ask("SELECT \"" + strName + "\" FROM t") == Compact(jGiven),
