@@ -27,32 +27,6 @@ std::string Pretty(const Json::Value& jValue) {
     return Json::writeString(Builder, jValue);
 }
 
-// What a name leads to; standard input's "-", too.
-bool LooksAt(const std::string& strPath, struct stat& Found) {
-    return (strPath == "-" ? fstat(STDIN_FILENO, &Found) : stat(strPath.c_str(), &Found)) == 0;
-}
-
-// --errors begins with an empty file, whatever was in it.
-void CheckErrorFile(const Context& Call, const InsertOptions& How) {
-    std::vector<std::string> vecNeeded = How.vecFiles;
-    vecNeeded.push_back(Call.Text("--def"));
-    for (const char* const szSuffix : {"", "-journal", "-wal", "-shm"}) {
-        vecNeeded.push_back(Call.Db() + szSuffix);
-    }
-    struct stat Errors {};
-    if (stat(How.strErrors.c_str(), &Errors) != 0 || !S_ISREG(Errors.st_mode)) {
-        return;
-    }
-    for (const std::string& strPath : vecNeeded) {
-        struct stat Needed {};
-        if (LooksAt(strPath, Needed) && Needed.st_dev == Errors.st_dev &&
-            Needed.st_ino == Errors.st_ino) {
-            Fail(kExitUsage, "--errors: " + How.strErrors +
-                                 " is read or written by this call itself; name another file");
-        }
-    }
-}
-
 // The first look at all records. Bad ones are an Error unless they are to be left out later.
 class TypesSink : public Inference {
   public:
@@ -368,8 +342,12 @@ void Import::Load() {
     }
     std::unique_ptr<ErrorFile> pErrors;
     if (!m_How.strErrors.empty()) {
-        CheckErrorFile(m_Call, m_How);
-        pErrors = std::make_unique<ErrorFile>(m_How.strErrors);
+        std::vector<std::string> vecNeeded = m_How.vecFiles;
+        vecNeeded.push_back(m_Call.Text("--def"));
+        for (const char* const szSuffix : {"", "-journal", "-wal", "-shm"}) {
+            vecNeeded.push_back(m_Call.Db() + szSuffix);
+        }
+        pErrors = std::make_unique<ErrorFile>(m_How.strErrors, vecNeeded);
     }
     Prepare();
     const bool blMode = m_How.eOnDuplicate != OnDuplicate::kStop;

@@ -1,7 +1,5 @@
 #include "LoaderSink.h"
 
-#include <cerrno>
-#include <cstring>
 #include <utility>
 
 #include "../Command.h"
@@ -9,7 +7,6 @@
 #include "InputFiles.h"
 #include "JsonQuote.h"
 #include "Numbers.h"
-#include "Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -27,47 +24,11 @@ bool IsOfRecord(const Status& Outcome) {
            Outcome.Code() == StatusCode::kConstraint;
 }
 
-// JSON holds nothing but UTF-8.
-std::string WithoutBadBytes(std::string_view strBytes) {
-    std::string strText(strBytes);
-    for (size_t i = FindNoUtf8(strText); i != std::string::npos; i = FindNoUtf8(strText)) {
-        strText.replace(i, 1, "\xEF\xBF\xBD");
-    }
-    return strText;
-}
-
 std::string At(const std::string& strInput, const Place& Where) {
     return strInput + ":" + std::to_string(Where.nLine);
 }
 
 }  // namespace
-
-ErrorFile::ErrorFile(const std::string& strPath)
-    : m_strPath(strPath), m_pFile(std::fopen(strPath.c_str(), "we")) {
-    if (m_pFile == nullptr) {
-        Fail(kExitIo, strPath + ": " + std::strerror(errno) + "; name another file for --errors");
-    }
-}
-
-void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::string& strReason) {
-    std::string strLine = "{\"file\":";
-    AppendQuoted(strInput, strLine);
-    strLine += ",\"line\":" + std::to_string(Where.nLine) +
-               ",\"record\":" + std::to_string(Where.nRecord) + ",\"reason\":";
-    AppendQuoted(strReason, strLine);
-    strLine += ",\"text\":";
-    AppendQuoted(WithoutBadBytes(Where.strText), strLine);
-    strLine += "}\n";
-    // Close looks at what became of it.
-    static_cast<void>(std::fwrite(strLine.data(), 1, strLine.size(), m_pFile.get()));
-}
-
-void ErrorFile::Close() {
-    const bool blWritten = std::ferror(m_pFile.get()) == 0;
-    if (std::fclose(m_pFile.release()) != 0 || !blWritten) {
-        Fail(kExitIo, m_strPath + ": cannot write: " + std::strerror(errno));
-    }
-}
 
 LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
                        std::function<bool()> fnAfter)

@@ -5,31 +5,15 @@
 
 #include <VornJsonDbTable.h>
 
-#include <cstdio>
 #include <functional>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "../../src/schema/MemberType.h"
+#include "ErrorFile.h"
 #include "Sink.h"
 
 namespace VORN_JSON_DB::Cli {
-
-// The file of bad records: JSON Lines with file, line, record, reason and text.
-class ErrorFile {
-  public:
-    explicit ErrorFile(const std::string& strPath);  // an Error, if it cannot be written
-    void Add(const std::string& strInput, const Place& Where, const std::string& strReason);
-    void Close();
-
-  private:
-    struct CloseFile {
-        void operator()(std::FILE* pFile) const { static_cast<void>(std::fclose(pFile)); }
-    };
-    std::string m_strPath;
-    std::unique_ptr<std::FILE, CloseFile> m_pFile;
-};
 
 class LoaderSink : public Sink {
   public:
