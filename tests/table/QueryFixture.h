@@ -62,6 +62,17 @@ class QueryTest : public TableTest {
         Open(kDocs, How);
     }
 
+    // Records 1, 2, ... of which each has one member more.
+    void Fill(const std::string& strMember, const std::vector<std::string>& vecValues) {
+        int nId = 0;
+        for (const std::string& strValue : vecValues) {
+            Json::Value jRecord;
+            jRecord["id"] = ++nId;
+            jRecord[strMember] = Parse(strValue);
+            EXPECT_EQ("ok", Text(m_Table.Create(jRecord)));
+        }
+    }
+
     // Writes a value into the statement, so that tests see which goes where.
     static void WriteShown(const vornjsondb::BoundValue& Value, std::string& strSql) {
         strSql += "{" + Text(Value) + "}";
