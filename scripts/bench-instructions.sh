@@ -60,10 +60,12 @@ versions="g++ $("${CXX:-g++}" -dumpfullversion), SQLite $(pkg_version libsqlite3
     pkg_version libjsoncpp-dev), C library $(pkg_version libc6)"
 
 results=$folder/instructions.txt
-for work in create get update delete list table-{create,get,first,list,load,json} \
-    hand-{create,get,list,load}; do
-    count "$work"
-done >"$results"
+works=({create,get,update,delete,list} table-{create,get,first,list,load,json} hand-{create,get,list,load})
+# The work of each runs alone in a process: a process for each core.
+export -f count
+export folder
+printf '%s\n' "${works[@]}" | xargs -P "$jobs" -I{} bash -c 'set -eo pipefail; count {} >"$folder/instructions.{}"'
+(cd "$folder" && cat "${works[@]/#/instructions.}") >"$results"
 echo "# $heading"
 sed 's/^/  /' "$results"
 

@@ -24,9 +24,8 @@ configure() {
     if [[ ! -e $folder/CMakeCache.txt ]] && command -v ninja >/dev/null; then
         options+=(-G Ninja)
     fi
-    if command -v ccache >/dev/null; then
-        options+=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache)
-    fi
+    # Said each time, so that a folder outlives the ccache that it was made with.
+    options+=(-DCMAKE_CXX_COMPILER_LAUNCHER="${CMAKE_CXX_COMPILER_LAUNCHER:-$(command -v ccache || true)}")
     mkdir -p "$folder"
     if ! cmake -S . -B "$folder" "${options[@]}" "$@" >"$folder/configure.log" 2>&1; then
         cat "$folder/configure.log" >&2
@@ -59,6 +58,13 @@ configure_release() {
     need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}"
     configure release -DCMAKE_BUILD_TYPE=Release -DBUILD_TESTING=OFF -DVORNJSONDB_EXAMPLES=ON \
         -DVORNJSONDB_COMMAND=ON "$@"
+}
+
+# configure_debug makes build/debug: the tests of both libraries, which look for them where
+# LD_LIBRARY_PATH says before they look where they were built.
+configure_debug() {
+    configure debug -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
+        -DVORNJSONDB_COMMAND=OFF "${together[@]}" -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
 }
 
 # What the scripts need. Where the compiler is given with CXX, it counts in the place of g++.

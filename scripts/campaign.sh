@@ -37,15 +37,24 @@ for option; do
     esac
 done
 
-# run PROGRAM FOLDER CMAKE-OPTION... builds one of the campaigns in one of the folders of
-# scripts/test.sh, and runs it.
+# run FOLDER CMAKE-OPTION... builds the campaigns in one of the folders of scripts/test.sh, and runs them
+# side by side.
 run() {
-    local program=$1 folder=$2
-    shift 2
-    configure "$folder" "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
-    build_quietly "$folder" "vornjsondb_campaign_$program"
-    UBSAN_OPTIONS=print_stacktrace=1 \
-        "build/$folder/tests/campaigns/vornjsondb_campaign_$program" "${options[@]}" | tee build/campaign.txt
+    local folder=$1 program i status=0
+    local -a campaigns=()
+    configure "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
+    build_quietly "$folder" "${programs[@]/#/vornjsondb_campaign_}"
+    for program in "${programs[@]}"; do
+        UBSAN_OPTIONS=print_stacktrace=1 "build/$folder/tests/campaigns/vornjsondb_campaign_$program" \
+            "${options[@]}" >"build/campaign-$program.txt" &
+        campaigns+=($!)
+    done
+    for ((i = 0; i < ${#programs[@]}; ++i)); do
+        wait "${campaigns[i]}" || status=1
+        printf '== %s\n' "${programs[i]}"
+        cat "build/campaign-${programs[i]}.txt"
+    done
+    return "$status"
 }
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
@@ -53,19 +62,19 @@ programs=("$name")
 if [[ $name != model ]]; then
     programs+=("table_$name")
 fi
-for program in "${programs[@]}"; do
-    if [[ $name == memory ]]; then
-        run "$program" asan -DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON
-    fi
-    if [[ $name != memory || -n $long ]]; then
-        run "$program" "test" -DCMAKE_BUILD_TYPE=Release
-    fi
-    if [[ -n $record ]]; then
-        need_packages python3:python3
+if [[ $name == memory ]]; then
+    run asan -DCMAKE_BUILD_TYPE=Debug -DVORNJSONDB_SANITIZE=ON
+fi
+if [[ $name != memory || -n $long ]]; then
+    run "test" -DCMAKE_BUILD_TYPE=Release
+fi
+if [[ -n $record ]]; then
+    need_packages python3:python3
+    for program in "${programs[@]}"; do
         {
             printf '```\n%s: %s\n' "$(date +%F)" "scripts/campaign.sh $name ${options[*]}"
-            grep '^  ' build/campaign.txt
+            grep '^  ' "build/campaign-$program.txt"
             printf '```\n'
         } | scripts/figures.py docs/reliability.md "campaign-$program"
-    fi
-done
+    done
+fi

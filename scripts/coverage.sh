@@ -25,9 +25,8 @@ configure coverage -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_COVE
 find build/coverage -name '*.gcda' -delete
 programs=(vornjsondb_tests table/vornjsondb_table_tests)
 build coverage "${programs[@]##*/}"
-for program in "${programs[@]}"; do
-    "build/coverage/tests/$program" --gtest_brief=1
-done
+# Side by side: each counts in objects of its own.
+printf '%s\0' "${programs[@]/#/build/coverage/tests/}" | xargs -0 -n 1 -P "$jobs" sh -c '"$0" --gtest_brief=1'
 
 # Counted is what the tests reach by themselves: in the shared library with every name visible, and of
 # table/ in the static one and in its tests, which bring some of its inline functions.

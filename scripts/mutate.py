@@ -117,7 +117,7 @@ class TableLibrary(Library):
     def make_tests(self):
         self.link(self.folder, {})
         program = self.folder / "table_tests"
-        objects = (self.folder / "tests/table/CMakeFiles/vornjsondb_table_tests.dir").glob("*.cpp.o")
+        objects = (self.folder / "tests/table/CMakeFiles/vornjsondb_table_tests.dir").rglob("*.o")
         # nanosleep and clock_gettime of the tests must be found before the real ones.
         subprocess.run([COMPILER, *LINKER, "-rdynamic", "-o", str(program), *map(str, sorted(objects)),
                         f"-L{self.folder}", f"-l:{self.NAME}", "-lvornjsondb", f"-Wl,-rpath,{self.folder.resolve()},--enable-new-dtags",

@@ -20,10 +20,14 @@ source scripts/install-packages.sh
 source scripts/build.sh
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" python3:python3
-configure mutate -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
-    -DVORNJSONDB_COMMAND=OFF \
-    -DCMAKE_EXE_LINKER_FLAGS=-Wl,--enable-new-dtags
-build_quietly mutate vornjsondb_tests vornjsondb_table_tests
+configure_debug
+tests=vornjsondb_tests
+for option; do
+    if [[ $option == --table ]]; then
+        tests=vornjsondb_table_tests
+    fi
+done
+build_quietly debug "$tests" vornjsondb
 
 seed=$(git rev-parse --short=7 HEAD 2>/dev/null || echo 1)
-exec python3 scripts/mutate.py --folder build/mutate --jobs "$jobs" --seed "$((16#$seed))" "$@"
+exec python3 scripts/mutate.py --folder build/debug --jobs "$jobs" --seed "$((16#$seed))" "$@"

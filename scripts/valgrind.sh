@@ -9,15 +9,24 @@ source scripts/install-packages.sh
 source scripts/build.sh
 
 need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}" valgrind:valgrind
-configure valgrind -DCMAKE_BUILD_TYPE=Debug -DBUILD_TESTING=ON -DVORNJSONDB_EXAMPLES=OFF \
-    "${together[@]}" -DVORNJSONDB_COMMAND=OFF
-build valgrind vornjsondb_tests
+configure_debug
+build debug vornjsondb_tests
 
-# All tests in one process, because the start of valgrind costs more than most tests. What a forked
-# child leaks is its parent's, so that it keeps silent; a new process of the tests is looked at, too.
-# The tests have an operator new of their own, which must stay in its place.
-tests=$PWD/build/valgrind/tests/vornjsondb_tests
-VORNJSONDB_TEST_PROGRAM=$tests valgrind --quiet --error-exitcode=99 --leak-check=full \
-    --errors-for-leak-kinds=definite,indirect --trace-children=yes \
-    --child-silent-after-fork=yes --soname-synonyms=somalloc=nouserintercepts \
-    "$tests" --gtest_brief=1 "$@"
+# A process for each core and not one for each test, because the start of valgrind costs more than most
+# tests. What a forked child leaks is its parent's, so that it keeps silent; a new process of the tests
+# is looked at, too. The tests have an operator new of their own, which must stay in its place.
+tests=$PWD/build/debug/tests/vornjsondb_tests
+export VORNJSONDB_TEST_PROGRAM=$tests GTEST_TOTAL_SHARDS=$jobs
+shards=()
+for ((shard = 0; shard < jobs; ++shard)); do
+    GTEST_SHARD_INDEX=$shard valgrind --quiet --error-exitcode=99 --leak-check=full \
+        --errors-for-leak-kinds=definite,indirect --trace-children=yes \
+        --child-silent-after-fork=yes --soname-synonyms=somalloc=nouserintercepts \
+        "$tests" --gtest_brief=1 "$@" &
+    shards+=($!)
+done
+status=0
+for shard in "${shards[@]}"; do
+    wait "$shard" || status=1
+done
+exit "$status"
