@@ -28,7 +28,7 @@ LOOKS = re.compile(
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
-    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code)$"
+    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size)$"
 )
 
 

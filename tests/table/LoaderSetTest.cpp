@@ -1,5 +1,7 @@
 // JSON texts that a loader is given for a member: as they will be stored already, and otherwise.
 
+#include <limits>
+
 #include "TableFixture.h"
 
 namespace VORN_JSON_DB {
@@ -105,6 +107,19 @@ TEST_F(LoaderSetTest, ValueThatFitsReplacesOneThatDidNot) {
     m_Into.SetJson(m_Into.MemberIndex("list"), "{}");
     EXPECT_EQ(Add("list", "[2]"), "ok");
     EXPECT_EQ(Rows("SELECT list FROM item"), "[2]");
+}
+
+TEST_F(LoaderSetTest, OfWhatIsWrongInOnePlaceTheLastIsTold) {
+    m_Into.SetInteger(-1, 1);
+    m_Into.SetInteger(std::numeric_limits<int>::max(), 1);
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 1 into table \"item\": there is no member of number "
+              "2147483647 [unknown-member ]");
+    m_Into.Reject("first");
+    m_Into.Reject("second");
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 2 into table \"item\": second [rejected ]");
+    EXPECT_EQ(Add("list", "[2]"), "ok");
 }
 
 }  // namespace

@@ -227,6 +227,10 @@ TEST_F(LoaderTest, ModesOtherThanStopNeedTheKey) {
         "refused: cannot load record 1 into table \"task\": the key's member \"id\" has no "
         "value [missing-key /id]",
         Add(Into, {R"({"name": "a"})"}));
+    EXPECT_EQ(
+        "refused: cannot load record 2 into table \"task\": the record has no members "
+        "[not-a-record ]",
+        Text(Into.EndRecord()));
     Run("CREATE TABLE keyless (a INTEGER)");
     Table Keyless;
     EXPECT_EQ("ok", Text(Keyless.Open(m_pDb, "keyless", Json::Value())));
