@@ -64,7 +64,9 @@ Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, 
     bool blTaken = true;
     const auto fnSteps = [&]() -> Status {
         // Anew for each further try: the one before may have filled defaults.
+        // mutate(hoisted, sunk): taken once more it is the same record.
         if (!std::exchange(blTaken, false)) {
+            // mutate(doubled): taken once more it is the same record.
             Take(Into, jRecord, eOnDuplicate, What).Ignore();
         }
         vornjsondb::RecordWriter Writer(Into, Into.Values);
