@@ -20,6 +20,7 @@ bool IsPaged(const Query& Which) {
 
 BoundValue Integer(std::int64_t nValue) {
     BoundValue Value;
+    // mutate(exchanged): in any order.
     Value.eKind = BoundValue::Kind::kInteger;
     Value.nValue = nValue;
     return Value;
@@ -32,6 +33,7 @@ void CheckPage(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
     if (Which.nOffset < 0) {
         Report(vecFindings, FindingCode::kBadCount, "/offset", "the offset is less than 0");
     }
+    // mutate(exchanged): both only look.
     if (eUse == QueryUse::kChange && (IsPaged(Which) || !Which.vecSort.empty())) {
         Report(vecFindings, FindingCode::kPagedChange, "",
                "a change reaches all records that the conditions select, in no order");
@@ -63,6 +65,7 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
     }
     m_nTailEnd = m_Sql.strSql.size();
     for (const size_t nMember : m_vecColumns) {
+        // mutate(doubled): told twice, it tells the same columns apart.
         Append(m_Sql.strSql, {" ", DigitsOf(static_cast<std::int64_t>(nMember))});
     }
 }
@@ -108,7 +111,9 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
                    Why.strMessage);
             continue;
         }
+        // mutate(exchanged): in any order.
         AppendSort(Where.nMember, Where.strPath, blDescending);
+        // mutate(doubled): it is only asked whether it is there.
         vecSorted.push_back(Where.strPath.empty() ? Where.nMember : Members::kNone);
     }
     for (const size_t nMember : m_Of.Key()) {

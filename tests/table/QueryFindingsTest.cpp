@@ -382,4 +382,40 @@ TEST_F(QueryFindings, FindingsEndAtAHundred) {
     EXPECT_EQ(100U, Query(jQuery).vecFindings.size());
 }
 
+TEST_F(QueryFindings, AllThatIsWrongIsToldInOneOrder) {
+    Query Paged = Query().Limit(-2).Offset(-1).Sort("id");
+    EXPECT_EQ(Sql(Paged, QueryUse::kChange),
+              "bad-count /limit: the limit is less than 0; bad-count /offset: the offset is less "
+              "than 0; paged-change : a change reaches all records that the conditions select, in "
+              "no order; no-condition /where: the query has no condition and would reach every "
+              "record");
+    EXPECT_EQ(Wrong(R"({"members": ["xyz"], "sort": ["uvw"]})"),
+              "unknown-member /members/0: table \"doc\" has no member \"xyz\"; unknown-member "
+              "/sort/0: table \"doc\" has no member \"uvw\"");
+}
+
+TEST_F(QueryFindings, OfTwoEndsTheFirstIsLookedAtFirst) {
+    EXPECT_EQ(WrongWhere(R"({"size": {"$between": [null, true]}})"),
+              "null-operand /where/size/$between: \"$between\": nothing is less or greater than "
+              "null");
+    for (const char* szEnds : {R"(["a", 5])", R"([5, "a"])"}) {
+        EXPECT_EQ(WrongWhere(R"({"any": {"$between": )" + std::string(szEnds) + "}}"),
+                  "wrong-operand /where/any/$between: \"$between\" takes a list of two values, not "
+                  "a list of 2");
+    }
+}
+
+// What a query says that could not be read is not looked at any further.
+TEST_F(QueryFindings, QueryThatCannotBeReadTellsNoMore) {
+    const Query Which(Parse(R"({"limit": "x", "sort": ["none"]})"));
+    EXPECT_EQ(Sql(Which, QueryUse::kChange),
+              "bad-count /limit: a whole number from 0 belongs here, not \"x\"");
+    EXPECT_EQ(Sql(Which), "bad-count /limit: a whole number from 0 belongs here, not \"x\"");
+}
+
+TEST_F(QueryFindings, MembersAreOnlyForWhatIsRead) {
+    EXPECT_EQ(Sql(Query().Where("id", 1).Members({"nope"}), QueryUse::kCount),
+              " WHERE \"id\" IS ?");
+}
+
 }  // namespace VORN_JSON_DB
