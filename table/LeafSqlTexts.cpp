@@ -1,6 +1,6 @@
 // "$like" and "$prefix".
 
-#include <cstring>
+#include <string_view>
 #include <utility>
 
 #include "Concat.h"
@@ -14,16 +14,18 @@ constexpr size_t kLongestPattern = 50000;  // SQLite's limit in its usual build
 
 // What SQLite cannot take for a pattern, or takes for another one; nullptr: nothing.
 const char* PatternFault(std::string_view strPattern) {
+    static constexpr std::string_view kEscaped = "%_\\";
     if (strPattern.size() > kLongestPattern) {
         return "is longer than SQLite takes";
     }
     for (size_t i = 0; i < strPattern.size(); ++i) {
+        // mutate(exchanged): no character is both.
         if (strPattern[i] == '\0') {
             return "holds a NUL byte, where SQLite ends it";
         }
         if (strPattern[i] == '\\') {
             ++i;
-            if (i == strPattern.size() || std::strchr("%_\\", strPattern[i]) == nullptr) {
+            if (i == strPattern.size() || kEscaped.find(strPattern[i]) == std::string_view::npos) {
                 return "has a \\ before something else than %, _ and \\";
             }
         }

@@ -234,13 +234,16 @@ TEST_F(QueryFindings, FindingsOfValuesThatJsonTextCannotHold) {
     EXPECT_EQ(0U, Sql(Query().Where("json.a", dNaN)).find("not-a-number /where/json.a: "));
     EXPECT_EQ("not-a-number /where/tags/$contains: JSON: NaN is no number",
               Sql(Query().Where("tags", Op::kContains, dNaN)));
-    const std::string strLong = "%" + std::string(50000, 'a');
-    EXPECT_EQ("bad-pattern /where/name/$like: pattern \"%" + std::string(59, 'a') +
+    const std::string strLong = "\\x" + std::string(50000, 'a');
+    EXPECT_EQ("bad-pattern /where/name/$like: pattern \"\\x" + std::string(58, 'a') +
                   "\"... is longer than SQLite takes",
               Sql(Query().Where("name", Op::kLike, strLong)));
     EXPECT_EQ("bad-pattern /where/name/$like: pattern \"a" + std::string(1, '\0') +
                   "\" holds a NUL byte, where SQLite ends it",
               Sql(Query().Where("name", Op::kLike, std::string("a\0", 2))));
+    EXPECT_EQ(Sql(Query().Where("name", Op::kLike, std::string("a\\\0", 3))),
+              "bad-pattern /where/name/$like: pattern \"a\\" + std::string(1, '\0') +
+                  "\" has a \\ before something else than %, _ and \\");
     EXPECT_EQ(std::string("bad-path /where/map.") + std::string(1, '\x01') + ": path \"map." +
                   std::string(1, '\x01') + "\": no path leads to \"" + std::string(1, '\x01') +
                   "\"",
@@ -400,8 +403,8 @@ TEST_F(QueryFindings, OfTwoEndsTheFirstIsLookedAtFirst) {
               "null");
     for (const char* szEnds : {R"(["a", 5])", R"([5, "a"])"}) {
         EXPECT_EQ(WrongWhere(R"({"any": {"$between": )" + std::string(szEnds) + "}}"),
-                  "wrong-operand /where/any/$between: \"$between\" takes a list of two values, not "
-                  "a list of 2");
+                  "wrong-operand /where/any/$between: \"$between\" takes a list of two texts or of "
+                  "two numbers, not a list of 2");
     }
 }
 
