@@ -53,6 +53,7 @@ BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
 
 // With a bare parameter SQLite would prepare the statement again for each pattern.
 bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
+    // mutate(exchanged): the SQL of what is refused is not run.
     if (const char* szFault = PatternFault(BytesOf(jPattern))) {
         return Why.Tell(FindingCode::kBadPattern,
                         Concat({"pattern ", Shown(jPattern), " ", szFault}));
@@ -62,6 +63,7 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
     m_strSql += " LIKE ";
     m_Out.Add(BoundText(BytesOf(jPattern)));
     m_strSql += "||'' ESCAPE '\\'";
+    // mutate(hoisted): without a path it writes nothing.
     if (m_blPath) {
         CloseJson(ValueKind::kText);
     } else {

@@ -78,6 +78,14 @@ TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
     EXPECT_EQ(Rows("SELECT count(*) FROM item"), "0");
 }
 
+TEST_F(LoaderSetTest, ValueThatDoesNotFitIsShown) {
+    m_Into.SetText(m_Into.MemberIndex("id"), "seven");
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 1 into table \"item\": member \"id\": \"seven\" is "
+              "another kind of value: expected is a whole number from -2147483648 to 2147483647 "
+              "[wrong-kind /id]");
+}
+
 TEST_F(LoaderSetTest, BooleansAreForMembersOfTheirKind) {
     m_Into.SetBoolean(m_Into.MemberIndex("name"), false);
     EXPECT_EQ(

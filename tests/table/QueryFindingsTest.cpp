@@ -2,6 +2,7 @@
 
 #include <limits>
 
+#include "../../table/ConditionNode.h"
 #include "QueryFixture.h"
 
 namespace VORN_JSON_DB {
@@ -419,6 +420,36 @@ TEST_F(QueryFindings, QueryThatCannotBeReadTellsNoMore) {
 TEST_F(QueryFindings, MembersAreOnlyForWhatIsRead) {
     EXPECT_EQ(Sql(Query().Where("id", 1).Members({"nope"}), QueryUse::kCount),
               " WHERE \"id\" IS ?");
+}
+
+TEST_F(QueryFindings, WhatIsTooDeepOrTooMuchIsToldBeforeWhatIsWrongInIt) {
+    Json::Value jWhere = 5;
+    for (int i = 0; i <= 1000; ++i) {
+        Json::Value jOuter;
+        jOuter["$not"].swapPayload(jWhere);
+        jWhere.swapPayload(jOuter);
+    }
+    Json::Value jQuery;
+    jQuery["where"].swapPayload(jWhere);
+    const Query Deep(jQuery);
+    EXPECT_EQ(Deep.vecFindings.size(), 1U);
+    EXPECT_EQ(Deep.vecFindings[0].strMessage, "the conditions are nested too deep");
+    EXPECT_EQ(WrongWhere(R"({"$and": {}})"),
+              "not-conditions /where/$and: this group is a list of conditions, not an object of 0");
+    DeepList Lists(1001);
+    Json::Value jMany;
+    for (int i = 0; i < 1000; ++i) {
+        jMany["where"]["$or"].append(Parse(R"({"id": 1})"));
+    }
+    jMany["where"]["$or"][1000]["map"].swapPayload(Lists.jList);
+    EXPECT_EQ(Text(Query(jMany).vecFindings),
+              "too-many-conditions /where/$or/1000/map: the query has more than 1000 conditions");
+}
+
+TEST_F(QueryFindings, ValueMayHaveAThousandLevels) {
+    DeepList Thousand(1000), More(1001);
+    EXPECT_FALSE(vornjsondb::IsTooDeep(Thousand.jList));
+    EXPECT_TRUE(vornjsondb::IsTooDeep(More.jList));
 }
 
 }  // namespace VORN_JSON_DB

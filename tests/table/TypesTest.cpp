@@ -40,8 +40,7 @@ class TypesTest : public TableTest {
     int m_nTables = 0;
 };
 
-Json::Value Nested(int nLevels) {
-    Json::Value jInner(Json::arrayValue);
+Json::Value Nested(int nLevels, Json::Value jInner = Json::arrayValue) {
     for (int i = 1; i < nLevels; ++i) {
         Json::Value jOuter(Json::arrayValue);
         jOuter.append(std::move(jInner));
@@ -272,6 +271,9 @@ TEST_F(TypesTest, JsonIsStoredAsDeepAsItsReaderGoes) {
     EXPECT_EQ("text|" + strText + "|" + strText, Store("Json::arrayValue", Nested(nMost)));
     EXPECT_EQ("too-deep", Store("Json::arrayValue", Nested(nMost + 1)));
     EXPECT_EQ("too-deep", Store("Json::Value", Nested(10000)));
+    // A value inside is one level more.
+    EXPECT_EQ(Store("Json::arrayValue", Nested(nMost + 1, 0.5)), "too-deep");
+    EXPECT_EQ(Store("Json::arrayValue", Nested(nMost, 0.5)).substr(0, 6), "text|[");
 }
 
 TEST_F(TypesTest, StoredValuesOfAnotherKindAreReadAsWhatTheyAre) {
