@@ -19,6 +19,7 @@ constexpr Enclosure kEnclosures[] = {{"'", "'"}, {"\"", "\""}, {"`", "`"},
 
 bool IsOfWord(char c) {
     const auto nByte = static_cast<unsigned char>(c);
+    // mutate(exchanged): all only look.
     return std::isalnum(nByte) != 0 || c == '_' || c == '$' || nByte >= 0x80;
 }
 
@@ -50,6 +51,7 @@ bool HoldsWord(const std::string& strSql, std::string_view strWord) {
         while (nEnd < strSql.size() && IsOfWord(strSql[nEnd])) {
             ++nEnd;
         }
+        // mutate(exchanged): both only look.
         if (nEnd - nAt == strWord.size() &&
             sqlite3_strnicmp(&strSql[nAt], strWord.data(), static_cast<int>(strWord.size())) == 0) {
             return true;
