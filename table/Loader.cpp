@@ -69,6 +69,7 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);
     }
+    // mutate(exchanged): both only look.
     if (!vecFindings.empty()) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
@@ -175,6 +176,7 @@ Status Loader::Add(const Json::Value& jRecord) {
     }
     FindingList vecFindings;
     if (m_pParts->nWrong > 0) {
+        // mutate(doubled): the second time there is none.
         m_pParts->TakeWrong(vecFindings);
         vecFindings.clear();
     }

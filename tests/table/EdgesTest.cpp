@@ -135,6 +135,13 @@ TEST_F(EdgesTest, AllDifferencesAreToldInOneOrder) {
               "it creates");
 }
 
+TEST_F(EdgesTest, ColumnDeclaredAsTwoTypesIsABooleanFirst) {
+    Run("CREATE TABLE item (id INTEGER PRIMARY KEY, odd JSON_BOOL)");
+    Table Item;
+    EXPECT_EQ(Text(Item.Open(m_pDb, "item", Json::Value())), "ok");
+    EXPECT_EQ(Text(Item.Definition()["item"]["member"]["odd"]), R"({"cpptype":"bool"})");
+}
+
 // "-m." could be the path "." into "-m", which is none, or "m." the other way round.
 TEST_F(EdgesTest, SortTermIsWhatTheTableHas) {
     Meet(R"(CREATE TABLE item (id INTEGER PRIMARY KEY, "-m" TEXT, "m." TEXT))",
