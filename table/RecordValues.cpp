@@ -63,7 +63,6 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
     for (Json::Value::const_iterator it = jRecord.begin(); it != itEnd; ++it) {
         const MemberName Name = NameOf(it);
         int nOrder = 1;
-        // mutate(exchanged): behind the last name only AddressSanitizer sees who looks.
         while (nNext < vecNames.size() && (nOrder = Compare(NameOf(vecNames[nNext]), Name)) < 0) {
             ++nNext;
         }

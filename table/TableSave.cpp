@@ -32,6 +32,7 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
     if (nResult == SQLITE_OK) {
         nResult = Lent.Step();
     }
+    // mutate(hoisted): without a row nobody is given what was read.
     if (nResult == SQLITE_ROW) {
         jStored = From.WholeRow.Read(Lent.Get(), From.Codec);
         return {};
