@@ -33,7 +33,6 @@ void CheckPage(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
     if (Which.nOffset < 0) {
         Report(vecFindings, FindingCode::kBadCount, "/offset", "the offset is less than 0");
     }
-    // mutate(exchanged): both only look.
     if (eUse == QueryUse::kChange && (IsPaged(Which) || !Which.vecSort.empty())) {
         Report(vecFindings, FindingCode::kPagedChange, "",
                "a change reaches all records that the conditions select, in no order");

@@ -457,7 +457,7 @@ TEST_F(LoaderTest, ShortTextFollowsALongOneAndALongOneAShort) {
     EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
     const int nList = Into.MemberIndex("list");
     const int nText = Into.MemberIndex("text");
-    for (const size_t nLength : {3, 400, 2, 0, 40}) {
+    for (const size_t nLength : {3U, 400U, 2U, 0U, 40U}) {
         Into.SetText(nText, std::string(nLength, 'x') + "!");
         Into.SetText(nText, std::string(nLength, 'y'));
         Into.SetJson(nList, "[\"" + std::string(nLength, 'z') + "\"]");

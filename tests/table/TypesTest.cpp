@@ -267,7 +267,8 @@ TEST_F(TypesTest, TextsComeBackByteByByte) {
 TEST_F(TypesTest, JsonIsStoredAsDeepAsItsReaderGoes) {
     Json::CharReaderBuilder Builder;
     const int nMost = Builder["stackLimit"].asInt();
-    const std::string strText = std::string(nMost, '[') + std::string(nMost, ']');
+    const auto nLevels = static_cast<size_t>(nMost);
+    const std::string strText = std::string(nLevels, '[') + std::string(nLevels, ']');
     EXPECT_EQ("text|" + strText + "|" + strText, Store("Json::arrayValue", Nested(nMost)));
     EXPECT_EQ("too-deep", Store("Json::arrayValue", Nested(nMost + 1)));
     EXPECT_EQ("too-deep", Store("Json::Value", Nested(10000)));
