@@ -184,6 +184,7 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
         return blWhole ? FitInteger(Type, static_cast<std::int64_t>(dValue), blCompatible, Out)
                        : Misfit::kKind;
     }
+    // mutate(exchanged): both only look.
     if (Form.eKind != BoundKind::kReal && Form.eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }

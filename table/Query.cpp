@@ -51,6 +51,7 @@ std::shared_ptr<const Node> Leaf(std::string& strMember, Op eOp, Json::Value& jO
     pNode->eOp = eOp;
     // mutate(exchanged): in any order.
     pNode->strMember = std::move(strMember);
+    // mutate(sunk): nobody looks into what is too deep.
     if (vornjsondb::IsTooDeep(jOperand)) {
         pNode->eKind = Node::Kind::kTooDeep;
     } else {

@@ -51,7 +51,6 @@ bool HoldsWord(const std::string& strSql, std::string_view strWord) {
         while (nEnd < strSql.size() && IsOfWord(strSql[nEnd])) {
             ++nEnd;
         }
-        // mutate(exchanged): both only look.
         if (nEnd - nAt == strWord.size() &&
             sqlite3_strnicmp(&strSql[nAt], strWord.data(), static_cast<int>(strWord.size())) == 0) {
             return true;

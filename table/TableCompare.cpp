@@ -210,7 +210,6 @@ class TableCompare {
                std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame) ||
                std::any_of(m_vecIndexes.begin(), m_vecIndexes.end(),
                            [&fnSame](const RealIndex& Index) {
-                               // mutate(exchanged): both only look.
                                return Index.blUnique && fnSame(Index.vecColumns);
                            });
     }

@@ -204,7 +204,6 @@ class WhereParser {
         if (m_blValuesOnly) {
             Report(m_vecFindings, FindingCode::kOperatorRefused, strPath,
                    Concat({strShown, " is an operator, and this query takes plain values"}));
-            // mutate(exchanged): both only look.
         } else if (FindOperator(strKey) != nullptr || FindGroupKey(strKey) != nullptr) {
             Report(m_vecFindings, FindingCode::kMisplacedOperator, strPath,
                    Concat({strShown, " cannot stand here"}));

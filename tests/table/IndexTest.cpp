@@ -226,8 +226,10 @@ TEST_F(IndexTest, NoAdviceWhereNoIndexHelps) {
 TEST_F(IndexTest, PlanThatCannotBeReadIsAFailure) {
     const std::string strSql = "SELECT id, name, size FROM doc WHERE id = 5";
     sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, static_cast<int>(strSql.size()) + 2);
-    EXPECT_EQ(ExplainSql(strSql),
+    Plan Found;
+    EXPECT_EQ(Text(m_Table.ExplainSql(strSql, Found)),
               "refused: cannot explain a statement on table \"doc\": string or blob too big");
+    EXPECT_EQ(Found.strSql, "");
 }
 
 TEST_F(IndexTest, ExplainSqlTakesOneStatement) {
