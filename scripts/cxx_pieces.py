@@ -21,6 +21,8 @@ BEFORE_BLOCK = re.compile(r"(?:\)|\belse|\bdo|\btry|\bconst|\bnoexcept|-> [\w:*&
 DECLARATION = re.compile(r"(?:static |constexpr |const )*[\w:]+(?:<[^;=]*>)?(?: const)?[ &*]+(\w+)(?=[ ;({\[])")
 # Neighbours that set members of one value; each of another name, so in any order.
 SETS_MEMBER = re.compile(r'[\w.]+\[" +"\] = [^();]*;$')
+# A lambda that takes what it names by reference: where it stands it does nothing yet.
+LAMBDA = re.compile(r"const auto \w+ = \[&\]")
 CALL = re.compile(r"((?:\w+(?:\.|->|::))*)(\w+)\(")
 # Calls that only look, the library's own in the last lines; macros and casts are no calls.
 LOOKS = re.compile(
@@ -28,7 +30,7 @@ LOOKS = re.compile(
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
-    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code)$"
+    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size)$"
 )
 
 
@@ -172,6 +174,10 @@ class Effect:
         declaration = DECLARATION.match(text)
         self.text = text
         self.declared = declaration.group(1) if declaration and not KEYWORD.match(text) else None
+        if LAMBDA.match(text):
+            self.names = self.written = {self.declared}
+            self.leaves = self.anything = False
+            return
         # No types and calls; a type stands before another word.
         self.names = set(re.findall(r"(?<![.:>\w])[a-z_]\w*\b(?!\s*(?:::|\(|<)|[&*]? \w)", text))
         self.names.update(re.findall(r"\b[A-Z]\w*(?=\.|->|\[)", text), {self.declared} - {None})

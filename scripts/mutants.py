@@ -45,8 +45,9 @@ OTHER = {
 CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TEXT) ?\(")
 # Calls that change nothing when they are made twice.
 TWICE_IS_ONCE = re.compile(
-    r"(?:clear|Clear|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
-    r"|Set|Fill|FillDefaults|pfnRead|Read)$"
+    r"(?:clear|Clear|fill|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
+    r"|Set|Fill|FillDefaults|pfnRead|Read|SetRight|SetUnknown|SetNull|SetText|Judge|strictMode"
+    r"|sqlite3_reset|sqlite3_clear_bindings)$"
 )
 # Log lines may come of these, and a name that nobody knew is known afterwards.
 LOOK_UP = re.compile(r"(?:\w+(?:\.|->|::))*(?:recType|LookUp|LookUpTable)\(")

@@ -86,6 +86,7 @@ Whole::~Whole() {
     // mutate(exchanged): both only look.
     if (m_blOpen && sqlite3_get_autocommit(m_pDb) == 0) {
         m_Undo.Finish();  // mutate(doubled): a second time there is nothing to undo.
+        // mutate(hoisted, sunk): after a ROLLBACK there is nothing to COMMIT, which is ignored.
         if (m_blSavepoint) {
             m_End.Finish();
         }

@@ -12,11 +12,13 @@ namespace {
 
 bool IsOfName(char c) {
     const auto nByte = static_cast<unsigned char>(c);
+    // mutate(exchanged): all only look.
     return std::isalnum(nByte) != 0 || c == '_' || nByte >= 0x80;
 }
 
 // One word for SQLite: nothing in it ends the name, so it can go into a statement.
 bool IsWord(const std::string& strName) {
+    // mutate(exchanged): both only look.
     return std::isdigit(static_cast<unsigned char>(strName[0])) == 0 &&
            std::all_of(strName.begin(), strName.end(), IsOfName);
 }
@@ -26,6 +28,7 @@ bool IsWord(const std::string& strName) {
 BareNames::BareNames() {
     sqlite3* pDb = nullptr;
     const int nResult = sqlite3_open(":memory:", &pDb);
+    // mutate(exchanged): what is not freed then only AddressSanitizer sees.
     m_pDb.reset(pDb);
     if (nResult != SQLITE_OK) {
         throw std::bad_alloc();
@@ -46,6 +49,7 @@ bool BareNames::Has(const std::string& strName) const {
     if (nResult == SQLITE_NOMEM) {
         throw std::bad_alloc();
     }
+    // mutate(exchanged): both only look.
     return nResult == SQLITE_ROW && sqlite3_column_int(pStatement.get(), 0) == 7;
 }
 

@@ -12,7 +12,9 @@ std::string Concat(std::initializer_list<std::string_view> listParts) {
 
 void Append(std::string& strTo, std::initializer_list<std::string_view> listParts) {
     size_t nSize = strTo.size();
+    // mutate(dropped): room shows only when memory runs out.
     for (const std::string_view strPart : listParts) {
+        // mutate(dropped, doubled): room shows only when memory runs out.
         nSize += strPart.size();
     }
     // Twice the room when it runs out: texts grow by many calls.

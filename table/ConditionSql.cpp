@@ -50,6 +50,7 @@ class ConditionWriter {
 
     // blOpen: SQLite looks into it.
     void WriteGroup(std::vector<const Node*> vecNodes, Kind eKind, int nLevel, bool blOpen) {
+        // mutate(exchanged): to look for the deepest changes nothing.
         if (vecNodes.size() == 1) {
             Write(*vecNodes[0], nLevel, blOpen, nullptr);
             return;
@@ -141,6 +142,7 @@ class ConditionWriter {
     }
 
     static std::string PathOf(const Node& Leaf) {
+        // mutate(exchanged): a path for nobody only takes time.
         if (!Leaf.strPath.empty()) {
             return Leaf.strPath;
         }
@@ -169,8 +171,10 @@ void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of,
     std::vector<const Node*> vecNodes;
     vecNodes.reserve(vecWhere.size());
     for (const Condition& Each : vecWhere) {
+        // mutate(exchanged): in any order.
         nLeaves += Each.Root().nLeaves;
         // All of all is all: one chain, whoever grouped it.
+        // mutate(exchanged): both only look.
         if (Each.Root().eKind == Kind::kAll && !Each.Root().vecParts.empty()) {
             AddNodes(Each.Root().vecParts, vecNodes);
         } else {

@@ -33,6 +33,7 @@ Json::Value Describe(const RealTable& Real) {
     Json::Value jTable(Json::objectValue);
     for (const RealColumn& Column : Real.vecColumns) {
         Json::Value& jMember = jTable["member"][Column.strName];
+        // mutate(exchanged): in any order.
         jMember["cpptype"] = TypeFor(Column.strType);
         if (Column.blNotNull) {
             jMember["notNull"] = true;

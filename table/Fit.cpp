@@ -47,6 +47,7 @@ Misfit CheckTree(const Json::Value& jValue, size_t nLevelsLeft) {
     if (nLevelsLeft == 0) {
         return Misfit::kDepth;
     }
+    // mutate(exchanged): what has no members has an end, too.
     if (!jValue.isArray() && !jValue.isObject()) {
         return jValue.type() == Json::realValue ? CheckReal(jValue.asDouble()) : Misfit::kNone;
     }
@@ -68,6 +69,7 @@ Misfit CheckTree(const Json::Value& jValue) {
 // Whether a member of that type takes JSON that begins so.
 bool TakesJson(const MemberType& Type, char cFirst) {
     const BoundKind eKind = Type.Bound.eKind;
+    // mutate(exchanged): all only look.
     return eKind == BoundKind::kJson || (eKind == BoundKind::kObject && cFirst == '{') ||
            (eKind == BoundKind::kList && cFirst == '[');
 }
@@ -79,6 +81,7 @@ Misfit Readable(const MemberType& Type, bool blCompatible) {
 // A whole number beyond 63 bits, which SQLite has no integers for: at most a real that equals it.
 Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, BoundValue& Out) {
     const double dValue = static_cast<double>(nValue);
+    // mutate(exchanged): of a cast beyond the range only UndefinedBehaviorSanitizer knows.
     const bool blExact = dValue < 2 * kTwoTo63 && static_cast<std::uint64_t>(dValue) == nValue;
     const bool blReal = Type.Bound.eKind == BoundKind::kReal || Type.Bound.eKind == BoundKind::kAny;
     return blReal && !blExact ? Misfit::kRange : FitReal(Type, dValue, blCompatible, Out);
@@ -88,12 +91,15 @@ Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, 
 Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out) try {
     const char cOther = jValue.isObject() ? '{' : '"';
+    // mutate(exchanged): the text of what does not fit is not used.
     if (!TakesJson(Type, jValue.isArray() ? '[' : cOther)) {
         return Misfit::kKind;
     }
     strJson.clear();
+    // mutate(sunk): both write the same.
     if (!WritePlainJson(jValue, strJson)) {
         const Misfit eMisfit = CheckTree(jValue);
+        // mutate(exchanged): the text of what does not fit is not used.
         if (eMisfit != Misfit::kNone) {
             return eMisfit;
         }
@@ -136,7 +142,9 @@ Misfit FitBoolean(const MemberType& Type, bool blValue, BoundValue& Out) {
 
 Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible, BoundValue& Out) {
     const BoundForm& Form = Type.Bound;
+    // mutate(hoisted, exchanged): what follows gives its own.
     if (Form.eKind == BoundKind::kReal) {
+        // mutate(exchanged): in any order.
         Out.eKind = BoundValue::Kind::kReal;
         Out.dValue = static_cast<double>(nValue);
         const bool blExact =
@@ -147,6 +155,7 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
     if (Form.eKind == BoundKind::kAny) {
         return Readable(Type, blCompatible);
     }
+    // mutate(exchanged): a reference only looks.
     if (Form.eKind != BoundKind::kInteger) {
         return Misfit::kKind;
     }
@@ -160,6 +169,7 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
 
 Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out) {
     const BoundForm& Form = Type.Bound;
+    // mutate(exchanged): in any order.
     Out.eKind = BoundValue::Kind::kReal;
     Out.dValue = dValue;
     if (std::isnan(dValue)) {
@@ -174,9 +184,11 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
         return blWhole ? FitInteger(Type, static_cast<std::int64_t>(dValue), blCompatible, Out)
                        : Misfit::kKind;
     }
+    // mutate(exchanged): both only look.
     if (Form.eKind != BoundKind::kReal && Form.eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }
+    // mutate(exchanged): all only look.
     const bool blBeyond = Form.eKind == BoundKind::kReal && std::isfinite(dValue) &&
                           std::fabs(dValue) > RangeOf(Type).dMost;
     return blBeyond ? Misfit::kRange : Readable(Type, blCompatible);
@@ -195,6 +207,7 @@ Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompati
 
 Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompatible,
                BoundValue& Out) {
+    // mutate(exchanged): in any order.
     Out.eKind = BoundValue::Kind::kBlob;
     Out.strBytes = strBytes;
     return Type.Bound.eKind == BoundKind::kAny ? Readable(Type, blCompatible) : Misfit::kKind;
@@ -208,6 +221,7 @@ Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompa
 
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
+    // mutate(hoisted): what follows gives its own.
     if (jValue.isNull()) {
         Out.eKind = BoundValue::Kind::kNull;
         return Misfit::kNone;

@@ -40,16 +40,19 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vec
               const std::vector<IndexTerm>& vecTerms, bool blUnique,
               std::vector<std::string>& vecPlanned, IndexPlan& Out) {
     const std::string strHead = blUnique ? "CREATE UNIQUE INDEX " : "CREATE INDEX ";
+    // mutate(exchanged): in any order.
     std::string strBase = Of.Table();
     std::string strTail = " ON " + Of.QuotedTable();
     const char* szBefore = " (";
     for (const IndexTerm& Term : vecTerms) {
+        // mutate(exchanged): in any order.
         strBase += "_" + Term.strName;
         strTail += szBefore + TermSql(Of.At(Term.Where.nMember), Term.Where);
         szBefore = ", ";
     }
     strTail += ')';
     for (const RealIndex& Index : vecIndexes) {
+        // mutate(exchanged, hoisted): both only look, and what follows gives another plan.
         if (Index.strSql.compare(0, strHead.size(), strHead) == 0 &&
             EndsWith(Index.strSql, strTail)) {
             Out = IndexPlan{Index.strSql, true};
@@ -58,6 +61,7 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vec
     }
     std::string strName;
     const int nResult = FindFreeName(pDb, strBase, vecPlanned, strName);
+    // mutate(doubled, exchanged): it is only asked whether it is there, and in any order.
     vecPlanned.push_back(strName);
     Out = IndexPlan{strHead + Quoted(strName) + strTail, false};
     return nResult;

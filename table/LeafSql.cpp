@@ -51,6 +51,7 @@ const char* JsonTypeTest(ValueKind eKind) {
 }
 
 void BoundSql::Add(const BoundValue& Value) {
+    // mutate(sunk): who writes literals binds nothing.
     if (pfnLiteral != nullptr) {
         pfnLiteral(Value, strSql);
     } else {
@@ -176,6 +177,7 @@ void LeafSql::AddJsonEqual(const Operand& What) {
 
 bool LeafSql::ReadOrdered(const Operator& Row, const Json::Value& jValue, Operand& Out,
                           Problem& Why) {
+    // mutate(exchanged): nothing is both.
     if (jValue.isString() || jValue.isNumeric()) {
         return m_Reader.Read(m_Where, jValue, Out, Why);
     }
@@ -198,6 +200,7 @@ bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Pro
     AddLeft(What.eKind);
     m_strSql += Row.szSql;
     AddValue(What.eKind, What.Value);
+    // mutate(exchanged): only one of the two writes anything.
     if (blEnd) {
         m_strSql += " AND ";
         AddLeft(What.eKind);
@@ -215,6 +218,7 @@ bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Proble
     if (Least.eKind != Most.eKind) {
         return RefuseOperand(Row, jPair, Why);
     }
+    // mutate(exchanged): the SQL of what is refused is not run.
     if (IsLess(jPair[1], jPair[0])) {
         return Why.Tell(FindingCode::kSwappedEnds, Concat({"nothing lies between ", Shown(jPair[0]),
                                                            " and ", Shown(jPair[1])}));

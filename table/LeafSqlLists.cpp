@@ -20,9 +20,11 @@ bool LeafSql::WriteIn(const Operator& Row, const Json::Value& jList, Problem& Wh
         AddLeft(eKind);
         m_strSql += szList;
     };
+    // mutate(exchanged): of an empty list the loop writes nothing.
     for (size_t i = 0; i < kValueKinds; ++i) {
         const auto eKind = static_cast<ValueKind>(i);
         ListOperand::OneKind& Kind = List.Kinds[i];
+        // mutate(exchanged): no kind has both.
         if (Kind.blBare) {
             Begin();
             AddJsonEqual(Operand{eKind, BoundValue()});
@@ -54,6 +56,7 @@ bool LeafSql::WriteIn(const Operator& Row, const Json::Value& jList, Problem& Wh
 
 bool LeafSql::WriteContains(const Json::Value& jElement, Problem& Why) {
     Operand What;
+    // mutate(exchanged): a name for nobody only takes time.
     if (!m_Reader.ReadJson(jElement, What, Why)) {
         return false;
     }

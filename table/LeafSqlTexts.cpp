@@ -1,6 +1,6 @@
 // "$like" and "$prefix".
 
-#include <cstring>
+#include <string_view>
 #include <utility>
 
 #include "Concat.h"
@@ -14,16 +14,18 @@ constexpr size_t kLongestPattern = 50000;  // SQLite's limit in its usual build
 
 // What SQLite cannot take for a pattern, or takes for another one; nullptr: nothing.
 const char* PatternFault(std::string_view strPattern) {
+    static constexpr std::string_view kEscaped = "%_\\";
     if (strPattern.size() > kLongestPattern) {
         return "is longer than SQLite takes";
     }
     for (size_t i = 0; i < strPattern.size(); ++i) {
+        // mutate(exchanged): no character is both.
         if (strPattern[i] == '\0') {
             return "holds a NUL byte, where SQLite ends it";
         }
         if (strPattern[i] == '\\') {
             ++i;
-            if (i == strPattern.size() || std::strchr("%_\\", strPattern[i]) == nullptr) {
+            if (i == strPattern.size() || kEscaped.find(strPattern[i]) == std::string_view::npos) {
                 return "has a \\ before something else than %, _ and \\";
             }
         }
@@ -51,6 +53,7 @@ BoundValue Beyond(std::string_view strPrefix, OperandReader& Reader) {
 
 // With a bare parameter SQLite would prepare the statement again for each pattern.
 bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
+    // mutate(exchanged): the SQL of what is refused is not run.
     if (const char* szFault = PatternFault(BytesOf(jPattern))) {
         return Why.Tell(FindingCode::kBadPattern,
                         Concat({"pattern ", Shown(jPattern), " ", szFault}));
@@ -60,6 +63,7 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
     m_strSql += " LIKE ";
     m_Out.Add(BoundText(BytesOf(jPattern)));
     m_strSql += "||'' ESCAPE '\\'";
+    // mutate(hoisted): without a path it writes nothing.
     if (m_blPath) {
         CloseJson(ValueKind::kText);
     } else {

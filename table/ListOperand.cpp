@@ -32,6 +32,7 @@ size_t CharacterBytes(std::string_view strText) {
     }
     // Overlong forms, surrogates, beyond the last character.
     const unsigned nSecond = At(1);
+    // mutate(exchanged): all only look.
     const bool blBad = (nFirst == 0xe0 && nSecond < 0xa0) || (nFirst == 0xed && nSecond > 0x9f) ||
                        (nFirst == 0xf0 && nSecond < 0x90) || (nFirst == 0xf4 && nSecond > 0x8f);
     return blBad ? 0 : nBytes;
@@ -67,6 +68,7 @@ bool AppendExact(const Operand& Each, std::string& strJson) {
             return blWhole;
         }
         default:
+            // mutate(exchanged): what is appended is taken away again.
             if (Each.eKind == ValueKind::kNumber || !IsPlainText(Value.strBytes)) {
                 return false;
             }
@@ -76,13 +78,16 @@ bool AppendExact(const Operand& Each, std::string& strJson) {
 }
 
 void Add(const Operand& Each, bool blOneByOne, ListOperand::OneKind& Into) {
+    // mutate(exchanged): to look changes nothing.
     if (Each.Value.eKind == BoundValue::Kind::kNull) {
         Into.blBare = true;
         return;
     }
     const size_t nBefore = Into.strJson.size();
     Into.strJson += nBefore == 0 ? '[' : ',';
+    // mutate(exchanged): what is appended is taken away again.
     if (blOneByOne || !AppendExact(Each, Into.strJson)) {
+        // mutate(exchanged): in any order.
         Into.strJson.resize(nBefore);
         Into.vecValues.push_back(Each.Value);
     }
@@ -98,6 +103,7 @@ bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, Ope
     }
     for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
         Operand Each;
+        // mutate(hoisted): where nothing is wrong nobody asks for the place.
         if (!Reader.Read(Where, jList[i], Each, Why)) {
             Why.strStep = Concat({"/", DigitsOf(i)});
             return false;
@@ -113,6 +119,7 @@ bool ReadList(const Place& Where, const Json::Value& jList, bool blOneByOne, Ope
 bool IsPlainText(std::string_view strText) {
     while (!strText.empty()) {
         const size_t nBytes = strText[0] == '\0' ? 0 : CharacterBytes(strText);
+        // mutate(exchanged): of no bytes none are removed.
         if (nBytes == 0) {
             return false;
         }

@@ -44,6 +44,7 @@ void Loader::Parts::SetRight(size_t nPlace) {
 void Loader::Parts::TakeWrong(FindingList& vecFindings) {
     vecFindings.reserve(nWrong);
     for (size_t nPlace = 0; nWrong > 0; ++nPlace) {
+        // mutate(sunk): what is right stays so.
         if (vecWrong[nPlace].szCode != nullptr) {
             vecFindings.push_back(std::move(vecWrong[nPlace]));
             SetRight(nPlace);
@@ -52,6 +53,7 @@ void Loader::Parts::TakeWrong(FindingList& vecFindings) {
 }
 
 Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
+    // mutate(exchanged): nobody asks a load that has ended whose transaction it was in.
     if (All.IsOpen()) {
         return vornjsondb::Fail(StatusCode::kMisuse, What, "its transaction was ended by others");
     }
@@ -67,19 +69,20 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);
     }
+    // mutate(exchanged): both only look.
     if (!vecFindings.empty()) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
-    Status Outcome;
+    // mutate(exchanged): both only look.
     const bool blBegun = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) == 0;
     if (!blBegun) {
-        Outcome = Begin(What);
-        if (!Outcome.Ok()) {
-            return Outcome;
+        Status Begun = Begin(What);
+        if (!Begun.Ok()) {
+            return Begun;
         }
     }
     Written eWritten = Written::kInserted;
-    Outcome = Writer.Write(How.eOnDuplicate, What, eWritten);
+    Status Outcome = Writer.Write(How.eOnDuplicate, What, eWritten);
     if (Outcome.Ok()) {
         std::int64_t* const apnCounts[] = {&Now.nInserted, &Now.nSkipped, &Now.nReplaced,
                                            &Now.nReplaced};
@@ -173,6 +176,7 @@ Status Loader::Add(const Json::Value& jRecord) {
     }
     FindingList vecFindings;
     if (m_pParts->nWrong > 0) {
+        // mutate(doubled): the second time there is none.
         m_pParts->TakeWrong(vecFindings);
         vecFindings.clear();
     }
@@ -185,9 +189,8 @@ Status Loader::EndRecord() {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    if (m_pParts->nWrong > 0) {
-        m_pParts->TakeWrong(vecFindings);
-    }
+    // mutate(doubled): the second time there is none.
+    m_pParts->TakeWrong(vecFindings);
     return m_pParts->EndRecord(vecFindings);
 }
 

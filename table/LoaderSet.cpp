@@ -21,12 +21,14 @@ using Parts = Loader::Parts;
 
 void SetWrong(Parts& Of, size_t nPlace, FindingCode eCode, std::string_view strMessage) {
     FindingList vecFindings;
+    // mutate(doubled): only the first one is taken.
     Report(vecFindings, eCode, "", strMessage);
     Of.SetWrong(nPlace, vecFindings);
 }
 
 void SetUnknown(Parts& Of, int nMember) {
     if (!Of.Into.How.blIgnoreUnknown) {
+        // mutate(doubled): the last one counts.
         SetWrong(Of, Of.UnknownPlace(), FindingCode::kUnknownMember,
                  "there is no member of number " + std::to_string(nMember));
     }
@@ -34,6 +36,7 @@ void SetUnknown(Parts& Of, int nMember) {
 
 // What was wrong with a member's last value counts no more, but what is wrong with this one.
 void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const char* szShown) {
+    // mutate(exchanged): a reference only looks.
     const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
     Of.SetRight(nPlace);
     if (eMisfit != Misfit::kNone || Into.blGenerated) {
@@ -42,6 +45,7 @@ void Judge(Parts& Of, size_t nPlace, Misfit eMisfit, const char* szShown) {
             strShown = szShown;
         }
         FindingList vecFindings;
+        // mutate(doubled): only the first one is taken.
         ReportMisfit(eMisfit, Into, strShown, vornjsondb::Below("", Into.strName), vecFindings);
         Of.SetWrong(nPlace, vecFindings);
     }
@@ -62,9 +66,9 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
     }
     const vornjsondb::MemberType& Type = *pOf->Into.Of.At(nPlace).pType;
     const bool blCompatible = pOf->Into.How.blCompatible;
-    BoundValue& Out = pOf->Values.Give(nPlace);
     Misfit eMisfit = Misfit::kNone;
     const char* szShown = nullptr;
+    BoundValue& Out = pOf->Values.Give(nPlace);
     switch (eKind) {
         case Passed::kBoolean:
             eMisfit = FitBoolean(Type, nValue != 0, Out);
@@ -109,15 +113,18 @@ std::unique_ptr<Json::CharReader> StrictReader() {
 // Most texts are just as they will be stored, and need no reading.
 bool SetWritten(Parts& Of, size_t nPlace, std::string_view strJson) {
     const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
+    // mutate(exchanged): the longer way refuses a generated member as well.
     return vornjsondb::IsWrittenJson(strJson.data(), strJson.size()) && !Into.blGenerated &&
            FitWritten(*Into.pType, strJson, Of.Into.How.blCompatible, Of.Values.Give(nPlace)) ==
                Misfit::kNone;
 }
 
 bool Parse(Parts& Of, std::string_view strJson, Json::Value& jOut) {
+    // mutate(exchanged): a reader may be made early.
     if (vornjsondb::ReadPlainJson(strJson.data(), strJson.size(), jOut)) {
         return true;
     }
+    // mutate(hoisted, sunk): each new one reads alike.
     if (!Of.pReader) {
         Of.pReader = StrictReader();
     }
@@ -136,6 +143,7 @@ void Loader::SetNull(int nMember) {
 
 void Loader::SetBoolean(int nMember, bool blValue) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
+    // mutate(hoisted, sunk): the longer way gives the same.
     if (pInto == nullptr || !pInto->TakeBoolean(static_cast<size_t>(nMember), blValue)) {
         Set(m_pParts.get(), nMember, Passed::kBoolean, blValue ? 1 : 0);
     }
@@ -143,6 +151,7 @@ void Loader::SetBoolean(int nMember, bool blValue) {
 
 void Loader::SetInteger(int nMember, std::int64_t nValue) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
+    // mutate(hoisted, sunk): the longer way gives the same.
     if (pInto == nullptr || !pInto->TakeInteger(static_cast<size_t>(nMember), nValue)) {
         Set(m_pParts.get(), nMember, Passed::kInteger, nValue);
     }
@@ -155,6 +164,7 @@ void Loader::SetReal(int nMember, double dValue) {
 void Loader::SetText(int nMember, std::string_view strText) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
     const auto nPlace = static_cast<size_t>(nMember);
+    // mutate(sunk): the longer way gives the same.
     if (pInto != nullptr && pInto->FitsText(nPlace, strText)) {
         pInto->Give(nPlace).SetText(pInto->Copied(nPlace, strText));
     } else {
@@ -168,36 +178,40 @@ void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
 
 void Loader::SetJson(int nMember, std::string_view strJson) {
     const auto nPlace = static_cast<size_t>(nMember);
+    // mutate(hoisted): what follows gives another value.
     if (!m_pParts || nPlace >= m_pParts->Values.Size()) {
         SetNull(nMember);  // which says what is wrong
         return;
     }
-    if (m_pParts->nWrong > 0) {
-        m_pParts->SetRight(nPlace);
-    }
+    // mutate(exchanged): the one knows nothing of the other.
+    m_pParts->SetRight(nPlace);
     strJson = m_pParts->Values.Copied(nPlace, strJson);
     if (SetWritten(*m_pParts, nPlace, strJson)) {
         return;
     }
+    FindingList vecFindings;
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);
-    FindingList vecFindings;
     try {
         Json::Value jValue;
         if (!Parse(*m_pParts, strJson, jValue)) {
+            // mutate(doubled): only the first one is taken.
             Report(
                 vecFindings, FindingCode::kWrongKind, strPath,
                 "member " + Into.strQuoted + ": " + vornjsondb::ShownText(strJson) + " is no JSON");
         } else if (jValue.isString() && !Into.IsJson()) {
             SetText(nMember, jValue.asString());
         } else {
+            // mutate(doubled): only the first finding is taken.
             m_pParts->Values.SetJson(nPlace, jValue, vecFindings);
         }
     } catch (const Json::RuntimeError& Error) {
         // The one exception of JsonCpp's for two things.
+        // mutate(exchanged): the exception ends the list, too.
         if (std::strstr(Error.what(), "stackLimit") == nullptr) {
             vornjsondb::ThrowBadAlloc();
         }
+        // mutate(doubled): only the first one is taken.
         Report(vecFindings, FindingCode::kTooDeep, strPath,
                "member " + Into.strQuoted + ": the JSON is nested too deeply");
     }
@@ -208,6 +222,7 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
 
 void Loader::Reject(const std::string& strReason) {
     if (m_pParts) {
+        // mutate(doubled): the last one counts.
         SetWrong(*m_pParts, m_pParts->WholePlace(), FindingCode::kRejected, strReason);
     }
 }

@@ -57,6 +57,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
+        // mutate(exchanged): in any order.
         const std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
@@ -91,6 +92,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     for (Json::ArrayIndex i = 0; i < nNames; ++i) {
         const Json::Value& jName = jKey.isArray() ? jKey[i] : jKey;
         const std::string strName = jName.isString() ? jName.asString() : std::string();
+        // mutate(exchanged): in any order.
         if (Find(strName) == kNone) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,
                    Concat({Shown(jName), " is no member that can be a key",
@@ -98,6 +100,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
         }
         vecNames.push_back(strName);
     }
+    // mutate(doubled): the same key once more.
     SetKey(vecNames);
 }
 

@@ -103,6 +103,7 @@ Status Table::ToOldQuery(const Query& Which, OldCall eCall, Json::Value& jOldQue
         std::string strTail;
         Plan.AppendTail(strTail);
         const bool blAll = strCondition.empty() && strTail.empty();
+        // mutate(doubled): the second one adds nothing.
         strCondition.append(strCondition.empty() ? "1" : "");
         Status Tried = vornjsondb::Try(From, strCondition, strTail, What);
         if (!Tried.Ok()) {

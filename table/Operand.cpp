@@ -54,7 +54,10 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
                                Problem& Why) {
     std::string strJson;
     const Misfit eMisfit = FitJson(*Of.pType, jValue, false, m_Codec, strJson, Out.Value);
+    // mutate(hoisted, exchanged): the value of what is refused is not used, and a name for nobody
+    // only takes time.
     if (eMisfit == Misfit::kNone) {
+        // mutate(exchanged): a text is one wherever it is kept.
         if (!strJson.empty()) {
             Out.Value = Keep(std::move(strJson));
         }
@@ -75,15 +78,19 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
 
 bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& Why) {
     static constexpr char kAnyJson[] = "Json::Value";
+    // mutate(hoisted, exchanged): no value is of two kinds, and what follows gives its own.
     if (jValue.isNull()) {
         Out.eKind = ValueKind::kNull;  // mutate(dropped): a new one is of this kind.
         return true;
     }
+    // mutate(exchanged): no value is of two kinds.
     if (jValue.isBool()) {
         Out.eKind = jValue.asBool() ? ValueKind::kTrue : ValueKind::kFalse;
         return true;
     }
+    // mutate(hoisted, exchanged): no value is of two kinds, and what follows gives its own.
     if (jValue.isString()) {
+        // mutate(exchanged): in any order.
         Out.eKind = ValueKind::kText;
         Out.Value = BoundText(BytesOf(jValue));
         if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
@@ -95,7 +102,9 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     }
     Out.eKind = jValue.isArray() ? ValueKind::kList
                                  : (jValue.isObject() ? ValueKind::kObject : ValueKind::kNumber);
+    // mutate(hoisted): what follows gives its own.
     if (jValue.type() != Json::realValue && jValue.isInt64()) {
+        // mutate(exchanged): in any order.
         Out.Value.eKind = BoundValue::Kind::kInteger;
         Out.Value.nValue = jValue.asInt64();
         return true;
@@ -103,6 +112,7 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     std::string strJson;
     const MemberType& Any = FindMemberType(std::begin(kAnyJson), std::end(kAnyJson) - 1);
     const Misfit eMisfit = FitJson(Any, jValue, false, m_Codec, strJson, Out.Value);
+    // mutate(exchanged): the value of what is refused is not used.
     if (eMisfit != Misfit::kNone) {
         return RefuseMisfit(eMisfit, "JSON", jValue, Why);
     }
@@ -117,6 +127,7 @@ BoundValue OperandReader::Keep(std::string strText) {
 
 BoundValue BoundText(std::string_view strText) {
     BoundValue Text;
+    // mutate(exchanged): in any order.
     Text.eKind = BoundValue::Kind::kText;
     Text.strBytes = strText;
     return Text;

@@ -19,6 +19,7 @@ bool IsNumber(std::string_view strText) {
 // SQLite has no escape for what would end the name or begin one.
 bool IsReachable(std::string_view strName) {
     return std::none_of(strName.begin(), strName.end(), [](char c) {
+        // mutate(exchanged): all only look.
         return c == '"' || c == '\\' || static_cast<unsigned char>(c) < ' ';
     });
 }
@@ -26,12 +27,15 @@ bool IsReachable(std::string_view strName) {
 // Takes ".name" from the front of strSteps.
 bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const std::string_view strName = strSteps.substr(1, strSteps.find_first_of(".[", 1) - 1);
+    // mutate(exchanged): no name is both.
     if (strName.empty()) {
         return Why.Tell(FindingCode::kBadPath, "a name is missing in it");
     }
+    // mutate(exchanged): no name is both.
     if (!IsReachable(strName)) {
         return Why.Tell(FindingCode::kBadPath, Concat({"no path leads to ", ShownText(strName)}));
     }
+    // mutate(exchanged): the path of what is refused is not used.
     if (IsNumber(strName)) {
         return Why.Tell(FindingCode::kNumberInPath,
                         Concat({ShownText(strName), " would be a name, not an index"}));
@@ -49,6 +53,7 @@ bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
 bool TakeIndex(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     const size_t nEnd = std::min(strSteps.find(']'), strSteps.size() - 1);
     const std::string_view strDigits = strSteps.substr(1, nEnd - 1);
+    // mutate(exchanged): all only look, and the path of what is refused is not used.
     if (!IsNumber(strDigits) || strDigits.size() > kMostIndexDigits || strSteps[nEnd] != ']') {
         return Why.Tell(FindingCode::kBadPath, "an index is a whole number in brackets");
     }
@@ -86,11 +91,14 @@ bool Problem::Tell(FindingCode eWrong, std::string_view strText) {
 }
 
 bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem& Why) {
+    // mutate(exchanged): in any order.
     Out.nMember = Of.Find(strName);
     Out.strPath.clear();
     size_t nEnd = strName.size();
     while (Out.nMember == Members::kNone && nEnd > 0) {
+        // mutate(exchanged): the whole name is not found a second time either.
         nEnd = strName.find_last_of(".[", nEnd - 1);
+        // mutate(exchanged): the whole name is not found a second time either.
         if (nEnd == std::string_view::npos) {
             break;
         }
@@ -106,6 +114,7 @@ bool FindPlace(const Members& Of, std::string_view strName, Place& Out, Problem&
         return true;
     }
     const Member& Base = Of.At(Out.nMember);
+    // mutate(exchanged): what is told last counts.
     if (!Base.IsJson()) {
         return Why.Tell(FindingCode::kNoJsonMember,
                         Concat({"member ", ShownText(Base.strName), " of type \"",

@@ -19,6 +19,7 @@ bool IsTooDeep(const Json::Value& jValue) {
     std::vector<std::pair<Iterator, Iterator>> vecOpen;  // lists and objects, each inside the last
     const Json::Value* pjNext = &jValue;
     while (true) {
+        // mutate(sunk): what has no elements is closed at once.
         if ((pjNext->isArray() || pjNext->isObject()) && !pjNext->empty()) {
             if (vecOpen.size() == kMaxLevels) {
                 return true;
@@ -48,7 +49,9 @@ using Node = Condition::Node;
 std::shared_ptr<const Node> Leaf(std::string& strMember, Op eOp, Json::Value& jOperand) {
     auto pNode = std::make_shared<Node>();
     pNode->eOp = eOp;
+    // mutate(exchanged): in any order.
     pNode->strMember = std::move(strMember);
+    // mutate(sunk): nobody looks into what is too deep.
     if (vornjsondb::IsTooDeep(jOperand)) {
         pNode->eKind = Node::Kind::kTooDeep;
     } else {
@@ -69,6 +72,7 @@ Condition Group(Node::Kind eKind, std::vector<Condition> vecParts) {
         const Node& Each = Part.Root();
         const bool blSame = Each.eKind == eKind && eKind != Node::Kind::kNot;
         pNode->nLeaves += Each.nLeaves;
+        // mutate(exchanged): the part is the same wherever it has been moved.
         pNode->nLevels = std::max(pNode->nLevels, Each.nLevels + (blSame ? 0 : 1));
         if (blSame) {
             for (Condition Inner : Each.vecParts) {

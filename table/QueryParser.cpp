@@ -59,6 +59,7 @@ void ReadOffset(const Json::Value& jOffset, bool, Query& Out) {
 }
 
 void ReadMembers(const Json::Value& jMembers, bool, Query& Out) {
+    // mutate(exchanged): an empty list has no names.
     ReadNames(jMembers, "/members", FindingCode::kBadMembers, Out.vecMembers, Out.vecFindings);
     // To a Query no names are all names.
     if (jMembers.isArray() && jMembers.empty()) {
@@ -86,6 +87,7 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
     std::vector<std::string> vecKeys;
     for (const QueryKey& Key : kKeys) {
         std::string strOne = Key.szKey;
+        // mutate(doubled): an empty name is near to none.
         vecKeys.push_back(std::move(strOne));
     }
     const std::string strKey(Name.pBegin, Name.pEnd);
@@ -97,6 +99,7 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
 
 Query ParseQuery(const Json::Value& jQuery, bool blValuesOnly) {
     Query Parsed;
+    // mutate(exchanged): what has no members has an end, too.
     if (!jQuery.isObject()) {
         Report(Parsed.vecFindings, FindingCode::kNotAQuery, "",
                Concat({"a query is an object, not ", Shown(jQuery)}));

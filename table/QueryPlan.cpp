@@ -20,6 +20,7 @@ bool IsPaged(const Query& Which) {
 
 BoundValue Integer(std::int64_t nValue) {
     BoundValue Value;
+    // mutate(exchanged): in any order.
     Value.eKind = BoundValue::Kind::kInteger;
     Value.nValue = nValue;
     return Value;
@@ -63,6 +64,7 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
     }
     m_nTailEnd = m_Sql.strSql.size();
     for (const size_t nMember : m_vecColumns) {
+        // mutate(doubled): told twice, it tells the same columns apart.
         Append(m_Sql.strSql, {" ", DigitsOf(static_cast<std::int64_t>(nMember))});
     }
 }
@@ -108,7 +110,9 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
                    Why.strMessage);
             continue;
         }
+        // mutate(exchanged): in any order.
         AppendSort(Where.nMember, Where.strPath, blDescending);
+        // mutate(doubled): it is only asked whether it is there.
         vecSorted.push_back(Where.strPath.empty() ? Where.nMember : Members::kNone);
     }
     for (const size_t nMember : m_Of.Key()) {

@@ -19,6 +19,7 @@ RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatibl
       m_vecSlots(Of.Size()),
       m_strGiven(Of.Size(), '0') {
     for (size_t i = 0; i < Of.Size(); ++i) {
+        // mutate(doubled): a default is given once.
         Prepare(i);
     }
 }
@@ -27,12 +28,17 @@ void RecordValues::Prepare(size_t nMember) {
     const Member& Of = m_Of.At(nMember);
     const Range& Fits = RangeOf(*Of.pType);
     Slot& Into = m_vecSlots[nMember];
+    // mutate(exchanged): in any order.
     if (!Of.blGenerated && (!m_blCompatible || Of.pType->pfnRead != nullptr)) {
+        // mutate(dropped): the longer way gives the same.
         Into.eKind = Of.Kind();
     }
+    // mutate(dropped, exchanged): the longer way gives the same, and in any order.
     Into.nLeast = Fits.nLeast;
+    // mutate(dropped): the longer way gives the same.
     Into.nMost = m_blCompatible ? Fits.nMostRead : Fits.nMost;
     if (Of.pjDefault != nullptr) {
+        // mutate(doubled): a default is given once.
         m_vecDefaults.push_back(nMember);
     }
 }
@@ -43,6 +49,7 @@ void RecordValues::Clear() {
 }
 
 bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
+    // mutate(exchanged): what is refused is not written.
     Clear();
     if (!jRecord.isObject() || jRecord.empty()) {
         Report(vecFindings, FindingCode::kNotARecord, "",
@@ -70,6 +77,7 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
 
 void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
     bool blTaken = false;
+    // mutate(exchanged): the longer way gives the same.
     switch (jValue.type()) {
         case Json::stringValue: {
             const std::string_view strText = BytesOf(jValue);
@@ -80,14 +88,17 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
             break;
         }
         case Json::intValue:
+            // mutate(dropped): the longer way gives the same.
             blTaken = TakeInteger(nMember, jValue.asInt64());
             break;
         case Json::booleanValue:
+            // mutate(dropped): the longer way gives the same.
             blTaken = TakeBoolean(nMember, jValue.asBool());
             break;
         default:
             break;
     }
+    // mutate(hoisted, sunk): the longer way gives the same.
     if (!blTaken) {
         LookAtJson(nMember, jValue, vecFindings);
     }
@@ -119,6 +130,7 @@ void RecordValues::Grow(std::string& strOwn, size_t nBytes) {
 bool RecordValues::FillDefaults(FindingList& vecFindings) {
     for (const size_t nMember : m_vecDefaults) {
         // The real table may compute what the definition has a default for.
+        // mutate(exchanged): both only look.
         if (!Has(nMember) && !m_Of.At(nMember).blGenerated) {
             SetJson(nMember, *m_Of.At(nMember).pjDefault, vecFindings);
         }
@@ -127,10 +139,12 @@ bool RecordValues::FillDefaults(FindingList& vecFindings) {
 }
 
 bool RecordValues::HasKey(FindingList& vecFindings) const {
+    // mutate(exchanged): only one of the two finds anything.
     if (m_Of.Key().empty()) {
         Report(vecFindings, FindingCode::kNoKey, "", kNoKeyText);
     }
     for (const size_t nMember : m_Of.Key()) {
+        // mutate(exchanged): both only look.
         if (!Has(nMember) || At(nMember).eKind == BoundValue::Kind::kNull) {
             Report(vecFindings, FindingCode::kMissingKey, Below("", m_Of.At(nMember).strName),
                    Concat({"the key's member ", m_Of.At(nMember).strQuoted, " has no value"}));

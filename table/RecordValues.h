@@ -41,6 +41,7 @@ class RecordValues {
     // for each member, whose memory never becomes less.
     std::string_view Copied(size_t nMember, std::string_view strBytes) {
         std::string& strOwn = m_vecSlots[nMember].strBytes;
+        // mutate(hoisted, sunk): how much memory is kept shows nowhere.
         if (strOwn.size() < strBytes.size()) {
             Grow(strOwn, strBytes.size());
         }

@@ -21,8 +21,11 @@ sqlite3_value* ColumnValue(sqlite3_stmt* pStatement, int nColumn) {
 // First the pointer, then the length: the other way round SQLite may convert in between. An empty
 // blob has no pointer, and neither has a text for which there is no memory.
 std::string_view TextOf(sqlite3_stmt* pStatement, sqlite3_value* pValue) {
+    // mutate(exchanged): with values in UTF-8 either order converts once.
     const auto* pText = reinterpret_cast<const char*>(sqlite3_value_text(pValue));
+    // mutate(exchanged): without a text nobody asks for its length.
     const int nBytes = sqlite3_value_bytes(pValue);
+    // mutate(hoisted): where there is a text, no memory was lacking.
     if (pText == nullptr) {
         if (sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
             throw std::bad_alloc();
@@ -80,12 +83,14 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
     : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
     for (size_t i = 0; i < m_vecColumns.size(); ++i) {
         const Member& Shown = Of.At(m_vecColumns[i]);
+        // mutate(exchanged): both only look.
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
                                 (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
         // Members are numbered in the order of their names.
         const auto itPlace =
             std::upper_bound(m_vecInKeyOrder.begin(), m_vecInKeyOrder.end(), m_vecColumns[i],
                              [](size_t nNew, const Column& Each) { return nNew < Each.nMember; });
+        // mutate(exchanged): in any order.
         m_vecInKeyOrder.insert(
             itPlace, Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
@@ -104,7 +109,9 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
         ++itMember;
         sqlite3_value* const pValue = ColumnValue(pStatement, Each.nColumn);
         const RowKind eKind = KindOf(pValue, Each.eKind);
+        // mutate(sunk): with nothing to leave out nothing is.
         if (eKind == RowKind::kJson) {
+            // mutate(doubled): it reads the same again.
             ReadJson(TextOf(pStatement, pValue), Codec, jMember);
         } else if (eKind != RowKind::kNull) {
             Json::Value jValue = ReadValue(pStatement, pValue, eKind);
@@ -113,7 +120,9 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
             blLeaveOut = blLeaveOut || !Each.blKeepNull;
         }
     }
+    // mutate(hoisted, sunk): with nothing to leave out nothing is.
     if (blLeaveOut) {
+        // mutate(doubled): the second time there is nothing to leave out.
         LeaveOutNulls(pStatement, jRecord);
     }
     return jRecord;

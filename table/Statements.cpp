@@ -41,7 +41,9 @@ Statement::Statement(Statement&& From) noexcept
       m_strShape(std::move(From.m_strShape)) {}
 
 Statement& Statement::operator=(Statement&& From) noexcept {
+    // mutate(exchanged): in any order.
     std::swap(m_pHome, From.m_pHome);
+    // mutate(exchanged): in any order.
     std::swap(m_pStatement, From.m_pStatement);
     std::swap(m_strShape, From.m_strShape);
     return *this;
@@ -74,10 +76,13 @@ bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
     const auto itFound =
         std::find_if(m_vecKept.rbegin(), m_vecKept.rend(),
                      [strShape](const Kept& Each) { return Each.strShape == strShape; });
+    // mutate(exchanged): without a statement nobody asks for its home.
     if (itFound == m_vecKept.rend()) {
         return false;
     }
+    // mutate(exchanged): in any order.
     Lent.m_pHome = this;
+    // mutate(exchanged): in any order.
     Lent.m_pStatement = std::move(itFound->pStatement);
     Lent.m_strShape = std::move(itFound->strShape);
     m_vecKept.erase(std::next(itFound).base());
@@ -90,8 +95,10 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
     }
     OwnStatement pStatement;
     const int nResult = Prepare(m_pDb, fnSql(), pStatement);
+    // mutate(hoisted, sunk): without a statement nobody asks for its shape and home.
     if (nResult == SQLITE_OK) {
         Lent.m_strShape = strShape;
+        // mutate(exchanged): in any order.
         Lent.m_pStatement = std::move(pStatement);
         Lent.m_pHome = this;
     }
@@ -99,12 +106,14 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
 }
 
 void Statements::GiveBack(Statement& Lent) {
+    // mutate(exchanged): in any order.
     sqlite3_reset(Lent.m_pStatement.get());
+    // mutate(exchanged): in any order.
     sqlite3_clear_bindings(Lent.m_pStatement.get());
+    if (m_nMost == 0) {
+        return;
+    }
     if (m_vecKept.size() == m_nMost) {
-        if (m_nMost == 0) {
-            return;
-        }
         m_vecKept.erase(m_vecKept.begin());
     }
     m_vecKept.push_back(Kept{std::move(Lent.m_strShape), std::move(Lent.m_pStatement)});

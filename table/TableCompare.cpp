@@ -31,12 +31,14 @@ class TableCompare {
     int Run(bool& blFound) {
         int nResult = ReadRealTable(m_pDb, m_Of.Table(), m_Real);
         blFound = !m_Real.vecColumns.empty();
+        // mutate(exchanged): in any order.
         if (nResult == SQLITE_OK && blFound) {
             nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_vecIndexes);
         }
         if (nResult == SQLITE_OK && blFound) {
             nResult = IsView(m_pDb, m_Of.Table(), m_blView);
         }
+        // mutate(exchanged): what is not there is not compared.
         if (nResult != SQLITE_OK || !blFound) {
             return nResult;
         }
@@ -74,6 +76,7 @@ class TableCompare {
 
     // The column that is the rowid never holds NULL.
     bool IsRowid(const RealColumn& Column) const {
+        // mutate(exchanged): all only look.
         return m_Real.vecKey.size() == 1 && m_Real.vecKey[0] == Column.strName &&
                sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
     }
@@ -85,6 +88,7 @@ class TableCompare {
             CompareMissing(Of);
             return SQLITE_OK;
         }
+        // mutate(exchanged): what is learned in between is not told.
         if (pColumn->strName != Of.strName) {
             Add(LintCode::kOtherCase, Of,
                 " is the column " + Quoted(pColumn->strName) +
@@ -130,6 +134,7 @@ class TableCompare {
         } else {
             const std::string strDefault = DefaultClause(Of);
             const bool blNotNull = Of.blNotNull && !strDefault.empty();
+            // mutate(exchanged): statements and findings are told apart.
             m_pvecStatements->push_back("ALTER TABLE " + m_Of.QuotedTable() + " ADD COLUMN " +
                                         ColumnClause(Of, blNotNull));
             if (Of.blNotNull && !blNotNull) {
@@ -163,6 +168,7 @@ class TableCompare {
         std::vector<IndexTerm> vecTerms;
         for (const size_t nMember : vecMembers) {
             const Member& Of = m_Of.At(nMember);
+            // mutate(exchanged): both only look.
             if (blKey && ColumnOf(Of) == nullptr) {
                 return SQLITE_OK;  // told already
             }
@@ -179,6 +185,7 @@ class TableCompare {
         IndexPlan Plan;
         const int nResult =
             PlanIndex(m_pDb, m_Of, m_vecIndexes, vecTerms, true, m_vecPlanned, Plan);
+        // mutate(doubled): it is only asked whether it is there.
         m_vecUniqueByPlan.push_back(vecNames);
         m_pvecStatements->push_back(Plan.strSql);
         return nResult;
@@ -198,6 +205,7 @@ class TableCompare {
         const auto fnSame = [&vecNames](const std::vector<std::string>& vecOther) {
             return SameNames(vecNames, vecOther);
         };
+        // mutate(exchanged): all only look.
         return fnSame(m_Real.vecKey) ||
                std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame) ||
                std::any_of(m_vecIndexes.begin(), m_vecIndexes.end(),

@@ -77,6 +77,7 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
         Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
         Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
+        // mutate(exchanged): a statement for nobody only takes time.
         if (!Checked.Ok()) {
             return Checked;
         }
@@ -84,10 +85,12 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         Resolved.AppendWhere(Made.strSql);
         Resolved.AppendTail(Made.strSql);
         Status Outcome = ReadPlan(From, What, Made);
+        // mutate(exchanged): an advice for nobody only takes time.
         if (!Outcome.Ok()) {
             return Outcome;
         }
         const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
+        // mutate(exchanged): both only look.
         if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "/where",
@@ -102,17 +105,20 @@ Status Table::Explain(const Query& Which, Plan& Found) {
 Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
     const auto fnExplain = [&](Parts& From, const Doing& What) {
         Plan Made;
+        // mutate(exchanged): in any order.
         Made.strSql = strSql;
         Status Outcome = vornjsondb::Attempt(From.pDb, From.How.nWaitMs,
                                              [&] { return CheckOne(From, What, strSql); });
         if (Outcome.Ok()) {
             Outcome = ReadPlan(From, What, Made);
         }
+        // mutate(exchanged): it only looks.
         if (!Outcome.Ok()) {
             return Outcome;
         }
         const bool blSearched =
             vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
+        // mutate(exchanged): both only look.
         if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "",

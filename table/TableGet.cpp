@@ -75,8 +75,8 @@ Status Table::Get(const Json::Value& jKey, Json::Value& jRecord) {
     if (!Outcome.Ok()) {
         return Outcome;
     }
-    const vornjsondb::Doing What = m_pParts->Do(kDo);
     FindingList vecFindings;
+    const vornjsondb::Doing What = m_pParts->Do(kDo);
     if (!TakeKey(*m_pParts, jKey, vecFindings)) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }

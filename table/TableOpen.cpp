@@ -23,6 +23,7 @@ using vornjsondb::RealTable;
 
 std::vector<size_t> AllColumns(const vornjsondb::Members& Of) {
     std::vector<size_t> vecAll(Of.Size());
+    // mutate(doubled): the same numbers once more.
     std::iota(vecAll.begin(), vecAll.end(), size_t{0});
     return vecAll;
 }
@@ -34,6 +35,7 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     if (nResult == SQLITE_OK) {
         nResult = sqlite3_step(pStatement.get());
     }
+    // mutate(exchanged): where there is no row its columns are empty.
     if (nResult != SQLITE_ROW) {
         return FailBySqlite(pDb, nResult, What);
     }
@@ -80,11 +82,13 @@ Status Table::Parts::Meet() {
     RealTable Real;
     int nResult = vornjsondb::ReadRealTable(pDb, Of.Table(), Real);
     const bool blCreate = How.blCreateTable || !How.strSqlCreate.empty();
+    // mutate(hoisted): who creates nothing does not ask for the SQL.
     if (nResult == SQLITE_OK && Real.vecColumns.empty() && blCreate) {
         if (How.strSqlCreate.empty()) {
             How.strSqlCreate = vornjsondb::CreateTableSql(Of, {});
         }
         Outcome = RunWhole(*this, How.strSqlCreate, What);
+        // mutate(exchanged): after a failure nobody asks what was read.
         if (!Outcome.Ok()) {
             return Outcome;
         }
@@ -93,6 +97,7 @@ Status Table::Parts::Meet() {
     if (nResult != SQLITE_OK) {
         return FailBySqlite(pDb, nResult, What);
     }
+    // mutate(exchanged): of no columns nothing is learned.
     if (Real.vecColumns.empty()) {
         return vornjsondb::Fail(StatusCode::kNotFound, What, "there is no such table");
     }
@@ -101,17 +106,22 @@ Status Table::Parts::Meet() {
 }
 
 void Table::Parts::Learn(const RealTable& Real) {
+    // mutate(exchanged): in any order.
     strRowid = Real.strRowid;
     if (Of.Key().empty()) {
+        // mutate(doubled): the same key once more.
         Of.SetKey(Real.vecKey);
     }
+    // mutate(exchanged): in any order.
     for (const size_t nMember : Of.Key()) {
         vecKeyNames.push_back(Of.At(nMember).strName);
     }
     for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
         const size_t nMember = Of.FindColumn(Column.strName);
         if (Column.blGenerated && nMember != vornjsondb::Members::kNone) {
+            // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);
+            // mutate(exchanged): in any order.
             Values.LookAlways(nMember);
             Wanted.LookAlways(nMember);
         }
@@ -130,6 +140,7 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
     }
     m_pParts.reset();
     const Doing What{"open", &strName};
+    // mutate(exchanged): it only looks.
     if (pDb == nullptr) {
         return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no connection");
     }

@@ -42,6 +42,7 @@ Status Select(Parts& From, const Query& Which, const Doing& What,
     Status Begun = vornjsondb::FirstStep(
         From, What, Plan.ShapeFor('L'), fnSql,
         [&](sqlite3_stmt* pStatement) { return Plan.Bind(pStatement, 1); }, Lent, nResult);
+    // mutate(exchanged): what did not begin has no row.
     if (!Begun.Ok()) {
         return Begun;
     }
@@ -60,6 +61,7 @@ Status SelectRecords(Parts& From, const Query& Which, const Doing& What,
     std::unique_ptr<vornjsondb::RowReader> pSome;
     const auto fnRow = [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
         const bool blAll = &vecColumns == &From.WholeRow.Columns();
+        // mutate(hoisted, sunk): each new one reads alike.
         if (!blAll && !pSome) {
             pSome = std::make_unique<vornjsondb::RowReader>(From.Of, vecColumns, From.How.eNulls);
         }

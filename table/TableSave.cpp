@@ -32,6 +32,7 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
     if (nResult == SQLITE_OK) {
         nResult = Lent.Step();
     }
+    // mutate(hoisted): without a row nobody is given what was read.
     if (nResult == SQLITE_ROW) {
         jStored = From.WholeRow.Read(Lent.Get(), From.Codec);
         return {};
@@ -64,7 +65,9 @@ Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, 
     bool blTaken = true;
     const auto fnSteps = [&]() -> Status {
         // Anew for each further try: the one before may have filled defaults.
+        // mutate(hoisted, sunk): taken once more it is the same record.
         if (!std::exchange(blTaken, false)) {
+            // mutate(doubled): taken once more it is the same record.
             Take(Into, jRecord, eOnDuplicate, What).Ignore();
         }
         vornjsondb::RecordWriter Writer(Into, Into.Values);

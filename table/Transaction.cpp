@@ -42,10 +42,12 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     const char* szBegin = eMode == Mode::kImmediate ? "BEGIN IMMEDIATE" : "BEGIN";
     int nPrepared =
         vornjsondb::Prepare(pDb, m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", pUndo);
+    // mutate(exchanged): in any order.
     if (nPrepared == SQLITE_OK) {
         nPrepared = vornjsondb::Prepare(pDb, m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", pEnd);
     }
     if (nPrepared == SQLITE_OK) {
+        // mutate(doubled): the first one is finalized.
         nPrepared =
             vornjsondb::Prepare(pDb, m_blSavepoint ? "SAVEPOINT vornjsondb" : szBegin, pFirst);
     }
@@ -74,6 +76,7 @@ int Transaction::Undo() {
 }
 
 void Transaction::Close() {
+    // mutate(exchanged): in any order.
     sqlite3_finalize(m_pUndo);
     sqlite3_finalize(m_pEnd);
     m_pDb = nullptr;
@@ -87,6 +90,7 @@ Status Transaction::Commit() {
         return NotOpen(What);
     }
     if (sqlite3_get_autocommit(m_pDb) != 0) {
+        // mutate(exchanged): the failure asks nothing of the transaction.
         Close();
         const Status Gone = vornjsondb::Fail(
             StatusCode::kMisuse, What, "a failure has undone it, or a statement has ended it");

@@ -71,6 +71,7 @@ class WhereParser {
                    "the conditions are nested too deep");
             return vecOut;
         }
+        // mutate(exchanged): what has no members has an end, too.
         if (!jObject.isObject()) {
             Report(m_vecFindings, FindingCode::kNotConditions, strPath,
                    Concat({"conditions are an object, not ", Shown(jObject)}));
@@ -80,6 +81,7 @@ class WhereParser {
         for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
             const std::string strKey(Name.pBegin, Name.pEnd);
+            // mutate(exchanged): in any order.
             const std::string strBelow = Below(strPath, strKey);
             const GroupKey* pGroup = FindGroupKey(strKey);
             if (!IsOperator(Name)) {
@@ -156,6 +158,7 @@ class WhereParser {
         Conditions vecParts;
         for (Json::ArrayIndex i = 0; i < jParts.size(); ++i) {
             const std::string strBelow = Below(strPath, DigitsOf(i));
+            // mutate(hoisted, sunk): a query with a finding does not run.
             if (!IsEmpty(jParts[i], strBelow)) {
                 vecParts.push_back(Condition::All(Read(jParts[i], strBelow, nLevel + 1)));
             }

@@ -31,6 +31,7 @@ const char* BehindWord(const char* p, std::string_view strWord) {
 
 // -0 is read as 0, and 01 is none.
 const char* BehindInteger(const char* p) {
+    // mutate(exchanged): in any order.
     if (*p == '0') {
         return p + 1;
     }
@@ -38,6 +39,7 @@ const char* BehindInteger(const char* p) {
     for (p = pFirst; *p >= '0' && *p <= '9' && p - pFirst <= kMostDigits;) {
         ++p;
     }
+    // mutate(exchanged): all only look.
     return p != pFirst && *pFirst != '0' && p - pFirst <= kMostDigits ? p : nullptr;
 }
 
@@ -104,6 +106,7 @@ const char* BehindValue(const char* p, int nLevel) {
 }  // namespace
 
 bool IsWrittenJson(const char* szText, size_t nLength) {
+    // mutate(exchanged): both only look.
     return (*szText == '[' || *szText == '{') && BehindValue(szText, 0) == szText + nLength;
 }
 

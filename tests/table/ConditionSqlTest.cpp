@@ -330,6 +330,10 @@ TEST_F(ConditionSql, OfManyThatMustHoldTheFirstSixtyAreOpen) {
     EXPECT_EQ(strHidden, strSql.substr(strSql.size() - strHidden.size()));
     EXPECT_EQ(1U, CountOf(strSql, "IS TRUE"));
     EXPECT_EQ(70U, CountOf(strSql, "?"));
+    std::vector<Condition> vecParts = Leaves("id", Op::kEqual, 1, 69);
+    vecParts.push_back(Condition::Any({Condition("size", 1), Condition("rate", 1)}));
+    const std::string strGrouped = Sql(Query().Where(Condition::All(vecParts)));
+    EXPECT_EQ(strGrouped.substr(strGrouped.size() - strHidden.size()), strHidden);
 }
 
 // A condition of these shapes took SQLite half a minute and gigabytes before groups were hidden.

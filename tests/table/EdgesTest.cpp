@@ -108,11 +108,38 @@ TEST_F(EdgesTest, DefaultThatCannotBeComparedEndsTheComparison) {
     const int nLength = sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, 2000);
     EXPECT_EQ(Lint(),
               "refused: cannot compare the definition with table \"item\": string or blob too big");
+    FindingList vecBefore(1);
+    vecBefore[0].strMessage = "what was told before";
+    EXPECT_FALSE(m_Table.Lint(vecBefore).Ok());
+    EXPECT_EQ(vecBefore.size(), 1U);
+    EXPECT_EQ(vecBefore[0].strMessage, "what was told before");
     sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, nLength);
     EXPECT_EQ(
         Lint(),
         "other-default /item/member/note: member \"note\" has the default 'x', and its column " +
             strLong + "; missing-column /item/member/other: member \"other\" has no column");
+}
+
+TEST_F(EdgesTest, AllDifferencesAreToldInOneOrder) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, NOTE INTEGER, more TEXT) WITHOUT ROWID",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "note": {"cpptype": "string", "notNull": true}}})");
+    EXPECT_EQ(Lint(),
+              "other-case /item/member/note: member \"note\" is the column \"NOTE\", which a "
+              "VornJsonDbApi does not know by this name; other-affinity /item/member/note: member "
+              "\"note\" of type \"string\": its column, declared as \"INTEGER\", has integer "
+              "affinity and changes what is stored; nullable-column /item/member/note: member "
+              "\"note\" is \"notNull\", and its column takes NULL; extra-column /item/member: "
+              "column \"more\" is no member: a VornJsonDbApi cannot read back what it creates; "
+              "without-rowid /item: the table has no rowid: a VornJsonDbApi cannot read back what "
+              "it creates");
+}
+
+TEST_F(EdgesTest, ColumnDeclaredAsTwoTypesIsABooleanFirst) {
+    Run("CREATE TABLE item (id INTEGER PRIMARY KEY, odd JSON_BOOL)");
+    Table Item;
+    EXPECT_EQ(Text(Item.Open(m_pDb, "item", Json::Value())), "ok");
+    EXPECT_EQ(Text(Item.Definition()["item"]["member"]["odd"]), R"({"cpptype":"bool"})");
 }
 
 // "-m." could be the path "." into "-m", which is none, or "m." the other way round.

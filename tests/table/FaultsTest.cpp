@@ -50,6 +50,9 @@ TEST_F(FaultsTest, TextThatIsTooLongIsNotBound) {
     bool blExists = true;
     EXPECT_EQ(Text(m_Table.Exists(Same, blExists)), Refused("look for records of"));
     EXPECT_TRUE(blExists);
+    std::int64_t nRecords = 7;
+    EXPECT_EQ(Text(m_Table.Count(Same, nRecords)), Refused("count records of"));
+    EXPECT_EQ(nRecords, 7);
     EXPECT_EQ(Text(m_Table.Update(Same, Parse(R"({"size": 1})"))), Refused("update records of"));
     EXPECT_EQ(Text(m_Table.Update(Query().Where("size", 1), jRecord)),
               Refused("update records of"));

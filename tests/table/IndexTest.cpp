@@ -66,6 +66,14 @@ TEST_F(IndexTest, StatementNeedNotBeAskedFor) {
     EXPECT_EQ("doc_size", Rows("SELECT name FROM sqlite_schema WHERE type = 'index'"));
 }
 
+// What asks for the indexes is longer than SQLite takes now, and what would make one is not.
+TEST_F(IndexTest, IndexesThatCannotBeReadAreNotMadeAnew) {
+    sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, 200);
+    EXPECT_EQ(Index({"size"}),
+              "refused: cannot create an index on table \"doc\": string or blob too big");
+    EXPECT_EQ(Rows("SELECT name FROM sqlite_schema WHERE type = 'index'"), "");
+}
+
 TEST_F(IndexTest, SameIndexIsMadeOnce) {
     const std::string strSql = Index({"name"});
     EXPECT_EQ(strSql, R"(CREATE INDEX "doc_name" ON "doc" ("name" COLLATE BINARY))");
@@ -192,6 +200,8 @@ TEST_F(IndexTest, AdviceNamesWhatEveryPartNeeds) {
     EXPECT_EQ(ExplainWhere(R"({"$or": [{"size": 5}, {"name": "a"}]})"),
               FullScan("\"size\", \"name\""));
     EXPECT_EQ(ExplainWhere(R"({"size": {"$ne": 5}, "name": "a"})"), FullScan("\"name\""));
+    EXPECT_EQ(ExplainWhere(R"({"$or": [{"size": 5}, {"rate": {"$ne": 1}}], "name": "a"})"),
+              FullScan("\"name\""));
     EXPECT_EQ(ExplainWhere(R"({"$and": [{"$or": [{"size": 5}, {"name": {"$like": "a"}}]},
                                         {"rate": 1}]})"),
               FullScan("\"rate\""));
@@ -210,6 +220,16 @@ TEST_F(IndexTest, NoAdviceWhereNoIndexHelps) {
         EXPECT_NE(strPlan.find("VIRTUAL TABLE INDEX"), std::string::npos) << strPlan;
         EXPECT_EQ(strPlan.find("full-scan"), std::string::npos) << strPlan;
     }
+}
+
+// What asks for the plan is a little longer than the statement, and than SQLite takes now.
+TEST_F(IndexTest, PlanThatCannotBeReadIsAFailure) {
+    const std::string strSql = "SELECT id, name, size FROM doc WHERE id = 5";
+    sqlite3_limit(m_pDb, SQLITE_LIMIT_SQL_LENGTH, static_cast<int>(strSql.size()) + 2);
+    Plan Found;
+    EXPECT_EQ(Text(m_Table.ExplainSql(strSql, Found)),
+              "refused: cannot explain a statement on table \"doc\": string or blob too big");
+    EXPECT_EQ(Found.strSql, "");
 }
 
 TEST_F(IndexTest, ExplainSqlTakesOneStatement) {

@@ -60,6 +60,16 @@ TEST_F(LoaderAnewTest, WholeRecordTakesTheWrongsOfTheStepsBefore) {
     EXPECT_EQ(Text(m_Into.Commit()), "ok");
 }
 
+TEST_F(LoaderAnewTest, WhatIsWrongWithAWholeRecordIsNotForgottenWithTheStepsBefore) {
+    Start();
+    m_Into.Reject("no good");
+    EXPECT_EQ(
+        Add(R"({"id": 1, "name": 2})"),
+        "refused: cannot load record 1 into table \"task\": member \"name\": 2 is another kind "
+        "of value: expected is a text [wrong-kind /name]");
+    EXPECT_EQ(Ids(), "");
+}
+
 TEST_F(LoaderAnewTest, MembersAreThoseOfOneRecord) {
     Start();
     m_Into.SetInteger(m_Into.MemberIndex("id"), 1);

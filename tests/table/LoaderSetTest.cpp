@@ -1,5 +1,7 @@
 // JSON texts that a loader is given for a member: as they will be stored already, and otherwise.
 
+#include <limits>
+
 #include "TableFixture.h"
 
 namespace VORN_JSON_DB {
@@ -76,6 +78,14 @@ TEST_F(LoaderSetTest, WrittenJsonIsForMembersOfItsKind) {
     EXPECT_EQ(Rows("SELECT count(*) FROM item"), "0");
 }
 
+TEST_F(LoaderSetTest, ValueThatDoesNotFitIsShown) {
+    m_Into.SetText(m_Into.MemberIndex("id"), "seven");
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 1 into table \"item\": member \"id\": \"seven\" is "
+              "another kind of value: expected is a whole number from -2147483648 to 2147483647 "
+              "[wrong-kind /id]");
+}
+
 TEST_F(LoaderSetTest, BooleansAreForMembersOfTheirKind) {
     m_Into.SetBoolean(m_Into.MemberIndex("name"), false);
     EXPECT_EQ(
@@ -105,6 +115,19 @@ TEST_F(LoaderSetTest, ValueThatFitsReplacesOneThatDidNot) {
     m_Into.SetJson(m_Into.MemberIndex("list"), "{}");
     EXPECT_EQ(Add("list", "[2]"), "ok");
     EXPECT_EQ(Rows("SELECT list FROM item"), "[2]");
+}
+
+TEST_F(LoaderSetTest, OfWhatIsWrongInOnePlaceTheLastIsTold) {
+    m_Into.SetInteger(-1, 1);
+    m_Into.SetInteger(std::numeric_limits<int>::max(), 1);
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 1 into table \"item\": there is no member of number "
+              "2147483647 [unknown-member ]");
+    m_Into.Reject("first");
+    m_Into.Reject("second");
+    EXPECT_EQ(Text(m_Into.EndRecord()),
+              "refused: cannot load record 2 into table \"item\": second [rejected ]");
+    EXPECT_EQ(Add("list", "[2]"), "ok");
 }
 
 }  // namespace

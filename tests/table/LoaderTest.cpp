@@ -227,6 +227,10 @@ TEST_F(LoaderTest, ModesOtherThanStopNeedTheKey) {
         "refused: cannot load record 1 into table \"task\": the key's member \"id\" has no "
         "value [missing-key /id]",
         Add(Into, {R"({"name": "a"})"}));
+    EXPECT_EQ(
+        "refused: cannot load record 2 into table \"task\": the record has no members "
+        "[not-a-record ]",
+        Text(Into.EndRecord()));
     Run("CREATE TABLE keyless (a INTEGER)");
     Table Keyless;
     EXPECT_EQ("ok", Text(Keyless.Open(m_pDb, "keyless", Json::Value())));
@@ -453,7 +457,7 @@ TEST_F(LoaderTest, ShortTextFollowsALongOneAndALongOneAShort) {
     EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
     const int nList = Into.MemberIndex("list");
     const int nText = Into.MemberIndex("text");
-    for (const size_t nLength : {3, 400, 2, 0, 40}) {
+    for (const size_t nLength : {3U, 400U, 2U, 0U, 40U}) {
         Into.SetText(nText, std::string(nLength, 'x') + "!");
         Into.SetText(nText, std::string(nLength, 'y'));
         Into.SetJson(nList, "[\"" + std::string(nLength, 'z') + "\"]");

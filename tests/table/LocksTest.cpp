@@ -151,6 +151,30 @@ TEST_F(LocksTest, CommitThatWaitedInVainCanBeTriedAgain) {
     EXPECT_FALSE(All.IsOpen());
 }
 
+TEST_F(LocksTest, TransactionThatDidNotBeginIsNotOpen) {
+    Other("BEGIN IMMEDIATE");
+    const FakeTime Time;
+    Transaction All;
+    EXPECT_EQ(Text(All.Begin(m_pDb, Transaction::Mode::kImmediate, 3)),
+              "locked: cannot begin a transaction: database is locked (waited 3 ms)");
+    EXPECT_FALSE(All.IsOpen());
+    Other("COMMIT");
+    EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
+}
+
+TEST_F(LocksTest, RefusedBeginLeavesTheTimeToWait) {
+    Other("BEGIN; SELECT * FROM task");
+    const FakeTime Time;
+    Transaction All;
+    EXPECT_EQ(Text(All.Begin(m_pDb, Transaction::Mode::kImmediate, 3)), "ok");
+    EXPECT_EQ(Text(All.Begin(m_pDb, Transaction::Mode::kImmediate, 5)),
+              "misuse: cannot begin a transaction: it is open already");
+    EXPECT_EQ(Create(1), "ok");
+    EXPECT_EQ(Text(All.Commit()),
+              "locked: cannot commit a transaction: database is locked (waited 3 ms)");
+    Other("COMMIT");
+}
+
 TEST_F(LocksTest, CallersBusyHandlerStays) {
     static int s_nCalls = 0;
     sqlite3_busy_handler(

@@ -247,7 +247,7 @@ TEST_F(TableMemoryTest, WhatExplainsAndCompares) {
 }
 
 TEST_F(TableMemoryTest, WhatMakesIndexesAndColumns) {
-    Try([this](Table& Into) {
+    Try([](Table& Into) {
         std::string strSql;
         const Status Outcome = Into.CreateIndex({"name", "size"}, false, &strSql);
         return End(Outcome).append(strSql);

@@ -2,6 +2,7 @@
 
 #include <limits>
 
+#include "../../table/ConditionNode.h"
 #include "QueryFixture.h"
 
 namespace VORN_JSON_DB {
@@ -234,13 +235,16 @@ TEST_F(QueryFindings, FindingsOfValuesThatJsonTextCannotHold) {
     EXPECT_EQ(0U, Sql(Query().Where("json.a", dNaN)).find("not-a-number /where/json.a: "));
     EXPECT_EQ("not-a-number /where/tags/$contains: JSON: NaN is no number",
               Sql(Query().Where("tags", Op::kContains, dNaN)));
-    const std::string strLong = "%" + std::string(50000, 'a');
-    EXPECT_EQ("bad-pattern /where/name/$like: pattern \"%" + std::string(59, 'a') +
+    const std::string strLong = "\\x" + std::string(50000, 'a');
+    EXPECT_EQ("bad-pattern /where/name/$like: pattern \"\\x" + std::string(58, 'a') +
                   "\"... is longer than SQLite takes",
               Sql(Query().Where("name", Op::kLike, strLong)));
     EXPECT_EQ("bad-pattern /where/name/$like: pattern \"a" + std::string(1, '\0') +
                   "\" holds a NUL byte, where SQLite ends it",
               Sql(Query().Where("name", Op::kLike, std::string("a\0", 2))));
+    EXPECT_EQ(Sql(Query().Where("name", Op::kLike, std::string("a\\\0", 3))),
+              "bad-pattern /where/name/$like: pattern \"a\\" + std::string(1, '\0') +
+                  "\" has a \\ before something else than %, _ and \\");
     EXPECT_EQ(std::string("bad-path /where/map.") + std::string(1, '\x01') + ": path \"map." +
                   std::string(1, '\x01') + "\": no path leads to \"" + std::string(1, '\x01') +
                   "\"",
@@ -380,6 +384,72 @@ TEST_F(QueryFindings, FindingsEndAtAHundred) {
         jQuery["where"]["$or"].append(Json::Value(i));
     }
     EXPECT_EQ(100U, Query(jQuery).vecFindings.size());
+}
+
+TEST_F(QueryFindings, AllThatIsWrongIsToldInOneOrder) {
+    Query Paged = Query().Limit(-2).Offset(-1).Sort("id");
+    EXPECT_EQ(Sql(Paged, QueryUse::kChange),
+              "bad-count /limit: the limit is less than 0; bad-count /offset: the offset is less "
+              "than 0; paged-change : a change reaches all records that the conditions select, in "
+              "no order; no-condition /where: the query has no condition and would reach every "
+              "record");
+    EXPECT_EQ(Wrong(R"({"members": ["xyz"], "sort": ["uvw"]})"),
+              "unknown-member /members/0: table \"doc\" has no member \"xyz\"; unknown-member "
+              "/sort/0: table \"doc\" has no member \"uvw\"");
+}
+
+TEST_F(QueryFindings, OfTwoEndsTheFirstIsLookedAtFirst) {
+    EXPECT_EQ(WrongWhere(R"({"size": {"$between": [null, true]}})"),
+              "null-operand /where/size/$between: \"$between\": nothing is less or greater than "
+              "null");
+    for (const char* szEnds : {R"(["a", 5])", R"([5, "a"])"}) {
+        EXPECT_EQ(WrongWhere(R"({"any": {"$between": )" + std::string(szEnds) + "}}"),
+                  "wrong-operand /where/any/$between: \"$between\" takes a list of two texts or of "
+                  "two numbers, not a list of 2");
+    }
+}
+
+// What a query says that could not be read is not looked at any further.
+TEST_F(QueryFindings, QueryThatCannotBeReadTellsNoMore) {
+    const Query Which(Parse(R"({"limit": "x", "sort": ["none"]})"));
+    EXPECT_EQ(Sql(Which, QueryUse::kChange),
+              "bad-count /limit: a whole number from 0 belongs here, not \"x\"");
+    EXPECT_EQ(Sql(Which), "bad-count /limit: a whole number from 0 belongs here, not \"x\"");
+}
+
+TEST_F(QueryFindings, MembersAreOnlyForWhatIsRead) {
+    EXPECT_EQ(Sql(Query().Where("id", 1).Members({"nope"}), QueryUse::kCount),
+              " WHERE \"id\" IS ?");
+}
+
+TEST_F(QueryFindings, WhatIsTooDeepOrTooMuchIsToldBeforeWhatIsWrongInIt) {
+    Json::Value jWhere = 5;
+    for (int i = 0; i <= 1000; ++i) {
+        Json::Value jOuter;
+        jOuter["$not"].swapPayload(jWhere);
+        jWhere.swapPayload(jOuter);
+    }
+    Json::Value jQuery;
+    jQuery["where"].swapPayload(jWhere);
+    const Query Deep(jQuery);
+    EXPECT_EQ(Deep.vecFindings.size(), 1U);
+    EXPECT_EQ(Deep.vecFindings[0].strMessage, "the conditions are nested too deep");
+    EXPECT_EQ(WrongWhere(R"({"$and": {}})"),
+              "not-conditions /where/$and: this group is a list of conditions, not an object of 0");
+    DeepList Lists(1001);
+    Json::Value jMany;
+    for (int i = 0; i < 1000; ++i) {
+        jMany["where"]["$or"].append(Parse(R"({"id": 1})"));
+    }
+    jMany["where"]["$or"][1000]["map"].swapPayload(Lists.jList);
+    EXPECT_EQ(Text(Query(jMany).vecFindings),
+              "too-many-conditions /where/$or/1000/map: the query has more than 1000 conditions");
+}
+
+TEST_F(QueryFindings, ValueMayHaveAThousandLevels) {
+    DeepList Thousand(1000), More(1001);
+    EXPECT_FALSE(vornjsondb::IsTooDeep(Thousand.jList));
+    EXPECT_TRUE(vornjsondb::IsTooDeep(More.jList));
 }
 
 }  // namespace VORN_JSON_DB

@@ -1,5 +1,6 @@
 // What queries mean.
 
+#include "../../table/Operand.h"
 #include "QueryFixture.h"
 
 namespace VORN_JSON_DB {
@@ -224,6 +225,16 @@ TEST_F(Queries, ListsOfAnyLength) {
     jIds.append(1);
     EXPECT_EQ("too-many-values /where/id/$in: a list may have 100000 values, not 100001",
               Sql(Query().Where("id", Op::kIn, jIds)));
+    jIds[0] = "no number";
+    EXPECT_EQ(Sql(Query().Where("id", Op::kIn, jIds)),
+              "too-many-values /where/id/$in: a list may have 100000 values, not 100001");
+}
+
+// SQLite would read the bytes behind an unfinished character as a part of it.
+TEST_F(Queries, TextsGoIntoJsonOnlyWhereTheyAreUtf8) {
+    EXPECT_TRUE(vornjsondb::IsPlainText("a\xc3\xa9"));
+    EXPECT_FALSE(vornjsondb::IsPlainText("\xc3x"));
+    EXPECT_FALSE(vornjsondb::IsPlainText("\xe2\x82x"));
 }
 
 TEST_F(Queries, BigNumbersAreComparedExactly) {

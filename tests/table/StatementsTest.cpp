@@ -42,6 +42,27 @@ TEST_F(StatementsTest, LastUsedAreKept) {
     EXPECT_EQ("new b", Use(Kept, "b"));
 }
 
+TEST_F(StatementsTest, OneThatIsUsedAgainAndAgainLeavesTheOthersTheirPlace) {
+    Statements Kept(m_pDb, 2);
+    EXPECT_EQ(Use(Kept, "a"), "new a");
+    EXPECT_EQ(Use(Kept, "b"), "new b");
+    EXPECT_EQ(Use(Kept, "a"), "kept a");
+    EXPECT_EQ(Use(Kept, "a"), "kept a");
+    EXPECT_EQ(Use(Kept, "b"), "kept b");
+}
+
+TEST_F(StatementsTest, AssignedStatementIsKeptUnderItsShape) {
+    Statements Kept(m_pDb, 2);
+    {
+        Statement First;
+        bool blPrepared = false;
+        EXPECT_EQ(Take(Kept, "a", First, blPrepared), SQLITE_OK);
+        Statement Assigned;
+        Assigned = std::move(First);
+    }
+    EXPECT_EQ(Use(Kept, "a"), "kept a");
+}
+
 TEST_F(StatementsTest, NoneOrManyMayBeKept) {
     Statements None(m_pDb, 0);
     EXPECT_EQ("new a", Use(None, "a"));
@@ -87,6 +108,17 @@ TEST_F(StatementsTest, FailedPrepareLendsNothing) {
     EXPECT_EQ(SQLITE_ERROR, Kept.Take(
                                 "x", [] { return std::string("nonsense"); }, Lent));
     EXPECT_EQ(nullptr, Lent.Get());
+}
+
+TEST_F(StatementsTest, FinishCountsTheRows) {
+    Statements Kept(m_pDb, 2);
+    Statement Lent;
+    EXPECT_EQ(Kept.Take(
+                  "x", [] { return std::string("VALUES (1), (2), (3)"); }, Lent),
+              SQLITE_OK);
+    int nRows = 0;
+    EXPECT_EQ(Lent.Finish(&nRows), SQLITE_OK);
+    EXPECT_EQ(nRows, 3);
 }
 
 TEST_F(StatementsTest, FinishTellsTheFirstFailure) {

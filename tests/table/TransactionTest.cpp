@@ -38,6 +38,26 @@ TEST_F(TransactionTest, NestedOnesAreSavepoints) {
     EXPECT_EQ("1;3", Rows("SELECT id FROM task ORDER BY id"));
 }
 
+// All savepoints have one name, and SQLite takes the innermost: to undo one must not touch another.
+TEST_F(TransactionTest, SavepointInASavepointIsUndoneAlone) {
+    Open();
+    Transaction Outer, Middle;
+    EXPECT_EQ(Text(Outer.Begin(m_pDb)), "ok");
+    EXPECT_EQ(Text(Middle.Begin(m_pDb)), "ok");
+    Create(R"({"id": 1})");
+    {
+        Transaction Inner;
+        EXPECT_EQ(Text(Inner.Begin(m_pDb)), "ok");
+        Create(R"({"id": 2})");
+    }
+    EXPECT_EQ(Rows("SELECT id FROM task"), "1");
+    Json::Value jStored;
+    EXPECT_EQ(m_Table.Create(Parse(R"({"id": 1})"), &jStored).Code(), StatusCode::kDuplicate);
+    EXPECT_EQ(Text(Middle.Rollback()), "ok");
+    EXPECT_EQ(Text(Outer.Commit()), "ok");
+    EXPECT_EQ(Rows("SELECT id FROM task"), "");
+}
+
 TEST_F(TransactionTest, CallsOutOfTurnAreMisuse) {
     Transaction All;
     EXPECT_EQ("misuse: cannot commit a transaction: none was begun", Text(All.Commit()));

@@ -40,8 +40,7 @@ class TypesTest : public TableTest {
     int m_nTables = 0;
 };
 
-Json::Value Nested(int nLevels) {
-    Json::Value jInner(Json::arrayValue);
+Json::Value Nested(int nLevels, Json::Value jInner = Json::arrayValue) {
     for (int i = 1; i < nLevels; ++i) {
         Json::Value jOuter(Json::arrayValue);
         jOuter.append(std::move(jInner));
@@ -268,10 +267,14 @@ TEST_F(TypesTest, TextsComeBackByteByByte) {
 TEST_F(TypesTest, JsonIsStoredAsDeepAsItsReaderGoes) {
     Json::CharReaderBuilder Builder;
     const int nMost = Builder["stackLimit"].asInt();
-    const std::string strText = std::string(nMost, '[') + std::string(nMost, ']');
+    const auto nLevels = static_cast<size_t>(nMost);
+    const std::string strText = std::string(nLevels, '[') + std::string(nLevels, ']');
     EXPECT_EQ("text|" + strText + "|" + strText, Store("Json::arrayValue", Nested(nMost)));
     EXPECT_EQ("too-deep", Store("Json::arrayValue", Nested(nMost + 1)));
     EXPECT_EQ("too-deep", Store("Json::Value", Nested(10000)));
+    // A value inside is one level more.
+    EXPECT_EQ(Store("Json::arrayValue", Nested(nMost + 1, 0.5)), "too-deep");
+    EXPECT_EQ(Store("Json::arrayValue", Nested(nMost, 0.5)).substr(0, 6), "text|[");
 }
 
 TEST_F(TypesTest, StoredValuesOfAnotherKindAreReadAsWhatTheyAre) {
