@@ -28,9 +28,10 @@
 // otherwise, and the whole call is tried again. Inside a transaction that is open already a lock is
 // reported at once, because the other side may be waiting for just this transaction. The caller's
 // busy handler is neither replaced nor removed.
-// A call that changes something is whole or nothing, inside a transaction of the caller's too. Two
-// failures may undo that transaction with it, as SQLite works: a full disk and an interrupt. Then
-// the message ends in "the transaction is undone".
+// A call that changes something is whole or nothing, inside a transaction of the caller's too. Some
+// failures may undo that transaction with it, as SQLite works: a full disk, an interrupt, and what
+// the table's own SQL answers with ROLLBACK. Then the message ends in "the transaction is undone".
+// Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for.
 // Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words
@@ -510,6 +511,7 @@ class Transaction {
     sqlite3* m_pDb = nullptr;
     sqlite3_stmt* m_pUndo = nullptr;
     sqlite3_stmt* m_pEnd = nullptr;
+    sqlite3_stmt* m_pBegin = nullptr;
     bool m_blSavepoint = false;
     int m_nWaitMs = 0;
 };

@@ -98,6 +98,10 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
     return nResult;
 }
 
+int Statements::KeepBegin() {
+    return m_pBegin ? SQLITE_OK : Prepare(m_pDb, "BEGIN IMMEDIATE", m_pBegin);
+}
+
 void Statements::GiveBack(Statement& Lent) {
     sqlite3_reset(Lent.m_pStatement.get());
     sqlite3_clear_bindings(Lent.m_pStatement.get());
