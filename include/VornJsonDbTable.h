@@ -349,11 +349,11 @@ class Table {
     Table(const Table&) = delete;
     Table& operator=(const Table&) = delete;
 
-    // Must come first; a table that is open already becomes another one, but not in a callback of
-    // its own nor while a Loader works on it. Copies its arguments but the connection. A null
-    // definition is made from the real table. kNotFound: there is no such table and Options do not
-    // say how to make one. Columns that the table lacks, or has more, are no failure: see Lint and
-    // Sync.
+    // Must come first; a table that is open already becomes another one, or is closed by a failure,
+    // but not in a callback of its own nor while a Loader works on it. Copies its arguments but the
+    // connection. A null definition is made from the real table. kNotFound: there is no such table
+    // and Options do not say how to make one. Columns that the table lacks, or has more, are no
+    // failure: see Lint and Sync.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 

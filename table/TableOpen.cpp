@@ -128,7 +128,8 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
     if (m_pParts && m_pParts->nReading > 0) {
         return vornjsondb::CheckState(m_pParts.get(), "open anew", true);
     }
-    m_pParts.reset();
+    // The arguments may be parts of what it was before.
+    const std::unique_ptr<Parts> pBefore = std::move(m_pParts);
     const Doing What{"open", &strName};
     if (pDb == nullptr) {
         return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no connection");
