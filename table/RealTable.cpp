@@ -18,7 +18,9 @@ constexpr char kColumnsSql[] =
 
 constexpr char kIndexesSql[] =
     "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name,"
-    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name)"
+    " coalesce((SELECT sql FROM sqlite_temp_schema WHERE type = 'index' AND name = Listed.name"
+    " AND tbl_name = ?1 COLLATE NOCASE),"
+    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name))"
     " FROM pragma_index_list(?1) AS Listed, pragma_index_info(Listed.name) AS Part"
     " ORDER BY Listed.seq, Part.seqno";
 
