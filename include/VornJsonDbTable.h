@@ -91,7 +91,7 @@ enum class StatusCode {
     kOk,
     kNotFound,    // no such record or table
     kDuplicate,   // another record has this key, or this value of a unique member
-    kConstraint,  // not null, check, foreign key, trigger
+    kConstraint,  // not null, check, foreign key, trigger; or the table has ignored the record
     kLocked,      // by another connection, or by a running statement of this one
     kRefused,     // the findings say what is wrong with the arguments; nothing was run
     kReadOnly,
@@ -365,7 +365,8 @@ class Table {
 
     // Writes one record. pjStored, where given, receives the row as it is stored, with keys and
     // defaults of the database and what triggers did. kDuplicate names the member whose value
-    // another row has already. Save needs a key, and its members in the record.
+    // another row has already. Save needs a key, and its members in the record; so does pjStored
+    // in a view or a table WITHOUT ROWID. A view takes kStop and kUpsert.
     Status Create(const Json::Value& jRecord, Json::Value* pjStored = nullptr);
     Status Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate,
                 Json::Value* pjStored = nullptr, Written* peWritten = nullptr);
@@ -385,7 +386,8 @@ class Table {
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
     // Sets members of all records that the query selects, or removes these records. A query
-    // without a condition, with sorting or with paging is refused.
+    // without a condition, with sorting or with paging is refused. SQLite counts no rows of a
+    // view, whose triggers do the work.
     Status Update(const Query& Which, const Json::Value& jMembers, std::int64_t* pnRows = nullptr);
     Status Remove(const Query& Which, std::int64_t* pnRows = nullptr);
     Status RemoveAll(std::int64_t* pnRows = nullptr);

@@ -102,6 +102,7 @@ Status Table::Parts::Meet() {
 
 void Table::Parts::Learn(const RealTable& Real) {
     strRowid = Real.strRowid;
+    blView = Real.blView;
     if (Of.Key().empty()) {
         Of.SetKey(Real.vecKey);
     }
