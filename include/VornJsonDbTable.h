@@ -28,9 +28,10 @@
 // otherwise, and the whole call is tried again. Inside a transaction that is open already a lock is
 // reported at once, because the other side may be waiting for just this transaction. The caller's
 // busy handler is neither replaced nor removed.
-// A call that changes something is whole or nothing, inside a transaction of the caller's too. Two
-// failures may undo that transaction with it, as SQLite works: a full disk and an interrupt. Then
-// the message ends in "the transaction is undone".
+// A call that changes something is whole or nothing, inside a transaction of the caller's too. Some
+// failures may undo that transaction with it, as SQLite works: a full disk, an interrupt, and what
+// the table's own SQL answers with ROLLBACK. Then the message ends in "the transaction is undone".
+// Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for.
 // Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words
@@ -90,7 +91,7 @@ enum class StatusCode {
     kOk,
     kNotFound,    // no such record or table
     kDuplicate,   // another record has this key, or this value of a unique member
-    kConstraint,  // not null, check, foreign key, trigger
+    kConstraint,  // not null, check, foreign key, trigger; or the table has ignored the record
     kLocked,      // by another connection, or by a running statement of this one
     kRefused,     // the findings say what is wrong with the arguments; nothing was run
     kReadOnly,
@@ -348,11 +349,11 @@ class Table {
     Table(const Table&) = delete;
     Table& operator=(const Table&) = delete;
 
-    // Must come first; a table that is open already becomes another one, but not in a callback of
-    // its own nor while a Loader works on it. Copies its arguments but the connection. A null
-    // definition is made from the real table. kNotFound: there is no such table and Options do not
-    // say how to make one. Columns that the table lacks, or has more, are no failure: see Lint and
-    // Sync.
+    // Must come first; a table that is open already becomes another one, or is closed by a failure,
+    // but not in a callback of its own nor while a Loader works on it. Copies its arguments but the
+    // connection. A null definition is made from the real table. kNotFound: there is no such table
+    // and Options do not say how to make one. Columns that the table lacks, or has more, are no
+    // failure: see Lint and Sync.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 
@@ -364,7 +365,8 @@ class Table {
 
     // Writes one record. pjStored, where given, receives the row as it is stored, with keys and
     // defaults of the database and what triggers did. kDuplicate names the member whose value
-    // another row has already. Save needs a key, and its members in the record.
+    // another row has already. Save needs a key, and its members in the record; so does pjStored
+    // in a view or a table WITHOUT ROWID. A view takes kStop and kUpsert.
     Status Create(const Json::Value& jRecord, Json::Value* pjStored = nullptr);
     Status Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate,
                 Json::Value* pjStored = nullptr, Written* peWritten = nullptr);
@@ -384,7 +386,8 @@ class Table {
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
     // Sets members of all records that the query selects, or removes these records. A query
-    // without a condition, with sorting or with paging is refused.
+    // without a condition, with sorting or with paging is refused. SQLite counts no rows of a
+    // view, whose triggers do the work.
     Status Update(const Query& Which, const Json::Value& jMembers, std::int64_t* pnRows = nullptr);
     Status Remove(const Query& Which, std::int64_t* pnRows = nullptr);
     Status RemoveAll(std::int64_t* pnRows = nullptr);
@@ -510,6 +513,7 @@ class Transaction {
     sqlite3* m_pDb = nullptr;
     sqlite3_stmt* m_pUndo = nullptr;
     sqlite3_stmt* m_pEnd = nullptr;
+    sqlite3_stmt* m_pBegin = nullptr;
     bool m_blSavepoint = false;
     int m_nWaitMs = 0;
 };

@@ -55,20 +55,36 @@ Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce) {
     return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
 }
 
+int RunOnce(sqlite3_stmt* pStatement) {
+    sqlite3_step(pStatement);
+    return sqlite3_reset(pStatement);
+}
+
+int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
+    const int nResult = RunOnce(pUndo);
+    if (nResult == SQLITE_INTERRUPT) {
+        RunOnce(pBegin);
+    }
+    return nResult;
+}
+
 // How it ends is prepared before it begins: undoing must not need memory.
 int Whole::Begin() {
     m_blSavepoint = sqlite3_get_autocommit(m_pDb) == 0;
-    int nResult = Take(m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", m_Undo);
+    int nResult = m_Kept.KeepBegin();
+    if (nResult == SQLITE_OK) {
+        nResult = Take(m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", m_Undo);
+    }
     if (nResult == SQLITE_OK) {
         nResult = Take(m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", m_End);
     }
     Statement First;
-    if (nResult == SQLITE_OK) {
-        nResult = Take(m_blSavepoint ? "SAVEPOINT vornjsondb" : "BEGIN IMMEDIATE", First);
+    if (nResult == SQLITE_OK && m_blSavepoint) {
+        nResult = Take("SAVEPOINT vornjsondb", First);
     }
     // mutate(exchanged): a transaction that did not begin is not undone either way.
     if (nResult == SQLITE_OK) {
-        nResult = First.Finish();
+        nResult = m_blSavepoint ? First.Finish() : RunOnce(m_Kept.Begin());
     }
     m_blOpen = nResult == SQLITE_OK;
     return nResult;
@@ -85,9 +101,10 @@ int Whole::Keep() {
 Whole::~Whole() {
     // mutate(exchanged): both only look.
     if (m_blOpen && sqlite3_get_autocommit(m_pDb) == 0) {
-        m_Undo.Finish();  // mutate(doubled): a second time there is nothing to undo.
+        // mutate(doubled): a second time there is nothing to undo.
+        const int nResult = Undo(m_Undo.Get(), m_Kept.Begin());
         // mutate(hoisted, sunk): after a ROLLBACK there is nothing to COMMIT, which is ignored.
-        if (m_blSavepoint) {
+        if (m_blSavepoint && nResult == SQLITE_OK) {
             m_End.Finish();
         }
     }

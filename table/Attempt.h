@@ -39,6 +39,16 @@ Status InTransaction(sqlite3* pDb, const Status& Outcome);
 // that is open already there is one try: the other side may be waiting for just this transaction.
 Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce);
 
+// Runs a statement that gives no rows. Returns SQLite's result. Takes no memory of its own, so that
+// a destructor may call it.
+int RunOnce(sqlite3_stmt* pStatement);
+
+// Runs pUndo, which undoes a transaction or a savepoint. An interrupt lasts as long as anything on
+// the connection runs, a ForEach around the call perhaps, and would leave all as it is. Then
+// pBegin, a BEGIN IMMEDIATE, is interrupted as well; and for what would have written SQLite undoes
+// the whole transaction. Returns SQLite's result of pUndo.
+int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin);
+
 // Several statements as one: a transaction, or a savepoint inside of one that is open. Undone at
 // the end of its life unless Keep succeeded.
 class Whole {

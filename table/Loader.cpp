@@ -107,7 +107,11 @@ Status Loader::Parts::End(const Status& Outcome) {
     Ended = Outcome;
     // mutate(true, hoisted, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
+        const bool blThere = sqlite3_get_autocommit(Into.pDb) == 0;
         All.Rollback().Ignore();  // mutate(doubled): a second time there is nothing to undo.
+        if (blCallers && blThere) {
+            Ended = vornjsondb::InTransaction(Into.pDb, Ended);
+        }
     }
     Now.nInserted = Kept.nInserted;  // mutate(exchanged): in any order.
     Now.nReplaced = Kept.nReplaced;  // mutate(exchanged): in any order.

@@ -18,7 +18,9 @@ constexpr char kColumnsSql[] =
 
 constexpr char kIndexesSql[] =
     "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name,"
-    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name)"
+    " coalesce((SELECT sql FROM sqlite_temp_schema WHERE type = 'index' AND name = Listed.name"
+    " AND tbl_name = ?1 COLLATE NOCASE),"
+    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name))"
     " FROM pragma_index_list(?1) AS Listed, pragma_index_info(Listed.name) AS Part"
     " ORDER BY Listed.seq, Part.seqno";
 
@@ -43,6 +45,15 @@ int NumberColumn(const OwnStatement& pStatement, int nColumn) {
     return sqlite3_column_int(pStatement.get(), nColumn);
 }
 
+// SQLite finds the table as in statements, in whatever database it is, and gives no metadata of a
+// view.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
+    const int nResult = sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), nullptr,
+                                                      nullptr, nullptr, nullptr, nullptr, nullptr);
+    blView = nResult == SQLITE_ERROR;
+    return blView ? SQLITE_OK : nResult;
+}
+
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
@@ -63,7 +74,7 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     // Hidden columns of virtual tables are no part of a row; generated ones are, of either kind.
     constexpr int kHidden = 1;
-    const int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
+    int nResult = ForEachRow(pDb, kColumnsSql, strTable, [&](const OwnStatement& pRow) {
         if (NumberColumn(pRow, 5) == kHidden) {
             return;
         }
@@ -78,7 +89,9 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         }
     });
     if (nResult == SQLITE_OK && !Out.vecColumns.empty()) {
-        Out.strRowid = NameOfRowid(pDb, strTable, Out);
+        nResult = IsView(pDb, strTable, Out.blView);
+        // Some builds of SQLite give views a rowid, which is NULL.
+        Out.strRowid = Out.blView ? "" : NameOfRowid(pDb, strTable, Out);
     }
     return nResult;
 }
@@ -96,17 +109,6 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealI
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken) {
     blTaken = false;
     return ForEachRow(pDb, kNameSql, strName, [&](const OwnStatement&) { blTaken = true; });
-}
-
-// A temporary one hides another of its name.
-int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
-    static constexpr char kSql[] =
-        "SELECT type = 'view' FROM (SELECT name, type FROM sqlite_temp_master UNION ALL"
-        " SELECT name, type FROM sqlite_master)"
-        " WHERE name = ?1 COLLATE NOCASE AND type IN ('table', 'view') LIMIT 1";
-    blView = false;  // mutate(dropped): it is so before the one call.
-    return ForEachRow(pDb, kSql, strTable,
-                      [&](const OwnStatement& pRow) { blView = NumberColumn(pRow, 0) != 0; });
 }
 
 namespace {

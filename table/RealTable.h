@@ -22,6 +22,7 @@ struct RealTable {
     std::vector<RealColumn> vecColumns;  // none: there is no such table or view
     std::vector<std::string> vecKey;     // the primary key's columns, in its order
     std::string strRowid;                // a name of the rowid that no column hides; empty: none
+    bool blView = false;
 };
 
 struct RealIndex {
@@ -36,9 +37,6 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealI
 
 // Whether a table, an index, a view or a trigger has that name, in any letter case.
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);
-
-// Whether the name is that of a view. Returns SQLite's result.
-int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
 
 // Whether two SQL expressions without names have one value; as JSON, where both are JSON. What
 // SQLite cannot compute, or the second computes with a function, counts as the same. Returns

@@ -30,23 +30,30 @@ std::string KeyList(const Members& Of) {
     return strList.append(")");
 }
 
+// Or the key as it is, so that SQLite tells whether there is such a record.
+std::string SetOrKey(const Members& Of, const std::string& strSet) {
+    const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
+    return strSet.empty() ? Concat({strKey, "=", strKey}) : strSet;
+}
+
 // What the INSERT does with a key that is there already: all other members anew, or nothing.
 std::string OnConflict(const Members& Of, bool blReplace) {
+    const std::string strHead = Concat({" ON CONFLICT ", KeyList(Of), " DO "});
+    if (!blReplace) {
+        return strHead + "NOTHING";
+    }
     std::string strSet;
     for (const Member& Other : Of.All()) {
         // "excluded" holds the column's default where the record has no value.
-        if (blReplace && !Other.blKey && !Other.blGenerated) {
+        if (!Other.blKey && !Other.blGenerated) {
             // mutate(doubled): a column may be set twice.
-            Append(strSet, {strSet.empty() ? "UPDATE SET " : ", ", Other.strQuoted, "=excluded.",
-                            Other.strQuoted});
+            Append(strSet,
+                   {strSet.empty() ? "" : ", ", Other.strQuoted, "=excluded.", Other.strQuoted});
         }
     }
-    // mutate(doubled): the second one adds nothing.
-    strSet.append(strSet.empty() ? "NOTHING" : "");
-    return Concat({" ON CONFLICT ", KeyList(Of), " DO ", strSet});
+    return Concat({strHead, "UPDATE SET ", SetOrKey(Of, strSet)});
 }
 
-// A record of nothing but its key changes nothing: "id" = "id" finds out whether it is there.
 std::string UpdateSql(const Members& Of, const RecordValues& Values) {
     std::string strSet;
     for (size_t i = 0; i < Of.Size(); ++i) {
@@ -54,11 +61,7 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
             Append(strSet, {strSet.empty() ? "" : ", ", Of.At(i).strQuoted, "=?"});
         }
     }
-    if (strSet.empty()) {
-        const std::string& strKey = Of.At(Of.Key()[0]).strQuoted;
-        strSet = Concat({strKey, "=", strKey});
-    }
-    return Concat({"UPDATE ", Of.QuotedTable(), " SET ", strSet, WhereKey(Of)});
+    return Concat({"UPDATE ", Of.QuotedTable(), " SET ", SetOrKey(Of, strSet), WhereKey(Of)});
 }
 
 }  // namespace
@@ -115,7 +118,8 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
 }
 
 // An upsert updates first: an INSERT would ask for all NOT NULL members even of a record that is
-// there and needs none of them. What replaces looks first, to tell which it was.
+// there and needs none of them. What replaces looks first, to tell which it was; and so does all in
+// a view, where SQLite counts no changes.
 Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written& eWritten) {
     struct Mode {
         Verb eFirst, eThen;  // kInsert: nothing comes first
@@ -128,8 +132,9 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
     const Mode& Now = kModes[static_cast<size_t>(eOnDuplicate)];
     int nResult = SQLITE_OK;
     int nFound = 0;
+    int nChanged = 0;
     if (Now.eFirst != Verb::kInsert) {
-        nResult = Run(Now.eFirst, nFound);
+        nResult = Run(m_Into.blView ? Verb::kFind : Now.eFirst, nFound);
     }
     eWritten = nFound > 0 ? Now.eFound : Written::kInserted;
     if (nResult == SQLITE_OK && eWritten != Written::kUpdated) {
@@ -139,10 +144,16 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
                 return FromFindings(std::move(vecFindings), What);
             }
         }
-        int nChanged = 0;
         nResult = Run(Now.eThen, nChanged);
         const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
         eWritten = blSkipped ? Now.eFound : eWritten;
+        if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
+            return Fail(StatusCode::kConstraint, What,
+                        "nothing was stored: a trigger or an ON CONFLICT clause of the table has "
+                        "ignored the record");
+        }
+    } else if (nResult == SQLITE_OK && m_Into.blView) {
+        nResult = Run(Verb::kUpdate, nChanged);
     }
     if (nResult == SQLITE_OK) {
         return {};

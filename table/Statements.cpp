@@ -105,6 +105,10 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
     return nResult;
 }
 
+int Statements::KeepBegin() {
+    return m_pBegin ? SQLITE_OK : Prepare(m_pDb, "BEGIN IMMEDIATE", m_pBegin);
+}
+
 void Statements::GiveBack(Statement& Lent) {
     // mutate(exchanged): in any order.
     sqlite3_reset(Lent.m_pStatement.get());

@@ -77,6 +77,11 @@ class Statements {
     // Returns SQLite's result.
     int Take(std::string_view strShape, Callable<std::string()> fnSql, Statement& Lent);
 
+    // A BEGIN IMMEDIATE that stays, whatever else is used, and is prepared by the first KeepBegin.
+    // Which returns SQLite's result.
+    int KeepBegin();
+    sqlite3_stmt* Begin() const { return m_pBegin.get(); }
+
   private:
     friend class Statement;
 
@@ -91,6 +96,7 @@ class Statements {
     sqlite3* m_pDb;
     size_t m_nMost;
     std::vector<Kept> m_vecKept;  // the one used last at the end
+    OwnStatement m_pBegin;
 };
 
 }  // namespace vornjsondb

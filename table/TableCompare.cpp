@@ -35,21 +35,18 @@ class TableCompare {
         if (nResult == SQLITE_OK && blFound) {
             nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_vecIndexes);
         }
-        if (nResult == SQLITE_OK && blFound) {
-            nResult = IsView(m_pDb, m_Of.Table(), m_blView);
-        }
         // mutate(exchanged): what is not there is not compared.
         if (nResult != SQLITE_OK || !blFound) {
             return nResult;
         }
-        if (m_blView) {
+        if (m_Real.blView) {
             m_pvecStatements = nullptr;  // nothing can be added to a view
         }
         for (size_t i = 0; nResult == SQLITE_OK && i < m_Of.Size(); ++i) {
             nResult = CompareMember(i);
         }
         CompareColumns();
-        if (m_blView) {
+        if (m_Real.blView) {
             return nResult;
         }
         for (size_t i = 0; nResult == SQLITE_OK && i < m_Of.Size(); ++i) {
@@ -101,7 +98,7 @@ class TableCompare {
                     Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
                     " affinity and changes what is stored");
         }
-        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn) && !m_blView) {
+        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn) && !m_Real.blView) {
             Add(LintCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
         }
         return CompareDefault(Of, *pColumn);
@@ -154,7 +151,7 @@ class TableCompare {
                            (blNeeded ? ", and no record can be created without its value" : ""));
             }
         }
-        if (m_blView) {
+        if (m_Real.blView) {
             Report(m_vecFindings, LintCode::kView, Below("", m_Of.Table()),
                    m_Of.QuotedTable() + " is a view");
         } else if (m_Real.strRowid.empty()) {
@@ -220,7 +217,6 @@ class TableCompare {
     std::vector<std::string>* m_pvecStatements;
     FindingList& m_vecFindings;
     RealTable m_Real;
-    bool m_blView = false;
     std::vector<RealIndex> m_vecIndexes;
     std::vector<std::string> m_vecPlanned;                    // names of indexes
     std::vector<std::vector<std::string>> m_vecUniqueByPlan;  // their columns

@@ -108,6 +108,7 @@ Status Table::Parts::Meet() {
 void Table::Parts::Learn(const RealTable& Real) {
     // mutate(exchanged): in any order.
     strRowid = Real.strRowid;
+    blView = Real.blView;
     if (Of.Key().empty()) {
         // mutate(doubled): the same key once more.
         Of.SetKey(Real.vecKey);
@@ -138,7 +139,8 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
     if (m_pParts && m_pParts->nReading > 0) {
         return vornjsondb::CheckState(m_pParts.get(), "open anew", true);
     }
-    m_pParts.reset();
+    // The arguments may be parts of what it was before.
+    const std::unique_ptr<Parts> pBefore = std::move(m_pParts);
     const Doing What{"open", &strName};
     // mutate(exchanged): it only looks.
     if (pDb == nullptr) {

@@ -37,6 +37,7 @@ struct VORN_JSON_DB::Table::Parts {
     vornjsondb::Members Of;
     std::vector<std::string> vecKeyNames;
     std::string strRowid;  // a name of the rowid that no column has; empty: rows have none
+    bool blView = false;   // whose triggers do the work, of which SQLite counts nothing
     vornjsondb::Statements Kept;
     vornjsondb::JsonCodec Codec;
     vornjsondb::RowReader WholeRow;

@@ -20,6 +20,12 @@ using Parts = Table::Parts;
 // not tell yet; all others by their key.
 Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& jStored) {
     const bool blByRowid = eWritten == Written::kInserted && !From.strRowid.empty();
+    FindingList vecMissing;
+    if (!blByRowid && !From.Values.HasKey(vecMissing)) {
+        return vornjsondb::Fail(StatusCode::kNotFound, What,
+                                "the row cannot be told from others: it has no rowid, and the "
+                                "record no key");
+    }
     vornjsondb::Statement Lent;
     int nResult = From.Kept.Take(
         blByRowid ? "rowid" : "key", [&] { return vornjsondb::SelectOneSql(From, blByRowid); },

@@ -9,12 +9,7 @@ namespace VORN_JSON_DB {
 namespace {
 
 using vornjsondb::Doing;
-
-// Takes no memory of its own, so that a destructor may call it.
-int Finish(sqlite3_stmt* pStatement) {
-    sqlite3_step(pStatement);
-    return sqlite3_reset(pStatement);
-}
+using vornjsondb::RunOnce;
 
 Status NotOpen(const Doing& What) {
     return vornjsondb::Fail(StatusCode::kMisuse, What, "none was begun");
@@ -38,13 +33,16 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     }
     m_nWaitMs = nWaitMs;
     m_blSavepoint = sqlite3_get_autocommit(pDb) == 0;
-    vornjsondb::OwnStatement pUndo, pEnd, pFirst;
+    vornjsondb::OwnStatement pUndo, pEnd, pBegin, pFirst;
     const char* szBegin = eMode == Mode::kImmediate ? "BEGIN IMMEDIATE" : "BEGIN";
     int nPrepared =
         vornjsondb::Prepare(pDb, m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", pUndo);
     // mutate(exchanged): in any order.
     if (nPrepared == SQLITE_OK) {
         nPrepared = vornjsondb::Prepare(pDb, m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", pEnd);
+    }
+    if (nPrepared == SQLITE_OK) {
+        nPrepared = vornjsondb::Prepare(pDb, "BEGIN IMMEDIATE", pBegin);
     }
     if (nPrepared == SQLITE_OK) {
         // mutate(doubled): the first one is finalized.
@@ -55,13 +53,14 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
         return vornjsondb::FailBySqlite(pDb, nPrepared, What);
     }
     const auto fnBegin = [&]() -> Status {
-        const int nResult = Finish(pFirst.get());
+        const int nResult = RunOnce(pFirst.get());
         if (nResult != SQLITE_OK) {
             return vornjsondb::FailBySqlite(pDb, nResult, What);
         }
         m_pDb = pDb;
         m_pUndo = pUndo.release();
         m_pEnd = pEnd.release();
+        m_pBegin = pBegin.release();
         return {};
     };
     return vornjsondb::Attempt(pDb, nWaitMs, fnBegin);
@@ -71,14 +70,15 @@ int Transaction::Undo() {
     if (sqlite3_get_autocommit(m_pDb) != 0) {
         return SQLITE_OK;  // a failure has undone it already, which is what was asked for
     }
-    const int nResult = Finish(m_pUndo);
-    return nResult == SQLITE_OK && m_blSavepoint ? Finish(m_pEnd) : nResult;
+    const int nResult = vornjsondb::Undo(m_pUndo, m_pBegin);
+    return nResult == SQLITE_OK && m_blSavepoint ? RunOnce(m_pEnd) : nResult;
 }
 
 void Transaction::Close() {
     // mutate(exchanged): in any order.
     sqlite3_finalize(m_pUndo);
     sqlite3_finalize(m_pEnd);
+    sqlite3_finalize(m_pBegin);
     m_pDb = nullptr;
 }
 
@@ -96,10 +96,10 @@ Status Transaction::Commit() {
             StatusCode::kMisuse, What, "a failure has undone it, or a statement has ended it");
         return vornjsondb::Amended(Gone, Retry::kTransaction, "");
     }
-    int nResult = Finish(m_pEnd);
+    int nResult = RunOnce(m_pEnd);
     vornjsondb::Patience Left(m_nWaitMs);
     while (nResult == SQLITE_BUSY && Left.Wait()) {
-        nResult = Finish(m_pEnd);
+        nResult = RunOnce(m_pEnd);
     }
     if (nResult == SQLITE_OK) {
         Close();
@@ -118,7 +118,7 @@ Status Transaction::Rollback() {
         return NotOpen(What);
     }
     const int nResult = Undo();
-    Status Outcome = vornjsondb::FromSqlite(m_pDb, nResult, What);
+    Status Outcome = vornjsondb::InTransaction(m_pDb, vornjsondb::FromSqlite(m_pDb, nResult, What));
     Close();
     return Outcome;
 }

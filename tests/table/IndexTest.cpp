@@ -86,6 +86,14 @@ TEST_F(IndexTest, SameIndexIsMadeOnce) {
     EXPECT_EQ(Index({"name"}), R"(CREATE INDEX "doc_name_4" ON "doc" ("name" COLLATE BINARY))");
 }
 
+TEST_F(IndexTest, SameIndexOfATemporaryTableIsMadeOnce) {
+    Run("CREATE TEMP TABLE doc (id INTEGER PRIMARY KEY, name TEXT)");
+    const std::string strSql = Index({"name"});
+    EXPECT_EQ(strSql, R"(CREATE INDEX "doc_name" ON "doc" ("name" COLLATE BINARY))");
+    EXPECT_EQ(Index({"name"}), strSql);
+    EXPECT_EQ(Rows("SELECT name FROM sqlite_temp_schema WHERE type = 'index'"), "doc_name");
+}
+
 TEST_F(IndexTest, WhatCannotBeIndexed) {
     EXPECT_EQ(Index({}),
               "refused: cannot create an index on table \"doc\": the list names no member "

@@ -1,0 +1,132 @@
+// An interrupt lasts as long as any statement of the connection runs, and stops what would undo a
+// transaction as well: what is told to be undone must be, all the same.
+
+#include <cstring>
+#include <functional>
+
+#include "TableFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+class InterruptTest : public TableTest {
+  protected:
+    InterruptTest() {
+        Open();
+        Run("INSERT INTO task (id, name) VALUES (1, 'a'); CREATE TABLE other (x);"
+            "INSERT INTO other VALUES (1)");
+    }
+
+    // What fnDo tells when it runs in a callback that reads another table, and the first statement
+    // from then on that begins with szAt is interrupted.
+    std::string InterruptAt(const char* szAt, const std::function<Status()>& fnDo) {
+        Table Other;
+        EXPECT_EQ(Text(Other.Open(m_pDb, "other", Json::Value())), "ok");
+        m_szAt = szAt;
+        std::string strText;
+        const auto fnRow = [&](const Row&) {
+            sqlite3_trace_v2(m_pDb, SQLITE_TRACE_STMT, Trace, this);
+            strText = Text(fnDo());
+            sqlite3_trace_v2(m_pDb, 0, nullptr, nullptr);
+            return false;
+        };
+        EXPECT_EQ(Text(Other.ForEachRow(Query(), fnRow)), "ok");
+        return strText;
+    }
+
+    // Also whether a transaction is open.
+    std::string Ids() {
+        const std::string strOpen = sqlite3_get_autocommit(m_pDb) == 0 ? "open: " : "";
+        return strOpen + Rows("SELECT id, name FROM task ORDER BY id");
+    }
+
+    Status SaveOne(OnDuplicate eOnDuplicate) {
+        Json::Value jStored;
+        return m_Table.Save(Parse(R"({"id": 1, "name": "b"})"), eOnDuplicate, &jStored);
+    }
+
+  private:
+    static int Trace(unsigned, void* pTest, void*, void* pSql) {
+        auto* const pThis = static_cast<InterruptTest*>(pTest);
+        if (std::strncmp(static_cast<const char*>(pSql), pThis->m_szAt,
+                         std::strlen(pThis->m_szAt)) == 0) {
+            sqlite3_interrupt(pThis->m_pDb);
+        }
+        return 0;
+    }
+
+    const char* m_szAt = "";
+};
+
+TEST_F(InterruptTest, CallIsUndone) {
+    for (const char* szAt : {"SELECT", "COMMIT"}) {
+        EXPECT_EQ(InterruptAt(szAt, [this] { return SaveOne(OnDuplicate::kUpsert); }),
+                  "interrupted: cannot save a record in table \"task\": interrupted");
+        EXPECT_EQ(Ids(), "1|a");
+    }
+}
+
+TEST_F(InterruptTest, CallInATransactionUndoesAllOfIt) {
+    for (const char* szAt : {"SELECT", "RELEASE"}) {
+        Run("BEGIN; INSERT INTO task (id) VALUES (2)");
+        EXPECT_EQ(InterruptAt(szAt, [this] { return SaveOne(OnDuplicate::kUpsert); }),
+                  "interrupted: cannot save a record in table \"task\": interrupted; the "
+                  "transaction is undone");
+        EXPECT_EQ(Ids(), "1|a");
+    }
+}
+
+TEST_F(InterruptTest, LeavingATransactionUndoesIt) {
+    const auto fnLeave = [this] {
+        Transaction All;
+        EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
+        EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), "ok");
+        return All.Commit();
+    };
+    EXPECT_EQ(InterruptAt("COMMIT", fnLeave),
+              "interrupted: cannot commit a transaction: interrupted");
+    EXPECT_EQ(Ids(), "1|a");
+    Run("BEGIN");
+    EXPECT_EQ(InterruptAt("RELEASE", fnLeave),
+              "interrupted: cannot commit a transaction: interrupted");
+    EXPECT_EQ(Ids(), "1|a");
+}
+
+TEST_F(InterruptTest, RollbackThatIsInterruptedUndoesAll) {
+    for (const char* szBefore : {"SELECT 1", "BEGIN"}) {
+        Run(szBefore);
+        const auto fnRollback = [this] {
+            Transaction All;
+            EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
+            EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), "ok");
+            return All.Rollback();
+        };
+        EXPECT_EQ(InterruptAt("ROLLBACK", fnRollback),
+                  "interrupted: cannot roll a transaction back: interrupted; the transaction is "
+                  "undone");
+        EXPECT_EQ(Ids(), "1|a");
+    }
+}
+
+TEST_F(InterruptTest, LoadIsUndone) {
+    const auto fnLoad = [this] {
+        Loader Into;
+        EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
+        EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 2})"))), "ok");
+        return Into.Commit();
+    };
+    EXPECT_EQ(InterruptAt("COMMIT", fnLoad),
+              "interrupted: cannot load records into table \"task\": cannot commit a transaction: "
+              "interrupted");
+    EXPECT_EQ(Ids(), "1|a");
+    Run("BEGIN; INSERT INTO task (id) VALUES (3)");
+    EXPECT_EQ(InterruptAt("RELEASE", fnLoad),
+              "interrupted: cannot load records into table \"task\": cannot commit a transaction: "
+              "interrupted; the transaction is undone");
+    EXPECT_EQ(Ids(), "1|a");
+}
+
+}  // namespace
+
+}  // namespace VORN_JSON_DB

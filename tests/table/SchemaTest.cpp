@@ -1,0 +1,159 @@
+// What the table's own SQL makes of what is written: clauses and triggers that ignore a record,
+// views, keys that the database fills in.
+
+#include "TableFixture.h"
+
+namespace VORN_JSON_DB {
+
+namespace {
+
+constexpr char kItems[] = R"({"item": {"key": "id", "member": {"id": {"cpptype": "int"},
+    "name": {"cpptype": "string"}, "size": {"cpptype": "int"}}}})";
+
+class SchemaTest : public TableTest {
+  protected:
+    void Meet(const std::string& strSql, const std::string& strDefinition = kItems) {
+        Run(strSql);
+        EXPECT_EQ(Text(m_Table.Open(m_pDb, "item", Parse(strDefinition))), "ok");
+    }
+
+    // A view whose triggers note what they do.
+    void MeetView() {
+        Meet(
+            "CREATE TABLE base (id INTEGER PRIMARY KEY, name TEXT, size INT); CREATE TABLE log (a);"
+            "CREATE VIEW item AS SELECT id, name, size FROM base;"
+            "CREATE TRIGGER i INSTEAD OF INSERT ON item BEGIN INSERT INTO log VALUES ('insert');"
+            " INSERT INTO base VALUES (new.id, new.name, new.size); END;"
+            "CREATE TRIGGER u INSTEAD OF UPDATE ON item BEGIN INSERT INTO log VALUES ('update');"
+            " UPDATE base SET name = new.name, size = new.size WHERE id = old.id; END;"
+            "CREATE TRIGGER d INSTEAD OF DELETE ON item BEGIN DELETE FROM base WHERE id = old.id;"
+            " END");
+    }
+
+    // Without asking for the stored row.
+    std::string Put(const std::string& strRecord, OnDuplicate eOnDuplicate) {
+        Written eWritten = Written::kReplaced;
+        const Status Outcome = m_Table.Save(Parse(strRecord), eOnDuplicate, nullptr, &eWritten);
+        return Text(Outcome) + (Outcome.Ok() && eWritten == Written::kSkipped ? " skipped" : "");
+    }
+};
+
+constexpr char kIgnored[] =
+    "constraint: cannot save a record in table \"item\": nothing was stored: a trigger or an ON "
+    "CONFLICT clause of the table has ignored the record";
+
+TEST_F(SchemaTest, RecordThatATriggerIgnoresIsNotStored) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, name TEXT, size INT);"
+        "CREATE TRIGGER i BEFORE INSERT ON item WHEN new.size = 3 BEGIN SELECT RAISE(IGNORE); END;"
+        "CREATE TRIGGER u BEFORE UPDATE ON item WHEN new.size = 4 BEGIN SELECT RAISE(IGNORE); END");
+    EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+    for (const OnDuplicate eMode :
+         {OnDuplicate::kStop, OnDuplicate::kReplace, OnDuplicate::kUpsert}) {
+        EXPECT_EQ(Save(R"({"id": 2, "size": 3})", eMode), kIgnored);
+        EXPECT_EQ(Put(R"({"id": 2, "size": 3})", eMode), kIgnored);
+    }
+    EXPECT_EQ(Put(R"({"id": 2, "size": 3})", OnDuplicate::kSkip), "ok skipped");
+    EXPECT_EQ(Save(R"({"id": 1, "size": 4})", OnDuplicate::kReplace), kIgnored);
+    EXPECT_EQ(Rows("SELECT * FROM item"), "1|a|NULL");
+}
+
+TEST_F(SchemaTest, RecordThatAClauseIgnoresIsNotStored) {
+    Meet(
+        "CREATE TABLE item (id INT PRIMARY KEY ON CONFLICT IGNORE,"
+        " name TEXT UNIQUE ON CONFLICT IGNORE, size INT)");
+    Create(R"({"id": 1, "name": "a"})");
+    Create(R"({"id": 2, "name": "b"})");
+    EXPECT_EQ(Create(R"({"id": 1, "name": "c"})"), kIgnored);
+    EXPECT_EQ(Create(R"({"id": 3, "name": "a"})"), kIgnored);
+    EXPECT_EQ(Save(R"({"id": 2, "name": "a"})", OnDuplicate::kUpsert), kIgnored);
+    EXPECT_EQ(Rows("SELECT id, name FROM item"), "1|a;2|b");
+}
+
+TEST_F(SchemaTest, LoaderCountsWhatTheTableIgnoresAsBad) {
+    Meet(
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, name TEXT, size INT);"
+        "CREATE TRIGGER i BEFORE INSERT ON item WHEN new.size = 3 BEGIN SELECT RAISE(IGNORE); END");
+    LoadOptions How;
+    How.blGoOnAfterBad = true;
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table, How)), "ok");
+    EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 1})"))), "ok");
+    EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 2, "size": 3})"))),
+              "constraint: cannot load record 2 into table \"item\": nothing was stored: a trigger "
+              "or an ON CONFLICT clause of the table has ignored the record");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
+    EXPECT_EQ(Into.Counts().nInserted, 1);
+    EXPECT_EQ(Into.Counts().nFailed, 1);
+    EXPECT_EQ(Rows("SELECT id FROM item"), "1");
+}
+
+// The key as it is stands for members that are not there.
+TEST_F(SchemaTest, RecordOfNothingButItsKeyIsReplacedByItself) {
+    Meet("CREATE TABLE item (id INT, name TEXT, PRIMARY KEY (id, name))",
+         R"({"item": {"member": {"id": {"cpptype": "int"}, "name": {"cpptype": "string"}}}})");
+    const char* szRecord = R"({"id": 1, "name": "a"})";
+    EXPECT_EQ(Save(szRecord, OnDuplicate::kReplace), R"(inserted {"id":1,"name":"a"})");
+    EXPECT_EQ(Save(szRecord, OnDuplicate::kReplace), R"(replaced {"id":1,"name":"a"})");
+    EXPECT_EQ(Rows("SELECT id, name FROM item"), "1|a");
+}
+
+TEST_F(SchemaTest, ViewHandsOutWhatItsTriggersStored) {
+    MeetView();
+    EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+    EXPECT_EQ(Put(R"({"name": "b"})", OnDuplicate::kStop), "ok");
+    EXPECT_EQ(Create(R"({"name": "c"})"),
+              "not-found: cannot save a record in table \"item\": the row cannot be told from "
+              "others: it has no rowid, and the record no key");
+    EXPECT_EQ(Rows("SELECT id, name FROM base"), "1|a;2|b");
+    std::int64_t nRows = -1;
+    EXPECT_EQ(Text(m_Table.Update(Query().Where("id", 1), Parse(R"({"size": 5})"), &nRows)), "ok");
+    EXPECT_EQ(nRows, 0);
+    EXPECT_EQ(Text(m_Table.Remove(Query().Where("id", 2))), "ok");
+    EXPECT_EQ(Rows("SELECT * FROM base"), "1|a|5");
+}
+
+TEST_F(SchemaTest, UpsertOfAViewUpdatesOrInserts) {
+    MeetView();
+    EXPECT_EQ(Save(R"({"id": 1, "name": "a"})", OnDuplicate::kUpsert),
+              R"(inserted {"id":1,"name":"a"})");
+    EXPECT_EQ(Save(R"({"id": 1, "size": 2})", OnDuplicate::kUpsert),
+              R"(updated {"id":1,"name":"a","size":2})");
+    EXPECT_EQ(Rows("SELECT a FROM log"), "insert;update");
+    EXPECT_EQ(Save(R"({"id": 1, "size": 2})", OnDuplicate::kReplace),
+              "refused: cannot save a record in table \"item\": cannot UPSERT a view");
+}
+
+TEST_F(SchemaTest, ViewOfAnotherDatabaseIsOneToo) {
+    Meet(
+        "ATTACH ':memory:' AS other; CREATE TABLE other.base (id INTEGER PRIMARY KEY, name, size);"
+        "CREATE VIEW other.item AS SELECT id, name, size FROM base;"
+        "CREATE TRIGGER other.i INSTEAD OF INSERT ON item BEGIN"
+        " INSERT INTO base VALUES (new.id, new.name, new.size); END");
+    EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+}
+
+TEST_F(SchemaTest, KeyThatTheDatabaseFillsInIsNotReadBackWithoutARowid) {
+    Meet("CREATE TABLE item (id INT PRIMARY KEY DEFAULT 7, name TEXT, size INT) WITHOUT ROWID");
+    EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+    EXPECT_EQ(Create(R"({"name": "b"})"),
+              "not-found: cannot save a record in table \"item\": the row cannot be told from "
+              "others: it has no rowid, and the record no key");
+    EXPECT_EQ(Rows("SELECT id FROM item"), "1");
+    EXPECT_EQ(Put(R"({"name": "b"})", OnDuplicate::kStop), "ok");
+    EXPECT_EQ(Rows("SELECT id FROM item"), "1;7");
+}
+
+TEST_F(SchemaTest, TableWithoutAKeyThatIsKnownHandsOutNoOtherRow) {
+    Meet(
+        "CREATE TABLE item (id INT PRIMARY KEY DEFAULT 7, name TEXT) WITHOUT ROWID;"
+        "INSERT INTO item VALUES (1, 'a')",
+        R"({"item": {"member": {"name": {"cpptype": "string"}}}})");
+    EXPECT_EQ(Create(R"({"name": "b"})"),
+              "not-found: cannot save a record in table \"item\": the row cannot be told from "
+              "others: it has no rowid, and the record no key");
+}
+
+}  // namespace
+
+}  // namespace VORN_JSON_DB
