@@ -62,8 +62,9 @@ std::string FileOf(sqlite3* pDb) {
 }
 
 void CheckFile(const std::string& strFile, Access eAccess) {
-    // SQLite takes these for databases that end with the call, and all that it stored.
-    if (strFile.empty() || strFile == ":memory:") {
+    // SQLite takes these for databases that end with the call, and all that it stored; or for
+    // another file than the one that is looked at here.
+    if (strFile.empty() || strFile == ":memory:" || strFile.compare(0, 5, "file:") == 0) {
         Fail(kExitUsage, "\"" + strFile + "\" names no file; name the file of a database");
     }
     if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
