@@ -84,6 +84,10 @@ void CheckFile(const std::string& strFile, Access eAccess) {
     }
 }
 
+int Look(sqlite3* pDb) {
+    return sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr);
+}
+
 bool SameName(const std::string& strLeft, const std::string& strRight) {
     return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
 }
@@ -132,8 +136,14 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
     sqlite3_extended_result_codes(pDb, 1);
     sqlite3_busy_timeout(pDb, Call.WaitMs());
     // SQLite looks into the file no sooner than now.
-    if (sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr) !=
-        SQLITE_OK) {
+    int nLooked = Look(pDb);
+    if (nLooked == SQLITE_READONLY_ROLLBACK) {
+        // A killed program left changes half done; who only reads can neither read past nor undo
+        // them.
+        OpenDatabase(Call, Access::kChange);
+        nLooked = Look(pDb);
+    }
+    if (nLooked != SQLITE_OK) {
         FailBySqlite(pDb, strFile);
     }
     return pOwner;

@@ -24,6 +24,25 @@ same 'doctor' "$(sed -n 3p out | cut -c 1-39)" 'integrity     *** in database ma
 : >empty
 expect 5 '' 'error: empty: there is no table "t"; see vornjsondb tables' -- list empty t
 
+# What a killed program left half done is undone, by who only reads, too.
+cat >killed.py <<'END'
+import os, sqlite3
+database = sqlite3.connect('killed.db')
+database.executescript("PRAGMA cache_size = 5; CREATE TABLE t (id INTEGER PRIMARY KEY, text);")
+database.executemany("INSERT INTO t VALUES (?, ?)", [(i, 'x' * 200) for i in range(1000)])
+database.commit()
+database.execute("UPDATE t SET text = 'half done'")
+os._exit(1)
+END
+for words in 'count t' 'list t' 'tables' 'doctor' 'dump t'; do
+    rm -f killed.db && python3 killed.py
+    read -r subcommand table <<<"$words"
+    "$VORNJSONDB" "$subcommand" killed.db $table >out 2>err
+    same "exit of $subcommand after a crash" $? 0
+    same "$subcommand after a crash" "$(cat err; grep -c 'half done' out)" 0
+done
+same 'after a crash' "$(sqlite3 killed.db 'SELECT count(*), min(text) = max(text) FROM t')" '1000|1'
+
 # Other files.
 expect 7 '' 'error: none: No such file or directory; check name and permissions' -- insert all.db t none
 expect 7 '' 'error: folder: Is a directory; check name and permissions' -- insert all.db t folder
