@@ -263,6 +263,17 @@ void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
     }
 }
 
+// Dumps one after another are not loaded in part without a word.
+void CheckEnd(LineReader& From) {
+    while (From.Next()) {
+        if (!From.Line().empty()) {
+            Fail(
+                kExitBadData,
+                From.Place() + ": something follows the dump of a table; load each dump by itself");
+        }
+    }
+}
+
 std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
     const Statement pInsert = PrepareInsert(pDb, jHeader);
     Checksum Sum;
@@ -273,6 +284,7 @@ std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader
             if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
                 From.FailHere("count or checksum differ from the rows");
             }
+            CheckEnd(From);
             return nRows;
         }
         if (!jRow.isArray() || jRow.size() != jHeader["columns"].size()) {

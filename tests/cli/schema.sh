@@ -58,6 +58,8 @@ expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load thi
 sed 's/,1\.0\]/,2.0]/' dump >changed
 expect 3 '' 'error: changed:8: count or checksum differ from the rows; dump the table again' -- \
     load fourth.db changed
+cat single.dump dump >both
+expect 3 '' 'error: both:4: something follows the dump of a table; load each dump by itself' -- load third.db both
 sed '1s/"columns":\[/&{},/' dump >named
 expect 3 '' 'error: named:1: a column has no name; dump the table again' -- load fifth.db named
 sed '1s/{/{"sequence":"x",/' dump >counted
