@@ -53,6 +53,14 @@ same 'exit without a temporary folder' $? 7
 same 'no temporary folder' "$(cat err)" \
     'error: standard input: cannot copy it to read it twice: No such file or directory; set TMPDIR to a folder with space (nothing is stored)'
 
+# Standard input is read from where it stands, both times, and by nobody else.
+{
+    read -r _
+    "$VORNJSONDB" insert rest.db t - --key id --quiet
+} <lines
+expect 0 '1999' '' -- count rest.db t
+expect 0 0 '' -- count rest.db t id=1
+
 # --errors empties no file that the call needs.
 echo '[{"id": 1}]' >one.json
 ln -s one.json link.json
