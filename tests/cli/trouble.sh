@@ -60,6 +60,10 @@ same 'no temporary folder' "$(cat err)" \
 } <lines
 expect 0 '1999' '' -- count rest.db t
 expect 0 0 '' -- count rest.db t id=1
+expect 2 '' 'error: standard input is named more than once; give - once' -- insert new.db t - -
+"$VORNJSONDB" insert new.db t - <&- 2>err
+same 'exit with a closed input' $? 7
+same 'a closed input' "$(cat err)" 'error: standard input: Bad file descriptor; check name and permissions (nothing is stored)'
 
 # --errors empties no file that the call needs.
 echo '[{"id": 1}]' >one.json
