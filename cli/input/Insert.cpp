@@ -78,6 +78,7 @@ class Import {
     void Begin();
     void CommitBatch();
     void NoteNulls();
+    void Keep();
     int Finish();
     [[noreturn]] void StopForInterrupt();
     std::string WhatIsStored() const;
@@ -94,6 +95,7 @@ class Import {
     bool m_blToKeep = false;  // it is not there yet as it is
     bool m_blAdded = false;   // the table lacks members of the definition
     Json::Value m_jDefinition;
+    Json::Value m_jOwnKey;  // of the definition, where --key gives another for this call
     std::vector<std::string> m_vecNotes;
     std::int64_t m_nBatch = 0;
     std::int64_t m_nStored = 0;  // records that a commit has dealt with
@@ -177,6 +179,7 @@ void Import::FindDefinition() {
     }
     if (!m_How.vecKey.empty() && !m_jDefinition.isNull()) {
         Json::Value& jKey = m_jDefinition[m_strTable]["key"];
+        m_jOwnKey = jKey;
         jKey = Json::Value(Json::arrayValue);
         for (const std::string& strName : m_How.vecKey) {
             jKey.append(strName);
@@ -303,7 +306,7 @@ void Import::Prepare() {
     }
     CheckKey();
     if (m_blToKeep) {
-        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+        Keep();
         m_blKept = true;
     }
     LoadOptions HowToLoad;
@@ -384,6 +387,17 @@ void Import::CommitBatch() {
     m_nStored = m_Into.Counts().nRecords;
 }
 
+void Import::Keep() {
+    Json::Value jKept = m_jDefinition;
+    if (m_blTableThere && !m_How.vecKey.empty()) {
+        jKept[m_strTable].removeMember("key");
+        if (!m_jOwnKey.isNull()) {
+            jKept[m_strTable]["key"] = m_jOwnKey;
+        }
+    }
+    KeepDefinition(m_pDb.get(), m_strTable, jKept);
+}
+
 // Nulls that came into a table that was there are to come back as null.
 void Import::NoteNulls() {
     bool blNew = false;
@@ -396,7 +410,7 @@ void Import::NoteNulls() {
         }
     }
     if (blNew && m_blKept) {
-        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+        Keep();
     }
 }
 

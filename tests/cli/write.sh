@@ -29,6 +29,15 @@ for mode in --skip --upsert; do
         -- insert shop.db heap heap.json --key id $mode
 done
 
+# The key of one call is not that of the definition, which a null or a new member is noted in.
+echo '{"id": 1, "code": "a", "n": 5}' >key.json
+expect 0 '' '' -- insert key.db t key.json --key id --quiet
+expect 0 '' '' -- index key.db t code --unique --quiet
+echo '{"code": "a", "n": null, "m": 1}' >key.json
+expect 0 '' '0 inserted, 1 replaced, 0 skipped, 0 failed (key.json: JSON)' -- \
+    insert key.db t key.json --key code --upsert --add-members
+expect 0 '{"id":1,"m":1,"n":null}' '' -- get key.db t 1 --members id,m,n
+
 # A key that is given twice is one record, and a default that does not fit is no default.
 expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
 expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x
