@@ -382,6 +382,11 @@ bool Import::AfterRecord() {
 
 void Import::CommitBatch() {
     NoteNulls();
+    int nMoved = 0;
+    sqlite3_file_control(m_pDb.get(), "main", SQLITE_FCNTL_HAS_MOVED, &nMoved);
+    if (nMoved != 0) {
+        Fail(kExitIo, m_Call.Db() + ": it was moved or replaced since it was opened; try again");
+    }
     Check(m_Into.Commit(), m_Call.Db());
     Check(m_All.Commit(), m_Call.Db());
     m_nStored = m_Into.Counts().nRecords;

@@ -205,6 +205,21 @@ expect 3 '' 'error: broken.json:2: the input ends inside of the list, after reco
     -- insert fresh.db t broken.json
 same 'no file is left' "$(ls fresh.db 2>/dev/null)" ''
 
+# What is written to a database that was moved away would be nowhere.
+"$VORNJSONDB" init moved.db t id:int --quiet && cp moved.db other.db
+mkfifo later
+"$VORNJSONDB" insert moved.db t later --format jsonl 2>err &
+pid=$!
+exec 3>later
+head -n 5 lines | cut -d , -f 1 | sed 's/$/}/' >&3
+until [[ -e moved.db-journal ]]; do sleep 0.01; done
+mv other.db moved.db
+exec 3>&-
+wait "$pid"
+same 'exit where the database was replaced' $? 7
+same 'a database that was replaced' "$(cat err)" \
+    'error: moved.db: it was moved or replaced since it was opened; try again (nothing is stored)'
+
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go
 (
