@@ -248,6 +248,10 @@ void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
     if (jHeader["version"] != kVersion) {
         From.FailHere("version " + CompactJson(jHeader["version"]) + " is not known here");
     }
+    const Json::Value jKept = jHeader.get("definition", Json::Value());
+    if (!jKept.isNull() && !jKept.isObject()) {
+        From.FailHere("the definition is no object");
+    }
     if (jHeader.isMember("sequence") && !jHeader["sequence"].isInt64()) {
         From.FailHere("the counter is no number");
     }
@@ -277,12 +281,13 @@ void CheckEnd(LineReader& From) {
 std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
     const Statement pInsert = PrepareInsert(pDb, jHeader);
     Checksum Sum;
+    Sum.Add(From.Line());  // the header
     std::int64_t nRows = 0;
     while (From.Next()) {
         const Json::Value jRow = From.Parsed();
         if (jRow.isObject()) {
             if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
-                From.FailHere("count or checksum differ from the rows");
+                From.FailHere("count or checksum differ from what is above");
             }
             CheckEnd(From);
             return nRows;
@@ -322,11 +327,12 @@ int RunDump(Context& Call) {
     Transaction All;
     Check(All.Begin(pDb.get(), Transaction::Mode::kDeferred, Call.WaitMs()), Call.Db());
     const Described Found = Describe(Call, pDb.get());
-    Put(CompactJson(Found.jHeader) + "\n");
     const Statement pRow = Prepare(pDb.get(), Found.strSelect);
     Checksum Sum;
     std::int64_t nRows = 0;
-    std::string strLine;
+    std::string strLine = CompactJson(Found.jHeader);
+    Sum.Add(strLine);
+    Put(strLine + "\n");
     while (Step(pRow.get())) {
         strLine = '[';
         for (int nColumn = 0; nColumn < sqlite3_column_count(pRow.get()); ++nColumn) {

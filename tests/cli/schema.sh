@@ -56,8 +56,12 @@ expect 0 '' 'loaded 1 row into table "single"' -- load other.db single.dump
 head -n 2 dump >cut
 expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
 sed 's/,1\.0\]/,2.0]/' dump >changed
-expect 3 '' 'error: changed:8: count or checksum differ from the rows; dump the table again' -- \
+expect 3 '' 'error: changed:8: count or checksum differ from what is above; dump the table again' -- \
     load fourth.db changed
+sed '1s/CREATE TABLE odd (a, b)/CREATE TABLE odd (b, a)/' dump >turned
+expect 3 '' 'error: turned:8: count or checksum differ from what is above; dump the table again' -- load third.db turned
+sed '1s/{/{"definition":5,/' dump >defined
+expect 3 '' 'error: defined:1: the definition is no object; dump the table again' -- load fifth.db defined
 cat single.dump dump >both
 expect 3 '' 'error: both:4: something follows the dump of a table; load each dump by itself' -- load third.db both
 sed '1s/"columns":\[/&{},/' dump >named
