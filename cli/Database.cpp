@@ -221,7 +221,8 @@ void Run(sqlite3* pDb, const std::string& strSql) {
 }
 
 std::string ColumnText(sqlite3_stmt* pStatement, int nColumn) {
-    const void* const pBytes = sqlite3_column_blob(pStatement, nColumn);
+    // As UTF-8, whatever the database has.
+    const void* const pBytes = sqlite3_column_text(pStatement, nColumn);
     const auto nBytes = static_cast<std::size_t>(sqlite3_column_bytes(pStatement, nColumn));
     return pBytes == nullptr ? "" : std::string(static_cast<const char*>(pBytes), nBytes);
 }

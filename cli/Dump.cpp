@@ -85,6 +85,7 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
             }
             return AppendReal(strOut, sqlite3_column_double(pRow, nColumn));
         case SQLITE_TEXT:
+            sqlite3_column_text(pRow, nColumn);  // from now on UTF-8, whatever the database has
             if (IsUtf8(Bytes())) {
                 return AppendJsonString(strOut, Bytes());
             }
