@@ -278,7 +278,8 @@ enum class OnDuplicate {
     kUpsert    // change the given members alone
 };
 
-// What became of the record.
+// What became of the record. kSkipped also where the table itself leaves it out without an error,
+// by ON CONFLICT IGNORE or a trigger's RAISE(IGNORE).
 enum class Written { kInserted, kSkipped, kReplaced, kUpdated };
 
 struct Options {

@@ -5,6 +5,7 @@
 
 #include "Concat.h"
 #include "FindingCodes.h"
+#include "RealTable.h"
 
 namespace vornjsondb {
 
@@ -141,8 +142,15 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         }
         int nChanged = 0;
         nResult = Run(Now.eThen, nChanged);
-        const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
-        eWritten = blSkipped ? Now.eFound : eWritten;
+        if (nResult == SQLITE_OK && nChanged == 0 && eWritten == Written::kInserted) {
+            // The key was there, or the table itself leaves the record out, by a conflict clause or
+            // a trigger. What the triggers of a view store is not counted.
+            bool blView = false;
+            if (Now.eThen == Verb::kInsert) {
+                nResult = IsView(m_Into.pDb, m_Into.Of.Table(), blView);
+            }
+            eWritten = blView ? eWritten : Written::kSkipped;
+        }
     }
     if (nResult == SQLITE_OK) {
         return {};

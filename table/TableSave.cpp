@@ -16,10 +16,15 @@ using vornjsondb::Doing;
 using vornjsondb::FailBySqlite;
 using Parts = Table::Parts;
 
+constexpr char kGone[] = "the row is gone once it is written";
+
 // Reads the row that was just written. A row that is new is found by its rowid, which the key may
 // not tell yet; all others by their key.
 Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& jStored) {
     const bool blByRowid = eWritten == Written::kInserted && !From.strRowid.empty();
+    if (eWritten == Written::kSkipped && From.Of.Key().empty()) {
+        return vornjsondb::Fail(StatusCode::kNotFound, What, kGone);
+    }
     vornjsondb::Statement Lent;
     int nResult = From.Kept.Take(
         blByRowid ? "rowid" : "key", [&] { return vornjsondb::SelectOneSql(From, blByRowid); },
@@ -36,9 +41,8 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
         jStored = From.WholeRow.Read(Lent.Get(), From.Codec);
         return {};
     }
-    return nResult == SQLITE_DONE
-               ? vornjsondb::Fail(StatusCode::kNotFound, What, "the row is gone once it is written")
-               : FailBySqlite(From.pDb, nResult, What);
+    return nResult == SQLITE_DONE ? vornjsondb::Fail(StatusCode::kNotFound, What, kGone)
+                                  : FailBySqlite(From.pDb, nResult, What);
 }
 
 // A single statement is whole by itself.

@@ -320,6 +320,16 @@ TEST_F(LoaderTest, TransactionThatATriggerOrTheCallerEndsEndsTheLoad) {
     EXPECT_EQ("", Stored());
 }
 
+TEST_F(LoaderTest, RecordsThatTheTableLeavesOutAreNotCountedAsInserted) {
+    Run("CREATE TRIGGER t BEFORE INSERT ON task WHEN new.id = 2 BEGIN SELECT raise(IGNORE); END");
+    Loader Into;
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    EXPECT_EQ("ok\nok\nok", Add(Into, {R"({"id": 1})", R"({"id": 2})", R"({"id": 3})"}));
+    EXPECT_EQ("ok", Text(Into.Commit()));
+    EXPECT_EQ("3 2 0 1 0 3", Counts(Into));
+    EXPECT_EQ("1;3", Rows("SELECT id FROM task"));
+}
+
 TEST_F(LoaderTest, RecordsOfTheTableCanBeWrittenAndReadBetween) {
     Loader Into;
     EXPECT_EQ("ok", Text(Into.Start(m_Table)));

@@ -169,6 +169,24 @@ TEST_F(SaveTest, TriggersAreSeenInTheStoredRow) {
     EXPECT_EQ(R"({"done":false,"id":1,"name":"a!"})", Create(R"({"name": "a"})"));
 }
 
+// It was handed out as inserted, with the row that came before it.
+TEST_F(SaveTest, RecordThatTheTableLeavesOutIsNotInserted) {
+    const std::string strGone =
+        "not-found: cannot save a record in table \"t\": the row is gone once it is written";
+    for (const char* const szColumns : {"id INTEGER PRIMARY KEY", "id INTEGER"}) {
+        Run(std::string("DROP TABLE IF EXISTS t; CREATE TABLE t (") + szColumns +
+            ", a TEXT UNIQUE ON CONFLICT IGNORE)");
+        Open(R"({"t": {"member": {"a": {"cpptype": "string"}, "id": {"cpptype": "long long"}}}})");
+        EXPECT_EQ(R"({"a":"x","id":1})", Create(R"({"a": "x", "id": 1})"));
+        EXPECT_EQ(strGone, Create(R"({"a": "x", "id": 2})"));
+        Written eWritten = Written::kInserted;
+        const Json::Value jAgain = Parse(R"({"a": "x", "id": 2})");
+        EXPECT_EQ("ok", Text(m_Table.Save(jAgain, OnDuplicate::kStop, nullptr, &eWritten)));
+        EXPECT_EQ(Written::kSkipped, eWritten);
+        EXPECT_EQ("1|x", Rows("SELECT id, a FROM t"));
+    }
+}
+
 TEST_F(SaveTest, RowThatATriggerRemovesIsNotFoundAndNothingIsStored) {
     Open();
     Run("CREATE TABLE log (a); CREATE TRIGGER t AFTER INSERT ON task BEGIN "
