@@ -78,8 +78,9 @@ void RemoveEmpty(sqlite3* pDb, const std::string& strFile) {
 }
 
 void CheckFile(const std::string& strFile, Access eAccess) {
-    // SQLite takes these for databases that end with the call, and all that it stored.
-    if (strFile.empty() || strFile == ":memory:") {
+    // SQLite takes these for databases that end with the call, and all that it stored; or for
+    // another file than the one that is looked at here.
+    if (strFile.empty() || strFile == ":memory:" || strFile.compare(0, 5, "file:") == 0) {
         Fail(kExitUsage, "\"" + strFile + "\" names no file; name the file of a database");
     }
     if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
@@ -97,6 +98,10 @@ void CheckFile(const std::string& strFile, Access eAccess) {
                           (nError == ENOENT ? "; check the name, or make it with init or insert"
                                             : "; check its permissions"));
     }
+}
+
+int Look(sqlite3* pDb) {
+    return sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr);
 }
 
 bool SameName(const std::string& strLeft, const std::string& strRight) {
@@ -155,21 +160,30 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
     sqlite3_extended_result_codes(pDb, 1);
     sqlite3_busy_timeout(pDb, Call.WaitMs());
     // SQLite looks into the file no sooner than now.
-    if (sqlite3_exec(pDb, "SELECT 1 FROM sqlite_master LIMIT 1", nullptr, nullptr, nullptr) !=
-        SQLITE_OK) {
+    int nLooked = Look(pDb);
+    if (nLooked == SQLITE_READONLY_ROLLBACK) {
+        // A killed program left changes half done; who only reads can neither read past nor undo
+        // them.
+        OpenDatabase(Call, Access::kChange);
+        nLooked = Look(pDb);
+    }
+    if (nLooked != SQLITE_OK) {
         FailBySqlite(pDb, strFile);
     }
     return pOwner;
 }
 
-// Another call may have removed the file that it made in vain while this one had it open.
-void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
-    const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, Call.WaitMs());
+void CheckInPlace(const Context& Call, sqlite3* pDb) {
     int nMoved = 0;
     sqlite3_file_control(pDb, nullptr, SQLITE_FCNTL_HAS_MOVED, &nMoved);
     if (nMoved != 0) {
         Fail(kExitIo, Call.Db() + ": another program has removed or replaced the file; try again");
     }
+}
+
+void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
+    const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, Call.WaitMs());
+    CheckInPlace(Call, pDb);
     Check(Begun, Call.Db());
 }
 
@@ -245,7 +259,8 @@ void Run(sqlite3* pDb, const std::string& strSql) {
 }
 
 std::string ColumnText(sqlite3_stmt* pStatement, int nColumn) {
-    const void* const pBytes = sqlite3_column_blob(pStatement, nColumn);
+    // As UTF-8, whatever the database has.
+    const void* const pBytes = sqlite3_column_text(pStatement, nColumn);
     const auto nBytes = static_cast<std::size_t>(sqlite3_column_bytes(pStatement, nColumn));
     return pBytes == nullptr ? "" : std::string(static_cast<const char*>(pBytes), nBytes);
 }

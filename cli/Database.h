@@ -23,6 +23,10 @@ using Database = std::unique_ptr<sqlite3, CloseDatabase>;
 // Opens Call.Db(). A file that is missing, no database or not readable is an Error at once.
 Database OpenDatabase(const Context& Call, Access eAccess);
 
+// Another program, even another call that has made it in vain, may have removed the file while it
+// was open: what is stored then is nowhere, which is an Error.
+void CheckInPlace(const Context& Call, sqlite3* pDb);
+
 // Begins what changes the database, which lives until All ends.
 void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All);
 

@@ -85,6 +85,7 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
             }
             return AppendReal(strOut, sqlite3_column_double(pRow, nColumn));
         case SQLITE_TEXT:
+            sqlite3_column_text(pRow, nColumn);  // from now on UTF-8, whatever the database has
             if (IsUtf8(Bytes())) {
                 return AppendJsonString(strOut, Bytes());
             }
@@ -248,6 +249,10 @@ void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
     if (jHeader["version"] != kVersion) {
         From.FailHere("version " + CompactJson(jHeader["version"]) + " is not known here");
     }
+    const Json::Value jKept = jHeader.get("definition", Json::Value());
+    if (!jKept.isNull() && !jKept.isObject()) {
+        From.FailHere("the definition is no object");
+    }
     if (jHeader.isMember("sequence") && !jHeader["sequence"].isInt64()) {
         From.FailHere("the counter is no number");
     }
@@ -263,16 +268,29 @@ void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
     }
 }
 
+// Dumps one after another are not loaded in part without a word.
+void CheckEnd(LineReader& From) {
+    while (From.Next()) {
+        if (!From.Line().empty()) {
+            Fail(
+                kExitBadData,
+                From.Place() + ": something follows the dump of a table; load each dump by itself");
+        }
+    }
+}
+
 std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
     const Statement pInsert = PrepareInsert(pDb, jHeader);
     Checksum Sum;
+    Sum.Add(From.Line());  // the header
     std::int64_t nRows = 0;
     while (From.Next()) {
         const Json::Value jRow = From.Parsed();
         if (jRow.isObject()) {
             if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
-                From.FailHere("count or checksum differ from the rows");
+                From.FailHere("count or checksum differ from what is above");
             }
+            CheckEnd(From);
             return nRows;
         }
         if (!jRow.isArray() || jRow.size() != jHeader["columns"].size()) {
@@ -310,11 +328,12 @@ int RunDump(Context& Call) {
     Transaction All;
     Check(All.Begin(pDb.get(), Transaction::Mode::kDeferred, Call.WaitMs()), Call.Db());
     const Described Found = Describe(Call, pDb.get());
-    Put(CompactJson(Found.jHeader) + "\n");
     const Statement pRow = Prepare(pDb.get(), Found.strSelect);
     Checksum Sum;
     std::int64_t nRows = 0;
-    std::string strLine;
+    std::string strLine = CompactJson(Found.jHeader);
+    Sum.Add(strLine);
+    Put(strLine + "\n");
     while (Step(pRow.get())) {
         strLine = '[';
         for (int nColumn = 0; nColumn < sqlite3_column_count(pRow.get()); ++nColumn) {

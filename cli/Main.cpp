@@ -1,6 +1,8 @@
 // vornjsondb: the command.
 
+#include <fcntl.h>
 #include <signal.h>
+#include <unistd.h>
 
 #include <cerrno>
 #include <cstdio>
@@ -22,6 +24,18 @@ int Report(int nExit, const std::string& strLine) {
     static_cast<void>(std::fprintf(stderr, "%serror:%s %s\n", blColour ? "\033[1;31m" : "",
                                    blColour ? "\033[0m" : "", strLine.c_str()));
     return nExit;
+}
+
+// A stream that the parent closed stays useless, but no file that is opened later may get its
+// number and be read or written in its place: so input is opened for writing alone, outputs for
+// reading.
+void KeepClosed() {
+    for (const int nFile : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+        if (fcntl(nFile, F_GETFD) < 0) {
+            // The lowest number that is free is this one.
+            static_cast<void>(open("/dev/null", nFile == STDIN_FILENO ? O_WRONLY : O_RDONLY));
+        }
+    }
 }
 
 int Run(int nArguments, char** pszArguments) {
@@ -51,6 +65,7 @@ int RunGuarded(int nArguments, char** pszArguments) {
 }  // namespace
 
 int main(int nArguments, char** pszArguments) {
+    KeepClosed();
     // A reader that goes away ends the command without a word, whatever the parent made of it; a
     // file that hits the limit of the shell is a write error like others.
     static_cast<void>(signal(SIGPIPE, SIG_DFL));

@@ -21,6 +21,31 @@ int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords) 
     return kExitFine;
 }
 
+bool IsView(const OpenTable& Open) {
+    const Statement pLook = Prepare(Open.pDb.get(),
+                                    "SELECT 1 FROM sqlite_master WHERE type = 'view' AND name = ?1 "
+                                    "COLLATE NOCASE");
+    sqlite3_bind_text(pLook.get(), 1, Open.Records.Name().c_str(), -1, SQLITE_TRANSIENT);
+    return Step(pLook.get());
+}
+
+// Runs a change and counts its records. SQLite does not count what the triggers of a view do: there
+// all that are found count.
+template <typename Change>
+Status Counted(OpenTable& Open, const Query& Which, std::int64_t& nRecords,
+               const Change& fnChange) {
+    std::int64_t nFound = 0;
+    if (IsView(Open)) {
+        const Status Looked = Open.Records.Count(Which, nFound);
+        if (!Looked.Ok()) {
+            return Looked;
+        }
+    }
+    const Status Changed = fnChange();
+    nRecords += nFound;
+    return Changed;
+}
+
 // Runs a change for each key; a key that is not there undoes them all.
 template <typename Change>
 std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std::string>& vecKeys,
@@ -85,7 +110,8 @@ int RunUpdate(Context& Call) {
     const Json::Value jMembers = ParseAssignments(Open.Records, vecAssignments);
     CheckNoBytes(Open.Records, jMembers);
     const auto Change = [&](const Query& Which, std::int64_t& nRows) {
-        return Open.Records.Update(Which, jMembers, &nRows);
+        return Counted(Open, Which, nRows,
+                       [&] { return Open.Records.Update(Which, jMembers, &nRows); });
     };
     std::int64_t nRecords = 0;
     if (vecKeys.empty()) {
@@ -108,14 +134,16 @@ int RunDelete(Context& Call) {
     }
     OpenTable Open(Call, Access::kChange);
     std::int64_t nRecords = 0;
+    const auto Change = [&Open](const Query& Which, std::int64_t& nRows) {
+        return Counted(Open, Which, nRows, [&] { return Open.Records.Remove(Which, &nRows); });
+    };
     if (Call.Has("--all")) {
-        Check(Open.Records.RemoveAll(&nRecords), Call.Db());
+        Check(Counted(Open, Query(), nRecords, [&] { return Open.Records.RemoveAll(&nRecords); }),
+              Call.Db());
     } else if (Call.Has("--where")) {
-        Check(Open.Records.Remove(ParseQuery(Call, Open.Records, {}), &nRecords), Call.Db());
+        Check(Change(ParseQuery(Call, Open.Records, {}), nRecords), Call.Db());
     } else {
-        nRecords = ForKeys(Call, Open, vecKeys, [&Open](const Query& Which, std::int64_t& nRows) {
-            return Open.Records.Remove(Which, &nRows);
-        });
+        nRecords = ForKeys(Call, Open, vecKeys, Change);
     }
     return ReportCount(Call, "deleted", nRecords);
 }

@@ -67,7 +67,10 @@ bool ByteSource::Open(const std::string& strPath) {
         errno = EISDIR;
         return Fail();
     }
-    m_nSize = S_ISREG(Found.st_mode) ? Found.st_size : -1;
+    if (S_ISREG(Found.st_mode)) {
+        m_nBegin = lseek(m_nFile, 0, SEEK_CUR);
+        m_nSize = std::max<std::int64_t>(0, Found.st_size - m_nBegin);
+    }
     return true;
 }
 
@@ -144,6 +147,7 @@ bool ByteSource::Spool() {
     m_nFile = nCopy;
     m_blOwn = true;
     m_nSize = nAll;
+    m_nBegin = 0;
     return m_nError == 0 && Rewind();
 }
 
@@ -151,7 +155,7 @@ bool ByteSource::Rewind() {
     m_strLooked.clear();
     m_nLookedTaken = 0;
     m_nTaken = 0;
-    return lseek(m_nFile, 0, SEEK_SET) == 0 || Fail();
+    return lseek(m_nFile, m_nBegin, SEEK_SET) == m_nBegin || Fail();
 }
 
 }  // namespace VORN_JSON_DB::Cli

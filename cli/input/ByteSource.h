@@ -49,6 +49,7 @@ class ByteSource {
     int m_nError = 0;
     bool m_blOwn = false;
     std::int64_t m_nSize = -1;
+    std::int64_t m_nBegin = 0;  // standard input may have been read in part before
     std::int64_t m_nTaken = 0;
     std::string m_strLooked;  // what Look read
     size_t m_nLookedTaken = 0;

@@ -1,5 +1,6 @@
 #include "InputFiles.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "Interrupt.h"
@@ -66,6 +67,10 @@ void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& 
 }
 
 InputFiles::InputFiles(const InsertOptions& How) {
+    // Each would get some of its bytes.
+    if (std::count(How.vecFiles.begin(), How.vecFiles.end(), "-") > 1) {
+        Fail(kExitUsage, "standard input is named more than once; give - once");
+    }
     for (const std::string& strPath : How.vecFiles) {
         m_vecInputs.push_back(std::make_unique<Input>());
         Input& Now = *m_vecInputs.back();
@@ -90,6 +95,9 @@ bool InputFiles::ReadOne(Input& Now, Sink& To) {
 
 bool InputFiles::Read(Sink& To, const Begin& fnBegin, bool blAgain) {
     for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
+        if (pNow->From.Error() != 0) {
+            FailBySystem(pNow->From);  // the first look failed
+        }
         const bool blReady = m_blReadBefore ? pNow->From.Rewind() : !blAgain || pNow->From.Spool();
         if (!blReady && !Interrupt::Came()) {
             Fail(kExitIo, pNow->From.Name() + ": cannot copy it to read it twice: " +

@@ -76,6 +76,7 @@ class Import {
     bool AfterRecord();
     void CommitBatch();
     void NoteNulls();
+    void Keep();
     int Finish();
     [[noreturn]] void StopForInterrupt();
     std::string WhatIsStored() const;
@@ -92,6 +93,7 @@ class Import {
     bool m_blAdded = false;   // the table lacks members of the definition
     Json::Value m_jDefinition;
     std::vector<std::string> m_vecColumns;  // of a table that is made: as the records have them
+    Json::Value m_jOwnKey;  // of the definition, where --key gives another for this call
     std::vector<std::string> m_vecNotes;
     std::int64_t m_nBatch = 0;
     std::int64_t m_nStored = 0;  // records that a commit has dealt with
@@ -162,6 +164,7 @@ void Import::FindDefinition() {
     }
     if (!m_How.vecKey.empty() && !m_jDefinition.isNull()) {
         Json::Value& jKey = m_jDefinition[m_strTable]["key"];
+        m_jOwnKey = jKey;
         jKey = Json::Value(Json::arrayValue);
         for (const std::string& strName : m_How.vecKey) {
             jKey.append(strName);
@@ -292,7 +295,7 @@ void Import::Prepare() {
     }
     CheckKey();
     if (m_blToKeep) {
-        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+        Keep();
         m_blKept = true;
     }
     LoadOptions HowToLoad;
@@ -368,9 +371,21 @@ bool Import::AfterRecord() {
 
 void Import::CommitBatch() {
     NoteNulls();
+    CheckInPlace(m_Call, m_pDb.get());
     Check(m_Into.Commit(), m_Call.Db());
     Check(m_All.Commit(), m_Call.Db());
     m_nStored = m_Into.Counts().nRecords;
+}
+
+void Import::Keep() {
+    Json::Value jKept = m_jDefinition;
+    if (m_blTableThere && !m_How.vecKey.empty()) {
+        jKept[m_strTable].removeMember("key");
+        if (!m_jOwnKey.isNull()) {
+            jKept[m_strTable]["key"] = m_jOwnKey;
+        }
+    }
+    KeepDefinition(m_pDb.get(), m_strTable, jKept);
 }
 
 // Nulls that came into a table that was there are to come back as null.
@@ -385,7 +400,7 @@ void Import::NoteNulls() {
         }
     }
     if (blNew && m_blKept) {
-        KeepDefinition(m_pDb.get(), m_strTable, m_jDefinition);
+        Keep();
     }
 }
 

@@ -18,8 +18,12 @@ bool IsJson(BoundKind eKind) {
     return eKind == BoundKind::kObject || eKind == BoundKind::kList || eKind == BoundKind::kJson;
 }
 
-// The record's own fault, which harms no other.
-bool IsOfRecord(const Status& Outcome) {
+// The record's own fault, which harms no other: a table may also demand that a bad record undoes
+// the whole transaction.
+bool IsOfRecord(const Status& Outcome, sqlite3* pDb) {
+    if (sqlite3_get_autocommit(pDb) != 0) {
+        return false;
+    }
     return Outcome.Code() == StatusCode::kRefused || Outcome.Code() == StatusCode::kDuplicate ||
            Outcome.Code() == StatusCode::kConstraint;
 }
@@ -172,7 +176,7 @@ bool LoaderSink::EndRecord(const Place& Where) {
                                                  : strNearest + " or add it by --add-members"));
     }
     const Status Outcome = m_Into.EndRecord();
-    if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome))) {
+    if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome, m_Of.Connection()))) {
         const bool blDuplicate = Outcome.Code() == StatusCode::kDuplicate;
         const char* const szHint = !blDuplicate ? ""
                                    : m_blMode

@@ -64,7 +64,7 @@ odd	bad-name	/odd/member/$x
 zoo	missing-column	/zoo/member/b'
 
 # A variable that is not set makes neither a database that is gone afterwards nor a table without a name.
-for database in '' :memory:; do
+for database in '' :memory: file::memory: 'file:new.db?mode=memory'; do
     for words in 'insert more.json' 'list'; do
         expect 2 '' "error: \"$database\" names no file; name the file of a database" -- \
             "${words% *}" "$database" t ${words#"${words% *}"}

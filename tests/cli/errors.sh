@@ -109,6 +109,14 @@ expect 3 '' 'error: near.json:1: the table has no member "ID"; did you mean "id"
 expect 2 '' 'error: --delimiter: it must be one ASCII character, and no quote or newline; for tabs there is --format tsv' \
     -- insert shop.db product near.json --delimiter '\t'
 
+# A table may demand that a bad record undoes all: then there is nothing to go on with.
+sqlite3 shop.db 'CREATE TABLE undone (a INTEGER UNIQUE ON CONFLICT ROLLBACK)'
+printf '{"a": %s}\n' 1 '"x"' 1 2 3 >undone.json
+expect 4 '' 'error: undone.json:3: cannot load record 3 into table "undone": UNIQUE constraint failed: undone.a (a = 1); the transaction is undone; --skip, --replace or --upsert tells what to do with it (nothing is stored)' \
+    -- insert shop.db undone undone.json --errors bad --format jsonl
+same 'bad records' "$(grep -c . bad)" 1
+expect 0 0 '' -- count shop.db undone
+
 # What a message quotes does not steer the terminal.
 expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \
     list shop.db $'a\e[31m\u009b0m\nb'

@@ -50,6 +50,17 @@ all="SELECT rowid, typeof(a), hex(a), quote(a), typeof(b), hex(b), b FROM odd"
 same 'odd values' "$(sqlite3 other.db "$all")" "$(sqlite3 shop.db "$all")"
 same 'indexes' "$(sqlite3 other.db .schema\ product)" "$(sqlite3 shop.db .schema\ product)"
 
+# What is in UTF-16 comes back in UTF-8.
+sqlite3 wide.db "PRAGMA encoding = 'UTF-16'; CREATE TABLE odd (a, b);
+    INSERT INTO odd VALUES ('漢😀', x'00ff'), ('a' || char(0) || 'b', 1.5)"
+"$VORNJSONDB" dump wide.db odd >dump.wide
+expect 0 '' 'loaded 2 rows into table "odd"' -- load narrow.db dump.wide
+same 'values in UTF-8' "$(sqlite3 narrow.db 'SELECT typeof(a), hex(a), typeof(b), hex(b) FROM odd')" \
+    $'text|E6BCA2F09F9880|blob|00FF\ntext|610062|real|312E35'
+expect 0 'table
+-----
+odd' '' -- tables wide.db
+
 "$VORNJSONDB" init shop.db single a:int --quiet && "$VORNJSONDB" insert shop.db single - --quiet <<<'{"a": 1}'
 "$VORNJSONDB" dump shop.db single >single.dump
 expect 0 '' 'loaded 1 row into table "single"' -- load other.db single.dump
@@ -57,8 +68,14 @@ head -n 2 dump >cut
 expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
 same 'no file is left' "$(ls third.db 2>/dev/null)" ''
 sed 's/,1\.0\]/,2.0]/' dump >changed
-expect 3 '' 'error: changed:8: count or checksum differ from the rows; dump the table again' -- \
+expect 3 '' 'error: changed:8: count or checksum differ from what is above; dump the table again' -- \
     load fourth.db changed
+sed '1s/CREATE TABLE odd (a, b)/CREATE TABLE odd (b, a)/' dump >turned
+expect 3 '' 'error: turned:8: count or checksum differ from what is above; dump the table again' -- load third.db turned
+sed '1s/{/{"definition":5,/' dump >defined
+expect 3 '' 'error: defined:1: the definition is no object; dump the table again' -- load fifth.db defined
+cat single.dump dump >both
+expect 3 '' 'error: both:4: something follows the dump of a table; load each dump by itself' -- load third.db both
 sed '1s/"columns":\[/&{},/' dump >named
 expect 3 '' 'error: named:1: a column has no name; dump the table again' -- load fifth.db named
 sed '1s/{/{"sequence":"x",/' dump >counted

@@ -24,6 +24,25 @@ same 'doctor' "$(sed -n 3p out | cut -c 1-39)" 'integrity     *** in database ma
 : >empty
 expect 5 '' 'error: empty: there is no table "t"; see vornjsondb tables' -- list empty t
 
+# What a killed program left half done is undone, by who only reads, too.
+cat >killed.py <<'END'
+import os, sqlite3
+database = sqlite3.connect('killed.db')
+database.executescript("PRAGMA cache_size = 5; CREATE TABLE t (id INTEGER PRIMARY KEY, text);")
+database.executemany("INSERT INTO t VALUES (?, ?)", [(i, 'x' * 200) for i in range(1000)])
+database.commit()
+database.execute("UPDATE t SET text = 'half done'")
+os._exit(1)
+END
+for words in 'count t' 'list t' 'tables' 'doctor' 'dump t'; do
+    rm -f killed.db && python3 killed.py
+    read -r subcommand table <<<"$words"
+    "$VORNJSONDB" "$subcommand" killed.db $table >out 2>err
+    same "exit of $subcommand after a crash" $? 0
+    same "$subcommand after a crash" "$(cat err; grep -c 'half done' out)" 0
+done
+same 'after a crash' "$(sqlite3 killed.db 'SELECT count(*), min(text) = max(text) FROM t')" '1000|1'
+
 # Other files.
 expect 7 '' 'error: none: No such file or directory; check name and permissions' -- insert all.db t none
 expect 7 '' 'error: folder: Is a directory; check name and permissions' -- insert all.db t folder
@@ -33,6 +52,18 @@ expect 7 '' 'error: none: No such file or directory; check the name' -- list all
 same 'exit without a temporary folder' $? 7
 same 'no temporary folder' "$(cat err)" \
     'error: standard input: cannot copy it to read it twice: No such file or directory; set TMPDIR to a folder with space (nothing is stored)'
+
+# Standard input is read from where it stands, both times, and by nobody else.
+{
+    read -r _
+    "$VORNJSONDB" insert rest.db t - --key id --quiet
+} <lines
+expect 0 '1999' '' -- count rest.db t
+expect 0 0 '' -- count rest.db t id=1
+expect 2 '' 'error: standard input is named more than once; give - once' -- insert new.db t - -
+"$VORNJSONDB" insert new.db t - <&- 2>err
+same 'exit with a closed input' $? 7
+same 'a closed input' "$(cat err)" 'error: standard input: Bad file descriptor; check name and permissions (nothing is stored)'
 
 # --errors empties no file that the call needs.
 echo '[{"id": 1}]' >one.json
@@ -211,6 +242,21 @@ for instead in '' ': >gone.db'; do
         'error: gone.db: another program has removed or replaced the file; try again (nothing is stored)'
     rm -f gone.db
 done
+
+# What is written to a database that was moved away would be nowhere.
+"$VORNJSONDB" init moved.db t id:int --quiet && cp moved.db other.db
+mkfifo later
+"$VORNJSONDB" insert moved.db t later --format jsonl 2>err &
+pid=$!
+exec 3>later
+head -n 5 lines | cut -d , -f 1 | sed 's/$/}/' >&3
+until [[ -e moved.db-journal ]]; do sleep 0.01; done
+mv other.db moved.db
+exec 3>&-
+wait "$pid"
+same 'exit where the database was replaced' $? 7
+same 'a database that was replaced' "$(cat err)" \
+    'error: moved.db: another program has removed or replaced the file; try again (nothing is stored)'
 
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go

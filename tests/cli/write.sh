@@ -40,6 +40,37 @@ echo "{\"id\": 1, \"bytes\": $bytes}" >file.json
 expect 0 '' '0 inserted, 1 replaced, 0 skipped, 0 failed (file.json: JSON)' -- insert shop.db file file.json --upsert
 same 'the bytes' "$(sqlite3 shop.db 'SELECT hex(bytes), note FROM file')" "0102|$bytes"
 
+# The key of one call is not that of the definition, which a null or a new member is noted in.
+echo '{"id": 1, "code": "a", "n": 5}' >key.json
+expect 0 '' '' -- insert key.db t key.json --key id --quiet
+expect 0 '' '' -- index key.db t code --unique --quiet
+echo '{"code": "a", "n": null, "m": 1}' >key.json
+expect 0 '' '0 inserted, 1 replaced, 0 skipped, 0 failed (key.json: JSON)' -- \
+    insert key.db t key.json --key code --upsert --add-members
+expect 0 '{"id":1,"m":1,"n":null}' '' -- get key.db t 1 --members id,m,n
+
+# What a table ignores is told, and left out when that is asked for; what the triggers of a view do is counted.
+sqlite3 own.db "CREATE TABLE t (id INTEGER PRIMARY KEY, a TEXT UNIQUE ON CONFLICT IGNORE);
+    CREATE TRIGGER no BEFORE INSERT ON t WHEN new.a = 'no' BEGIN SELECT RAISE(IGNORE); END;
+    CREATE VIEW v AS SELECT id, a FROM t;
+    CREATE TRIGGER i INSTEAD OF INSERT ON v BEGIN INSERT INTO t VALUES (new.id, new.a); END;
+    CREATE TRIGGER u INSTEAD OF UPDATE ON v BEGIN UPDATE t SET a = new.a WHERE id = old.id; END;
+    CREATE TRIGGER d INSTEAD OF DELETE ON v BEGIN DELETE FROM t WHERE id = old.id; END"
+printf '{"id": %d, "a": "%s"}\n' 1 x 2 no 3 x 4 y >own.json
+ignored='nothing was stored: a trigger or an ON CONFLICT clause of the table has ignored the record'
+expect 3 '' "error: own.json:2: cannot load record 2 into table \"t\": $ignored; vornjsondb schema shows what the table demands (nothing is stored)" \
+    -- insert own.db t own.json
+expect 0 '' '2 inserted, 0 replaced, 2 skipped, 0 failed (own.json: JSON Lines)' -- insert own.db t own.json --skip
+expect 3 '' "error: own.db: cannot save a record in table \"t\": $ignored; vornjsondb schema shows what the table demands" \
+    -- upsert own.db t id=5 a=no
+expect 0 2 '' -- count own.db t
+echo '{"id": 6, "a": "z"}' >own.json
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (own.json: JSON)' -- insert own.db v own.json
+expect 0 '' 'updated 2 records' -- update own.db v --where '{"id": {"$gt": 1}}' a:=null
+expect 0 '' 'deleted 1 record' -- delete own.db v --where '{"id": 1}'
+expect 0 '' 'deleted 2 records' -- delete own.db v --all --yes
+expect 0 0 '' -- count own.db t
+
 # A key that is given twice is one record, and a default that does not fit is no default.
 expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
 expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x
