@@ -76,6 +76,7 @@ std::vector<MemberAbilities> AbilitiesOf(const std::string& strTable,
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
         const std::string strName = it.name();
         const vornjsondb::MemberType& Type = vornjsondb::TypeOfMember(*it);
+        // mutate(exchanged): in any order.
         const Abilities Old =
             vornjsondb::Both(vornjsondb::OldAbilities(Type),
                              vornjsondb::OldByNames(blTable && Names.Has(strName), blAll));
