@@ -31,7 +31,9 @@
 // A call that changes something is whole or nothing, inside a transaction of the caller's too. Some
 // failures may undo that transaction with it, as SQLite works: a full disk, an interrupt, and what
 // the table's own SQL answers with ROLLBACK. Then the message ends in "the transaction is undone".
-// Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for.
+// Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for. And a progress
+// handler can interrupt a statement that has done its work: a call is then told as failed, and may
+// be done.
 // Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words

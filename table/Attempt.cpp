@@ -60,8 +60,18 @@ int RunOnce(sqlite3_stmt* pStatement) {
     return sqlite3_reset(pStatement);
 }
 
+int RunEnd(sqlite3_stmt* pEnd) {
+    const int nResult = RunOnce(pEnd);
+    const bool blDone =
+        nResult == SQLITE_INTERRUPT && sqlite3_get_autocommit(sqlite3_db_handle(pEnd)) != 0;
+    return blDone ? SQLITE_OK : nResult;
+}
+
 int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
-    const int nResult = RunOnce(pUndo);
+    int nResult = RunEnd(pUndo);
+    if (nResult == SQLITE_INTERRUPT) {
+        nResult = RunEnd(pUndo);  // a progress handler may be satisfied
+    }
     if (nResult == SQLITE_INTERRUPT) {
         RunOnce(pBegin);
     }
@@ -86,12 +96,14 @@ int Whole::Begin() {
     if (nResult == SQLITE_OK) {
         nResult = m_blSavepoint ? First.Finish() : RunOnce(m_Kept.Begin());
     }
-    m_blOpen = nResult == SQLITE_OK;
+    // Also of a BEGIN that was interrupted when its work was done.
+    const bool blBegun = !m_blSavepoint && sqlite3_get_autocommit(m_pDb) == 0;
+    m_blOpen = nResult == SQLITE_OK || blBegun;
     return nResult;
 }
 
 int Whole::Keep() {
-    const int nResult = m_End.Finish();
+    const int nResult = RunEnd(m_End.Get());
     m_blOpen = nResult != SQLITE_OK;
     return nResult;
 }

@@ -43,6 +43,10 @@ Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce);
 // a destructor may call it.
 int RunOnce(sqlite3_stmt* pStatement);
 
+// The same for what ends a transaction. A progress handler can interrupt a statement whose work is
+// done; that is a success.
+int RunEnd(sqlite3_stmt* pEnd);
+
 // Runs pUndo, which undoes a transaction or a savepoint. An interrupt lasts as long as anything on
 // the connection runs, a ForEach around the call perhaps, and would leave all as it is. Then
 // pBegin, a BEGIN IMMEDIATE, is interrupted as well; and for what would have written SQLite undoes

@@ -55,7 +55,12 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     const auto fnBegin = [&]() -> Status {
         const int nResult = RunOnce(pFirst.get());
         if (nResult != SQLITE_OK) {
-            return vornjsondb::FailBySqlite(pDb, nResult, What);
+            Status Failed = vornjsondb::FailBySqlite(pDb, nResult, What);
+            // A BEGIN may be interrupted when its work is done.
+            if (!m_blSavepoint && sqlite3_get_autocommit(pDb) == 0) {
+                vornjsondb::Undo(pUndo.get(), pBegin.get());
+            }
+            return Failed;
         }
         m_pDb = pDb;
         m_pUndo = pUndo.release();
@@ -96,10 +101,10 @@ Status Transaction::Commit() {
             StatusCode::kMisuse, What, "a failure has undone it, or a statement has ended it");
         return vornjsondb::Amended(Gone, Retry::kTransaction, "");
     }
-    int nResult = RunOnce(m_pEnd);
+    int nResult = vornjsondb::RunEnd(m_pEnd);
     vornjsondb::Patience Left(m_nWaitMs);
     while (nResult == SQLITE_BUSY && Left.Wait()) {
-        nResult = RunOnce(m_pEnd);
+        nResult = vornjsondb::RunEnd(m_pEnd);
     }
     if (nResult == SQLITE_OK) {
         Close();

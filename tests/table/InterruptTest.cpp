@@ -46,7 +46,23 @@ class InterruptTest : public TableTest {
         return m_Table.Save(Parse(R"({"id": 1, "name": "b"})"), eOnDuplicate, &jStored);
     }
 
+    // Calls fnDo again and again, and has it interrupted by a progress handler at its first call,
+    // at its second and so on, until it ends before. fnAfter looks at how each ended.
+    void InterruptEach(const std::function<void()>& fnBefore, const std::function<Status()>& fnDo,
+                       const std::function<void(const Status&)>& fnAfter) {
+        for (int nAt = 1, nLeft = 0; nLeft <= 0; ++nAt) {
+            fnBefore();
+            nLeft = nAt;
+            sqlite3_progress_handler(m_pDb, 1, Count, &nLeft);
+            const Status Outcome = fnDo();
+            sqlite3_progress_handler(m_pDb, 0, nullptr, nullptr);
+            fnAfter(Outcome);
+        }
+    }
+
   private:
+    static int Count(void* pnLeft) { return --*static_cast<int*>(pnLeft) == 0 ? 1 : 0; }
+
     static int Trace(unsigned, void* pTest, void*, void* pSql) {
         auto* const pThis = static_cast<InterruptTest*>(pTest);
         if (std::strncmp(static_cast<const char*>(pSql), pThis->m_szAt,
@@ -107,6 +123,38 @@ TEST_F(InterruptTest, RollbackThatIsInterruptedUndoesAll) {
                   "undone");
         EXPECT_EQ(Ids(), "1|a");
     }
+}
+
+// A progress handler is asked once more when a statement is done.
+TEST_F(InterruptTest, WhatIsToldIsTrueWhereverAProgressHandlerStopsIt) {
+    Transaction All;
+    const auto fnReset = [this] { Run("UPDATE task SET name = 'a'"); };
+    const auto fnBegin = [&] {
+        fnReset();
+        EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
+        Run("UPDATE task SET name = 'b'");
+    };
+    const auto fnLook = [&](const Status& Outcome) {
+        EXPECT_EQ(All.IsOpen() && Outcome.Ok(), false);
+        if (All.IsOpen()) {
+            EXPECT_EQ(Text(All.Rollback()), "ok");
+        }
+        EXPECT_EQ(Ids(), Outcome.Ok() ? "1|b" : "1|a") << Text(Outcome);
+    };
+    InterruptEach(
+        fnReset, [this] { return SaveOne(OnDuplicate::kReplace); }, fnLook);
+    InterruptEach(
+        fnBegin, [&] { return All.Commit(); }, fnLook);
+    InterruptEach(
+        fnBegin, [&] { return All.Rollback(); },
+        [this](const Status&) { EXPECT_EQ(Ids(), "1|a"); });
+    InterruptEach([] {}, [&] { return All.Begin(m_pDb); },
+                  [&](const Status& Outcome) {
+                      EXPECT_EQ(All.IsOpen(), Outcome.Ok());
+                      EXPECT_EQ(sqlite3_get_autocommit(m_pDb) == 0, Outcome.Ok());
+                      Run(Outcome.Ok() ? "ROLLBACK" : "SELECT 1");
+                      All.Rollback().Ignore();
+                  });
 }
 
 TEST_F(InterruptTest, LoadIsUndone) {
