@@ -385,7 +385,8 @@ void Import::CommitBatch() {
     int nMoved = 0;
     sqlite3_file_control(m_pDb.get(), "main", SQLITE_FCNTL_HAS_MOVED, &nMoved);
     if (nMoved != 0) {
-        Fail(kExitIo, m_Call.Db() + ": it was moved or replaced since it was opened; try again");
+        Fail(kExitIo,
+             m_Call.Db() + ": another program has removed or replaced the file; try again");
     }
     Check(m_Into.Commit(), m_Call.Db());
     Check(m_All.Commit(), m_Call.Db());

@@ -218,7 +218,7 @@ exec 3>&-
 wait "$pid"
 same 'exit where the database was replaced' $? 7
 same 'a database that was replaced' "$(cat err)" \
-    'error: moved.db: it was moved or replaced since it was opened; try again (nothing is stored)'
+    'error: moved.db: another program has removed or replaced the file; try again (nothing is stored)'
 
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go
