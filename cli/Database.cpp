@@ -1,6 +1,7 @@
 #include "Database.h"
 
 #include <fcntl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -59,6 +60,21 @@ std::string FileOf(sqlite3* pDb) {
         strLine += " (waited " + ColumnText(pWaited.get(), 0) + " ms)";
     }
     Fail(ExitOf(eCode), strLine + HintFor(eCode));
+}
+
+bool IsEmpty(const std::string& strFile) {
+    struct stat Now {};
+    return stat(strFile.c_str(), &Now) == 0 && Now.st_size == 0;
+}
+
+// Under a lock that nobody has beside it: another program may be about to store something.
+void RemoveEmpty(sqlite3* pDb, const std::string& strFile) {
+    sqlite3_busy_timeout(pDb, 0);
+    if (IsEmpty(strFile) &&
+        sqlite3_exec(pDb, "BEGIN EXCLUSIVE", nullptr, nullptr, nullptr) == SQLITE_OK &&
+        IsEmpty(strFile)) {
+        unlink(strFile.c_str());
+    }
 }
 
 void CheckFile(const std::string& strFile, Access eAccess) {
@@ -123,13 +139,21 @@ void GoByColumns(const Json::Value& jColumns, Json::Value& jTable) {
 
 }  // namespace
 
+void CloseDatabase::operator()(sqlite3* pDb) const {
+    if (!strMade.empty()) {
+        RemoveEmpty(pDb, strMade);
+    }
+    sqlite3_close_v2(pDb);
+}
+
 Database OpenDatabase(const Context& Call, Access eAccess) {
     const std::string& strFile = Call.Db();
     CheckFile(strFile, eAccess);
+    const bool blNew = access(strFile.c_str(), F_OK) != 0;
     sqlite3* pDb = nullptr;
     const int nResult =
         sqlite3_open_v2(strFile.c_str(), &pDb, kFlags[static_cast<int>(eAccess)], nullptr);
-    Database pOwner(pDb);
+    Database pOwner(pDb, CloseDatabase{blNew ? strFile : ""});
     if (nResult != SQLITE_OK) {
         Fail(kExitIo, strFile + ": " + sqlite3_errstr(nResult) + "; is it a file?");
     }
@@ -147,6 +171,17 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
         FailBySqlite(pDb, strFile);
     }
     return pOwner;
+}
+
+// Another call may have removed the file that it made in vain while this one had it open.
+void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
+    const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, Call.WaitMs());
+    int nMoved = 0;
+    sqlite3_file_control(pDb, nullptr, SQLITE_FCNTL_HAS_MOVED, &nMoved);
+    if (nMoved != 0) {
+        Fail(kExitIo, Call.Db() + ": another program has removed or replaced the file; try again");
+    }
+    Check(Begun, Call.Db());
 }
 
 std::string ReadFile(const std::string& strFile) {

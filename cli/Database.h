@@ -14,12 +14,17 @@ namespace VORN_JSON_DB::Cli {
 enum class Access { kRead, kChange, kCreate };  // kCreate makes the file, if there is none
 
 struct CloseDatabase {
-    void operator()(sqlite3* pDb) const { sqlite3_close_v2(pDb); }
+    std::string strMade;  // the file, if this call has made it: left empty, it goes again
+
+    void operator()(sqlite3* pDb) const;
 };
 using Database = std::unique_ptr<sqlite3, CloseDatabase>;
 
 // Opens Call.Db(). A file that is missing, no database or not readable is an Error at once.
 Database OpenDatabase(const Context& Call, Access eAccess);
+
+// Begins what changes the database, which lives until All ends.
+void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All);
 
 // Reads a whole file, "-" being standard input.
 std::string ReadFile(const std::string& strFile);

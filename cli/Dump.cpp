@@ -359,7 +359,7 @@ int RunLoad(Context& Call) {
     const std::string strTable = jHeader["table"].asString();
     const Database pDb = OpenDatabase(Call, Access::kCreate);
     Transaction All;
-    Check(All.Begin(pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    BeginChange(Call, pDb.get(), All);
     if (TableExists(pDb.get(), strTable)) {
         Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + strTable +
                                  "\" already; load into another database");

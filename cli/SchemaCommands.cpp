@@ -68,8 +68,9 @@ std::vector<std::string> CreateStatements(sqlite3* pDb, const std::string& strTa
     return vecStatements;
 }
 
-// "size:int", with --key, --not-null, --unique and --default beside it.
-Json::Value DefinitionFromWords(const Context& Call) {
+// Of "size:int" words, whose names go to vecNames, with --key, --not-null, --unique and --default
+// beside it.
+Json::Value DefinitionFromWords(const Context& Call, std::vector<std::string>& vecNames) {
     Json::Value jTable(Json::objectValue);
     Json::Value& jMembers = jTable["member"] = Json::Value(Json::objectValue);
     for (const std::string& strWord : Call.WordsFrom(2)) {
@@ -82,6 +83,7 @@ Json::Value DefinitionFromWords(const Context& Call) {
             Fail(kExitUsage, "the member \"" + strName + "\" is there twice; name it once");
         }
         jMembers[strName]["cpptype"] = strWord.substr(nColon + 1);
+        vecNames.push_back(strName);
     }
     const auto Member = [&jMembers](const char* szOption,
                                     const std::string& strName) -> Json::Value& {
@@ -185,13 +187,15 @@ int RunInit(Context& Call) {
     }
     CheckNewName(Call.TableName());
     Json::Value jDefinition;
+    std::vector<std::string> vecColumns;
     if (!blFile) {
-        jDefinition = DefinitionFromWords(Call);
+        jDefinition = DefinitionFromWords(Call, vecColumns);
     } else {
         jDefinition = KnownDefinition(Call, nullptr, Call.TableName());
     }
     std::string strSql;
-    Check(CreateStatement(Call.TableName(), jDefinition, strSql), Call.Db(), kExitBadData);
+    Check(CreateStatement(Call.TableName(), jDefinition, strSql, vecColumns), Call.Db(),
+          kExitBadData);
     CheckDefaults(Call.TableName(), jDefinition);
     if (Call.Has("--dry-run")) {
         Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
@@ -199,7 +203,7 @@ int RunInit(Context& Call) {
     }
     const Database pDb = OpenDatabase(Call, Access::kCreate);
     Transaction All;
-    Check(All.Begin(pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    BeginChange(Call, pDb.get(), All);
     if (TableExists(pDb.get(), Call.TableName())) {
         Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + Call.TableName() +
                                  "\" already; extend it with vornjsondb sync");
@@ -304,7 +308,7 @@ int RunSync(Context& Call) {
     SyncReport Done;
     Transaction All;
     if (!blLook) {
-        Check(All.Begin(Open.pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+        BeginChange(Call, Open.pDb.get(), All);
     }
     Check(Open.Records.Sync(blLook ? SyncMode::kLook : SyncMode::kChange, Done), Call.Db(),
           kExitBadData);

@@ -51,7 +51,7 @@ template <typename Change>
 std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std::string>& vecKeys,
                      const Change& fnChange) {
     Transaction All;
-    Check(All.Begin(Open.pDb.get(), Transaction::Mode::kImmediate, Call.WaitMs()), Call.Db());
+    BeginChange(Call, Open.pDb.get(), All);
     std::int64_t nRecords = 0;
     std::set<Json::Value> setDone;  // a record whose key is given twice is one record
     for (const std::string& strKey : vecKeys) {
@@ -81,6 +81,19 @@ void SplitWords(const Context& Call, std::vector<std::string>& vecKeys,
     }
 }
 
+// Bytes, as list shows and insert takes them, would become a text.
+void CheckNoBytes(const Table& Of, const Json::Value& jMembers) {
+    const Json::Value& jTypes = Of.Definition()[Of.Name()]["member"];
+    for (auto itMember = jMembers.begin(); itMember != jMembers.end(); ++itMember) {
+        if (itMember->isObject() && itMember->isMember("$base64") &&
+            jTypes[itMember.name()]["cpptype"] == "any") {
+            Fail(kExitUsage, "member \"" + itMember.name() +
+                                 "\": bytes are written by insert alone; give it the record on "
+                                 "standard input, with --upsert");
+        }
+    }
+}
+
 }  // namespace
 
 int RunUpdate(Context& Call) {
@@ -95,6 +108,7 @@ int RunUpdate(Context& Call) {
     }
     OpenTable Open(Call, Access::kChange);
     const Json::Value jMembers = ParseAssignments(Open.Records, vecAssignments);
+    CheckNoBytes(Open.Records, jMembers);
     const auto Change = [&](const Query& Which, std::int64_t& nRows) {
         return Counted(Open, Which, nRows,
                        [&] { return Open.Records.Update(Which, jMembers, &nRows); });
@@ -142,6 +156,7 @@ int RunUpsert(Context& Call) {
     } else {
         jRecord = ParseAssignments(Open.Records, Call.WordsFrom(2));
     }
+    CheckNoBytes(Open.Records, jRecord);
     Written eWritten{};
     Check(Open.Records.Save(jRecord, OnDuplicate::kUpsert, nullptr, &eWritten), Call.Db(),
           kExitBadData);

@@ -517,9 +517,11 @@ class Transaction {
 
 // 9  Definitions
 
-// The CREATE TABLE statement that Options::blCreateTable runs.
+// The CREATE TABLE statement that Options::blCreateTable runs. Its columns are in byte order, but
+// for the members of vecFirst, which come first and in that order; what else is in there is
+// ignored.
 Status CreateStatement(const std::string& strTable, const Json::Value& jDefinition,
-                       std::string& strSql);
+                       std::string& strSql, const std::vector<std::string>& vecFirst = {});
 
 // A definition that fits the columns of a real table or view.
 Status DefinitionOf(sqlite3* pDb, const std::string& strTable, Json::Value& jDefinition);

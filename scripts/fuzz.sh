@@ -124,24 +124,25 @@ run_target() {
 }
 
 # figures TARGET FINDINGS LOG prints: target, seconds, runs, runs a second, runs a second of processor
-# time, edges, findings.
+# time, edges, findings, date.
 figures() {
-    awk -v target="$1" -v findings="$2" '
+    awk -v target="$1" -v findings="$2" -v date="$(date +%F)" '
         FILENAME ~ /time$/ { seconds = $1; busy = $2 + $3; next }
         /^#[0-9]+\t/ { runs = substr($1, 2) }
         / cov: / { for (i = 1; i < NF; ++i) if ($i == "cov:") edges = $(i + 1) }
         function rate(time) { return time > 0 ? runs / time : 0 }
-        END { printf "%s %d %d %d %d %d %d\n", target, seconds, runs, rate(seconds), rate(busy), edges, findings }
+        END {
+            printf "%s %d %d %d %d %d %d %s\n", target, seconds, runs, rate(seconds), rate(busy), edges, findings, date
+        }
     ' "$3.time" "$3"
 }
 
-# A table of all figures, for the documentation.
+# A table of all figures, for the documentation: those of each target's last run.
 report() {
-    printf '%s, %d targets at a time\n\n' "$(date +%F)" "$jobs"
-    printf '| target | seconds | runs | a second | a second of processor time | edges | findings |\n'
-    printf '|---|--:|--:|--:|--:|--:|--:|\n'
+    printf '| target | date | seconds | runs | a second | a second of processor time | edges | findings |\n'
+    printf '|---|---|--:|--:|--:|--:|--:|--:|\n'
     (cd "$folder/figures" && cat "${all_targets[@]}") |
-        awk '{ printf "| %s | %d | %d | %d | %d | %d | %d |\n", $1, $2, $3, $4, $5, $6, $7 }'
+        awk '{ printf "| %s | %s | %d | %d | %d | %d | %d | %d |\n", $1, $8, $2, $3, $4, $5, $6, $7 }'
 }
 
 # The folders whose sources all targets share, and the command's readers, which know nothing of the command.

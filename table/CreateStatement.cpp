@@ -5,6 +5,7 @@
 #include <VornJsonDbTable.h>
 
 #include <string_view>
+#include <vector>
 
 #include "../src/base/JsonText.h"
 #include "Concat.h"
@@ -28,6 +29,24 @@ const char* DeclaredType(BoundKind eKind) {
         default:
             return " TEXT";
     }
+}
+
+std::vector<size_t> ColumnOrder(const Members& Of, const std::vector<std::string>& vecFirst) {
+    std::vector<size_t> vecOrder;
+    std::vector<bool> vecTaken(Of.Size());
+    const auto fnTake = [&](size_t nMember) {
+        if (nMember < vecTaken.size() && !vecTaken[nMember]) {
+            vecTaken[nMember] = true;
+            vecOrder.push_back(nMember);
+        }
+    };
+    for (const std::string& strName : vecFirst) {
+        fnTake(Of.Find(strName));
+    }
+    for (size_t nMember = 0; nMember < Of.Size(); ++nMember) {
+        fnTake(nMember);
+    }
+    return vecOrder;
 }
 
 }  // namespace
@@ -66,10 +85,11 @@ std::string ColumnClause(const Member& Declared, bool blNotNull) {
                    DefaultClause(Declared)});
 }
 
-std::string CreateTableSql(const Members& Of) {
+std::string CreateTableSql(const Members& Of, const std::vector<std::string>& vecFirst) {
     std::string strSql = Concat({"CREATE TABLE IF NOT EXISTS ", Of.QuotedTable(), " ("});
     const char* szBefore = "";
-    for (const Member& Declared : Of.All()) {
+    for (const size_t nMember : ColumnOrder(Of, vecFirst)) {
+        const Member& Declared = Of.At(nMember);
         const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
         Append(strSql, {szBefore,
@@ -96,11 +116,11 @@ std::string CreateTableSql(const Members& Of) {
 namespace VORN_JSON_DB {
 
 Status CreateStatement(const std::string& strTable, const Json::Value& jDefinition,
-                       std::string& strSql) {
+                       std::string& strSql, const std::vector<std::string>& vecFirst) {
     FindingList vecFindings;
     const vornjsondb::Members Of(strTable, jDefinition, vecFindings);
     if (!vornjsondb::HasError(vecFindings)) {
-        strSql = vornjsondb::CreateTableSql(Of);
+        strSql = vornjsondb::CreateTableSql(Of, vecFirst);
     }
     return vornjsondb::FromFindings(std::move(vecFindings), {"make a statement for", &strTable});
 }

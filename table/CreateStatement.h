@@ -2,12 +2,14 @@
 #define VORN_TABLE_CREATE_STATEMENT_H
 
 #include <string>
+#include <vector>
 
 #include "Members.h"
 
 namespace vornjsondb {
 
-std::string CreateTableSql(const Members& Of);
+// The members of vecFirst, each once, are the first columns.
+std::string CreateTableSql(const Members& Of, const std::vector<std::string>& vecFirst);
 
 // One column as CREATE TABLE and ALTER TABLE declare it: name, type, NOT NULL, default.
 std::string ColumnClause(const Member& Declared, bool blNotNull);

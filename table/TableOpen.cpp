@@ -82,7 +82,7 @@ Status Table::Parts::Meet() {
     const bool blCreate = How.blCreateTable || !How.strSqlCreate.empty();
     if (nResult == SQLITE_OK && Real.vecColumns.empty() && blCreate) {
         if (How.strSqlCreate.empty()) {
-            How.strSqlCreate = vornjsondb::CreateTableSql(Of);
+            How.strSqlCreate = vornjsondb::CreateTableSql(Of, {});
         }
         Outcome = RunWhole(*this, How.strSqlCreate, What);
         if (!Outcome.Ok()) {

@@ -72,6 +72,10 @@ size_t Columns(std::string_view strText, char cDelimiter) {
 }
 
 char GuessDelimiter(std::string_view strText) {
+    // Spreadsheets may say it in a line of its own.
+    if (strText.substr(0, 4) == "sep=" && strText.find_first_of("\r\n") == 5) {
+        return strText[4];
+    }
     size_t nMost = 1;
     char cBest = ',';
     for (const char* p = kDelimiters; *p != '\0'; ++p) {

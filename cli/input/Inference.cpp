@@ -127,6 +127,15 @@ Json::Value Inference::Members() const {
     return jMembers;
 }
 
+std::vector<std::string> Inference::Names() const {
+    std::vector<std::string> vecNames;
+    vecNames.reserve(m_vecSeen.size());
+    for (const Seen& Each : m_vecSeen) {
+        vecNames.push_back(Each.strName);
+    }
+    return vecNames;
+}
+
 std::vector<std::string> Inference::Notes() const {
     std::vector<std::string> vecNotes;
     for (const Seen& Each : m_vecSeen) {

@@ -30,6 +30,9 @@ class Inference : public Sink {
     // As "member" of a definition has them: {"id": {"cpptype": "long long"}}.
     Json::Value Members() const;
 
+    // In the order in which they were first seen.
+    std::vector<std::string> Names() const;
+
     // What a person should know of the choice, a line each.
     std::vector<std::string> Notes() const;
 

@@ -1,6 +1,5 @@
 #include "Insert.h"
 
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -64,10 +63,10 @@ class Import {
 
   private:
     void OpenFile();
-    void RemoveNewFile();
     void FindDefinition();
     void LearnTypes();
     Options Settings() const;
+    std::string CreateSql() const;
     std::vector<std::string> Statements();
     int ShowDryRun();
     void CheckColumns() const;
@@ -75,7 +74,6 @@ class Import {
     void CheckKey();
     void Load();
     bool AfterRecord();
-    void Begin();
     void CommitBatch();
     void NoteNulls();
     void Keep();
@@ -89,13 +87,13 @@ class Import {
     InputFiles m_Files;
     const std::string m_strTable;
     Database m_pDb;
-    bool m_blNewFile = false;
     bool m_blTableThere = false;
     bool m_blKept = false;    // the database keeps the definition, or will
     bool m_blToKeep = false;  // it is not there yet as it is
     bool m_blAdded = false;   // the table lacks members of the definition
     Json::Value m_jDefinition;
     Json::Value m_jOwnKey;  // of the definition, where --key gives another for this call
+    std::vector<std::string> m_vecColumns;  // of a table that is made: as the records have them
     std::vector<std::string> m_vecNotes;
     std::int64_t m_nBatch = 0;
     std::int64_t m_nStored = 0;  // records that a commit has dealt with
@@ -118,22 +116,10 @@ int Import::Run() {
         return Finish();
     } catch (Error& Failed) {
         m_pProgress.reset();
-        RemoveNewFile();
         if (!m_How.blDryRun) {
             Failed.strLine += WhatIsStored();
         }
         throw;
-    }
-}
-
-// Of a database that this call made and stored nothing in. Another program may have done so since.
-void Import::RemoveNewFile() {
-    if (m_All.IsOpen()) {
-        m_All.Rollback().Ignore();
-    }
-    struct stat Now {};
-    if (m_blNewFile && m_nStored == 0 && stat(m_Call.Db().c_str(), &Now) == 0 && Now.st_size == 0) {
-        unlink(m_Call.Db().c_str());
     }
 }
 
@@ -150,8 +136,7 @@ void Import::StopForInterrupt() {
 
 // What only looks makes no file.
 void Import::OpenFile() {
-    m_blNewFile = access(m_Call.Db().c_str(), F_OK) != 0;
-    if (m_How.blDryRun && m_blNewFile) {
+    if (m_How.blDryRun && access(m_Call.Db().c_str(), F_OK) != 0) {
         sqlite3* pDb = nullptr;
         sqlite3_open(":memory:", &pDb);
         m_pDb.reset(pDb);
@@ -214,6 +199,7 @@ void Import::LearnTypes() {
         Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
     }
     m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    m_vecColumns = Seen.Names();
     CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
@@ -231,12 +217,17 @@ void Import::CheckColumns() const {
     }
 }
 
+std::string Import::CreateSql() const {
+    std::string strSql;
+    Check(CreateStatement(m_strTable, m_jDefinition, strSql, m_vecColumns), m_Call.Db(),
+          kExitBadData);
+    return strSql;
+}
+
 // What would make the table, or extend the one that is there.
 std::vector<std::string> Import::Statements() {
-    std::string strSql;
     if (!m_blTableThere) {
-        Check(CreateStatement(m_strTable, m_jDefinition, strSql), m_strTable, kExitBadData);
-        return {strSql};
+        return {CreateSql()};
     }
     SyncReport Report;
     if (m_blAdded) {
@@ -273,25 +264,23 @@ int Import::ShowDryRun() {
     return kExitFine;
 }
 
-void Import::Begin() {
-    Check(m_All.Begin(m_pDb.get(), Transaction::Mode::kImmediate, m_Call.WaitMs()), m_Call.Db());
-}
-
 Options Import::Settings() const {
     Options How;
     How.blCompatible = false;
-    How.blCreateTable = true;
     How.nWaitMs = m_Call.WaitMs();
     return How;
 }
 
 // The table, its definition and the first records come to be at once.
 void Import::Prepare() {
-    const Options How = Settings();
-    Begin();
+    Options How = Settings();
+    BeginChange(m_Call, m_pDb.get(), m_All);
     if (!m_blTableThere && TableExists(m_pDb.get(), m_strTable)) {
         Fail(kExitDuplicate, m_Call.Db() + ": another program has just made the table \"" +
                                  m_strTable + "\"; try again, into that table");
+    }
+    if (!m_blTableThere) {
+        How.strSqlCreate = CreateSql();
     }
     // The names come from the records.
     Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db(), kExitBadData);
@@ -375,7 +364,7 @@ bool Import::AfterRecord() {
     m_pProgress->Tick(nRecords, m_Files.BytesRead());
     if (m_nBatch > 0 && nRecords - m_nStored >= m_nBatch) {
         CommitBatch();
-        Begin();
+        BeginChange(m_Call, m_pDb.get(), m_All);
     }
     return !Interrupt::Came();
 }

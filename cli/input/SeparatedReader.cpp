@@ -64,6 +64,7 @@ class SeparatedReader {
     void Fail(std::int64_t nLine, std::string strReason);
     void Cell(const char* pCell, size_t nCell);
     void Row();
+    bool IsDelimiterLine() const;
     void Header();
     void Name(const std::string& strName);
     void Blame(std::string strReason);
@@ -154,6 +155,12 @@ void SeparatedReader::Cell(const char* pCell, size_t nCell) {
     m_To.Take(nColumn, Given);
 }
 
+// "sep=;", with which a spreadsheet is told the delimiter.
+bool SeparatedReader::IsDelimiterLine() const {
+    return m_nRowLine == 1 && m_vecNames.size() == 2 && m_vecNames[0] == "sep=" &&
+           m_vecNames[1].empty();
+}
+
 void SeparatedReader::Header() {
     std::vector<std::string> vecNames;
     vecNames.swap(m_vecNames);
@@ -182,6 +189,10 @@ void SeparatedReader::Header() {
 void SeparatedReader::Row() {
     const size_t nCells = std::exchange(m_nCell, 0);
     const bool blHeader = !m_blHeaderRead && m_How.blHeader;
+    if (blHeader && IsDelimiterLine()) {
+        m_vecNames.clear();
+        return;
+    }
     m_blHeaderRead = true;
     if (blHeader) {
         Header();

@@ -6,7 +6,7 @@ make_shop
 # The columns count, with what is kept of them.
 sqlite3 shop.db 'ALTER TABLE product RENAME COLUMN name TO label; ALTER TABLE product DROP COLUMN price;
     ALTER TABLE product ADD COLUMN size INTEGER DEFAULT 5'
-expect 0 '{"id":1,"label":"tea, \"green\"","on":true,"tags":["a","b"],"size":5}' '' -- get shop.db product 1
+expect 0 '{"id":1,"label":"tea, \"green\"","tags":["a","b"],"on":true,"size":5}' '' -- get shop.db product 1
 expect 0 '' 'updated 1 record' -- upsert shop.db product id=1 size=6
 echo '[{"id": 8, "label": "new", "size": 7}]' >new.json
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (new.json: JSON)' -- insert shop.db product new.json
@@ -30,7 +30,7 @@ expect 0 '{"code":"7","x":8}' '' -- get shop.db product 7
 make_shop 2>/dev/null
 rm shop.db
 make_shop
-expect 0 '{"id":1,"name":"tea, \"green\"","on":true,"price":5.0,"tags":["a","b"]}' '' -- get shop.db PRODUCT 1
+expect 0 '{"id":1,"name":"tea, \"green\"","price":5.0,"tags":["a","b"],"on":true}' '' -- get shop.db PRODUCT 1
 echo '{"id": 9, "name": "x", "more": [1]}' >more.json
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (more.json: JSON)' -- \
     insert shop.db Product more.json --add-members

@@ -159,14 +159,14 @@ done
 expect 0 1 '' -- count names.db "$table" --where '{"-f": 8}'
 expect 0 '' 'updated 1 record' -- update names.db "$table" --where '{"%s": 11}' 'c"d=20' x=y=-7
 expect 0 '[{"c\"d":20,"x=y":-7,"-f":8}]' '' -- list names.db "$table" --members 'c"d,x=y,-f'
-expect 0 '"","
-", ,%s,-f,NULL,[0],a b,a.b,a:b,"c""d",it'\''s,rowid,select,x=y,"ü,b"
-12,9,13,11,8,16,6,1,5,15,20,4,14,3,-7,10' '' -- list names.db "$table" --format csv
-case_error='error: bad.db: cannot open table "t": "a" is another member'\''s column: letter case makes no difference; give one of the two another name (nothing is stored)'
+expect 0 'a b,"c""d",select,it'\''s,a.b,[0],x=y,-f,"
+","ü,b",%s,"", ,rowid,a:b,NULL
+1,20,3,4,5,6,-7,8,9,10,11,12,13,14,15,16' '' -- list names.db "$table" --format csv
+case_error='error: bad.db: cannot make a statement for table "t": "a" is another member'\''s column: letter case makes no difference; give one of the two another name (nothing is stored)'
 printf '[{"a": 1, "A": 2}]' >in
 expect 3 '' "$case_error" -- insert bad.db t in
 printf '[{"$x": 1}]' >in
-expect 3 '' 'error: bad.db: cannot open table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def (nothing is stored)' \
+expect 3 '' 'error: bad.db: cannot make a statement for table "t": "$x" cannot be a member: it begins with $ or holds a NUL byte; rename it, or give a definition without it by --def (nothing is stored)' \
     -- insert bad.db t in
 
 # Bad records are left out and kept where that is asked for.

@@ -7,7 +7,7 @@ expect 0 'table    records
 -------  -------
 product        3' '' -- tables shop.db --counts
 expect 0 '[{"table":"product"}]' '' -- tables shop.db --json
-expect 0 'CREATE TABLE "product" ("id" INTEGER PRIMARY KEY, "name" TEXT NOT NULL, "on" INTEGER, "price" REAL DEFAULT 0.5, "tags" TEXT);' \
+expect 0 'CREATE TABLE "product" ("id" INTEGER PRIMARY KEY, "name" TEXT NOT NULL, "price" REAL DEFAULT 0.5, "tags" TEXT, "on" INTEGER);' \
     '' -- schema shop.db product
 expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
     index shop.db product name
@@ -66,6 +66,7 @@ odd' '' -- tables wide.db
 expect 0 '' 'loaded 1 row into table "single"' -- load other.db single.dump
 head -n 2 dump >cut
 expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
+same 'no file is left' "$(ls third.db 2>/dev/null)" ''
 sed 's/,1\.0\]/,2.0]/' dump >changed
 expect 3 '' 'error: changed:8: count or checksum differ from what is above; dump the table again' -- \
     load fourth.db changed

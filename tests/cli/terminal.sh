@@ -9,11 +9,11 @@ on_terminal() {
     script -qec "stty cols $1; $2" /dev/null </dev/null | tr -d '\r'
 }
 same 'cut at 30 columns' "$(on_terminal 30 "NO_COLOR=1 '$VORNJSONDB' list shop.db product")" \
-'id  name   on    price  tags
---  -----  ----  -----  -----
--3  漢字           0.5
- 1  漢字…  true    5.0  ["a"…
- 2  a\tb…          0.1'
+'id  name   price  tags   on
+--  -----  -----  -----  ----
+-3  漢字     0.5
+ 1  漢字…    5.0  ["a"…  true
+ 2  a\tb…    0.1'
 same 'a bold header' "$(on_terminal 80 "'$VORNJSONDB' tables shop.db" | head -n 1)" \
     $'\e[1mtable'
 same 'a red error' "$(on_terminal 80 "'$VORNJSONDB' lst")" \

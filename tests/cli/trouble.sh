@@ -220,6 +220,44 @@ same 'exit where the database was replaced' $? 7
 same 'a database that was replaced' "$(cat err)" \
     'error: moved.db: another program has removed or replaced the file; try again (nothing is stored)'
 
+# What a failed call made is not removed while another program is about to store something there, and
+# nothing is stored in a file that is gone.
+begin_insert() {
+    exec 3>&-
+    "$VORNJSONDB" insert "$1" t slow --key id 2>err &
+    pid=$!
+    exec 3>slow
+    echo '[{"id": 1}' >&3
+    until [[ -e $1 ]]; do sleep 0.01; done
+}
+begin_insert held.db
+mkfifo hold
+# Neither may keep the input open.
+{
+    echo 'BEGIN IMMEDIATE; SELECT 1;'
+    cat hold
+} 3>&- | sqlite3 held.db >ready 3>&- &
+until [[ -s ready ]]; do sleep 0.01; done
+exec 3>&-
+wait "$pid"
+same 'exit of the first' $? 3
+same 'the file' "$(ls held.db)" held.db
+echo 'CREATE TABLE kept (a); COMMIT;' >hold
+wait
+same 'what the other stored' "$(sqlite3 held.db .tables)" kept
+for instead in '' ': >gone.db'; do
+    begin_insert gone.db
+    rm gone.db
+    eval "$instead"
+    echo ']' >&3
+    exec 3>&-
+    wait "$pid"
+    same 'exit without the file' $? 7
+    same 'what is said' "$(cat err)" \
+        'error: gone.db: another program has removed or replaced the file; try again (nothing is stored)'
+    rm -f gone.db
+done
+
 # What waits for a lock says how long, and a reader need not wait.
 mkfifo go
 (

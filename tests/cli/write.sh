@@ -56,6 +56,17 @@ expect 0 '' 'deleted 1 record' -- delete own.db v --where '{"id": 1}'
 expect 0 '' 'deleted 2 records' -- delete own.db v --all --yes
 expect 0 0 '' -- count own.db t
 
+# Bytes go in by insert alone; elsewhere they would become a text.
+sqlite3 shop.db "CREATE TABLE file (id INTEGER PRIMARY KEY, bytes BLOB, note TEXT); INSERT INTO file VALUES (1, x'00ff', NULL)"
+bytes='{"$base64":true,"encoded":"AQI="}'
+said='error: member "bytes": bytes are written by insert alone; give it the record on standard input, with --upsert'
+expect 2 '' "$said" -- update shop.db file 1 "bytes=$bytes"
+expect 2 '' "$said" -- upsert shop.db file "{\"id\": 1, \"bytes\": $bytes}"
+expect 0 '' 'updated 1 record' -- update shop.db file 1 "note=$bytes"
+echo "{\"id\": 1, \"bytes\": $bytes}" >file.json
+expect 0 '' '0 inserted, 1 replaced, 0 skipped, 0 failed (file.json: JSON)' -- insert shop.db file file.json --upsert
+same 'the bytes' "$(sqlite3 shop.db 'SELECT hex(bytes), note FROM file')" "0102|$bytes"
+
 # A key that is given twice is one record, and a default that does not fit is no default.
 expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
 expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x

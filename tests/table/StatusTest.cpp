@@ -1,3 +1,5 @@
+#include <cerrno>
+
 #include "../../table/Failure.h"
 #include "../../table/FindingCodes.h"
 #include "../../table/Nearest.h"
@@ -19,6 +21,34 @@ TEST(StatusTest, SuccessHoldsNothing) {
     EXPECT_EQ(0, Fine.SqliteCode());
     EXPECT_EQ(0, Fine.SystemError());
     EXPECT_EQ(Retry::kNever, Fine.Advice());
+}
+
+TEST(StatusTest, AFailureThatIsToldAnewKeepsAllElse) {
+    auto pDetails = std::make_shared<Status::Details>();
+    pDetails->eCode = StatusCode::kIoError;
+    pDetails->eRetry = Retry::kCall;
+    pDetails->nSqliteCode = SQLITE_IOERR_WRITE;
+    pDetails->nSystemError = ENOSPC;
+    pDetails->strMessage = "reason";
+    Report(pDetails->vecFindings, FindingCode::kRejected, "/a", "finding");
+    const Status Step(std::move(pDetails));
+    const std::string strTable = "t";
+    const struct {
+        Status Told;
+        Retry eRetry;
+        const char* szText;
+    } kCases[] = {
+        {vornjsondb::Within(Doing{"do", &strTable}, Step), Retry::kCall,
+         "io-error: cannot do table \"t\": reason [rejected /a]"},
+        {vornjsondb::Amended(Step, Retry::kTransaction, "; more"), Retry::kTransaction,
+         "io-error: reason; more [rejected /a]"},
+    };
+    for (const auto& Each : kCases) {
+        EXPECT_EQ(Each.szText, Text(Each.Told));
+        EXPECT_EQ(Each.eRetry, Each.Told.Advice());
+        EXPECT_EQ(SQLITE_IOERR_WRITE, Each.Told.SqliteCode());
+        EXPECT_EQ(ENOSPC, Each.Told.SystemError());
+    }
 }
 
 class SqliteFailure : public TableTest {

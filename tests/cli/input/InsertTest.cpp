@@ -114,7 +114,7 @@ constexpr char kTwo[] =
 TEST_F(Insert, ANewTableHasTheTypesOfAllRecords) {
     EXPECT_EQ(Run(kTwo, {"--key=id"}),
               "0 2 inserted, 0 replaced, 0 skipped, 0 failed (F: JSON Lines)\n");
-    EXPECT_EQ(Rows(), "1|1|'O'Neil %s'|1.5|'[1,\"x\"]';NULL|2|NULL|2.0|NULL");
+    EXPECT_EQ(Rows(), "1|'O'Neil %s'|'[1,\"x\"]'|1.5|1;2|NULL|NULL|2.0|NULL");
 }
 
 TEST_F(Insert, TheDefinitionIsKept) {

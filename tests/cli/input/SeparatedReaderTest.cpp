@@ -38,6 +38,17 @@ TEST(SeparatedReader, LinesAreCountedThroughQuotesAndBlankLines) {
     EXPECT_EQ(Csv("a\r1\r2\r"), "1@2: a='1'\n2@3: a='2'\n");
 }
 
+TEST(SeparatedReader, ALineThatTellsTheDelimiterIsNoHeader) {
+    EXPECT_EQ(ReadAll("\xEF\xBB\xBFsep=;\r\na;b\r\n1;2\r\n", Separated(';')), "1@3: a='1' b='2'\n");
+    const std::string strNoName =
+        ": column 2 has no name; --no-header is for input without names\n";
+    EXPECT_EQ(Csv("\nsep=,\na,b\n"), "failed in line 2" + strNoName);
+    EXPECT_EQ(Csv("sep=,\nsep=,\na,b\n"), "failed in line 2" + strNoName);
+    EXPECT_EQ(Csv("seq=,\na,b\n"), "failed in line 1" + strNoName);
+    EXPECT_EQ(Csv("sep=,b\n1,2\n"), "1@2: sep=='1' b='2'\n");
+    EXPECT_EQ(Csv("sep=\n1\n"), "1@2: sep=='1'\n");
+}
+
 TEST(SeparatedReader, TheMarkIsTakenOff) {
     EXPECT_EQ(Csv("\xEF\xBB\xBF\"a\",b\n1,2\n"), "1@2: a='1' b='2'\n");
     EXPECT_EQ(Csv("\xFE\xFF\0a"s),
@@ -156,6 +167,11 @@ TEST(GuessFormat, TheFirstBytesTell) {
         {"a;b;c\n\"1;\n2\";3;4\n", "CSV with ;"},
         {"one\n1\n2\n", "CSV"},
         {"a;b;c\n1;2\n", "CSV with ;"},
+        {"sep=;\r\na;b,c;d\n1;2,5;3\n", "CSV with ;"},
+        {"sep=|\na,b\n1,2\n", "CSV with |"},
+        {"sep=;a\n1,5;2\n", "CSV with ;"},
+        {"sep=,;\n1;2\n", "CSV with ;"},
+        {"sep=;", "CSV with ;"},
     };
     for (const Case& Each : aCases) {
         EXPECT_EQ(FormatText(GuessFormat(Each.szText)), Each.szFormat) << Each.szText;
