@@ -36,12 +36,12 @@ Status Counted(OpenTable& Open, const Query& Which, std::int64_t& nRecords,
                const Change& fnChange) {
     std::int64_t nFound = 0;
     if (IsView(Open)) {
-        const Status Looked = Open.Records.Count(Which, nFound);
+        Status Looked = Open.Records.Count(Which, nFound);
         if (!Looked.Ok()) {
             return Looked;
         }
     }
-    const Status Changed = fnChange();
+    Status Changed = fnChange();
     nRecords += nFound;
     return Changed;
 }

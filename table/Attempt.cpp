@@ -113,7 +113,6 @@ int Whole::Keep() {
 Whole::~Whole() {
     // mutate(exchanged): both only look.
     if (m_blOpen && sqlite3_get_autocommit(m_pDb) == 0) {
-        // mutate(doubled): a second time there is nothing to undo.
         const int nResult = Undo(m_Undo.Get(), m_Kept.Begin());
         // mutate(hoisted, sunk): after a ROLLBACK there is nothing to COMMIT, which is ignored.
         if (m_blSavepoint && nResult == SQLITE_OK) {

@@ -105,7 +105,7 @@ Status Loader::Parts::Fail(const Status& Outcome) {
 
 Status Loader::Parts::End(const Status& Outcome) {
     Ended = Outcome;
-    // mutate(true, hoisted, sunk): to roll back nothing fails, which is ignored.
+    // mutate(true, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
         const bool blThere = sqlite3_get_autocommit(Into.pDb) == 0;
         All.Rollback().Ignore();  // mutate(doubled): a second time there is nothing to undo.
@@ -193,8 +193,10 @@ Status Loader::EndRecord() {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    // mutate(doubled): the second time there is none.
-    m_pParts->TakeWrong(vecFindings);
+    if (m_pParts->nWrong > 0) {  // mutate(true): of none none is taken.
+        // mutate(doubled): the second time there is none.
+        m_pParts->TakeWrong(vecFindings);
+    }
     return m_pParts->EndRecord(vecFindings);
 }
 

@@ -91,7 +91,9 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     if (nResult == SQLITE_OK && !Out.vecColumns.empty()) {
         nResult = IsView(pDb, strTable, Out.blView);
         // Some builds of SQLite give views a rowid, which is NULL.
-        Out.strRowid = Out.blView ? "" : NameOfRowid(pDb, strTable, Out);
+        if (!Out.blView) {
+            Out.strRowid = NameOfRowid(pDb, strTable, Out);
+        }
     }
     return nResult;
 }

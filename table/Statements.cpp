@@ -106,7 +106,10 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
 }
 
 int Statements::KeepBegin() {
-    return m_pBegin ? SQLITE_OK : Prepare(m_pDb, "BEGIN IMMEDIATE", m_pBegin);
+    if (m_pBegin) {
+        return SQLITE_OK;
+    }
+    return Prepare(m_pDb, "BEGIN IMMEDIATE", m_pBegin);
 }
 
 void Statements::GiveBack(Statement& Lent) {

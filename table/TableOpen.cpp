@@ -106,7 +106,6 @@ Status Table::Parts::Meet() {
 }
 
 void Table::Parts::Learn(const RealTable& Real) {
-    // mutate(exchanged): in any order.
     strRowid = Real.strRowid;
     blView = Real.blView;
     if (Of.Key().empty()) {

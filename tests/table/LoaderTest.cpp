@@ -322,6 +322,12 @@ TEST_F(LoaderTest, TransactionThatATriggerOrTheCallerEndsEndsTheLoad) {
         "others",
         Add(Into, {R"({"id": 3})"}));
     EXPECT_EQ("", Stored());
+    Run("BEGIN");
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    EXPECT_EQ(
+        "constraint: cannot load record 1 into table \"task\": no two; the transaction is undone",
+        Add(Into, {R"({"id": 2})"}));
+    EXPECT_NE(0, sqlite3_get_autocommit(m_pDb));
 }
 
 TEST_F(LoaderTest, RecordsOfTheTableCanBeWrittenAndReadBetween) {
