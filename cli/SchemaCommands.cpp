@@ -1,5 +1,7 @@
 // What a database holds and how: tables, schema, init, index, explain, lint, sync.
 
+#include <algorithm>
+
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
@@ -279,6 +281,17 @@ int RunExplain(Context& Call) {
     return kExitFine;
 }
 
+namespace {
+
+int ExitBy(const Json::Value& jFindings) {
+    const bool blError =
+        std::any_of(jFindings.begin(), jFindings.end(),
+                    [](const Json::Value& jFinding) { return jFinding["severity"] == "error"; });
+    return blError ? kExitBadData : kExitFine;
+}
+
+}  // namespace
+
 int RunLint(Context& Call) {
     std::vector<std::string> vecTables = Call.WordsFrom(1);
     if (vecTables.empty()) {
@@ -290,16 +303,12 @@ int RunLint(Context& Call) {
         Call.vecWords.push_back(strTable);
         AppendFindings(FindingsOf(Call), strTable, jFindings);
     }
-    bool blError = false;
-    for (const Json::Value& jFinding : jFindings) {
-        blError = blError || jFinding["severity"] == "error";
-    }
     if (jFindings.empty() && !Call.Json()) {
         Call.Say("no findings");
     } else {
         WriteObjects(Call, jFindings, {"table", "severity", "code", "path", "message", "remedy"});
     }
-    return blError ? kExitBadData : kExitFine;
+    return ExitBy(jFindings);
 }
 
 int RunSync(Context& Call) {
@@ -318,13 +327,14 @@ int RunSync(Context& Call) {
         }
         Check(All.Commit(), Call.Db());
     }
+    Json::Value jDone;
+    jDone["statements"] = Strings(Done.vecStatements);
+    jDone["findings"] = Json::Value(Json::arrayValue);
+    AppendFindings(Done.vecFindings, Call.TableName(), jDone["findings"]);
+    const int nExit = ExitBy(jDone["findings"]);
     if (Call.Json()) {
-        Json::Value jDone;
-        jDone["statements"] = Strings(Done.vecStatements);
-        jDone["findings"] = Json::Value(Json::arrayValue);
-        AppendFindings(Done.vecFindings, Call.TableName(), jDone["findings"]);
         Put(CompactJson(jDone) + "\n");
-        return kExitFine;
+        return nExit;
     }
     for (const std::string& strStatement : Done.vecStatements) {
         Put(strStatement + ";\n");
@@ -333,7 +343,7 @@ int RunSync(Context& Call) {
     if (Done.vecStatements.empty() && Done.vecFindings.empty()) {
         Call.Say("nothing to do");
     }
-    return kExitFine;
+    return nExit;
 }
 
 }  // namespace VORN_JSON_DB::Cli

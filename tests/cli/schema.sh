@@ -80,4 +80,13 @@ sed '1s/"columns":\[/&{},/' dump >named
 expect 3 '' 'error: named:1: a column has no name; dump the table again' -- load fifth.db named
 sed '1s/{/{"sequence":"x",/' dump >counted
 expect 3 '' 'error: counted:1: the counter is no number; dump the table again' -- load fifth.db counted
+
+# What cannot be done is an error of sync's, too.
+sqlite3 bare.db 'CREATE TABLE bare (a TEXT)'
+echo '{"bare": {"key": "id", "member": {"id": {"cpptype": "int"}, "b": {"cpptype": "string"}}}}' >bare.def
+"$VORNJSONDB" sync bare.db bare --def bare.def --dry-run >found
+same 'the exit where a key is missing' $? 3
+same 'what can be done' "$(head -n 1 found)" 'ALTER TABLE "bare" ADD COLUMN "b" TEXT;'
+"$VORNJSONDB" sync bare.db bare --def bare.def --dry-run --json >found
+same 'the same in JSON' $? 3
 finish
