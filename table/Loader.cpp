@@ -113,7 +113,7 @@ Status Loader::Parts::End(const Status& Outcome) {
             Ended = vornjsondb::InTransaction(Into.pDb, Ended);
         }
     }
-    Now.nInserted = Kept.nInserted;  // mutate(exchanged): in any order.
+    Now.nInserted = Kept.nInserted;
     Now.nReplaced = Kept.nReplaced;  // mutate(exchanged): in any order.
     Now.nSkipped = Kept.nSkipped;
     return Ended;
