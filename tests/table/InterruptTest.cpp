@@ -46,6 +46,14 @@ class InterruptTest : public TableTest {
         return m_Table.Save(Parse(R"({"id": 1, "name": "b"})"), eOnDuplicate, &jStored);
     }
 
+    // A transaction with one record more, and its end.
+    Status CreateAnd(Status (Transaction::*pfnEnd)()) {
+        Transaction All;
+        EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
+        EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), "ok");
+        return (All.*pfnEnd)();
+    }
+
     // Calls fnDo again and again, and has it interrupted by a progress handler at its first call,
     // at its second and so on, until it ends before. fnAfter looks at how each ended.
     void InterruptEach(const std::function<void()>& fnBefore, const std::function<Status()>& fnDo,
@@ -94,12 +102,7 @@ TEST_F(InterruptTest, CallInATransactionUndoesAllOfIt) {
 }
 
 TEST_F(InterruptTest, LeavingATransactionUndoesIt) {
-    const auto fnLeave = [this] {
-        Transaction All;
-        EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
-        EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), "ok");
-        return All.Commit();
-    };
+    const auto fnLeave = [this] { return CreateAnd(&Transaction::Commit); };
     EXPECT_EQ(InterruptAt("COMMIT", fnLeave),
               "interrupted: cannot commit a transaction: interrupted");
     EXPECT_EQ(Ids(), "1|a");
@@ -112,13 +115,7 @@ TEST_F(InterruptTest, LeavingATransactionUndoesIt) {
 TEST_F(InterruptTest, RollbackThatIsInterruptedUndoesAll) {
     for (const char* szBefore : {"SELECT 1", "BEGIN"}) {
         Run(szBefore);
-        const auto fnRollback = [this] {
-            Transaction All;
-            EXPECT_EQ(Text(All.Begin(m_pDb)), "ok");
-            EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), "ok");
-            return All.Rollback();
-        };
-        EXPECT_EQ(InterruptAt("ROLLBACK", fnRollback),
+        EXPECT_EQ(InterruptAt("ROLLBACK", [this] { return CreateAnd(&Transaction::Rollback); }),
                   "interrupted: cannot roll a transaction back: interrupted; the transaction is "
                   "undone");
         EXPECT_EQ(Ids(), "1|a");
