@@ -52,6 +52,19 @@ build_quietly() {
     fi
 }
 
+# wait_all PID... waits for programs that run side by side, and fails if one of them does. A signal ends
+# them, too: what runs in the background does not hear of Ctrl-C.
+wait_all() {
+    local pid status=0
+    # shellcheck disable=SC2064  # these, whoever runs by then
+    trap "kill $* 2>/dev/null; wait; exit 1" INT TERM HUP
+    for pid; do
+        wait "$pid" || status=1
+    done
+    trap - INT TERM HUP
+    return "$status"
+}
+
 # configure_release [CMAKE-OPTION...] makes build/release: all that is installed, as it is installed. It
 # takes scripts/install-packages.sh, too.
 configure_release() {

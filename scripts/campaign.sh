@@ -40,7 +40,7 @@ done
 # run FOLDER CMAKE-OPTION... builds the campaigns in one of the folders of scripts/test.sh, and runs them
 # side by side.
 run() {
-    local folder=$1 program i status=0
+    local folder=$1 program status=0
     local -a campaigns=()
     configure "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
     build_quietly "$folder" "${programs[@]/#/vornjsondb_campaign_}"
@@ -49,10 +49,10 @@ run() {
             "${options[@]}" >"build/campaign-$program.txt" &
         campaigns+=($!)
     done
-    for ((i = 0; i < ${#programs[@]}; ++i)); do
-        wait "${campaigns[i]}" || status=1
-        printf '== %s\n' "${programs[i]}"
-        cat "build/campaign-${programs[i]}.txt"
+    wait_all "${campaigns[@]}" || status=1
+    for program in "${programs[@]}"; do
+        printf '== %s\n' "$program"
+        cat "build/campaign-$program.txt"
     done
     return "$status"
 }

@@ -158,13 +158,8 @@ git clone --quiet . "$fresh/project"
 
 # Side by side, because each of them has stretches that keep one core busy or none.
 tries=()
-trap 'kill "${tries[@]}"; wait; exit 1' INT TERM HUP
 for release in "${releases[@]}"; do
     try_release "$release" &
     tries+=($!)
 done
-status=0
-for try in "${tries[@]}"; do
-    wait "$try" || status=1
-done
-exit "$status"
+wait_all "${tries[@]}"

@@ -25,8 +25,4 @@ for ((shard = 0; shard < jobs; ++shard)); do
         "$tests" --gtest_brief=1 "$@" &
     shards+=($!)
 done
-status=0
-for shard in "${shards[@]}"; do
-    wait "$shard" || status=1
-done
-exit "$status"
+wait_all "${shards[@]}"
