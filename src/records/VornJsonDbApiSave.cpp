@@ -4,6 +4,8 @@
 
 #include <VornJsonDbApi.h>
 
+#include <vector>
+
 #include "../base/JsonText.h"
 #include "../base/SqlText.h"
 #include "../core/LogLine.h"
@@ -22,11 +24,10 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
         strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
         strSql.append(Handle.strName).append(" (");
-        const Json::Value& jMember = Handle.Declared();
-        VORN_FAIL_IF_TEXT(0 > AppendMemberNames(jMember, &jRec, strSql),  // GCOVR_EXCL_BR_LINE
-                          "0 > SqlExpandMemberName(strSql, &jRecInOut)");
+        const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), &jRec);
+        AppendMemberNames(vecValues, strSql);
         strSql.append(") VALUES (");
-        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, jMember, jRec, strSql),
+        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, vecValues, jRec, strSql),
                           "0 > SqlExpandMemberSymbol(strSql, jRecInOut)");
         strSql.append(";select * from ").append(Handle.strName);
         strSql.append(" where rowid == last_insert_rowid();");

@@ -14,39 +14,41 @@
 // SQLite refuses it. Hosts rely on such records being refused.
 // Pinned by Names.MissingLastMemberLeavesATrailingComma.
 
-int vornjsondb::AppendMemberNames(const Json::Value& jMember, const Json::Value* pjRec,
-                                  std::string& strSql) {
-    MemberCursor RecordCursor(pjRec != nullptr ? *pjRec : Json::Value::nullSingleton());
-    Json::ArrayIndex nLeft = jMember.size();
-    const Json::Value::const_iterator itEnd = jMember.end();
-    for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
-        --nLeft;
-        const MemberName Key = NameOf(it);
-        if (pjRec != nullptr && RecordCursor.Find(Key) == nullptr) {
+std::vector<vornjsondb::DeclaredValue> vornjsondb::DeclaredValues(const Json::Value& jMember,
+                                                                  const Json::Value* pjRec) {
+    std::vector<DeclaredValue> vecValues(jMember.size());
+    MemberCursor Record(pjRec != nullptr ? *pjRec : Json::Value::nullSingleton());
+    Json::Value::const_iterator it = jMember.begin();
+    for (DeclaredValue& Each : vecValues) {
+        Each.Name = NameOf(it);
+        Each.pjValue = pjRec != nullptr ? Record.Find(Each.Name) : &*it;
+        ++it;
+    }
+    return vecValues;
+}
+
+void vornjsondb::AppendMemberNames(const std::vector<DeclaredValue>& vecValues,
+                                   std::string& strSql) {
+    for (const DeclaredValue& Each : vecValues) {
+        if (Each.pjValue == nullptr) {
             continue;
         }
-        strSql.append(Key.pBegin, Key.Length());
-        if (nLeft > 0) {
+        strSql.append(Each.Name.pBegin, Each.Name.Length());
+        if (&Each != &vecValues.back()) {
             strSql += ',';
         }
     }
-    return 0;
 }
 
-int vornjsondb::AppendMemberValues(const HandleParts& Handle, const Json::Value& jMember,
+int vornjsondb::AppendMemberValues(const HandleParts& Handle,
+                                   const std::vector<DeclaredValue>& vecValues,
                                    const Json::Value& jRec, std::string& strSql) {
     TypeCursor Types(Handle.LookUp().Types());
     AccumulatedFormat Text(strSql);
-    MemberCursor RecordCursor(jRec);
-    Json::ArrayIndex nLeft = jMember.size();
-    const Json::Value::const_iterator itEnd = jMember.end();
-    for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
-        --nLeft;
-        const MemberName Key = NameOf(it);
-        const TypedMember* pMember = Types.Find(Key);
+    for (const DeclaredValue& Each : vecValues) {
+        const TypedMember* pMember = Types.Find(Each.Name);
         VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strKey)");
-        const Json::Value* pjValue = RecordCursor.Find(Key);
-        if (pjValue == nullptr) {
+        if (Each.pjValue == nullptr) {
             continue;
         }
         if (pMember->pType->pfnAppend == nullptr) {
@@ -55,24 +57,26 @@ int vornjsondb::AppendMemberValues(const HandleParts& Handle, const Json::Value&
         }
         try {
             VORN_FAIL_IF(Text.HoldsConversion());
-            Text.Format(*pMember->pType, *pjValue);
+            Text.Format(*pMember->pType, *Each.pjValue);
         } catch (const Json::Exception&) {
-            VORN_LOG_LOCATED("type failed, strKey=%s, jRecParam=%s", Key.pBegin,
+            VORN_LOG_LOCATED("type failed, strKey=%s, jRecParam=%s", Each.Name.pBegin,
                              ToString(jRec).c_str());
             return -1;
         }
-        Text.Append(nLeft > 0 ? "," : ") ");
+        Text.Append(&Each != &vecValues.back() ? "," : ") ");
     }
     strSql.swap(Text.Text());
     return 0;
 }
 
 int VornJsonDbApi::SqlExpandMemberName(std::string& strSql, Json::Value* pjRec) {
-    return vornjsondb::AppendMemberNames(vornjsondb::DeclaredMembers(m_jTableDef, m_strName), pjRec,
-                                         strSql);
+    const Json::Value& jMember = vornjsondb::DeclaredMembers(m_jTableDef, m_strName);
+    vornjsondb::AppendMemberNames(vornjsondb::DeclaredValues(jMember, pjRec), strSql);
+    return 0;
 }
 
 int VornJsonDbApi::SqlExpandMemberSymbol(std::string& strSql, Json::Value& jRec) {
     const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
-    return vornjsondb::AppendMemberValues(Handle, Handle.Declared(), jRec, strSql);
+    return vornjsondb::AppendMemberValues(
+        Handle, vornjsondb::DeclaredValues(Handle.Declared(), &jRec), jRec, strSql);
 }

@@ -2,18 +2,29 @@
 #define VORN_SQL_VORN_JSON_DB_API_VALUES_H
 
 #include <string>
+#include <vector>
 
 #include <json/json.h>
 
+#include "../base/JsonMember.h"
 #include "../schema/HandleParts.h"
 
 namespace vornjsondb {
 
-// SqlExpandMemberName of the declared members.
-int AppendMemberNames(const Json::Value& jMember, const Json::Value* pjRec, std::string& strSql);
+// A declared member, and its value in a record: nullptr where the record lacks it.
+struct DeclaredValue {
+    MemberName Name;
+    const Json::Value* pjValue;
+};
 
-// SqlExpandMemberSymbol of the declared members.
-int AppendMemberValues(const HandleParts& Handle, const Json::Value& jMember,
+// All declared members in key order, walked once for both lists. Without a record none is lacking.
+std::vector<DeclaredValue> DeclaredValues(const Json::Value& jMember, const Json::Value* pjRec);
+
+// SqlExpandMemberName of these.
+void AppendMemberNames(const std::vector<DeclaredValue>& vecValues, std::string& strSql);
+
+// SqlExpandMemberSymbol of these, which are jRec's.
+int AppendMemberValues(const HandleParts& Handle, const std::vector<DeclaredValue>& vecValues,
                        const Json::Value& jRec, std::string& strSql);
 
 }  // namespace vornjsondb
