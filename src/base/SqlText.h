@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <memory>
+#include <string>
 
 #include <sqlite3.h>
 
@@ -14,6 +15,9 @@ struct SqliteFree {
 
 // Owner of a text that SQLite allocated (sqlite3_mprintf, sqlite3_exec's error text).
 using SqlText = std::unique_ptr<char, SqliteFree>;
+
+// Appends the text in single quotes, each quote in it doubled, as SQLite's formatter writes "%Q".
+void AppendQuoted(const char* szText, std::string& strOut);
 
 // Room for most statements: spares a text that grows piece by piece its first allocations.
 constexpr size_t kUsualStatement = 256;

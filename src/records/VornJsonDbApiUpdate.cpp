@@ -22,7 +22,7 @@ int VornJsonDbApi::recUpdateByWhere(Json::Value& jRecIn, std::string& strSqlWher
         // Raw condition text in a record must not become an assignment.
         if (0 > vornjsondb::AppendMemberList(Handle.LookUp().Types(), jRecIn, strSql,
                                              VORN_SQL_WHERE_TYPE_COMMA,
-                                             vornjsondb::RawFilter::kLeftOut)) {
+                                             vornjsondb::ListUse::kAssignments)) {
             strSql.resize(nHead);  // what is logged of a failed statement is the head alone
             VORN_LOG_CONDITION(
                 "0 > SqlExpandMemberList(jColumnList, strSql2, VORN_SQL_WHERE_TYPE_COMMA)");

@@ -1,7 +1,6 @@
 #include "MemberType.h"
 
 #include <cstdlib>
-#include <cstring>
 #include <stdexcept>
 
 #include <sqlite3.h>
@@ -74,16 +73,6 @@ void ReadBool(const char* szText, Json::Value& jOut) {
 constexpr auto ReadJson = FromString;
 
 // ---- value into a value list ----
-
-// In single quotes, each quote in it doubled, as "%Q" writes it.
-void AppendQuoted(const char* szText, std::string& strOut) {
-    strOut += '\'';
-    while (const char* pQuote = std::strchr(szText, '\'')) {
-        strOut.append(szText, static_cast<size_t>(pQuote + 1 - szText)) += '\'';
-        szText = pQuote + 1;
-    }
-    strOut.append(szText) += '\'';
-}
 
 void AppendText(const Json::Value& jValue, std::string& strOut) {
     if (jValue.isString()) {  // mutate(false): a copy of it gives the same text.

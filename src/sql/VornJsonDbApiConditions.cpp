@@ -5,7 +5,9 @@
 #include <VornJsonDbApi.h>
 
 #include <cstring>
+#include <string_view>
 
+#include "../base/Digits.h"
 #include "../base/JsonText.h"
 #include "../base/SqlText.h"
 #include "../core/LogLine.h"
@@ -78,12 +80,31 @@ int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::strin
     const bool blQuoted = IsQuoted(eForm);
     // Room for all of it first: memory that runs out in between must not leave half a condition.
     strSqlOut.reserve(strSqlOut.length() + Member.Name.Length() + nValue + 3);
-    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()).append(blQuoted ? "='" : "=");
+    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()).append("='", blQuoted ? 2 : 1);
     strSqlOut.append(szSql.get(), nValue);
     if (blQuoted) {
         strSqlOut += '\'';
     }
     return 0;
+}
+
+// The same for an assignment, of the kinds that need no formatter; false for all others.
+bool AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue,
+                      std::string& strSqlOut) {
+    const ConditionForm eForm = Member.pType->eCondition;
+    const Json::ValueType eKind = jValue.type();
+    if (!(eForm == ConditionForm::kQuotedText && eKind == Json::stringValue) &&
+        !(eForm == ConditionForm::kBareText && eKind == Json::intValue) &&
+        !(eForm == ConditionForm::kBoolean && eKind == Json::booleanValue)) {
+        return false;
+    }
+    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()) += '=';
+    if (eKind == Json::stringValue) {
+        vornjsondb::AppendQuoted(jValue.asCString(), strSqlOut);
+    } else {
+        vornjsondb::AppendDigits(jValue.asInt64(), strSqlOut);
+    }
+    return true;
 }
 
 // "name in (value )" of a member.
@@ -140,7 +161,7 @@ int AppendMember(const TableTypes& Types, const TypedMember& Member, const Json:
 }
 
 struct JoinMode {
-    const char* szJoiner;
+    std::string_view Joiner;
     bool blWrapped;
 };
 
@@ -151,31 +172,34 @@ constexpr int kJoinModeCount = sizeof(kJoinModes) / sizeof(kJoinModes[0]);
 }  // namespace
 
 int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam,
-                                 std::string& strSqlOut, int andType, RawFilter eFilter) {
+                                 std::string& strSqlOut, int andType, ListUse eUse) {
     VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
     if (andType < 0 || andType >= kJoinModeCount) {
         VORN_LOG_LOCATED("error andType=%d", andType);
         return -1;
     }
+    const bool blAssignments = eUse == ListUse::kAssignments;
     bool blWritten = false;
     const JoinMode& Mode = kJoinModes[andType];
+    const std::string_view Opening = Mode.blWrapped ? " (" : "";
     TypeCursor NextType(Types);
     const Json::Value::const_iterator itEnd = jRecParam.end();
     for (Json::Value::const_iterator it = jRecParam.begin(); it != itEnd; ++it) {
         const MemberName Name = NameOf(it);
         const bool blFilter = Name.Is(kFilterKey);
         const TypedMember* pMember = NextType.Find(Name);
-        if (blFilter ? eFilter == RawFilter::kLeftOut : pMember == nullptr) {
+        if (blFilter ? blAssignments : pMember == nullptr) {
             continue;
         }
         // Written before the member's own text: an empty list, which writes nothing, leaves its
         // joiner, and SQLite refuses the statement instead of running it without the condition.
         // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
-        strSqlOut += blWritten ? Mode.szJoiner : (Mode.blWrapped ? " (" : "");
+        strSqlOut += blWritten ? Mode.Joiner : Opening;
         if (blFilter) {
             VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
             strSqlOut.append(" ").append(it->asString()).append(" ");
-        } else if (0 > AppendMember(Types, *pMember, *it, strSqlOut)) {
+        } else if (!(blAssignments && AppendPlainMatch(*pMember, *it, strSqlOut)) &&
+                   0 > AppendMember(Types, *pMember, *it, strSqlOut)) {
             return -1;
         }
         blWritten = true;
@@ -207,5 +231,5 @@ int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strS
                                        int andType) {
     const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     return vornjsondb::AppendMemberList(Types, jRecParam, strSqlWhereOut, andType,
-                                        vornjsondb::RawFilter::kWritten);
+                                        vornjsondb::ListUse::kConditions);
 }

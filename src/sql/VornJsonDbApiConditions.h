@@ -9,12 +9,13 @@
 
 namespace vornjsondb {
 
-// What becomes of raw condition text ("vornSqlWhereFilter") among the members.
-enum class RawFilter { kWritten, kLeftOut };
+// What a list of members is for. Among assignments raw condition text ("vornSqlWhereFilter") is
+// left out, and whole numbers, booleans and texts are written without SQLite's formatter.
+enum class ListUse { kConditions, kAssignments };
 
 // SqlExpandMemberList with the table's types looked up.
 int AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam, std::string& strSqlOut,
-                     int andType, RawFilter eFilter);
+                     int andType, ListUse eUse);
 
 }  // namespace vornjsondb
 

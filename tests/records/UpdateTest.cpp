@@ -156,6 +156,32 @@ TEST_F(Update, ByWhereChecksNoTypes) {
     EXPECT_EQ(TakeSql(), Lines{Statement("name='5' , size=7", "id=1")});
 }
 
+TEST_F(Update, AssignmentIsTheTextOfAConditionForEveryTypeAndKind) {
+    const Json::Value jValues = ParseJson(
+        R"([null, true, false, 0, -7, -9223372036854775808, 9223372036854775807,
+            18446744073709551615, 1.5, "", "it's ''", "100% %s %%", "a\u0000b", "\u00e9", {"k":"it's"}])");
+    for (const char* szType : {"string", "int", "long long", "bool", "Json::objectValue",
+                               "Json::arrayValue", "Json::Value", "unsigned int", "unsigned long",
+                               "double", "float", "uid_t", "time_t", "nosuch"}) {
+        Open(std::string("v:") + szType, "v");
+        for (const Json::Value& jValue : jValues) {
+            std::string strName = "v";
+            Json::Value jParam = jValue;
+            std::string strText;
+            const int nResult = m_pHandle->SqlMakeByMatchField(strName, jParam, strText);
+            TakeLog();
+            TakeSql();
+            Json::Value jRec;
+            jRec["v"] = jValue;
+            std::string strWhere = "1";
+            m_pHandle->recUpdateByWhere(jRec, strWhere);
+            TakeLog();
+            EXPECT_EQ(TakeSql(), nResult == 0 ? Lines{Statement(strText, "1")} : Lines())
+                << szType << " " << Compact(jValue);
+        }
+    }
+}
+
 // ---- by filter ---------------------------------------------------------------------------------
 
 TEST_F(Update, FilterSelectsTheRows) {
