@@ -23,6 +23,7 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
         Json::Value jArrayTmp(Json::arrayValue);
         strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
+        // mutate(exchanged): the walk changes nothing.
         strSql.append(Handle.strName).append(" (");
         const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), &jRec);
         AppendMemberNames(vecValues, strSql);

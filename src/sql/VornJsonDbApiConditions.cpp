@@ -16,6 +16,7 @@
 namespace {
 
 using vornjsondb::ConditionForm;
+using vornjsondb::ListUse;
 using vornjsondb::SqlText;
 using vornjsondb::TableTypes;
 using vornjsondb::TypedMember;
@@ -88,23 +89,29 @@ int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::strin
     return 0;
 }
 
-// The same for an assignment, of the kinds that need no formatter; false for all others.
-bool AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue,
-                      std::string& strSqlOut) {
-    const ConditionForm eForm = Member.pType->eCondition;
-    const Json::ValueType eKind = jValue.type();
-    if (!(eForm == ConditionForm::kQuotedText && eKind == Json::stringValue) &&
-        !(eForm == ConditionForm::kBareText && eKind == Json::intValue) &&
-        !(eForm == ConditionForm::kBoolean && eKind == Json::booleanValue)) {
-        return false;
+// Whether the formatter would write the value as it is, but for doubled quotes.
+bool IsPlain(const TypedMember& Member, const Json::Value& jValue) {
+    switch (Member.pType->eCondition) {
+        case ConditionForm::kQuotedText:
+            return jValue.type() == Json::stringValue;
+        case ConditionForm::kBareText:
+            return jValue.type() == Json::intValue;
+        case ConditionForm::kBoolean:
+            return jValue.type() == Json::booleanValue;
+        default:
+            return false;
     }
+}
+
+// AppendMatch of a value that is plain.
+void AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue,
+                      std::string& strSqlOut) {
     strSqlOut.append(Member.Name.pBegin, Member.Name.Length()) += '=';
-    if (eKind == Json::stringValue) {
+    if (jValue.isString()) {
         vornjsondb::AppendQuoted(jValue.asCString(), strSqlOut);
     } else {
         vornjsondb::AppendDigits(jValue.asInt64(), strSqlOut);
     }
-    return true;
 }
 
 // "name in (value )" of a member.
@@ -146,9 +153,13 @@ int AppendListOf(const TableTypes& Types, const char* szField, const Json::Value
     return AppendList(*pMember, jList, strSqlOut);
 }
 
-// A member's condition: by its value or by a list of values.
+// A member's condition or assignment: by its value or by a list of values.
 int AppendMember(const TableTypes& Types, const TypedMember& Member, const Json::Value& jValue,
-                 std::string& strSqlOut) {
+                 ListUse eUse, std::string& strSqlOut) {
+    if (eUse == ListUse::kAssignments && IsPlain(Member, jValue)) {  // mutate(false): the same.
+        AppendPlainMatch(Member, jValue, strSqlOut);
+        return 0;
+    }
     if (jValue.isArray()) {
         // By name: for a list the name ends at its first NUL.
         VORN_FAIL_IF_TEXT(0 > AppendListOf(Types, Member.Name.pBegin, jValue, strSqlOut),
@@ -178,7 +189,6 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         VORN_LOG_LOCATED("error andType=%d", andType);
         return -1;
     }
-    const bool blAssignments = eUse == ListUse::kAssignments;
     bool blWritten = false;
     const JoinMode& Mode = kJoinModes[andType];
     const std::string_view Opening = Mode.blWrapped ? " (" : "";
@@ -188,7 +198,7 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         const MemberName Name = NameOf(it);
         const bool blFilter = Name.Is(kFilterKey);
         const TypedMember* pMember = NextType.Find(Name);
-        if (blFilter ? blAssignments : pMember == nullptr) {
+        if (blFilter ? eUse == ListUse::kAssignments : pMember == nullptr) {
             continue;
         }
         // Written before the member's own text: an empty list, which writes nothing, leaves its
@@ -198,8 +208,7 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         if (blFilter) {
             VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
             strSqlOut.append(" ").append(it->asString()).append(" ");
-        } else if (!(blAssignments && AppendPlainMatch(*pMember, *it, strSqlOut)) &&
-                   0 > AppendMember(Types, *pMember, *it, strSqlOut)) {
+        } else if (0 > AppendMember(Types, *pMember, *it, eUse, strSqlOut)) {
             return -1;
         }
         blWritten = true;

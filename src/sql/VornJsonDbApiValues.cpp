@@ -16,13 +16,13 @@
 
 std::vector<vornjsondb::DeclaredValue> vornjsondb::DeclaredValues(const Json::Value& jMember,
                                                                   const Json::Value* pjRec) {
-    std::vector<DeclaredValue> vecValues(jMember.size());
     MemberCursor Record(pjRec != nullptr ? *pjRec : Json::Value::nullSingleton());
-    Json::Value::const_iterator it = jMember.begin();
-    for (DeclaredValue& Each : vecValues) {
-        Each.Name = NameOf(it);
-        Each.pjValue = pjRec != nullptr ? Record.Find(Each.Name) : &*it;
-        ++it;
+    std::vector<DeclaredValue> vecValues;
+    vecValues.reserve(jMember.size());
+    const Json::Value::const_iterator itEnd = jMember.end();
+    for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
+        const MemberName Name = NameOf(it);
+        vecValues.push_back({Name, pjRec != nullptr ? Record.Find(Name) : &*it});
     }
     return vecValues;
 }

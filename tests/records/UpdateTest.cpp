@@ -182,6 +182,21 @@ TEST_F(Update, AssignmentIsTheTextOfAConditionForEveryTypeAndKind) {
     }
 }
 
+TEST_F(Update, TextToSetNeedsNoMemoryOfTheFormatter) {
+    Json::Value jRec;
+    jRec["name"] = LongText();
+    std::string strWhere = "id=1";
+    {
+        ScarceMemory scarce;
+        EXPECT_EQ(m_pHandle->recUpdateByWhere(jRec, strWhere), -1);
+    }
+    const Lines vecLog = TakeLog();
+    ASSERT_FALSE(vecLog.empty());
+    const std::string strSql = Statement("name='" + LongText() + "'", strWhere);
+    EXPECT_TRUE(vecLog.front() == RunFailed("out of memory", strSql));
+    EXPECT_EQ(All(), kThreeRows);
+}
+
 // ---- by filter ---------------------------------------------------------------------------------
 
 TEST_F(Update, FilterSelectsTheRows) {

@@ -208,6 +208,17 @@ TEST_F(ConditionList, FailingEqualityIsReportedTwiceAndLeavesWhatStands) {
         "name='x' , ");
 }
 
+TEST_F(ConditionList, FormatterWithoutMemoryFailsInEveryMode) {
+    Json::Value jQuery;
+    jQuery["name"] = LongText();
+    for (const int nMode : {kOrMode, kAndMode, kCommaMode}) {
+        ScarceMemory scarce;
+        std::string strSql;
+        EXPECT_EQ(m_pHandle->SqlExpandMemberList(jQuery, strSql, nMode), -1) << nMode;
+        EXPECT_EQ(TakeLog(), (Lines{Check(kQuoteText), Check(kMatchFailed)})) << nMode;
+    }
+}
+
 TEST_F(ConditionList, FailingMembershipIsReportedTwiceAndLeavesWhatStands) {
     EXPECT_EQ(Left(R"({"name":"x","size":[1,[]]})", kOrMode,
                    {Check(kQuoteListText), Check(kMembershipFailed)}),
