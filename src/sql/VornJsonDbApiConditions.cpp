@@ -156,7 +156,8 @@ int AppendListOf(const TableTypes& Types, const char* szField, const Json::Value
 // A member's condition or assignment: by its value or by a list of values.
 int AppendMember(const TableTypes& Types, const TypedMember& Member, const Json::Value& jValue,
                  ListUse eUse, std::string& strSqlOut) {
-    if (eUse == ListUse::kAssignments && IsPlain(Member, jValue)) {  // mutate(false): the same.
+    // mutate(false, exchanged): the formatter gives the same; a list is not plain.
+    if (eUse == ListUse::kAssignments && IsPlain(Member, jValue)) {
         AppendPlainMatch(Member, jValue, strSqlOut);
         return 0;
     }
