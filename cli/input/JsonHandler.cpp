@@ -82,6 +82,7 @@ bool JsonHandler::Broken(const std::string& strReason) {
     Blame(strReason);
     m_nLevel = m_nRecordLevel;
     m_strJson.clear();
+    m_vecNested.clear();
     return EndRecord();
 }
 
@@ -172,12 +173,21 @@ bool JsonHandler::String(const char* pText, rapidjson::SizeType nText, bool) {
     return Scalar(Given, "a text");
 }
 
+// Of two members with one name only the last would be kept.
+void JsonHandler::NestedKey(std::string_view strName) {
+    if (m_strReason.empty() && !m_vecNested.back().emplace(strName).second) {
+        Blame("in an object of the member \"" + m_Names.Name(m_nMember) + "\" the name \"" +
+              std::string(strName) + "\" is there twice");
+    }
+    AppendTextToJson(strName);
+    m_strJson += ':';
+}
+
 bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strName(pText, nText);
     const bool blGood = CheckText(strName);
     if (m_nLevel > m_nRecordLevel + 1) {
-        AppendTextToJson(strName);
-        m_strJson += ':';
+        NestedKey(strName);
         return true;
     }
     if (!blGood) {
@@ -247,6 +257,9 @@ bool JsonHandler::Open(char cBracket) {
     } else if (!blList) {
         AppendToJson(std::string_view(&cBracket, 1));
     }
+    if (cBracket == '{' && m_nLevel > m_nRecordLevel) {
+        m_vecNested.emplace_back();
+    }
     ++m_nLevel;
     return true;
 }
@@ -262,6 +275,9 @@ bool JsonHandler::Close(char cBracket) {
         return EndRecord();
     }
     m_strJson += cBracket;
+    if (cBracket == '}') {
+        m_vecNested.pop_back();
+    }
     if (OfMember() && m_strReason.empty()) {
         Value Given;
         Given.eKind = Value::Kind::kJson;

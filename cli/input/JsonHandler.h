@@ -10,8 +10,10 @@
 #include <rapidjson/reader.h>
 
 #include <cstdint>
+#include <set>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "MemberNames.h"
 #include "Readers.h"
@@ -73,6 +75,7 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool EndRecord();
     void Blame(std::string strReason);
     bool CheckText(std::string_view strText);
+    void NestedKey(std::string_view strName);
     void AppendToJson(std::string_view strText);
     void AppendTextToJson(std::string_view strText);
 
@@ -87,8 +90,9 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool m_blStopped = false;
     std::int64_t m_nRecord = 0;
     size_t m_nMember = 0;
-    std::string m_strJson;    // of the member's value, where it is an object or a list
-    std::string m_strReason;  // what is wrong with the record
+    std::string m_strJson;  // of the member's value, where it is an object or a list
+    std::vector<std::set<std::string, std::less<>>> m_vecNested;  // names of its open objects
+    std::string m_strReason;                                      // what is wrong with the record
     std::string m_strListName;
 };
 

@@ -81,6 +81,8 @@ expect 0 '{"a":"18446744073709551616"}
 
 # Structure.
 bad 1 'the member "a" is there twice' '[{"a": 1, "a": 2}]'
+bad 2 'in an object of the member "a" the name "x" is there twice' '{"a": 1}\n{"a": [{"x": {"x": 1}, "\\u0078": 2}]}\n'
+good '{"a":{"b":{"x":2},"c":[{"x":3},{"x":4}],"x":1}}' '{"a": {"x": 1, "b": {"x": 2}, "c": [{"x": 3}, {"x": 4}]}}'
 broken 2 'the input ends inside of record 2' '[{"a": 1},\n{"a": 2'
 broken 1 'the input ends inside of record 1' '[{"a": "xy'
 broken 1 'the input ends inside of the list, after record 1' '[{"a": 1}'
