@@ -1,8 +1,45 @@
 #include "Readers.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace VORN_JSON_DB::Cli {
+
+namespace {
+
+// How the first bytes are in an encoding of several bytes a character: a mark, or without one a
+// character of ASCII. Z is a byte of zero, x one that is not.
+struct EncodingRow {
+    const char* szBegin;
+    const char* szName;
+};
+
+constexpr EncodingRow kEncodings[] = {
+    {"\xFF\xFEZZ", "UTF-32"}, {"ZZ\xFE\xFF", "UTF-32"}, {"\xFF\xFE", "UTF-16"},
+    {"\xFE\xFF", "UTF-16"},   {"xZZZ", "UTF-32LE"},     {"ZZZx", "UTF-32BE"},
+    {"xZ", "UTF-16LE"},       {"Zx", "UTF-16BE"},
+};
+
+bool BeginsLike(std::string_view strText, std::string_view strBegin) {
+    return strText.size() >= strBegin.size() &&
+           std::equal(strBegin.begin(), strBegin.end(), strText.begin(),
+                      [](char cBegin, char cText) {
+                          return cBegin == 'x'   ? cText != '\0'
+                                 : cBegin == 'Z' ? cText == '\0'
+                                                 : cText == cBegin;
+                      });
+}
+
+const char* WideEncoding(std::string_view strText) {
+    for (const EncodingRow& Row : kEncodings) {
+        if (BeginsLike(strText, Row.szBegin)) {
+            return Row.szName;
+        }
+    }
+    return nullptr;
+}
+
+}  // namespace
 
 ReadOutcome ReadRecords(ByteSource& From, const ReadOptions& How, Sink& To) {
     ReadOutcome Result;
@@ -25,8 +62,9 @@ ReadOutcome ReadRecords(ByteSource& From, const ReadOptions& How, Sink& To) {
 
 bool SkipByteOrderMark(ByteSource& From, std::string& strReason) {
     const std::string_view strFirst = From.Look();
-    if (strFirst.substr(0, 2) == "\xFF\xFE" || strFirst.substr(0, 2) == "\xFE\xFF") {
-        strReason = "the input is UTF-16; convert it with iconv -f UTF-16 -t UTF-8";
+    if (const char* const szEncoding = WideEncoding(strFirst)) {
+        strReason = std::string("the input is ") + szEncoding + "; convert it with iconv -f " +
+                    szEncoding + " -t UTF-8";
         return false;
     }
     if (strFirst.substr(0, 3) == "\xEF\xBB\xBF") {

@@ -56,6 +56,15 @@ bad 1 'there is a NUL byte' '{"a": 1}\0000\n{"a": 2}\n'
 good '{"a":"x\u0000y😀"}' '[{"a": "x\\u0000y\\ud83d\\ude00"}]'
 good '{"a":1}' '\0357\0273\0277[{"a": 1}]'
 bad 1 'the input is UTF-16; convert it with iconv -f UTF-16 -t UTF-8' '\0377\0376[\0000{\0000'
+for encoding in UTF-16LE UTF-16BE UTF-32LE UTF-32BE; do
+    for text in '[{"a": 1}]\n' '{"a": 1}\n{"a": 2}\n' 'a,b\n1,2\n'; do
+        # shellcheck disable=SC2059
+        printf "$text" | iconv -f UTF-8 -t $encoding >in
+        expect 3 '' "error: in:1: the input is $encoding; convert it with iconv -f $encoding -t UTF-8 (nothing is stored)" \
+            -- insert bad.db t in
+    done
+done
+bad 1 'the input is UTF-32; convert it with iconv -f UTF-32 -t UTF-8' '\0377\0376\0000\0000[\0000\0000\0000'
 
 # Numbers.
 broken 1 'a number is greater than any double' '[{"a": 1e400}]'
