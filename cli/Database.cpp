@@ -181,6 +181,17 @@ void CheckInPlace(const Context& Call, sqlite3* pDb) {
     }
 }
 
+void CheckEncoding(const Context& Call, sqlite3* pDb) {
+    const Statement pLook = Prepare(pDb, "PRAGMA encoding");
+    Step(pLook.get());
+    const std::string strEncoding = ColumnText(pLook.get(), 0);
+    if (strEncoding != "UTF-8") {
+        Fail(kExitBadData, Call.Db() + ": its texts are in " + strEncoding +
+                               ", not in UTF-8; copy its tables by vornjsondb dump " + Call.Db() +
+                               " TABLE | vornjsondb load COPY");
+    }
+}
+
 void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
     const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, Call.WaitMs());
     CheckInPlace(Call, pDb);
@@ -281,6 +292,18 @@ bool TableExists(sqlite3* pDb, const std::string& strTable) {
     return Step(pLook.get());
 }
 
+void FailNoTable(const Context& Call, sqlite3* pDb) {
+    std::vector<std::string> vecTables;
+    const Statement pLook =
+        Prepare(pDb, "SELECT name FROM sqlite_master WHERE type IN ('table', 'view')");
+    while (Step(pLook.get())) {
+        vecTables.push_back(ColumnText(pLook.get(), 0));
+    }
+    const std::string strHint = NearestHint(Call.TableName(), vecTables);
+    Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
+                            (strHint.empty() ? "; see vornjsondb tables" : strHint));
+}
+
 void CheckNewName(const std::string& strTable) {
     if (strTable.empty()) {
         Fail(kExitUsage, "the name of the new table is empty; give it one");
@@ -356,21 +379,14 @@ void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value
 
 OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition)
     : pDb(OpenDatabase(Call, eAccess)) {
+    CheckEncoding(Call, pDb.get());
     Options How;
     How.blCompatible = false;
     How.nWaitMs = Call.WaitMs();
     const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), Call.TableName());
     const Status Opened = Records.Open(pDb.get(), Call.TableName(), jDefinition, How);
     if (Opened.Code() == StatusCode::kNotFound) {
-        std::vector<std::string> vecTables;
-        const Statement pLook =
-            Prepare(pDb.get(), "SELECT name FROM sqlite_master WHERE type IN ('table', 'view')");
-        while (Step(pLook.get())) {
-            vecTables.push_back(ColumnText(pLook.get(), 0));
-        }
-        const std::string strHint = NearestHint(Call.TableName(), vecTables);
-        Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
-                                (strHint.empty() ? "; see vornjsondb tables" : strHint));
+        FailNoTable(Call, pDb.get());
     }
     Check(Opened, Call.Db(), kExitBadData);
 }

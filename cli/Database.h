@@ -27,6 +27,9 @@ Database OpenDatabase(const Context& Call, Access eAccess);
 // was open: what is stored then is nowhere, which is an Error.
 void CheckInPlace(const Context& Call, sqlite3* pDb);
 
+// Records are read and written in UTF-8 alone: another encoding is an Error.
+void CheckEncoding(const Context& Call, sqlite3* pDb);
+
 // Begins what changes the database, which lives until All ends.
 void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All);
 
@@ -45,6 +48,7 @@ Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::stri
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition);
 
 bool TableExists(sqlite3* pDb, const std::string& strTable);
+[[noreturn]] void FailNoTable(const Context& Call, sqlite3* pDb);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
 

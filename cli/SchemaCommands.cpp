@@ -162,14 +162,14 @@ int RunTables(Context& Call) {
 
 int RunSchema(Context& Call) {
     const bool blOne = Call.vecWords.size() > 1;
-    if (blOne) {
-        OpenTable Open(Call, Access::kRead);
-        if (Call.Json()) {
-            Put(CompactJson(Open.Records.Definition()) + "\n");
-            return kExitFine;
-        }
+    if (blOne && Call.Json()) {
+        Put(CompactJson(OpenTable(Call, Access::kRead).Records.Definition()) + "\n");
+        return kExitFine;
     }
     const Database pDb = OpenDatabase(Call, Access::kRead);
+    if (blOne && !TableExists(pDb.get(), Call.TableName())) {
+        FailNoTable(Call, pDb.get());
+    }
     const std::vector<std::string> vecStatements =
         CreateStatements(pDb.get(), blOne ? Call.TableName() : "");
     if (Call.Json()) {
@@ -204,6 +204,7 @@ int RunInit(Context& Call) {
         return kExitFine;
     }
     const Database pDb = OpenDatabase(Call, Access::kCreate);
+    CheckEncoding(Call, pDb.get());
     Transaction All;
     BeginChange(Call, pDb.get(), All);
     if (TableExists(pDb.get(), Call.TableName())) {

@@ -119,6 +119,7 @@ void Import::OpenFile() {
 }
 
 void Import::FindDefinition() {
+    CheckEncoding(m_Call, m_pDb.get());
     m_blTableThere = TableExists(m_pDb.get(), m_strTable);
     if (!m_blTableThere) {
         CheckNewName(m_strTable);

@@ -60,6 +60,17 @@ same 'values in UTF-8' "$(sqlite3 narrow.db 'SELECT typeof(a), hex(a), typeof(b)
 expect 0 'table
 -----
 odd' '' -- tables wide.db
+expect 0 'CREATE TABLE odd (a, b);' '' -- schema wide.db odd
+expect 5 '' 'error: wide.db: there is no table "od"; did you mean "odd"?' -- schema wide.db od
+# All that works on records says how to get there.
+other='error: wide.db: its texts are in UTF-16le, not in UTF-8; copy its tables by vornjsondb dump wide.db TABLE | vornjsondb load COPY'
+for words in 'schema --json' list count 'update 1 a=1' 'delete --all --yes' 'upsert a=1' index explain lint sync; do
+    expect 3 '' "$other" -- ${words%% *} wide.db odd $(cut -s -d ' ' -f 2- <<<"$words")
+done
+expect 3 '' "$other" -- init wide.db new a:int
+echo '{"a": 1}' >wide.json
+expect 3 '' "$other (nothing is stored)" -- insert wide.db odd wide.json
+expect 3 '' "$other" -- insert wide.db odd wide.json --dry-run
 
 "$VORNJSONDB" init shop.db single a:int --quiet && "$VORNJSONDB" insert shop.db single - --quiet <<<'{"a": 1}'
 "$VORNJSONDB" dump shop.db single >single.dump
