@@ -304,6 +304,18 @@ void FailNoTable(const Context& Call, sqlite3* pDb) {
                             (strHint.empty() ? "; see vornjsondb tables" : strHint));
 }
 
+std::string NameForSqlite(const std::string& strTable, Access eAccess) {
+    if (!SameName(strTable, "sqlite_schema") && !SameName(strTable, "sqlite_master")) {
+        return strTable;
+    }
+    if (eAccess != Access::kRead) {
+        Fail(kExitUsage, "table \"" + strTable +
+                             "\" is SQLite's own and can only be read; tables are changed by init, "
+                             "sync and index");
+    }
+    return "sqlite_master";
+}
+
 void CheckNewName(const std::string& strTable) {
     if (strTable.empty()) {
         Fail(kExitUsage, "the name of the new table is empty; give it one");
@@ -383,8 +395,9 @@ OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefiniti
     Options How;
     How.blCompatible = false;
     How.nWaitMs = Call.WaitMs();
-    const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), Call.TableName());
-    const Status Opened = Records.Open(pDb.get(), Call.TableName(), jDefinition, How);
+    const std::string strTable = NameForSqlite(Call.TableName(), eAccess);
+    const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), strTable);
+    const Status Opened = Records.Open(pDb.get(), strTable, jDefinition, How);
     if (Opened.Code() == StatusCode::kNotFound) {
         FailNoTable(Call, pDb.get());
     }

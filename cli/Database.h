@@ -49,6 +49,9 @@ void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value
 
 bool TableExists(sqlite3* pDb, const std::string& strTable);
 [[noreturn]] void FailNoTable(const Context& Call, sqlite3* pDb);
+// The table of all tables bears two names, of which SQLite takes the newer one in some places only.
+// Nobody may write to it.
+std::string NameForSqlite(const std::string& strTable, Access eAccess);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
 

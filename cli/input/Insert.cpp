@@ -30,7 +30,10 @@ std::string Pretty(const Json::Value& jValue) {
 class Import {
   public:
     Import(Context& Call, const InsertOptions& How)
-        : m_Call(Call), m_How(How), m_Files(How), m_strTable(Call.TableName()) {}
+        : m_Call(Call),
+          m_How(How),
+          m_Files(How),
+          m_strTable(NameForSqlite(Call.TableName(), Access::kChange)) {}
 
     int Run();
 

@@ -58,4 +58,18 @@ echo '{"id": 5, "b": {"$base64": true, "encoded": "AA==", "x": 1}}' >odd.json
 same 'exit of bytes with something beside them' $? 3
 sqlite3 bytes.db "CREATE VIRTUAL TABLE words USING fts5(title, body); INSERT INTO words VALUES ('a', 'b')"
 expect 0 '[{"title":"a","body":"b"}]' '' -- list bytes.db words
+
+# SQLite's own table of tables is read by either name, and never written to.
+tables=$(printf '[{"type":"table","name":"t"},\n {"type":"table","name":"u"}]')
+sqlite3 own.db 'CREATE TABLE t (a); CREATE TABLE u (a); CREATE INDEX i ON u (a)'
+for name in sqlite_schema sqlite_master SQLite_Schema; do
+    expect 0 "$tables" '' -- list own.db $name type=table --sort name --members type,name
+    expect 0 3 '' -- count own.db $name
+    for words in 'update --where {"name":"t"} name=x' 'delete --all --yes' 'upsert name=x' 'index name' sync; do
+        expect 2 '' "error: table \"$name\" is SQLite's own and can only be read; tables are changed by init, sync and index" \
+            -- ${words%% *} own.db $name $(cut -s -d ' ' -f 2- <<<"$words")
+    done
+    expect 2 '' "error: table \"$name\" is SQLite's own and can only be read; tables are changed by init, sync and index" \
+        -- insert own.db $name only.jsonl
+done
 finish
