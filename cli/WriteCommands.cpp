@@ -46,6 +46,20 @@ Status Counted(OpenTable& Open, const Query& Which, std::int64_t& nRecords,
     return Changed;
 }
 
+[[noreturn]] void FailUnchanged(const Context& Call, Table& Of, const Query& Which,
+                                const std::string& strKey) {
+    bool blThere = false;
+    Check(Of.Exists(Which, blThere), Call.Db());
+    const std::string strTable = Call.Db() + ": table \"" + Call.TableName() + "\" ";
+    if (blThere) {
+        Fail(kExitBadData, strTable + "ignores the change of the record with the key \"" + strKey +
+                               "\", by a trigger or an ON CONFLICT clause; nothing was changed; "
+                               "vornjsondb schema shows them");
+    }
+    Fail(kExitNotFound,
+         strTable + "has no record with the key \"" + strKey + "\"; nothing was changed");
+}
+
 // Runs a change for each key; a key that is not there undoes them all.
 template <typename Change>
 std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std::string>& vecKeys,
@@ -63,9 +77,7 @@ std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std
         const Query Which = KeyQuery(Open.Records, jKey);
         Check(fnChange(Which, nChanged), Call.Db());
         if (nChanged == 0) {
-            Fail(kExitNotFound, Call.Db() + ": table \"" + Call.TableName() +
-                                    "\" has no record with the key \"" + strKey +
-                                    "\"; nothing was changed");
+            FailUnchanged(Call, Open.Records, Which, strKey);
         }
         nRecords += nChanged;
     }

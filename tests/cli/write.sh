@@ -64,6 +64,15 @@ expect 0 '' '2 inserted, 0 replaced, 2 skipped, 0 failed (own.json: JSON Lines)'
 expect 3 '' "error: own.db: cannot save a record in table \"t\": $ignored; vornjsondb schema shows what the table demands" \
     -- upsert own.db t id=5 a=no
 expect 0 2 '' -- count own.db t
+sqlite3 own.db "CREATE TRIGGER keep BEFORE DELETE ON t WHEN old.id = 1 BEGIN SELECT RAISE(IGNORE); END"
+clause='by a trigger or an ON CONFLICT clause; nothing was changed; vornjsondb schema shows them'
+expect 3 '' "error: own.db: table \"t\" ignores the change of the record with the key \"1\", $clause" -- \
+    delete own.db t 4 1
+expect 3 '' "error: own.db: table \"t\" ignores the change of the record with the key \"4\", $clause" -- \
+    update own.db t 4 a=x
+expect 0 '' 'updated 0 records' -- update own.db t --where '{"id": 4}' a=x
+sqlite3 own.db 'DROP TRIGGER keep'
+expect 0 2 '' -- count own.db t
 echo '{"id": 6, "a": "z"}' >own.json
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (own.json: JSON)' -- insert own.db v own.json
 expect 0 '' 'updated 2 records' -- update own.db v --where '{"id": {"$gt": 1}}' a:=null
