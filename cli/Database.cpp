@@ -69,10 +69,14 @@ bool IsEmpty(const std::string& strFile) {
 
 // Under a lock that nobody has beside it: another program may be about to store something.
 void RemoveEmpty(sqlite3* pDb, const std::string& strFile) {
+    if (!IsEmpty(strFile)) {
+        return;
+    }
     sqlite3_busy_timeout(pDb, 0);
-    if (IsEmpty(strFile) &&
-        sqlite3_exec(pDb, "BEGIN EXCLUSIVE", nullptr, nullptr, nullptr) == SQLITE_OK &&
-        IsEmpty(strFile)) {
+    // A full disk has no room for a journal.
+    const int nLocked =
+        sqlite3_exec(pDb, "PRAGMA journal_mode = off; BEGIN EXCLUSIVE", nullptr, nullptr, nullptr);
+    if (nLocked == SQLITE_OK && IsEmpty(strFile)) {
         unlink(strFile.c_str());
     }
 }

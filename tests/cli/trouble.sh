@@ -137,6 +137,18 @@ same 'exit with a full disk' $? 7
 same 'a full disk' "$(cat err)" \
     "error: new.db: cannot commit a transaction: disk I/O error; check the disk and the shell's limits (nothing is stored)"
 same 'no database is left' "$(ls new.db 2>/dev/null)" ''
+# One that takes nothing at all, not even a journal.
+"$VORNJSONDB" dump all.db t >all.dump
+for words in 'init none.db t id:int' 'insert none.db t lines' 'load none.db all.dump'; do
+    found=$(
+        ulimit -f 0
+        "$VORNJSONDB" $words 2>&1
+    )
+    same "exit of $words without any room" $? 7
+    same "${words%% *} without any room" "${found% (nothing is stored)}" \
+        "error: none.db: cannot begin a transaction: disk I/O error; check the disk and the shell's limits"
+    same "${words%% *} leaves no database" "$(ls none.db 2>/dev/null)" ''
+done
 cp all.db before.db
 small update all.db t --where '{"id": {"$gt": 0}}' "text=$(printf 'x%.0s' {1..200})"
 same 'exit of an update with a full disk' $? 7
@@ -242,6 +254,15 @@ for instead in '' ': >gone.db'; do
         'error: gone.db: another program has removed or replaced the file; try again (nothing is stored)'
     rm -f gone.db
 done
+
+# What a killed call leaves does not disturb the next one.
+begin_insert dead.db
+kill -KILL "$pid"
+wait "$pid" 2>/dev/null
+same 'a killed insert leaves' "$(stat -c %s dead.db)" 0
+expect 0 'table
+-----' '' -- tables dead.db
+expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert dead.db t lines --key id
 
 # What is written to a database that was moved away would be nowhere.
 "$VORNJSONDB" init moved.db t id:int --quiet && cp moved.db other.db
