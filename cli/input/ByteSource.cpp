@@ -29,6 +29,8 @@ int OpenNameless() {
     return nFile;
 }
 
+}  // namespace
+
 bool WriteAll(int nFile, const char* pBytes, size_t nBytes) {
     while (nBytes > 0) {
         const ssize_t nWritten = write(nFile, pBytes, nBytes);
@@ -40,8 +42,6 @@ bool WriteAll(int nFile, const char* pBytes, size_t nBytes) {
     }
     return true;
 }
-
-}  // namespace
 
 ByteSource::~ByteSource() {
     if (m_blOwn) {

@@ -55,6 +55,9 @@ class ByteSource {
     size_t m_nLookedTaken = 0;
 };
 
+// All of it, or false with errno.
+bool WriteAll(int nFile, const char* pBytes, size_t nBytes);
+
 }  // namespace VORN_JSON_DB::Cli
 
 #endif  // VORNJSONDB_CLI_INPUT_BYTE_SOURCE_H

@@ -1,5 +1,6 @@
 #include "ErrorFile.h"
 
+#include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -7,6 +8,7 @@
 #include <cstring>
 
 #include "../Command.h"
+#include "ByteSource.h"
 #include "JsonQuote.h"
 #include "Utf8.h"
 
@@ -47,30 +49,52 @@ std::string WithoutBadBytes(std::string_view strBytes) {
 
 ErrorFile::ErrorFile(const std::string& strPath, const std::vector<std::string>& vecNeeded)
     : m_strPath(strPath) {
+    if (strPath == "-") {
+        Fail(kExitUsage, "--errors: - is no file; name one, such as /dev/stdout");
+    }
     CheckNotNeeded(strPath, vecNeeded);
-    m_pFile.reset(std::fopen(strPath.c_str(), "we"));
-    if (m_pFile == nullptr) {
+    m_nFile = open(strPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
+    if (m_nFile < 0) {
         Fail(kExitIo, strPath + ": " + std::strerror(errno) + "; name another file for --errors");
     }
 }
 
-void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::string& strReason) {
-    std::string strLine = "{\"file\":";
-    AppendQuoted(strInput, strLine);
-    strLine += ",\"line\":" + std::to_string(Where.nLine) +
-               ",\"record\":" + std::to_string(Where.nRecord) + ",\"reason\":";
-    AppendQuoted(strReason, strLine);
-    strLine += ",\"text\":";
-    AppendQuoted(WithoutBadBytes(Where.strText), strLine);
-    strLine += "}\n";
-    // Close looks at what became of it.
-    static_cast<void>(std::fwrite(strLine.data(), 1, strLine.size(), m_pFile.get()));
+ErrorFile::~ErrorFile() {
+    if (m_nFile >= 0) {
+        WriteWaiting();
+        close(m_nFile);
+    }
 }
 
-void ErrorFile::Close() {
-    const bool blWritten = std::ferror(m_pFile.get()) == 0;
-    if (std::fclose(m_pFile.release()) != 0 || !blWritten) {
-        Fail(kExitIo, m_strPath + ": cannot write: " + std::strerror(errno));
+void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::string& strReason) {
+    m_strWaiting += "{\"file\":";
+    AppendQuoted(strInput, m_strWaiting);
+    m_strWaiting += ",\"line\":" + std::to_string(Where.nLine) +
+                    ",\"record\":" + std::to_string(Where.nRecord) + ",\"reason\":";
+    AppendQuoted(strReason, m_strWaiting);
+    m_strWaiting += ",\"text\":";
+    AppendQuoted(WithoutBadBytes(Where.strText), m_strWaiting);
+    m_strWaiting += "}\n";
+    if (m_strWaiting.size() > ByteSource::kBlock) {
+        Write();
+    }
+}
+
+bool ErrorFile::WriteWaiting() {
+    const bool blWritten = WriteAll(m_nFile, m_strWaiting.data(), m_strWaiting.size());
+    const int nError = errno;
+    m_nWritten += blWritten ? static_cast<std::int64_t>(m_strWaiting.size()) : 0;
+    // A device has no end that could be moved.
+    [[maybe_unused]] const int nCut = blWritten ? 0 : ftruncate(m_nFile, m_nWritten);
+    errno = nError;
+    m_strWaiting.clear();
+    return blWritten;
+}
+
+void ErrorFile::Write() {
+    if (!WriteWaiting()) {
+        Fail(kExitIo, m_strPath + ": cannot write: " + std::strerror(errno) +
+                          "; free some space, or name another file for --errors");
     }
 }
 

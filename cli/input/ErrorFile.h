@@ -3,8 +3,7 @@
 #ifndef VORNJSONDB_CLI_INPUT_ERROR_FILE_H
 #define VORNJSONDB_CLI_INPUT_ERROR_FILE_H
 
-#include <cstdio>
-#include <memory>
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -18,15 +17,23 @@ class ErrorFile {
     // Begins with an empty file, whatever was in it: an Error, if it cannot be written, or is one
     // of those that the call needs.
     ErrorFile(const std::string& strPath, const std::vector<std::string>& vecNeeded);
+    ~ErrorFile();
+    ErrorFile(const ErrorFile&) = delete;
+    ErrorFile& operator=(const ErrorFile&) = delete;
+
     void Add(const std::string& strInput, const Place& Where, const std::string& strReason);
-    void Close();
+
+    // Comes before each commit: what the file cannot take is an Error, and the file ends with a
+    // whole line.
+    void Write();
 
   private:
-    struct CloseFile {
-        void operator()(std::FILE* pFile) const { static_cast<void>(std::fclose(pFile)); }
-    };
-    std::string m_strPath;
-    std::unique_ptr<std::FILE, CloseFile> m_pFile;
+    bool WriteWaiting();
+
+    const std::string m_strPath;
+    int m_nFile = -1;
+    std::int64_t m_nWritten = 0;
+    std::string m_strWaiting;
 };
 
 }  // namespace VORN_JSON_DB::Cli

@@ -78,6 +78,7 @@ class Import {
     Table m_Table;
     Loader m_Into;
     std::unique_ptr<Progress> m_pProgress;
+    std::unique_ptr<ErrorFile> m_pErrors;
     std::unique_ptr<LoaderSink> m_pSink;
 };
 
@@ -309,18 +310,17 @@ void Import::Load() {
         m_Call.Say("more than 1 GiB: committing after each " + std::to_string(kLargeBatch) +
                    " records; --batch 0 makes it all or nothing");
     }
-    std::unique_ptr<ErrorFile> pErrors;
     if (!m_How.strErrors.empty()) {
         std::vector<std::string> vecNeeded = m_How.vecFiles;
         vecNeeded.push_back(m_Call.Text("--def"));
         for (const char* const szSuffix : {"", "-journal", "-wal", "-shm"}) {
             vecNeeded.push_back(m_Call.Db() + szSuffix);
         }
-        pErrors = std::make_unique<ErrorFile>(m_How.strErrors, vecNeeded);
+        m_pErrors = std::make_unique<ErrorFile>(m_How.strErrors, vecNeeded);
     }
     Prepare();
     const bool blMode = m_How.eOnDuplicate != OnDuplicate::kStop;
-    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, pErrors.get(), blMode,
+    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, m_pErrors.get(), blMode,
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {
@@ -331,9 +331,6 @@ void Import::Load() {
     }
     CommitBatch();
     m_pProgress.reset();
-    if (pErrors) {
-        pErrors->Close();
-    }
 }
 
 bool Import::AfterRecord() {
@@ -347,6 +344,9 @@ bool Import::AfterRecord() {
 }
 
 void Import::CommitBatch() {
+    if (m_pErrors) {
+        m_pErrors->Write();
+    }
     NoteNulls();
     CheckInPlace(m_Call, m_pDb.get());
     Check(m_Into.Commit(), m_Call.Db());

@@ -120,8 +120,19 @@ done
 "$VORNJSONDB" list all.db nope >&- 2>&- <&-
 same 'exit with nothing open' $? 5
 printf '{"id": 1}\nx\n' >bad
-expect 7 '' 'error: /dev/full: cannot write: No space left on device (the first 2 records are dealt with and stay)' \
-    -- insert all.db t bad --replace --errors /dev/full
+full='cannot write: No space left on device; free some space, or name another file for --errors'
+expect 7 '' "error: /dev/full: $full (nothing is stored)" -- insert all.db t bad --replace --errors /dev/full
+{
+    echo '{"id": 2001}'
+    cat bad
+} >worse
+expect 7 '' "error: /dev/full: $full (the first 2 records are dealt with and stay)" -- \
+    insert new.db t worse --batch 2 --errors /dev/full
+rm new.db
+expect 2 '' 'error: --errors: - is no file; name one, such as /dev/stdout (nothing is stored)' -- \
+    insert all.db t bad --replace --errors -
+expect 3 '{"file":"bad","line":2,"record":2,"reason":"no value can begin like this","text":"x"}' \
+    '0 inserted, 1 replaced, 0 skipped, 1 failed (bad: JSON Lines)' -- insert all.db t bad --replace --errors /dev/stdout
 same 'the database is sound' "$(sqlite3 all.db 'PRAGMA integrity_check; SELECT count(*) FROM t')" \
     $'ok\n2000'
 
@@ -137,6 +148,13 @@ same 'exit with a full disk' $? 7
 same 'a full disk' "$(cat err)" \
     "error: new.db: cannot commit a transaction: disk I/O error; check the disk and the shell's limits (nothing is stored)"
 same 'no database is left' "$(ls new.db 2>/dev/null)" ''
+for i in {1..999}; do echo '{"id":'; done >broken.jsonl
+small insert all.db t broken.jsonl --format jsonl --errors bad.jsonl
+same 'exit where the bad records do not fit' $? 7
+same 'bad records that do not fit' "$(cat err)" \
+    'error: bad.jsonl: cannot write: File too large; free some space, or name another file for --errors (nothing is stored)'
+same 'no line is cut' "$(stat -c %s bad.jsonl)" 0
+
 # One that takes nothing at all, not even a journal.
 "$VORNJSONDB" dump all.db t >all.dump
 for words in 'init none.db t id:int' 'insert none.db t lines' 'load none.db all.dump'; do
@@ -258,7 +276,7 @@ done
 # What a killed call leaves does not disturb the next one.
 begin_insert dead.db
 kill -KILL "$pid"
-wait "$pid" 2>/dev/null
+{ wait "$pid"; } 2>/dev/null
 same 'a killed insert leaves' "$(stat -c %s dead.db)" 0
 expect 0 'table
 -----' '' -- tables dead.db
