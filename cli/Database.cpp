@@ -9,6 +9,7 @@
 #include <cstring>
 #include <sstream>
 
+#include "../table/Affinity.h"
 #include "JsonCells.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -110,11 +111,6 @@ int Look(sqlite3* pDb) {
 
 bool SameName(const std::string& strLeft, const std::string& strRight) {
     return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
-}
-
-bool HasName(const std::vector<std::string>& vecNames, const std::string& strName) {
-    return std::any_of(vecNames.begin(), vecNames.end(),
-                       [&](const std::string& strEach) { return SameName(strEach, strName); });
 }
 
 // Members without a column go; columns that are no member come, but those that can be none.
@@ -318,6 +314,48 @@ std::string NameForSqlite(const std::string& strTable, Access eAccess) {
                              "sync and index");
     }
     return "sqlite_master";
+}
+
+bool HasName(const std::vector<std::string>& vecNames, const std::string& strName) {
+    return std::any_of(vecNames.begin(), vecNames.end(),
+                       [&](const std::string& strEach) { return SameName(strEach, strName); });
+}
+
+std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
+    // A SQLite that knows no such pragma knows no STRICT table, either.
+    const Statement pList = Prepare(pDb, "PRAGMA main.table_list(" + Quoted(strTable) + ")");
+    const bool blStrict = Step(pList.get()) && sqlite3_column_int(pList.get(), 5) != 0;
+    const Statement pLook = Prepare(
+        pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE AND ?2");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    sqlite3_bind_int(pLook.get(), 2, blStrict ? 1 : 0);
+    std::vector<std::string> vecNames;
+    while (Step(pLook.get())) {
+        vecNames.push_back(ColumnText(pLook.get(), 0));
+    }
+    return vecNames;
+}
+
+std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable) {
+    using vornjsondb::Affinity;
+    const std::vector<std::string> vecAny = AnyColumns(pDb, strTable);
+    const Statement pLook = Prepare(pDb, "SELECT name, type FROM pragma_table_info(?1)");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    std::vector<std::string> vecNames;
+    while (Step(pLook.get())) {
+        const std::string strName = ColumnText(pLook.get(), 0);
+        const Affinity eAffinity = vornjsondb::AffinityOf(ColumnText(pLook.get(), 1));
+        if (eAffinity != Affinity::kNone && eAffinity != Affinity::kText &&
+            !HasName(vecAny, strName)) {
+            vecNames.push_back(strName);
+        }
+    }
+    return vecNames;
+}
+
+std::string NumberColumnText(const std::string& strColumn, std::string_view strText) {
+    return "member \"" + strColumn + "\": its column would turn the text \"" +
+           std::string(strText) + "\" into a number: give a number, or make the column TEXT";
 }
 
 void CheckNewName(const std::string& strTable) {

@@ -5,6 +5,7 @@
 
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "Command.h"
@@ -57,6 +58,13 @@ void CheckNewName(const std::string& strTable);
 
 // A default that its member's type cannot hold would be left out of a new table without a word.
 void CheckDefaults(const std::string& strTable, const Json::Value& jDefinition);
+
+// Columns that keep each value as it is although their type has a name: ANY in a STRICT table.
+std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable);
+// Columns that turn a text into a number if it looks like one. Such a text is refused.
+std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable);
+std::string NumberColumnText(const std::string& strColumn, std::string_view strText);
+bool HasName(const std::vector<std::string>& vecNames, const std::string& strName);
 
 // A statement of the command's own.
 struct FinalizeStatement {

@@ -5,6 +5,7 @@
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
+#include "input/Numbers.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -93,15 +94,20 @@ void SplitWords(const Context& Call, std::vector<std::string>& vecKeys,
     }
 }
 
-// Bytes, as list shows and insert takes them, would become a text.
-void CheckNoBytes(const Table& Of, const Json::Value& jMembers) {
+// Bytes, as list shows and insert takes them, would become a text; texts may become numbers.
+void CheckStorable(const Table& Of, const Json::Value& jMembers) {
     const Json::Value& jTypes = Of.Definition()[Of.Name()]["member"];
+    const std::vector<std::string> vecNumbers = NumberColumns(Of.Connection(), Of.Name());
     for (auto itMember = jMembers.begin(); itMember != jMembers.end(); ++itMember) {
-        if (itMember->isObject() && itMember->isMember("$base64") &&
-            jTypes[itMember.name()]["cpptype"] == "any") {
+        const Json::Value& jType = jTypes[itMember.name()]["cpptype"];
+        if (itMember->isObject() && itMember->isMember("$base64") && jType == "any") {
             Fail(kExitUsage, "member \"" + itMember.name() +
                                  "\": bytes are written by insert alone; give it the record on "
                                  "standard input, with --upsert");
+        }
+        if (itMember->isString() && (jType == "any" || jType == "string") &&
+            HasName(vecNumbers, itMember.name()) && IsNumberToSqlite(itMember->asString())) {
+            Fail(kExitBadData, NumberColumnText(itMember.name(), itMember->asString()));
         }
     }
 }
@@ -120,7 +126,7 @@ int RunUpdate(Context& Call) {
     }
     OpenTable Open(Call, Access::kChange);
     const Json::Value jMembers = ParseAssignments(Open.Records, vecAssignments);
-    CheckNoBytes(Open.Records, jMembers);
+    CheckStorable(Open.Records, jMembers);
     const auto Change = [&](const Query& Which, std::int64_t& nRows) {
         return Counted(Open, Which, nRows,
                        [&] { return Open.Records.Update(Which, jMembers, &nRows); });
@@ -168,7 +174,7 @@ int RunUpsert(Context& Call) {
     } else {
         jRecord = ParseAssignments(Open.Records, Call.WordsFrom(2));
     }
-    CheckNoBytes(Open.Records, jRecord);
+    CheckStorable(Open.Records, jRecord);
     Written eWritten{};
     Check(Open.Records.Save(jRecord, OnDuplicate::kUpsert, nullptr, &eWritten), Call.Db(),
           kExitBadData);

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "../Command.h"
+#include "../Database.h"
 #include "../JsonCells.h"
 #include "InputFiles.h"
 #include "JsonQuote.h"
@@ -41,6 +42,7 @@ LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool b
       m_pErrors(pErrors),
       m_blMode(blMode),
       m_fnAfter(std::move(fnAfter)),
+      m_vecNumberColumns(NumberColumns(Of.Connection(), Of.Name())),
       m_vecNulls(Of.Members().size()) {}
 
 void LoaderSink::BeginInput(const std::string& strName, bool blCells) {
@@ -50,10 +52,12 @@ void LoaderSink::BeginInput(const std::string& strName, bool blCells) {
 }
 
 void LoaderSink::NewMember(std::string_view strName) {
-    Column Added{std::string(strName), m_Into.MemberIndex(strName), BoundKind::kNone};
+    Column Added{std::string(strName), m_Into.MemberIndex(strName), BoundKind::kNone, false};
     if (Added.nLoader >= 0) {
         const Json::Value& jMembers = m_Of.Definition()[m_Of.Name()]["member"];
         Added.eKind = vornjsondb::TypeOfMember(jMembers[Added.strName]).Bound.eKind;
+        Added.blNumbers = (Added.eKind == BoundKind::kAny || Added.eKind == BoundKind::kText) &&
+                          HasName(m_vecNumberColumns, Added.strName);
     }
     m_vecColumns.push_back(std::move(Added));
 }
@@ -90,7 +94,15 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
         case Value::Kind::kJson:
             return SetObject(Into, Given.strText);
         default:
-            return m_Into.SetText(Into.nLoader, Given.strText);
+            return SetText(Into, Given.strText);
+    }
+}
+
+void LoaderSink::SetText(const Column& Into, std::string_view strText) {
+    if (Into.blNumbers && IsNumberToSqlite(strText)) {
+        m_Into.Reject(NumberColumnText(Into.strName, strText));
+    } else {
+        m_Into.SetText(Into.nLoader, strText);
     }
 }
 
@@ -117,7 +129,7 @@ void LoaderSink::SetWide(const Column& Into, std::string_view strNumber) {
     if (Into.eKind == BoundKind::kReal && ToReal(strNumber, dReal)) {
         m_Into.SetReal(Into.nLoader, dReal);
     } else {
-        m_Into.SetText(Into.nLoader, strNumber);
+        SetText(Into, strNumber);
     }
 }
 
@@ -143,7 +155,7 @@ void LoaderSink::SetCell(const Column& Into, std::string_view strCell) {
     switch (Into.eKind) {
         case BoundKind::kReal:
             return ToReal(strCell, dReal) ? m_Into.SetReal(Into.nLoader, dReal)
-                                          : m_Into.SetText(Into.nLoader, strCell);
+                                          : SetText(Into, strCell);
         case BoundKind::kInteger:
         case BoundKind::kAny:
             return Set(Into, Number);
@@ -151,9 +163,9 @@ void LoaderSink::SetCell(const Column& Into, std::string_view strCell) {
             if (strCell == "1" || strCell == "true" || strCell == "0" || strCell == "false") {
                 return m_Into.SetBoolean(Into.nLoader, strCell == "1" || strCell == "true");
             }
-            return m_Into.SetText(Into.nLoader, strCell);
+            return SetText(Into, strCell);
         case BoundKind::kText:
-            return m_Into.SetText(Into.nLoader, strCell);
+            return SetText(Into, strCell);
         default:
             return m_Into.SetJson(Into.nLoader, strCell);
     }

@@ -38,9 +38,11 @@ class LoaderSink : public Sink {
         std::string strName;
         int nLoader;  // -1: the table lacks it
         vornjsondb::BoundKind eKind;
+        bool blNumbers;  // it turns texts into numbers
     };
 
     void Set(const Column& Into, const Value& Given);
+    void SetText(const Column& Into, std::string_view strText);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
     void SetObject(const Column& Into, std::string_view strJson);
@@ -55,6 +57,7 @@ class LoaderSink : public Sink {
     std::string m_strInput;
     bool m_blCells = false;
     std::vector<Column> m_vecColumns;  // of the input
+    const std::vector<std::string> m_vecNumberColumns;
     std::vector<bool> m_vecNulls;
     std::string m_strUnknown;  // a member that the table lacks
     bool m_blUnknown = false;

@@ -1,6 +1,8 @@
 #include "Numbers.h"
 
 #include <charconv>
+#include <cstdlib>
+#include <string>
 
 namespace VORN_JSON_DB::Cli {
 
@@ -82,6 +84,22 @@ Value CellNumber(std::string_view strCell) {
         Found.eKind = Value::Kind::kReal;
     }
     return Found;
+}
+
+// Blanks around it, a plus and a point at either end do not matter.
+bool IsNumberToSqlite(std::string_view strText) {
+    constexpr char kBlanks[] = " \t\n\v\f\r";
+    const size_t nBegin = strText.find_first_not_of(kBlanks);
+    if (nBegin == std::string_view::npos) {
+        return false;
+    }
+    const size_t nEnd = strText.find_last_not_of(kBlanks) + 1;
+    const std::string strNumber(strText.substr(nBegin, nEnd - nBegin));
+    char* pRead = nullptr;
+    std::strtod(strNumber.c_str(), &pRead);
+    // The words for infinity and the hexadecimal numbers of C are texts to SQLite.
+    return pRead == strNumber.data() + strNumber.size() &&
+           strNumber.find_first_not_of("+-.0123456789eE") == std::string::npos;
 }
 
 }  // namespace VORN_JSON_DB::Cli

@@ -63,6 +63,40 @@ same 'lint goes on' "$(cut -f 1,3,4 found)" 'table	code	path
 odd	bad-name	/odd/member/$x
 zoo	missing-column	/zoo/member/b'
 
+# A text that SQLite would store as a number comes back as another value: it is refused.
+sqlite3 number.db 'CREATE TABLE t (id INTEGER PRIMARY KEY, code NUMERIC, price DECIMAL(5,2), day DATE, free);
+    CREATE TABLE strict (id INTEGER PRIMARY KEY, code ANY, "a/b~c" any) STRICT'
+lost() {
+    echo "member \"code\": its column would turn the text \"$1\" into a number: give a number, or make the column TEXT"
+}
+at='cannot load record 1 into table "t": '
+remedy='; correct the record where it comes from (nothing is stored)'
+for text in 007 5 +5 ' 5 ' .5 5. -5e1 12345678901234567890; do
+    echo "[{\"id\": 1, \"code\": \"$text\"}]" >number.json
+    expect 3 '' "error: number.json:1: $at$(lost "$text")$remedy" -- insert number.db t number.json
+    expect 3 '' "error: $(lost "$text")" -- upsert number.db t "{\"id\": 1, \"code\": \"$text\"}"
+done
+echo '[{"id": 1, "code": 12345678901234567890}]' >number.json
+expect 3 '' "error: number.json:1: $at$(lost 12345678901234567890)$remedy" -- insert number.db t number.json
+printf 'id,code,price,day,free\n1,A7,9.50,2020-01-01,007\n2,7,7,1e3,x\n3,0x10,inf,1 2,5e\n4,e5,.,,-\n' >number.csv
+expect 3 '' 'error: number.csv:3: cannot load record 2 into table "t": member "day": its column would turn the text "1e3" into a number: give a number, or make the column TEXT; correct the record where it comes from (nothing is stored)' \
+    -- insert number.db t number.csv
+expect 3 '' '3 inserted, 0 replaced, 0 skipped, 1 failed (number.csv: CSV)' -- \
+    insert number.db t number.csv --errors bad.jsonl
+expect 0 '{"id":1,"code":"A7","price":9.5,"day":"2020-01-01","free":"007"}
+{"id":3,"code":"0x10","price":"inf","day":"1 2","free":"5e"}
+{"id":4,"code":"e5","price":".","free":"-"}' '' -- list number.db t --format jsonl
+expect 3 '' "error: $(lost 08)" -- update number.db t 1 code=08
+expect 0 '' 'updated 1 record' -- update number.db t 1 code=8 day=2021 free:='"08"'
+expect 0 '{"id":1,"code":8,"price":9.5,"day":2021,"free":"08"}' '' -- get number.db t 1
+# A column of the type ANY keeps all in a STRICT table, and lint knows.
+expect 0 '' 'inserted 1 record' -- upsert number.db strict id=1 code=007
+expect 0 '{"id":1,"code":"007"}' '' -- get number.db strict 1
+expect 0 '' 'no findings' -- lint number.db strict
+echo '[{"id": 2, "code": "1e3"}]' >strict.json
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (strict.json: JSON)' -- insert number.db strict strict.json
+expect 0 '{"id":2,"code":"1e3"}' '' -- get number.db strict 2
+
 # A variable that is not set makes neither a database that is gone afterwards nor a table without a name.
 for database in '' :memory: file::memory: 'file:new.db?mode=memory'; do
     for words in 'insert more.json' 'list'; do
