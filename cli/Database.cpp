@@ -431,6 +431,36 @@ void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value
     Step(pWrite.get());
 }
 
+Replacements::Replacements(sqlite3* pDb, const std::string& strTable) {
+    const Statement pLook = Prepare(pDb,
+                                    "SELECT 1 FROM sqlite_master WHERE type = 'table' AND name = "
+                                    "?1 COLLATE NOCASE AND sql LIKE '%CONFLICT%REPLACE%'");
+    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    if (Step(pLook.get())) {
+        m_pCount = Prepare(pDb, "SELECT count(*) FROM " + Quoted(strTable));
+        m_nBefore = Count();
+    }
+}
+
+std::int64_t Replacements::Count() const {
+    sqlite3_reset(m_pCount.get());
+    Step(m_pCount.get());
+    const std::int64_t nCount = sqlite3_column_int64(m_pCount.get(), 0);
+    sqlite3_reset(m_pCount.get());
+    return nCount;
+}
+
+std::int64_t Replacements::Gone(std::int64_t nInserted) const {
+    return m_pCount ? std::max<std::int64_t>(0, m_nBefore + nInserted - Count()) : 0;
+}
+
+std::string GoneText(std::int64_t nGone) {
+    return nGone == 0 ? ""
+                      : "; " + std::to_string(nGone) +
+                            (nGone == 1 ? " other record is" : " other records are") +
+                            " gone, by the table's own ON CONFLICT REPLACE";
+}
+
 OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition)
     : pDb(OpenDatabase(Call, eAccess)) {
     CheckEncoding(Call, pDb.get());

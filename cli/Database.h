@@ -3,6 +3,7 @@
 #ifndef VORNJSONDB_CLI_DATABASE_H
 #define VORNJSONDB_CLI_DATABASE_H
 
+#include <cstdint>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -76,6 +77,23 @@ bool Step(sqlite3_stmt* pStatement);  // false after the last row; a failure is 
 void Run(sqlite3* pDb, const std::string& strSql);
 std::string ColumnText(sqlite3_stmt* pStatement, int nColumn);
 std::string Quoted(const std::string& strName);  // as an SQL name
+
+// Of a table that by its own ON CONFLICT REPLACE removes records to make room for others, which
+// SQLite counts nowhere. Made within the transaction that changes it.
+class Replacements {
+  public:
+    Replacements(sqlite3* pDb, const std::string& strTable);
+    // How many went away, where so many came.
+    std::int64_t Gone(std::int64_t nInserted) const;
+
+  private:
+    std::int64_t Count() const;
+
+    Statement m_pCount;  // null for all other tables
+    std::int64_t m_nBefore = 0;
+};
+// "; 1 other record is gone, ..."; nothing for none.
+std::string GoneText(std::int64_t nGone);
 
 // A database with one table open, which is what most subcommands work on.
 struct OpenTable {

@@ -15,10 +15,14 @@ std::string Records(std::int64_t nRecords) {
     return std::to_string(nRecords) + (nRecords == 1 ? " record" : " records");
 }
 
-int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords) {
+int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords,
+                std::int64_t nGone = 0) {
     Json::Value jResult;
     jResult[szDone] = Json::Int64(nRecords);
-    Call.Report(std::string(szDone) + " " + Records(nRecords), jResult);
+    if (nGone > 0) {
+        jResult["gone"] = Json::Int64(nGone);
+    }
+    Call.Report(std::string(szDone) + " " + Records(nRecords) + GoneText(nGone), jResult);
     return kExitFine;
 }
 
@@ -61,12 +65,10 @@ Status Counted(OpenTable& Open, const Query& Which, std::int64_t& nRecords,
          strTable + "has no record with the key \"" + strKey + "\"; nothing was changed");
 }
 
-// Runs a change for each key; a key that is not there undoes them all.
+// Runs a change for each key; a key that is not there is an Error.
 template <typename Change>
 std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std::string>& vecKeys,
                      const Change& fnChange) {
-    Transaction All;
-    BeginChange(Call, Open.pDb.get(), All);
     std::int64_t nRecords = 0;
     std::set<Json::Value> setDone;  // a record whose key is given twice is one record
     for (const std::string& strKey : vecKeys) {
@@ -82,7 +84,6 @@ std::int64_t ForKeys(const Context& Call, OpenTable& Open, const std::vector<std
         }
         nRecords += nChanged;
     }
-    Check(All.Commit(), Call.Db());
     return nRecords;
 }
 
@@ -131,13 +132,18 @@ int RunUpdate(Context& Call) {
         return Counted(Open, Which, nRows,
                        [&] { return Open.Records.Update(Which, jMembers, &nRows); });
     };
+    Transaction All;
+    BeginChange(Call, Open.pDb.get(), All);
+    const Replacements Others(Open.pDb.get(), Open.Records.Name());
     std::int64_t nRecords = 0;
     if (vecKeys.empty()) {
         Check(Change(ParseQuery(Call, Open.Records, {}), nRecords), Call.Db());
     } else {
         nRecords = ForKeys(Call, Open, vecKeys, Change);
     }
-    return ReportCount(Call, "updated", nRecords);
+    const std::int64_t nGone = Others.Gone(0);
+    Check(All.Commit(), Call.Db());
+    return ReportCount(Call, "updated", nRecords, nGone);
 }
 
 int RunDelete(Context& Call) {
@@ -151,6 +157,8 @@ int RunDelete(Context& Call) {
         Fail(kExitUsage, "delete --all removes every record; add --yes if that is meant");
     }
     OpenTable Open(Call, Access::kChange);
+    Transaction All;
+    BeginChange(Call, Open.pDb.get(), All);
     std::int64_t nRecords = 0;
     const auto Change = [&Open](const Query& Which, std::int64_t& nRows) {
         return Counted(Open, Which, nRows, [&] { return Open.Records.Remove(Which, &nRows); });
@@ -163,6 +171,7 @@ int RunDelete(Context& Call) {
     } else {
         nRecords = ForKeys(Call, Open, vecKeys, Change);
     }
+    Check(All.Commit(), Call.Db());
     return ReportCount(Call, "deleted", nRecords);
 }
 
@@ -175,10 +184,16 @@ int RunUpsert(Context& Call) {
         jRecord = ParseAssignments(Open.Records, Call.WordsFrom(2));
     }
     CheckStorable(Open.Records, jRecord);
+    Transaction All;
+    BeginChange(Call, Open.pDb.get(), All);
+    const Replacements Others(Open.pDb.get(), Open.Records.Name());
     Written eWritten{};
     Check(Open.Records.Save(jRecord, OnDuplicate::kUpsert, nullptr, &eWritten), Call.Db(),
           kExitBadData);
-    return ReportCount(Call, eWritten == Written::kInserted ? "inserted" : "updated", 1);
+    const bool blInserted = eWritten == Written::kInserted;
+    const std::int64_t nGone = Others.Gone(blInserted ? 1 : 0);
+    Check(All.Commit(), Call.Db());
+    return ReportCount(Call, blInserted ? "inserted" : "updated", 1, nGone);
 }
 
 }  // namespace VORN_JSON_DB::Cli

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <optional>
 
 #include "../Database.h"
 #include "InputFiles.h"
@@ -72,7 +73,10 @@ class Import {
     Json::Value m_jOwnKey;  // of the definition, where --key gives another for this call
     std::vector<std::string> m_vecNotes;
     std::int64_t m_nBatch = 0;
-    std::int64_t m_nStored = 0;  // records that a commit has dealt with
+    std::int64_t m_nStored = 0;            // records that a commit has dealt with
+    std::optional<Replacements> m_Others;  // of the transaction that is under way
+    std::int64_t m_nInserted = 0;          // before it
+    std::int64_t m_nGone = 0;
     // In this order: each works on what is above it.
     Transaction m_All;
     Table m_Table;
@@ -281,6 +285,7 @@ void Import::Prepare() {
     HowToLoad.nRowsPerTransaction = 0;
     HowToLoad.blGoOnAfterBad = !m_How.strErrors.empty();
     Check(m_Into.Start(m_Table, HowToLoad), m_Call.Db());
+    m_Others.emplace(m_pDb.get(), m_strTable);
 }
 
 // SQLite finds a record by its key only where no two can have the same.
@@ -339,6 +344,7 @@ bool Import::AfterRecord() {
     if (m_nBatch > 0 && nRecords - m_nStored >= m_nBatch) {
         CommitBatch();
         BeginChange(m_Call, m_pDb.get(), m_All);
+        m_Others.emplace(m_pDb.get(), m_strTable);
     }
     return !Interrupt::Came();
 }
@@ -349,6 +355,10 @@ void Import::CommitBatch() {
     }
     NoteNulls();
     CheckInPlace(m_Call, m_pDb.get());
+    const std::int64_t nInserted = m_Into.Counts().nInserted;
+    m_nGone += m_Others->Gone(nInserted - m_nInserted);
+    m_nInserted = nInserted;
+    m_Others.reset();
     Check(m_Into.Commit(), m_Call.Db());
     Check(m_All.Commit(), m_Call.Db());
     m_nStored = m_Into.Counts().nRecords;
@@ -399,7 +409,10 @@ int Import::Finish() {
     for (const std::string& strNote : m_vecNotes) {
         m_Call.Say(strNote);
     }
-    m_Call.Report(strLine + " (" + m_Files.Formats() + ")", jCounts);
+    if (m_nGone > 0) {
+        jCounts["gone"] = Json::Int64{m_nGone};
+    }
+    m_Call.Report(strLine + " (" + m_Files.Formats() + ")" + GoneText(m_nGone), jCounts);
     return Counts.nFailed > 0 ? kExitBadData : kExitFine;
 }
 

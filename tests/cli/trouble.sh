@@ -310,7 +310,7 @@ expect 0 0 '' -- count all.db t
 expect 6 '' "error: all.db: cannot begin a transaction: $locked (nothing is stored)" -- \
     insert all.db t lines --wait 10
 expect 6 '' "error: all.db: cannot begin a transaction: $locked" -- update all.db t 1 text=x --wait 10
-expect 6 '' "error: all.db: cannot save a record in table \"t\": $locked" -- \
+expect 6 '' "error: all.db: cannot begin a transaction: $locked" -- \
     upsert all.db t id=1 --wait 10
 expect 6 '' "error: all.db: cannot create an index on table \"t\": $locked" -- index all.db t text --wait 10
 "$VORNJSONDB" doctor all.db >out

@@ -80,6 +80,22 @@ expect 0 '' 'deleted 1 record' -- delete own.db v --where '{"id": 1}'
 expect 0 '' 'deleted 2 records' -- delete own.db v --all --yes
 expect 0 0 '' -- count own.db t
 
+# A table that removes records to make room for others says so by its counts.
+sqlite3 room.db "CREATE TABLE t (id INTEGER PRIMARY KEY, a TEXT UNIQUE ON CONFLICT
+    REPLACE, b TEXT); INSERT INTO t VALUES (1, 'x', 'REPLACE'), (2, 'y', ''), (3, 'z', '')"
+gone='by the table'\''s own ON CONFLICT REPLACE'
+printf '{"id": %d, "a": "%s"}\n' 11 x 12 y 13 new 14 new >room.json
+expect 0 '' "4 inserted, 0 replaced, 0 skipped, 0 failed (room.json: JSON Lines); 3 other records are gone, $gone" -- \
+    insert room.db t room.json --batch 1
+expect 0 '' "updated 1 record; 1 other record is gone, $gone" -- update room.db t 3 a=x
+expect 0 '{"gone":1,"updated":1}' '' -- update room.db t --where '{"id": 3}' a=y --json
+expect 0 '' "inserted 1 record; 1 other record is gone, $gone" -- upsert room.db t id=4 a=y
+expect 0 '' 'updated 1 record' -- upsert room.db t id=4 a=z
+expect 0 '[{"id":4},
+ {"id":14}]' '' -- list room.db t --members id --sort id
+printf '[{"id": 15, "a": "z"}, {"id": 4, "a": "new"}]' >room.json
+expect 0 '{"failed":0,"gone":2,"inserted":2,"replaced":0,"skipped":0}' '' -- insert room.db t room.json --json
+
 # A key that is given twice is one record, and a default that does not fit is no default.
 expect 0 '' 'updated 2 records' -- update shop.db product 1 2 1 price=1
 expect 0 '' 'inserted 1 record' -- upsert shop.db product id=70 name=x
