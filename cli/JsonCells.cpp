@@ -1,43 +1,16 @@
 #include "JsonCells.h"
 
-#include <utf8proc.h>
-
 #include <charconv>
 #include <cmath>
+
+#include "input/JsonQuote.h"
+#include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
 namespace {
 
 const char kBase64[] = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
-
-// The length of the character that begins at nAt, or 0 where the bytes are not UTF-8.
-std::size_t CharacterAt(std::string_view strText, std::size_t nAt) {
-    utf8proc_int32_t nCode = 0;
-    const auto* pBytes = reinterpret_cast<const utf8proc_uint8_t*>(strText.data());
-    const utf8proc_ssize_t nLength =
-        utf8proc_iterate(pBytes + nAt, static_cast<utf8proc_ssize_t>(strText.size() - nAt), &nCode);
-    return nLength > 0 ? static_cast<std::size_t>(nLength) : 0;
-}
-
-void AppendEscape(std::string& strOut, unsigned char c) {
-    const char* const szShort = "\"\"\\\\\bb\ff\nn\rr\tt";
-    for (const char* pPair = szShort; *pPair != '\0'; pPair += 2) {
-        if (static_cast<unsigned char>(*pPair) == c) {
-            strOut += '\\';
-            strOut += pPair[1];
-            return;
-        }
-    }
-    const char* const szHex = "0123456789abcdef";
-    strOut += "\\u00";
-    strOut += szHex[c >> 4];
-    strOut += szHex[c & 15];
-}
-
-bool IsPlain(unsigned char c) {
-    return c >= 0x20 && c < 0x80 && c != '"' && c != '\\';
-}
 
 }  // namespace
 
@@ -61,25 +34,11 @@ void AppendReal(std::string& strOut, double dValue) {
 }
 
 void AppendJsonString(std::string& strOut, std::string_view strText) {
-    strOut += '"';
-    std::size_t nDone = 0;
-    for (std::size_t nAt = 0; nAt < strText.size();) {
-        const auto c = static_cast<unsigned char>(strText[nAt]);
-        const std::size_t nLength = c < 0x80 ? 1 : CharacterAt(strText, nAt);
-        if (IsPlain(c) || (c >= 0x80 && nLength != 0)) {
-            nAt += nLength;
-            continue;
-        }
-        strOut += strText.substr(nDone, nAt - nDone);
-        if (c < 0x80) {
-            AppendEscape(strOut, c);
-        } else {
-            strOut += "\xEF\xBF\xBD";
-        }
-        nDone = ++nAt;
+    if (IsUtf8(strText)) {
+        AppendQuoted(strText, strOut);
+    } else {
+        AppendQuoted(WithoutBadBytes(strText), strOut);
     }
-    strOut += strText.substr(nDone);
-    strOut += '"';
 }
 
 void AppendJson(std::string& strOut, std::string_view strJson) {
@@ -140,15 +99,7 @@ void AppendBlob(std::string& strOut, std::string_view strBytes) {
 }
 
 bool IsUtf8(std::string_view strText) {
-    for (std::size_t nAt = 0; nAt < strText.size();) {
-        const auto c = static_cast<unsigned char>(strText[nAt]);
-        const std::size_t nLength = c < 0x80 ? 1 : CharacterAt(strText, nAt);
-        if (nLength == 0) {
-            return false;
-        }
-        nAt += nLength;
-    }
-    return true;
+    return FindNoUtf8(strText) == std::string_view::npos;
 }
 
 namespace {

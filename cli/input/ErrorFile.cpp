@@ -36,15 +36,6 @@ void CheckNotNeeded(const std::string& strPath, const std::vector<std::string>& 
     }
 }
 
-// JSON holds nothing but UTF-8.
-std::string WithoutBadBytes(std::string_view strBytes) {
-    std::string strText(strBytes);
-    for (size_t i = FindNoUtf8(strText); i != std::string::npos; i = FindNoUtf8(strText)) {
-        strText.replace(i, 1, "\xEF\xBF\xBD");
-    }
-    return strText;
-}
-
 }  // namespace
 
 ErrorFile::ErrorFile(const std::string& strPath, const std::vector<std::string>& vecNeeded)

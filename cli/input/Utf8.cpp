@@ -1,5 +1,6 @@
 #include "Utf8.h"
 
+#include <cstdint>
 #include <cstdio>
 #include <cstring>
 
@@ -39,59 +40,59 @@ size_t LengthAt(std::string_view strBytes, size_t nOffset) {
     return 0;
 }
 
-bool IsAllAscii(const char* pEight) {
-    unsigned long long nEight = 0;
+// How many of eight bytes, from the first on, are ASCII and not below cLeast. It may say less.
+size_t PlainBytes(const char* pEight, unsigned char cLeast) {
+    constexpr std::uint64_t kOnes = 0x0101010101010101U;
+    std::uint64_t nEight = 0;
     std::memcpy(&nEight, pEight, sizeof nEight);
-    return (nEight & 0x8080808080808080ULL) == 0;
+    // The top bit of each byte that is none of them, and maybe of bytes after the first such.
+    const std::uint64_t nOther = (nEight | (nEight - cLeast * kOnes)) & (0x80 * kOnes);
+    if (nOther == 0) {
+        return sizeof nEight;
+    }
+    constexpr bool kFirstIsLowest = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__;
+    return kFirstIsLowest ? static_cast<size_t>(__builtin_ctzll(nOther)) / 8 : 0;
 }
 
-// All of eight bytes lie between the blank and the last of ASCII.
-bool IsAllPrintable(const char* pEight) {
-    unsigned long long nEight = 0;
-    std::memcpy(&nEight, pEight, sizeof nEight);
-    return ((nEight | (nEight - 0x2020202020202020ULL)) & 0x8080808080808080ULL) == 0;
+// The offset of the first byte that is no part of UTF-8, or ASCII below cLeast; npos: there is
+// none.
+size_t FindOther(std::string_view strBytes, unsigned char cLeast) {
+    size_t i = 0;
+    while (i < strBytes.size()) {
+        const size_t nPlain =
+            i + 8 <= strBytes.size() ? PlainBytes(strBytes.data() + i, cLeast) : 0;
+        i += nPlain;
+        if (nPlain == 8) {
+            continue;
+        }
+        const auto cNext = static_cast<unsigned char>(strBytes[i]);
+        const size_t nLength = cNext >= 0x80 ? LengthAt(strBytes, i) : cNext >= cLeast ? 1 : 0;
+        if (nLength == 0) {
+            return i;
+        }
+        i += nLength;
+    }
+    return std::string_view::npos;
 }
 
 }  // namespace
 
 bool IsUtf8WithoutControls(std::string_view strBytes) {
-    size_t i = 0;
-    while (i < strBytes.size()) {
-        const auto cNext = static_cast<unsigned char>(strBytes[i]);
-        if (i + 8 <= strBytes.size() && IsAllPrintable(strBytes.data() + i)) {
-            i += 8;
-        } else if (cNext < 0x80) {
-            if (cNext < ' ') {
-                return false;
-            }
-            ++i;
-        } else {
-            const size_t nLength = LengthAt(strBytes, i);
-            if (nLength == 0) {
-                return false;
-            }
-            i += nLength;
-        }
-    }
-    return true;
+    return FindOther(strBytes, ' ') == std::string_view::npos;
 }
 
 size_t FindNoUtf8(std::string_view strBytes) {
-    size_t i = 0;
-    while (i < strBytes.size()) {
-        if (i + 8 <= strBytes.size() && IsAllAscii(strBytes.data() + i)) {
-            i += 8;
-        } else if (static_cast<unsigned char>(strBytes[i]) < 0x80) {
-            ++i;
-        } else {
-            const size_t nLength = LengthAt(strBytes, i);
-            if (nLength == 0) {
-                return i;
-            }
-            i += nLength;
-        }
+    return FindOther(strBytes, 0);
+}
+
+std::string WithoutBadBytes(std::string_view strBytes) {
+    std::string strText;
+    for (size_t i = FindNoUtf8(strBytes); i != std::string_view::npos; i = FindNoUtf8(strBytes)) {
+        strText += strBytes.substr(0, i);
+        strText += "\xEF\xBF\xBD";
+        strBytes.remove_prefix(i + 1);
     }
-    return std::string_view::npos;
+    return strText += strBytes;
 }
 
 std::string NoUtf8Text(std::string_view strBytes, size_t nOffset) {

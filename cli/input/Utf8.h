@@ -15,6 +15,9 @@ size_t FindNoUtf8(std::string_view strBytes);
 // Whether all is UTF-8, with none of the characters below a blank.
 bool IsUtf8WithoutControls(std::string_view strBytes);
 
+// With U+FFFD for each byte that is no part of UTF-8.
+std::string WithoutBadBytes(std::string_view strBytes);
+
 // "byte 0xE9 is no UTF-8; ..."
 std::string NoUtf8Text(std::string_view strBytes, size_t nOffset);
 
