@@ -66,6 +66,9 @@ int RunGuarded(int nArguments, char** pszArguments) {
 
 int main(int nArguments, char** pszArguments) {
     KeepClosed();
+    // There is one thread, which needs no locks, and nobody asks how much memory SQLite has.
+    sqlite3_config(SQLITE_CONFIG_SINGLETHREAD);
+    sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
     // A reader that goes away ends the command without a word, whatever the parent made of it; a
     // file that hits the limit of the shell is a write error like others.
     static_cast<void>(signal(SIGPIPE, SIG_DFL));
