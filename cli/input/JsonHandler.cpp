@@ -100,8 +100,8 @@ bool JsonHandler::NoRecord(const Value& Given, const char* szKind) {
     return EndRecord();
 }
 
-bool JsonHandler::CheckText(std::string_view strText) {
-    const bool blWrong = m_blEscapes && HasSurrogate(strText);
+bool JsonHandler::CheckEscapes(std::string_view strText) {
+    const bool blWrong = HasSurrogate(strText);
     if (blWrong) {
         Blame("\\u gives half of a surrogate pair");
     }

@@ -74,7 +74,8 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     void BeginRecord(std::string_view strTaken);
     bool EndRecord();
     void Blame(std::string strReason);
-    bool CheckText(std::string_view strText);
+    bool CheckText(std::string_view strText) { return !m_blEscapes || CheckEscapes(strText); }
+    bool CheckEscapes(std::string_view strText);
     void NestedKey(std::string_view strName);
     void AppendToJson(std::string_view strText);
     void AppendTextToJson(std::string_view strText);

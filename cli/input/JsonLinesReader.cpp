@@ -74,9 +74,6 @@ class LinesReader {
             return m_Handler.Broken("the line is longer than " + std::to_string(kMostRecordBytes) +
                                     " bytes");
         }
-        if (std::memchr(pBegin, '\0', m_Lines.Size()) != nullptr) {
-            return m_Handler.Broken("there is a NUL byte");
-        }
         // RapidJSON is several times as fast where it checks no text; one check of the line does
         // it. What it would complain about, it is given to find.
         constexpr unsigned kFlags = kJsonFlags | rapidjson::kParseInsituFlag;
@@ -84,6 +81,9 @@ class LinesReader {
             kFlags & ~unsigned{rapidjson::kParseValidateEncodingFlag};
         const std::string_view strLine(pBegin, m_Lines.Size());
         const bool blChecked = IsUtf8WithoutControls(strLine);
+        if (!blChecked && strLine.find('\0') != std::string_view::npos) {
+            return m_Handler.Broken("there is a NUL byte");
+        }
         m_Handler.MayHaveEscapes(strLine.find('\\') != std::string_view::npos);
         rapidjson::InsituStringStream Stream(pBegin);
         rapidjson::SkipWhitespace(Stream);

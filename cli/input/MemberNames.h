@@ -28,18 +28,30 @@ class MemberNames {
     }
 
     // The member's number. blTwice: the record has it already.
-    size_t Find(std::string_view strName, bool& blTwice);
+    size_t Find(std::string_view strName, bool& blTwice) {
+        // Records mostly have the same order.
+        const bool blNext = m_nNext < m_vecNames.size() && *m_vecNames[m_nNext] == strName;
+        const size_t nMember = blNext ? m_nNext : Look(strName);
+        if (nMember != kTooMany) {
+            blTwice = m_vecLastRecord[nMember] == m_nRecord;
+            m_vecLastRecord[nMember] = m_nRecord;
+            m_nNext = nMember + 1;
+        }
+        return nMember;
+    }
 
     const std::string& Name(size_t nMember) const { return *m_vecNames[nMember]; }
     size_t Size() const { return m_vecNames.size(); }
 
   private:
+    size_t Look(std::string_view strName);
+
     Sink& m_To;
     std::map<std::string, size_t, std::less<>> m_mapNumbers;
     std::vector<const std::string*> m_vecNames;  // keys of the map
     std::vector<std::int64_t> m_vecLastRecord;   // that had the member
     std::int64_t m_nRecord = 0;
-    size_t m_nNext = 0;  // records mostly have the same order: the one to look at first
+    size_t m_nNext = 0;  // the one to compare with first
 };
 
 }  // namespace VORN_JSON_DB::Cli

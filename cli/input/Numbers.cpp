@@ -58,13 +58,13 @@ bool ToReal(std::string_view strNumber, double& dReal) {
 Value JsonNumber(std::string_view strNumber) {
     Value Found;
     Found.strText = strNumber;
-    const bool blWhole =
-        strNumber != "-0" && strNumber.find_first_of(".eE") == std::string_view::npos;
-    if (blWhole) {
-        const bool blFits = Converts(strNumber, Found.nInteger);
-        Found.eKind = blFits ? Value::Kind::kInteger : Value::Kind::kWide;
+    if (Converts(strNumber, Found.nInteger) && strNumber != "-0") {
+        Found.eKind = Value::Kind::kInteger;
     } else {
-        Found.eKind = ToReal(strNumber, Found.dReal) ? Value::Kind::kReal : Value::Kind::kWide;
+        const bool blWhole =
+            strNumber != "-0" && strNumber.find_first_of(".eE") == std::string_view::npos;
+        Found.eKind =
+            !blWhole && ToReal(strNumber, Found.dReal) ? Value::Kind::kReal : Value::Kind::kWide;
     }
     return Found;
 }
