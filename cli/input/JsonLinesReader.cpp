@@ -1,7 +1,5 @@
 // JSON Lines: each line is read where it lies in memory, and a bad one harms no other.
 
-#include <cstring>
-
 #include "JsonHandler.h"
 #include "LineBuffer.h"
 #include "Utf8.h"
@@ -31,23 +29,6 @@ class LinePosition : public JsonPosition {
     std::string m_strText;
 };
 
-// Zeros after the line, which the reader looks at in steps of sixteen bytes, and what was there
-// afterwards.
-class Padding {
-  public:
-    explicit Padding(char* pEnd) : m_pEnd(pEnd) {
-        std::memcpy(m_acSaved, pEnd, sizeof m_acSaved);
-        std::memset(pEnd, 0, sizeof m_acSaved);
-    }
-    ~Padding() { std::memcpy(m_pEnd, m_acSaved, sizeof m_acSaved); }
-    Padding(const Padding&) = delete;
-    Padding& operator=(const Padding&) = delete;
-
-  private:
-    char* const m_pEnd;
-    char m_acSaved[LineBuffer::kPad];
-};
-
 class LinesReader {
   public:
     LinesReader(ByteSource& From, const ReadOptions& How, Sink& To)
@@ -69,7 +50,6 @@ class LinesReader {
   private:
     bool ReadLine() {
         char* const pBegin = m_Lines.Begin();
-        const Padding Zeros(pBegin + m_Lines.Size());
         if (m_Lines.IsTooLong()) {
             return m_Handler.Broken("the line is longer than " + std::to_string(kMostRecordBytes) +
                                     " bytes");

@@ -49,6 +49,7 @@ bool LineBuffer::Next() {
             break;
         }
     }
+    Begin()[m_nSize] = '\0';
     ++m_nNumber;
     return true;
 }

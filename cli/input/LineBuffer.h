@@ -12,12 +12,11 @@ namespace VORN_JSON_DB::Cli {
 
 class LineBuffer {
   public:
-    // Lines longer than nMost are skipped and reported as such. After each line there are kPad
-    // bytes more that may be overwritten, if they are put back.
-    static constexpr size_t kPad = 16;
+    // Lines longer than nMost are skipped and reported as such.
     LineBuffer(ByteSource& From, size_t nMost) : m_From(From), m_nMost(nMost) {}
 
-    // False at the end. The line is without its line feed.
+    // False at the end. The line is without its line feed, and a NUL follows it. Who looks for that
+    // sixteen bytes at a time may read beyond it.
     bool Next();
 
     char* Begin() { return m_vecBytes.data() + m_nBegin; }
@@ -26,6 +25,7 @@ class LineBuffer {
     std::int64_t Number() const { return m_nNumber; }
 
   private:
+    static constexpr size_t kPad = 16;
     bool Fill();
 
     ByteSource& m_From;

@@ -9,7 +9,6 @@
 #include <utility>
 #include <vector>
 
-#include "LineBuffer.h"
 #include "MemberNames.h"
 #include "Readers.h"
 #include "Utf8.h"
