@@ -17,6 +17,7 @@ namespace VORN_JSON_DB::Cli {
 namespace {
 
 const char kKeptTable[] = "vornjsondb_definition";
+const char kTablesAndViews[] = "SELECT name FROM sqlite_master WHERE type IN ('table', 'view')";
 
 constexpr int kFlags[] = {SQLITE_OPEN_READONLY, SQLITE_OPEN_READWRITE,
                           SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE};
@@ -56,9 +57,7 @@ std::string FileOf(sqlite3* pDb) {
     std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
     const StatusCode eCode = CodeOf(sqlite3_extended_errcode(pDb));
     if (eCode == StatusCode::kLocked) {
-        const Statement pWaited = Prepare(pDb, "PRAGMA busy_timeout");
-        Step(pWaited.get());
-        strLine += " (waited " + ColumnText(pWaited.get(), 0) + " ms)";
+        strLine += " (waited " + Texts(pDb, "PRAGMA busy_timeout").at(0) + " ms)";
     }
     Fail(ExitOf(eCode), strLine + HintFor(eCode));
 }
@@ -182,9 +181,7 @@ void CheckInPlace(const Context& Call, sqlite3* pDb) {
 }
 
 void CheckEncoding(const Context& Call, sqlite3* pDb) {
-    const Statement pLook = Prepare(pDb, "PRAGMA encoding");
-    Step(pLook.get());
-    const std::string strEncoding = ColumnText(pLook.get(), 0);
+    const std::string strEncoding = Texts(pDb, "PRAGMA encoding").at(0);
     if (strEncoding != "UTF-8") {
         Fail(kExitBadData, Call.Db() + ": its texts are in " + strEncoding +
                                ", not in UTF-8; copy its tables by vornjsondb dump " + Call.Db() +
@@ -255,6 +252,22 @@ Statement Prepare(sqlite3* pDb, const std::string& strSql) {
     return Statement(pStatement);
 }
 
+Statement Prepare(sqlite3* pDb, const std::string& strSql, const std::string& strText) {
+    Statement pStatement = Prepare(pDb, strSql);
+    sqlite3_bind_text(pStatement.get(), 1, strText.c_str(), -1, SQLITE_TRANSIENT);
+    return pStatement;
+}
+
+std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
+                               const std::string& strText) {
+    const Statement pLook = Prepare(pDb, strSql, strText);
+    std::vector<std::string> vecTexts;
+    while (Step(pLook.get())) {
+        vecTexts.push_back(ColumnText(pLook.get(), 0));
+    }
+    return vecTexts;
+}
+
 bool Step(sqlite3_stmt* pStatement) {
     const int nResult = sqlite3_step(pStatement);
     if (nResult != SQLITE_ROW && nResult != SQLITE_DONE) {
@@ -285,21 +298,11 @@ std::string Quoted(const std::string& strName) {
 }
 
 bool TableExists(sqlite3* pDb, const std::string& strTable) {
-    const Statement pLook = Prepare(
-        pDb,
-        "SELECT 1 FROM sqlite_master WHERE type IN ('table', 'view') AND name = ?1 COLLATE NOCASE");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    return Step(pLook.get());
+    return HasName(Texts(pDb, kTablesAndViews), strTable);
 }
 
 void FailNoTable(const Context& Call, sqlite3* pDb) {
-    std::vector<std::string> vecTables;
-    const Statement pLook =
-        Prepare(pDb, "SELECT name FROM sqlite_master WHERE type IN ('table', 'view')");
-    while (Step(pLook.get())) {
-        vecTables.push_back(ColumnText(pLook.get(), 0));
-    }
-    const std::string strHint = NearestHint(Call.TableName(), vecTables);
+    const std::string strHint = NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews));
     Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
                             (strHint.empty() ? "; see vornjsondb tables" : strHint));
 }
@@ -325,22 +328,17 @@ std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
     // A SQLite that knows no such pragma knows no STRICT table, either.
     const Statement pList = Prepare(pDb, "PRAGMA main.table_list(" + Quoted(strTable) + ")");
     const bool blStrict = Step(pList.get()) && sqlite3_column_int(pList.get(), 5) != 0;
-    const Statement pLook = Prepare(
-        pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE AND ?2");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    sqlite3_bind_int(pLook.get(), 2, blStrict ? 1 : 0);
-    std::vector<std::string> vecNames;
-    while (Step(pLook.get())) {
-        vecNames.push_back(ColumnText(pLook.get(), 0));
+    if (!blStrict) {
+        return {};
     }
-    return vecNames;
+    return Texts(pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE",
+                 strTable);
 }
 
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable) {
     using vornjsondb::Affinity;
     const std::vector<std::string> vecAny = AnyColumns(pDb, strTable);
-    const Statement pLook = Prepare(pDb, "SELECT name, type FROM pragma_table_info(?1)");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    const Statement pLook = Prepare(pDb, "SELECT name, type FROM pragma_table_info(?1)", strTable);
     std::vector<std::string> vecNames;
     while (Step(pLook.get())) {
         const std::string strName = ColumnText(pLook.get(), 0);
@@ -386,9 +384,10 @@ Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string
     if (!TableExists(pDb, kKeptTable)) {
         return {};
     }
-    const Statement pLook = Prepare(pDb, std::string("SELECT name, definition FROM ") + kKeptTable +
-                                             " WHERE name = ?1 COLLATE NOCASE");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+    const Statement pLook = Prepare(pDb,
+                                    std::string("SELECT name, definition FROM ") + kKeptTable +
+                                        " WHERE name = ?1 COLLATE NOCASE",
+                                    strTable);
     if (!Step(pLook.get())) {
         return {};
     }
@@ -418,25 +417,26 @@ void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value
     Run(pDb, std::string("CREATE TABLE IF NOT EXISTS ") + kKeptTable +
                  " (name TEXT PRIMARY KEY NOT NULL, definition TEXT NOT NULL)");
     const Statement pDelete =
-        Prepare(pDb, std::string("DELETE FROM ") + kKeptTable + " WHERE name = ?1 COLLATE NOCASE");
+        Prepare(pDb, std::string("DELETE FROM ") + kKeptTable + " WHERE name = ?1 COLLATE NOCASE",
+                strTable);
     const Statement pWrite =
-        Prepare(pDb, std::string("INSERT INTO ") + kKeptTable + " VALUES (?1, ?2)");
+        Prepare(pDb, std::string("INSERT INTO ") + kKeptTable + " VALUES (?1, ?2)", strTable);
     Json::Value jKept;
     jKept[strTable] = jDefinition[strTable];
     const std::string strText = CompactJson(jKept);
-    sqlite3_bind_text(pDelete.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    sqlite3_bind_text(pWrite.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
     sqlite3_bind_text(pWrite.get(), 2, strText.c_str(), -1, SQLITE_TRANSIENT);
     Step(pDelete.get());
     Step(pWrite.get());
 }
 
 Replacements::Replacements(sqlite3* pDb, const std::string& strTable) {
-    const Statement pLook = Prepare(pDb,
-                                    "SELECT 1 FROM sqlite_master WHERE type = 'table' AND name = "
-                                    "?1 COLLATE NOCASE AND sql LIKE '%CONFLICT%REPLACE%'");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    if (Step(pLook.get())) {
+    const bool blReplaces =
+        !Texts(pDb,
+               "SELECT 1 FROM sqlite_master WHERE type = 'table' AND name = ?1 COLLATE NOCASE AND "
+               "sql LIKE '%CONFLICT%REPLACE%'",
+               strTable)
+             .empty();
+    if (blReplaces) {
         m_pCount = Prepare(pDb, "SELECT count(*) FROM " + Quoted(strTable));
         m_nBefore = Count();
     }

@@ -74,8 +74,12 @@ struct FinalizeStatement {
 using Statement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 Statement Prepare(sqlite3* pDb, const std::string& strSql);
 bool Step(sqlite3_stmt* pStatement);  // false after the last row; a failure is an Error
+Statement Prepare(sqlite3* pDb, const std::string& strSql, const std::string& strText);  // as ?1
 void Run(sqlite3* pDb, const std::string& strSql);
 std::string ColumnText(sqlite3_stmt* pStatement, int nColumn);
+// The first column of all rows. ?1 is strText.
+std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
+                               const std::string& strText = "");
 std::string Quoted(const std::string& strName);  // as an SQL name
 
 // Of a table that by its own ON CONFLICT REPLACE removes records to make room for others, which

@@ -14,8 +14,8 @@ namespace VORN_JSON_DB::Cli {
 namespace {
 
 std::string Pragma(sqlite3* pDb, const std::string& strPragma) {
-    const Statement pLook = Prepare(pDb, "PRAGMA " + strPragma);
-    return Step(pLook.get()) ? ColumnText(pLook.get(), 0) : "";
+    const std::vector<std::string> vecFound = Texts(pDb, "PRAGMA " + strPragma);
+    return vecFound.empty() ? "" : vecFound[0];
 }
 
 // The bytes that SQLite locks: in the database file, and in the -shm file beside it. Locks of a

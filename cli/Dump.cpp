@@ -37,17 +37,6 @@ class Checksum {
     std::uint64_t m_nHash = 14695981039346656037U;
 };
 
-std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
-                               const std::string& strTable) {
-    const Statement pLook = Prepare(pDb, strSql);
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    std::vector<std::string> vecTexts;
-    while (Step(pLook.get())) {
-        vecTexts.push_back(ColumnText(pLook.get(), 0));
-    }
-    return vecTexts;
-}
-
 // A name by which the table's rowid can be read; empty when there is none.
 std::string RowidName(sqlite3* pDb, const std::string& strTable) {
     for (const char* const szName : {"rowid", "_rowid_", "oid"}) {
@@ -116,8 +105,6 @@ Described Describe(const Context& Call, sqlite3* pDb) {
                                 "\" that can be dumped; see vornjsondb tables");
     }
     const std::string& strTable = vecFound[0];
-    const std::vector<std::string> vecCreate =
-        Texts(pDb, "SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?1", strTable);
     Described Found;
     Json::Value& jHeader = Found.jHeader;
     jHeader["format"] = kStreamFormat;
@@ -127,11 +114,10 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     if (!jDefinition.isNull()) {
         jHeader["definition"] = jDefinition;
     }
-    jHeader["statements"].append(vecCreate[0]);
     for (const std::string& strSql :
          Texts(pDb,
-               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND type IN ('index', 'trigger') "
-               "AND sql IS NOT NULL ORDER BY type, name",
+               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND sql IS NOT NULL ORDER BY "
+               "type <> 'table', type, name",
                strTable)) {
         jHeader["statements"].append(strSql);
     }
@@ -146,8 +132,8 @@ Described Describe(const Context& Call, sqlite3* pDb) {
         Found.strSelect += (Found.strSelect.empty() ? "SELECT " : ", ") + Quoted(strColumn);
     }
     if (TableExists(pDb, "sqlite_sequence")) {
-        const Statement pCounter = Prepare(pDb, "SELECT seq FROM sqlite_sequence WHERE name = ?1");
-        sqlite3_bind_text(pCounter.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
+        const Statement pCounter =
+            Prepare(pDb, "SELECT seq FROM sqlite_sequence WHERE name = ?1", strTable);
         if (Step(pCounter.get())) {
             jHeader["sequence"] = Json::Int64(sqlite3_column_int64(pCounter.get(), 0));
         }
@@ -309,12 +295,9 @@ std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader
 
 // The counter of AUTOINCREMENT may be ahead of the greatest rowid.
 void SetSequence(sqlite3* pDb, const Json::Value& jHeader) {
-    const Statement pDelete = Prepare(pDb, "DELETE FROM sqlite_sequence WHERE name = ?1");
-    const Statement pInsert = Prepare(pDb, "INSERT INTO sqlite_sequence VALUES (?1, ?2)");
     const std::string strTable = jHeader["table"].asString();
-    for (sqlite3_stmt* const pStatement : {pDelete.get(), pInsert.get()}) {
-        sqlite3_bind_text(pStatement, 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    }
+    const Statement pDelete = Prepare(pDb, "DELETE FROM sqlite_sequence WHERE name = ?1", strTable);
+    const Statement pInsert = Prepare(pDb, "INSERT INTO sqlite_sequence VALUES (?1, ?2)", strTable);
     sqlite3_bind_int64(pInsert.get(), 2, jHeader["sequence"].asInt64());
     Step(pDelete.get());
     Step(pInsert.get());

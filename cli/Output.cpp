@@ -13,14 +13,11 @@ namespace {
 
 // As the real table has them; a Table knows its members in byte order.
 std::vector<std::string> MembersInColumnOrder(const Table& Of) {
-    const Statement pColumns =
-        Prepare(Of.Connection(), "SELECT name FROM pragma_table_xinfo(?1) ORDER BY cid");
-    sqlite3_bind_text(pColumns.get(), 1, Of.Name().c_str(), -1, SQLITE_TRANSIENT);
     std::vector<std::string> vecLeft = Of.Members();
     std::vector<std::string> vecOrdered;
-    while (Step(pColumns.get())) {
-        const auto itMember =
-            std::find(vecLeft.begin(), vecLeft.end(), ColumnText(pColumns.get(), 0));
+    for (const std::string& strColumn : Texts(
+             Of.Connection(), "SELECT name FROM pragma_table_xinfo(?1) ORDER BY cid", Of.Name())) {
+        const auto itMember = std::find(vecLeft.begin(), vecLeft.end(), strColumn);
         if (itMember != vecLeft.end()) {
             vecOrdered.push_back(*itMember);
             vecLeft.erase(itMember);

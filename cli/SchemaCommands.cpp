@@ -46,29 +46,17 @@ void PutFindings(const FindingList& vecFindings) {
 }
 
 std::vector<std::string> TableNames(sqlite3* pDb) {
-    std::vector<std::string> vecNames;
-    const Statement pLook = Prepare(pDb,
-                                    "SELECT name FROM sqlite_master WHERE type = 'table' AND name "
-                                    "NOT LIKE 'sqlite\\_%' ESCAPE '\\' AND name <> "
-                                    "'vornjsondb_definition' ORDER BY name");
-    while (Step(pLook.get())) {
-        vecNames.push_back(ColumnText(pLook.get(), 0));
-    }
-    return vecNames;
+    return Texts(pDb,
+                 "SELECT name FROM sqlite_master WHERE type = 'table' AND name NOT LIKE "
+                 "'sqlite\\_%' ESCAPE '\\' AND name <> 'vornjsondb_definition' ORDER BY name");
 }
 
 // All statements of one table, or of the database.
 std::vector<std::string> CreateStatements(sqlite3* pDb, const std::string& strTable) {
-    const Statement pLook = Prepare(pDb,
-                                    "SELECT sql FROM sqlite_master WHERE sql IS NOT NULL AND "
-                                    "(?1 = '' OR tbl_name = ?1 COLLATE NOCASE) ORDER BY tbl_name, "
-                                    "type <> 'table', name");
-    sqlite3_bind_text(pLook.get(), 1, strTable.c_str(), -1, SQLITE_TRANSIENT);
-    std::vector<std::string> vecStatements;
-    while (Step(pLook.get())) {
-        vecStatements.push_back(ColumnText(pLook.get(), 0));
-    }
-    return vecStatements;
+    return Texts(pDb,
+                 "SELECT sql FROM sqlite_master WHERE sql IS NOT NULL AND (?1 = '' OR tbl_name = "
+                 "?1 COLLATE NOCASE) ORDER BY tbl_name, type <> 'table', name",
+                 strTable);
 }
 
 // Of "size:int" words, whose names go to vecNames, with --key, --not-null, --unique and --default
@@ -253,8 +241,8 @@ int RunIndex(Context& Call) {
     const Statement pLook = Prepare(
         Open.pDb.get(),
         "SELECT l.name, l.\"unique\", (SELECT group_concat(coalesce(i.name, '(expression)'), ', ') "
-        "FROM pragma_index_info(l.name) i) FROM pragma_index_list(?1) l ORDER BY l.name");
-    sqlite3_bind_text(pLook.get(), 1, Call.TableName().c_str(), -1, SQLITE_TRANSIENT);
+        "FROM pragma_index_info(l.name) i) FROM pragma_index_list(?1) l ORDER BY l.name",
+        Call.TableName());
     Json::Value jIndexes(Json::arrayValue);
     while (Step(pLook.get())) {
         Json::Value jIndex;

@@ -27,11 +27,10 @@ int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords,
 }
 
 bool IsView(const OpenTable& Open) {
-    const Statement pLook = Prepare(Open.pDb.get(),
-                                    "SELECT 1 FROM sqlite_master WHERE type = 'view' AND name = ?1 "
-                                    "COLLATE NOCASE");
-    sqlite3_bind_text(pLook.get(), 1, Open.Records.Name().c_str(), -1, SQLITE_TRANSIENT);
-    return Step(pLook.get());
+    return !Texts(Open.pDb.get(),
+                  "SELECT 1 FROM sqlite_master WHERE type = 'view' AND name = ?1 COLLATE NOCASE",
+                  Open.Records.Name())
+                .empty();
 }
 
 // Runs a change and counts its records. SQLite does not count what the triggers of a view do: there
