@@ -1,6 +1,5 @@
 #include "Database.h"
 
-#include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -11,6 +10,7 @@
 
 #include "../table/Affinity.h"
 #include "JsonCells.h"
+#include "input/ByteSource.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -196,21 +196,15 @@ void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
 }
 
 std::string ReadFile(const std::string& strFile) {
-    const bool blStandard = strFile == "-";
-    const int nFile = blStandard ? STDIN_FILENO : open(strFile.c_str(), O_RDONLY | O_CLOEXEC);
+    ByteSource From;
     std::string strText;
     char szBlock[16384];
-    ssize_t nRead = nFile < 0 ? -1 : 1;
-    while (nRead > 0) {
-        nRead = read(nFile, szBlock, sizeof szBlock);
-        strText.append(szBlock, nRead > 0 ? static_cast<std::size_t>(nRead) : 0);
+    From.Open(strFile);
+    while (const std::size_t nRead = From.Read(szBlock, sizeof szBlock)) {
+        strText.append(szBlock, nRead);
     }
-    const int nError = errno;
-    if (nFile > STDIN_FILENO) {
-        close(nFile);
-    }
-    if (nRead < 0) {
-        Fail(kExitIo, strFile + ": " + std::strerror(nError) + "; check the name");
+    if (From.Error() != 0) {
+        Fail(kExitIo, strFile + ": " + std::strerror(From.Error()) + "; check the name");
     }
     return strText;
 }

@@ -8,6 +8,7 @@
 #include "Database.h"
 #include "JsonCells.h"
 #include "Output.h"
+#include "input/NewDefinition.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -59,11 +60,9 @@ std::vector<std::string> CreateStatements(sqlite3* pDb, const std::string& strTa
                  strTable);
 }
 
-// Of "size:int" words, whose names go to vecNames, with --key, --not-null, --unique and --default
-// beside it.
-Json::Value DefinitionFromWords(const Context& Call, std::vector<std::string>& vecNames) {
-    Json::Value jTable(Json::objectValue);
-    Json::Value& jMembers = jTable["member"] = Json::Value(Json::objectValue);
+// Of "size:int" words, whose names go to vecNames.
+Json::Value MembersFromWords(const Context& Call, std::vector<std::string>& vecNames) {
+    Json::Value jMembers(Json::objectValue);
     for (const std::string& strWord : Call.WordsFrom(2)) {
         const std::size_t nColon = strWord.find(':');
         if (nColon == std::string::npos || nColon == 0) {
@@ -76,39 +75,7 @@ Json::Value DefinitionFromWords(const Context& Call, std::vector<std::string>& v
         jMembers[strName]["cpptype"] = strWord.substr(nColon + 1);
         vecNames.push_back(strName);
     }
-    const auto Member = [&jMembers](const char* szOption,
-                                    const std::string& strName) -> Json::Value& {
-        if (!jMembers.isMember(strName)) {
-            const std::string strHint = NearestHint(strName, jMembers.getMemberNames());
-            Fail(kExitUsage, std::string(szOption) + ": there is no member \"" + strName + "\"" +
-                                 (strHint.empty() ? "; add it as member:type" : strHint));
-        }
-        return jMembers[strName];
-    };
-    for (const std::string& strName : Call.Names("--not-null")) {
-        Member("--not-null", strName)["notNull"] = true;
-    }
-    for (const std::string& strName : Call.Names("--unique")) {
-        Member("--unique", strName)["unique"] = true;
-    }
-    for (const std::string& strName : Call.Names("--key")) {
-        Member("--key", strName);
-        jTable["key"].append(strName);
-    }
-    for (const std::string& strWord : Call.List("--default")) {
-        const std::size_t nEquals = strWord.find('=');
-        if (nEquals == std::string::npos) {
-            Fail(kExitUsage, "--default: \"" + strWord + "\" is not of the form member=value");
-        }
-        Json::Value& jMember = Member("--default", strWord.substr(0, nEquals));
-        const std::string strText = strWord.substr(nEquals + 1);
-        jMember["cppDefaultValue"] = jMember["cpptype"] == "string"
-                                         ? Json::Value(strText)
-                                         : ParseJson(strText, "--default " + strWord, kExitUsage);
-    }
-    Json::Value jDefinition;
-    jDefinition[Call.TableName()] = jTable;
-    return jDefinition;
+    return jMembers;
 }
 
 // The table knows a column's type by name alone, and ANY is a number's in all tables but STRICT
@@ -196,7 +163,7 @@ int RunInit(Context& Call) {
     Json::Value jDefinition;
     std::vector<std::string> vecColumns;
     if (!blFile) {
-        jDefinition = DefinitionFromWords(Call, vecColumns);
+        jDefinition = NewDefinition(Call, MembersFromWords(Call, vecColumns));
     } else {
         jDefinition = KnownDefinition(Call, nullptr, Call.TableName());
     }

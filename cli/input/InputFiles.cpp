@@ -39,23 +39,25 @@ ReadOptions Named(const std::string& strFormat) {
     Fail(kExitIo, Of.Name() + ": " + std::strerror(Of.Error()) + "; check name and permissions");
 }
 
-ReadOptions OptionsFor(ByteSource& From, const InsertOptions& How) {
+ReadOptions OptionsFor(ByteSource& From, const Context& Call) {
     // A pipe is not waited for, when it is known what comes.
-    ReadOptions Found = How.strFormat.empty() ? GuessFormat(From.Look()) : Named(How.strFormat);
-    if (!How.strDelimiter.empty()) {
-        if (How.strDelimiter.size() != 1 || How.strDelimiter.find_first_of("\"\r\n") == 0) {
+    ReadOptions How =
+        Call.Has("--format") ? Named(Call.Text("--format")) : GuessFormat(From.Look());
+    if (Call.Has("--delimiter")) {
+        const std::string strDelimiter = Call.Text("--delimiter");
+        if (strDelimiter.size() != 1 || strDelimiter.find_first_of("\"\r\n") == 0) {
             Fail(kExitUsage,
                  "--delimiter: it must be one ASCII character, and no quote or newline; for tabs "
                  "there is --format tsv");
         }
-        Found.eFormat = Format::kSeparated;
-        Found.cDelimiter = How.strDelimiter[0];
+        How.eFormat = Format::kSeparated;
+        How.cDelimiter = strDelimiter[0];
     }
-    Found.blQuotes = How.blQuotes;
-    Found.blHeader = How.blHeader;
-    Found.blEmptyIsText = How.blEmptyIsText;
-    Found.blKeepText = !How.strErrors.empty();
-    return Found;
+    How.blQuotes = Call.Text("--quote") != "none";
+    How.blHeader = !Call.Has("--no-header");
+    How.blEmptyIsText = Call.Text("--empty") == "text";
+    How.blKeepText = Call.Has("--errors");
+    return How;
 }
 
 }  // namespace
@@ -66,18 +68,19 @@ void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& 
                            (strReason.find("; ") == std::string::npos ? szRemedy : ""));
 }
 
-InputFiles::InputFiles(const InsertOptions& How) {
+InputFiles::InputFiles(const Context& Call) {
+    const std::vector<std::string> vecFiles = Call.WordsFrom(2);
     // Each would get some of its bytes.
-    if (std::count(How.vecFiles.begin(), How.vecFiles.end(), "-") > 1) {
+    if (std::count(vecFiles.begin(), vecFiles.end(), "-") > 1) {
         Fail(kExitUsage, "standard input is named more than once; give - once");
     }
-    for (const std::string& strPath : How.vecFiles) {
+    for (const std::string& strPath : vecFiles) {
         m_vecInputs.push_back(std::make_unique<Input>());
         Input& Now = *m_vecInputs.back();
         if (!Now.From.Open(strPath)) {
             FailBySystem(Now.From);
         }
-        Now.How = OptionsFor(Now.From, How);
+        Now.How = OptionsFor(Now.From, Call);
     }
 }
 

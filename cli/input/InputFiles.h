@@ -8,8 +8,8 @@
 #include <string>
 #include <vector>
 
+#include "../Command.h"
 #include "ByteSource.h"
-#include "Insert.h"
 #include "Readers.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -23,7 +23,7 @@ constexpr char kLeaveOut[] = "; correct it, or leave it out by --errors FILE";
 class InputFiles {
   public:
     // Opens all of them, and finds out their formats; an Error, if one cannot be opened.
-    explicit InputFiles(const InsertOptions& How);
+    explicit InputFiles(const Context& Call);
 
     // Reads one after the other; fnBegin comes before each. Returns false where the sink wanted no
     // more; what else ends it early is an Error. blAgain: they will be read once more.

@@ -22,6 +22,26 @@ namespace {
 constexpr std::int64_t kMostAtOnce = std::int64_t{1} << 30;
 constexpr std::int64_t kLargeBatch = 100000;
 
+struct FlagRow {
+    const char* szName;
+    OnDuplicate eMode;
+};
+
+constexpr FlagRow kModes[] = {{"--skip", OnDuplicate::kSkip},
+                              {"--replace", OnDuplicate::kReplace},
+                              {"--upsert", OnDuplicate::kUpsert}};
+
+OnDuplicate ModeOf(const Context& Call) {
+    OnDuplicate eMode = OnDuplicate::kStop;
+    for (const FlagRow& Row : kModes) {
+        if (Call.Has(Row.szName) && eMode != OnDuplicate::kStop) {
+            Fail(kExitUsage, "--skip, --replace and --upsert exclude each other; give one");
+        }
+        eMode = Call.Has(Row.szName) ? Row.eMode : eMode;
+    }
+    return eMode;
+}
+
 std::string Pretty(const Json::Value& jValue) {
     Json::StreamWriterBuilder Builder;
     Builder["indentation"] = "  ";
@@ -30,10 +50,10 @@ std::string Pretty(const Json::Value& jValue) {
 
 class Import {
   public:
-    Import(Context& Call, const InsertOptions& How)
+    explicit Import(Context& Call)
         : m_Call(Call),
-          m_How(How),
-          m_Files(How),
+          m_eOnDuplicate(ModeOf(Call)),
+          m_Files(Call),
           m_strTable(NameForSqlite(Call.TableName(), Access::kChange)) {}
 
     int Run();
@@ -59,7 +79,7 @@ class Import {
     std::string WhatIsStored() const;
 
     Context& m_Call;
-    const InsertOptions& m_How;
+    const OnDuplicate m_eOnDuplicate;
     const Interrupt m_Guard;
     InputFiles m_Files;
     const std::string m_strTable;
@@ -90,14 +110,14 @@ int Import::Run() {
     OpenFile();
     try {
         FindDefinition();
-        if (m_How.blDryRun) {
+        if (m_Call.Has("--dry-run")) {
             return ShowDryRun();
         }
         Load();
         return Finish();
     } catch (Error& Failed) {
         m_pProgress.reset();
-        if (!m_How.blDryRun) {
+        if (!m_Call.Has("--dry-run")) {
             Failed.strLine += WhatIsStored();
         }
         throw;
@@ -117,13 +137,13 @@ void Import::StopForInterrupt() {
 
 // What only looks makes no file.
 void Import::OpenFile() {
-    if (m_How.blDryRun && access(m_Call.Db().c_str(), F_OK) != 0) {
+    if (m_Call.Has("--dry-run") && access(m_Call.Db().c_str(), F_OK) != 0) {
         sqlite3* pDb = nullptr;
         sqlite3_open(":memory:", &pDb);
         m_pDb.reset(pDb);
         return;
     }
-    m_pDb = OpenDatabase(m_Call, m_How.blDryRun ? Access::kRead : Access::kCreate);
+    m_pDb = OpenDatabase(m_Call, m_Call.Has("--dry-run") ? Access::kRead : Access::kCreate);
 }
 
 void Import::FindDefinition() {
@@ -139,27 +159,27 @@ void Import::FindDefinition() {
         Check(DefinitionOf(m_pDb.get(), m_strTable, m_jDefinition), m_Call.Db());
     }
     const bool blForNew =
-        !m_How.vecNotNull.empty() || !m_How.vecDefaults.empty() || !m_How.vecTypes.empty();
+        m_Call.Has("--not-null") || m_Call.Has("--default") || m_Call.Has("--type");
     if (m_blTableThere && blForNew) {
         Fail(kExitUsage, "--not-null, --default and --type are for tables that are made, and \"" +
                              m_strTable + "\" is there");
     }
-    if (!m_How.vecKey.empty() && !m_jDefinition.isNull()) {
+    if (m_Call.Has("--key") && !m_jDefinition.isNull()) {
         Json::Value& jKey = m_jDefinition[m_strTable]["key"];
         m_jOwnKey = jKey;
         jKey = Json::Value(Json::arrayValue);
-        for (const std::string& strName : m_How.vecKey) {
+        for (const std::string& strName : m_Call.Names("--key")) {
             jKey.append(strName);
         }
     }
-    if (m_jDefinition.isNull() || m_How.blAddMembers) {
+    if (m_jDefinition.isNull() || m_Call.Has("--add-members")) {
         LearnTypes();
     }
     CheckColumns();
 }
 
 void Import::LearnTypes() {
-    TypesSink Seen(!m_How.strErrors.empty(), [this](std::int64_t nRecords) {
+    TypesSink Seen(m_Call.Has("--errors"), [this](std::int64_t nRecords) {
         m_pProgress->Tick(nRecords, m_Files.BytesRead());
         return !Interrupt::Came();
     });
@@ -180,7 +200,7 @@ void Import::LearnTypes() {
     if (Seen.Records() == 0) {
         Fail(kExitBadData, m_Files.Formats() + ": there are no records to make a table from");
     }
-    m_jDefinition = NewDefinition(m_strTable, Seen, m_How);
+    m_jDefinition = NewDefinition(m_Call, Seen.Members());
     m_vecColumns = Seen.Names();
     CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
@@ -271,7 +291,7 @@ void Import::Prepare() {
         Check(m_Table.Sync(SyncMode::kChange, Report), m_Call.Db());
         Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, How), m_Call.Db());
     }
-    if (m_How.eOnDuplicate != OnDuplicate::kStop && m_Table.KeyMembers().empty()) {
+    if (m_eOnDuplicate != OnDuplicate::kStop && m_Table.KeyMembers().empty()) {
         Fail(kExitUsage, m_Call.Db() + ": --skip, --replace and --upsert need a key, and table \"" +
                              m_strTable + "\" has none; name it with --key MEMBER");
     }
@@ -281,9 +301,9 @@ void Import::Prepare() {
         m_blKept = true;
     }
     LoadOptions HowToLoad;
-    HowToLoad.eOnDuplicate = m_How.eOnDuplicate;
+    HowToLoad.eOnDuplicate = m_eOnDuplicate;
     HowToLoad.nRowsPerTransaction = 0;
-    HowToLoad.blGoOnAfterBad = !m_How.strErrors.empty();
+    HowToLoad.blGoOnAfterBad = m_Call.Has("--errors");
     Check(m_Into.Start(m_Table, HowToLoad), m_Call.Db());
     m_Others.emplace(m_pDb.get(), m_strTable);
 }
@@ -291,7 +311,7 @@ void Import::Prepare() {
 // SQLite finds a record by its key only where no two can have the same.
 void Import::CheckKey() {
     FindingList vecFindings;
-    if (m_How.eOnDuplicate == OnDuplicate::kSkip || m_How.eOnDuplicate == OnDuplicate::kReplace) {
+    if (m_eOnDuplicate == OnDuplicate::kSkip || m_eOnDuplicate == OnDuplicate::kReplace) {
         Check(m_Table.Lint(vecFindings), m_Call.Db());
     }
     std::string strWords;
@@ -309,22 +329,22 @@ void Import::CheckKey() {
 
 void Import::Load() {
     const std::int64_t nBytes = m_Files.AllBytes();
-    const bool blLarge = m_How.nBatch < 0 && nBytes > kMostAtOnce;
-    m_nBatch = blLarge ? kLargeBatch : std::max<std::int64_t>(0, m_How.nBatch);
+    const bool blLarge = !m_Call.Has("--batch") && nBytes > kMostAtOnce;
+    m_nBatch = blLarge ? kLargeBatch : m_Call.Whole("--batch", 0);
     if (blLarge) {
         m_Call.Say("more than 1 GiB: committing after each " + std::to_string(kLargeBatch) +
                    " records; --batch 0 makes it all or nothing");
     }
-    if (!m_How.strErrors.empty()) {
-        std::vector<std::string> vecNeeded = m_How.vecFiles;
+    if (m_Call.Has("--errors")) {
+        std::vector<std::string> vecNeeded = m_Call.WordsFrom(2);
         vecNeeded.push_back(m_Call.Text("--def"));
         for (const char* const szSuffix : {"", "-journal", "-wal", "-shm"}) {
             vecNeeded.push_back(m_Call.Db() + szSuffix);
         }
-        m_pErrors = std::make_unique<ErrorFile>(m_How.strErrors, vecNeeded);
+        m_pErrors = std::make_unique<ErrorFile>(m_Call.Text("--errors"), vecNeeded);
     }
     Prepare();
-    const bool blMode = m_How.eOnDuplicate != OnDuplicate::kStop;
+    const bool blMode = m_eOnDuplicate != OnDuplicate::kStop;
     m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, m_pErrors.get(), blMode,
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
@@ -366,7 +386,7 @@ void Import::CommitBatch() {
 
 void Import::Keep() {
     Json::Value jKept = m_jDefinition;
-    if (m_blTableThere && !m_How.vecKey.empty()) {
+    if (m_blTableThere && m_Call.Has("--key")) {
         jKept[m_strTable].removeMember("key");
         if (!m_jOwnKey.isNull()) {
             jKept[m_strTable]["key"] = m_jOwnKey;
@@ -418,8 +438,8 @@ int Import::Finish() {
 
 }  // namespace
 
-int RunInsert(Context& Call, const InsertOptions& How) {
-    return Import(Call, How).Run();
+int RunInsert(Context& Call) {
+    return Import(Call).Run();
 }
 
 }  // namespace VORN_JSON_DB::Cli

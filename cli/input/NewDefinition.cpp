@@ -1,5 +1,7 @@
 #include "NewDefinition.h"
 
+#include <utility>
+
 #include "../../src/schema/MemberType.h"
 #include "../Database.h"
 
@@ -7,58 +9,69 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-Json::Value& Find(Json::Value& jMembers, const std::string& strName, const char* szOption) {
+Json::Value& Find(Json::Value& jMembers, const char* szOption, const std::string& strName) {
     if (!jMembers.isMember(strName)) {
-        Fail(kExitUsage, std::string(szOption) + ": no record has a member \"" + strName + "\"" +
-                             NearestHint(strName, jMembers.getMemberNames()));
+        const std::string strHint = NearestHint(strName, jMembers.getMemberNames());
+        Fail(kExitUsage, std::string(szOption) + ": there is no member \"" + strName + "\"" +
+                             (strHint.empty() ? "; name one of the new table's" : strHint));
     }
     return jMembers[strName];
 }
 
-// A text where the member is one; else JSON.
-Json::Value DefaultFor(const Json::Value& jMember, const std::string& strName,
-                       const std::string& strValue) {
-    if (jMember["cpptype"] == "string") {
-        return strValue;
+// Calls fnEach with the member and the value of each "member=value".
+template <typename Each>
+void ForPairs(const Context& Call, const char* szOption, Json::Value& jMembers,
+              const Each& fnEach) {
+    for (const std::string& strPair : Call.List(szOption)) {
+        const std::size_t nEqual = strPair.find('=');
+        if (nEqual == std::string::npos) {
+            Fail(kExitUsage,
+                 std::string(szOption) + ": \"" + strPair + "\" is not of the form member=value");
+        }
+        fnEach(Find(jMembers, szOption, strPair.substr(0, nEqual)), strPair.substr(nEqual + 1));
     }
-    return ParseJson(strValue, "--default " + strName + "=" + strValue);
 }
 
-void TakeTypes(Json::Value& jMembers, const InsertOptions& How) {
-    for (const auto& Each : How.vecTypes) {
-        Json::Value& jMember = Find(jMembers, Each.first, "--type");
-        jMember["cpptype"] = Each.second;
-        if (vornjsondb::TypeOfMember(jMember).Bound.eKind == vornjsondb::BoundKind::kNone) {
-            Fail(kExitUsage, "--type: there is no type \"" + Each.second +
-                                 "\"; string, bool, int, long long, double, Json::Value and any "
-                                 "are some");
-        }
+void TakeType(Json::Value& jMember, const std::string& strType) {
+    jMember["cpptype"] = strType;
+    if (vornjsondb::TypeOfMember(jMember).Bound.eKind == vornjsondb::BoundKind::kNone) {
+        Fail(kExitUsage, "--type: there is no type \"" + strType +
+                             "\"; string, bool, int, long long, double, Json::Value and any are "
+                             "some");
     }
+}
+
+// A text where the member is one; else JSON.
+void TakeDefault(Json::Value& jMember, const std::string& strValue) {
+    jMember["cppDefaultValue"] =
+        jMember["cpptype"] == "string"
+            ? Json::Value(strValue)
+            : ParseJson(strValue, "--default \"" + strValue + "\"", kExitUsage);
 }
 
 }  // namespace
 
-Json::Value NewDefinition(const std::string& strTable, const Inference& Seen,
-                          const InsertOptions& How) {
-    Json::Value jMembers = Seen.Members();
-    TakeTypes(jMembers, How);
-    for (const std::string& strName : How.vecNotNull) {
-        Find(jMembers, strName, "--not-null")["notNull"] = true;
+Json::Value NewDefinition(const Context& Call, Json::Value jMembers) {
+    Json::Value jTable(Json::objectValue);
+    ForPairs(Call, "--type", jMembers, TakeType);
+    ForPairs(Call, "--default", jMembers, TakeDefault);
+    for (const std::string& strName : Call.Names("--not-null")) {
+        Find(jMembers, "--not-null", strName)["notNull"] = true;
     }
-    for (const auto& Each : How.vecDefaults) {
-        Json::Value& jMember = Find(jMembers, Each.first, "--default");
-        jMember["cppDefaultValue"] = DefaultFor(jMember, Each.first, Each.second);
+    for (const std::string& strName : Call.Names("--unique")) {
+        Find(jMembers, "--unique", strName)["unique"] = true;
     }
-    Json::Value jDefinition;
-    Json::Value& jTable = jDefinition[strTable];
-    for (const std::string& strName : How.vecKey) {
-        Find(jMembers, strName, "--key");
+    const std::vector<std::string> vecKey = Call.Names("--key");
+    for (const std::string& strName : vecKey) {
+        Find(jMembers, "--key", strName);
         jTable["key"].append(strName);
     }
-    if (How.vecKey.size() == 1) {
-        jTable["key"] = How.vecKey[0];
+    if (vecKey.size() == 1) {
+        jTable["key"] = vecKey[0];
     }
-    jTable["member"] = jMembers;
+    jTable["member"] = std::move(jMembers);
+    Json::Value jDefinition;
+    jDefinition[Call.TableName()] = std::move(jTable);
     return jDefinition;
 }
 

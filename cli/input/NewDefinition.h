@@ -1,22 +1,20 @@
-// The definition of a table that is made or extended for records.
+// The definition of a table that is made or extended.
 
 #ifndef VORNJSONDB_CLI_INPUT_NEW_DEFINITION_H
 #define VORNJSONDB_CLI_INPUT_NEW_DEFINITION_H
 
 #include <string>
 
-#include <json/json.h>
-
+#include "../Command.h"
 #include "Inference.h"
-#include "Insert.h"
 
 namespace VORN_JSON_DB::Cli {
 
-// For a table that is to be made, from what was seen and what the caller wants.
-Json::Value NewDefinition(const std::string& strTable, const Inference& Seen,
-                          const InsertOptions& How);
+// Members with what --key, --type, --not-null, --unique and --default say of them. What is said of
+// members that are not there is an Error.
+Json::Value NewDefinition(const Context& Call, Json::Value jMembers);
 
-// Adds to a definition the members that were seen and that it lacks. Returns whether there are any.
+// Takes what the records have beyond a definition into it. Returns whether there was any.
 bool AddSeenMembers(const std::string& strTable, const Inference& Seen, Json::Value& jDefinition);
 
 }  // namespace VORN_JSON_DB::Cli

@@ -6,10 +6,10 @@ make_shop
 expect 4 '' 'error: shop.db: there is a table "product" already; extend it with vornjsondb sync' -- \
     init shop.db product id:int
 expect 2 '' 'error: --key: there is no member "idd"; did you mean "id"?' -- init shop.db b id:int --key idd
-expect 2 '' 'error: --key: there is no member "x"; add it as member:type' -- init shop.db b id:int --key x
+expect 2 '' 'error: --key: there is no member "x"; name one of the new table'\''s' -- init shop.db b id:int --key x
 expect 2 '' 'error: the member "id" is there twice; name it once' -- init shop.db b id:int id:string
 expect 2 '' 'error: --default: "id" is not of the form member=value' -- init shop.db b id:int --default id
-expect 2 '' 'error: --default id=x: Line 1, Column 1: Syntax error: value, object or array expected.; it must be JSON' \
+expect 2 '' 'error: --default "x": Line 1, Column 1: Syntax error: value, object or array expected.; it must be JSON' \
     -- init shop.db b id:int --default id=x
 expect 0 '' 'updated 1 record' -- upsert shop.db product id=2 name=cup
 expect 0 '{"id":2,"name":"cup","price":0.1}' '' -- get shop.db product 2

@@ -40,7 +40,7 @@ class Insert : public testing::Test {
         int nExit = 0;
         std::string strError;
         try {
-            nExit = RunInsert(Call, InsertOptionsOf(Call));
+            nExit = RunInsert(Call);
         } catch (const Error& Failed) {
             nExit = Failed.nExit;
             strError = Failed.strLine;
@@ -233,9 +233,8 @@ TEST_F(Insert, AnInterruptEndsAtABatchsBorder) {
 TEST_F(Insert, WhatDoesNotFitTogetherIsRefused) {
     EXPECT_EQ(Run("[]"),
               "3 F: JSON: there are no records to make a table from (nothing is stored)");
-    EXPECT_EQ(
-        Run("[{\"name\":1}]", {"--key=nmae"}),
-        "2 --key: no record has a member \"nmae\"; did you mean \"name\"? (nothing is stored)");
+    EXPECT_EQ(Run("[{\"name\":1}]", {"--key=nmae"}),
+              "2 --key: there is no member \"nmae\"; did you mean \"name\"? (nothing is stored)");
     EXPECT_EQ(Run("[{\"a\":1}]", {"--skip"}),
               "2 DB: --skip, --replace and --upsert need a key, and table \"t\" has none; name it "
               "with --key MEMBER (nothing is stored)");
