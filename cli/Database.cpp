@@ -291,6 +291,12 @@ std::string Quoted(const std::string& strName) {
     return strQuoted + "\"";
 }
 
+std::vector<std::string> TableNames(sqlite3* pDb) {
+    return Texts(pDb,
+                 "SELECT name FROM sqlite_master WHERE type = 'table' AND name NOT LIKE "
+                 "'sqlite\\_%' ESCAPE '\\' AND name <> 'vornjsondb_definition' ORDER BY name");
+}
+
 bool TableExists(sqlite3* pDb, const std::string& strTable) {
     return HasName(Texts(pDb, kTablesAndViews), strTable);
 }

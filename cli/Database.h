@@ -49,6 +49,7 @@ Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::stri
 // Keeps it in the database, in the table vornjsondb_definition. For a transaction of the caller's.
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition);
 
+std::vector<std::string> TableNames(sqlite3* pDb);  // without SQLite's own and the kept definitions
 bool TableExists(sqlite3* pDb, const std::string& strTable);
 [[noreturn]] void FailNoTable(const Context& Call, sqlite3* pDb);
 // The table of all tables bears two names, of which SQLite takes the newer one in some places only.

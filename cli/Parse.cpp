@@ -29,24 +29,6 @@ std::vector<std::string> Unmarked(std::vector<std::string> vecWords) {
     return vecWords;
 }
 
-const Command* FindCommand(const std::string& strName) {
-    for (const Command& Row : AllCommands()) {
-        if (strName == Row.szName) {
-            return &Row;
-        }
-    }
-    return nullptr;
-}
-
-const Option* FindOption(const std::vector<Option>& vecOptions, const std::string& strName) {
-    for (const Option& Row : vecOptions) {
-        if (strName == Row.szName || strName == Row.szShort) {
-            return &Row;
-        }
-    }
-    return nullptr;
-}
-
 [[noreturn]] void FailUsage(const std::string& strWhat, const std::string& strHint,
                             const Command* pOf = nullptr) {
     const std::string strName = pOf == nullptr ? "" : std::string(" ") + pOf->szName;
@@ -120,7 +102,7 @@ const Command* TakeCommand(std::vector<std::string>& vecWords) {
 }
 
 void CheckChoice(const Option& Of, const std::vector<std::string>& vecValues) {
-    const std::vector<std::string> vecChoices = Choices(Of);
+    const std::vector<std::string> vecChoices = Choices(Of.szValue);
     for (const std::string& strValue : vecValues) {
         if (!vecChoices.empty() &&
             std::find(vecChoices.begin(), vecChoices.end(), strValue) == vecChoices.end()) {
@@ -201,16 +183,34 @@ void ParseWords(std::vector<std::string> vecWords, Context& Call) {
 
 }  // namespace
 
+const Command* FindCommand(const std::string& strName) {
+    for (const Command& Row : AllCommands()) {
+        if (strName == Row.szName) {
+            return &Row;
+        }
+    }
+    return nullptr;
+}
+
+const Option* FindOption(const std::vector<Option>& vecOptions, const std::string& strName) {
+    for (const Option& Row : vecOptions) {
+        if (strName == Row.szName || strName == Row.szShort) {
+            return &Row;
+        }
+    }
+    return nullptr;
+}
+
 std::vector<Option> OptionsOf(const Command& Of) {
     std::vector<Option> vecOptions = Of.vecOptions;
     vecOptions.insert(vecOptions.end(), SharedOptions().begin(), SharedOptions().end());
     return vecOptions;
 }
 
-std::vector<std::string> Choices(const Option& Of) {
+std::vector<std::string> Choices(const char* szValue) {
     std::vector<std::string> vecChoices;
-    if (std::strchr(Of.szValue, '|') != nullptr) {
-        std::istringstream Values(Of.szValue);
+    if (std::strchr(szValue, '|') != nullptr) {
+        std::istringstream Values(szValue);
         for (std::string strValue; std::getline(Values, strValue, '|');) {
             vecChoices.push_back(strValue);
         }
@@ -219,6 +219,10 @@ std::vector<std::string> Choices(const Option& Of) {
 }
 
 bool Parse(int nArguments, char** pszArguments, Context& Call) {
+    if (nArguments > 1 && std::strcmp(pszArguments[1], "--complete") == 0) {
+        PutCandidates({pszArguments + 2, pszArguments + nArguments});
+        return false;
+    }
     std::vector<std::string> vecWords;
     for (int nAt = 1; nAt < nArguments; ++nAt) {
         vecWords.push_back(Marked(pszArguments[nAt]));

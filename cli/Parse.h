@@ -13,9 +13,14 @@ namespace VORN_JSON_DB::Cli {
 // False: help or version was asked for and is written. A wrong command line is an Error.
 bool Parse(int nArguments, char** pszArguments, Context& Call);
 
+// Writes what the last word may become, which is being typed.
+void PutCandidates(const std::vector<std::string>& vecWords);
+
+const Command* FindCommand(const std::string& strName);  // null: there is none
+const Option* FindOption(const std::vector<Option>& vecOptions, const std::string& strName);
 // The options of one subcommand, the shared ones last.
 std::vector<Option> OptionsOf(const Command& Of);
-std::vector<std::string> Choices(const Option& Of);  // of "a|b|c"; empty for other values
+std::vector<std::string> Choices(const char* szValue);  // of "a|b|c"; empty for other values
 
 }  // namespace VORN_JSON_DB::Cli
 

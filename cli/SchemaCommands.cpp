@@ -46,12 +46,6 @@ void PutFindings(const FindingList& vecFindings) {
     }
 }
 
-std::vector<std::string> TableNames(sqlite3* pDb) {
-    return Texts(pDb,
-                 "SELECT name FROM sqlite_master WHERE type = 'table' AND name NOT LIKE "
-                 "'sqlite\\_%' ESCAPE '\\' AND name <> 'vornjsondb_definition' ORDER BY name");
-}
-
 // All statements of one table, or of the database.
 std::vector<std::string> CreateStatements(sqlite3* pDb, const std::string& strTable) {
     return Texts(pDb,

@@ -24,11 +24,22 @@ same 'bash: choices' "$(in_bash vornjsondb list shop.db price --format js)" 'jso
 same 'bash: files' "$(in_bash vornjsondb list sh)" 'shop.db'
 same 'bash: shells' "$(in_bash vornjsondb completion f)" 'fish'
 
+# What a table is called is never run.
+sqlite3 evil.db 'CREATE TABLE "$(touch ran) a:b" (a); CREATE TABLE plain (a)'
+same 'bash: an odd name' "$(in_bash vornjsondb list evil.db '$')" '$(touch ran) a:b'
+same 'it was not run' "$(ls ran 2>/dev/null)" ''
+
 in_fish() {
     fish -c "source script.fish; complete -C '$1'"
 }
 same 'fish: subcommands' "$(in_fish 'vornjsondb ini')" $'init\tCreate a table'
 same 'fish: tables' "$(in_fish 'vornjsondb list shop.db pri')" 'price'
+
+same 'fish: options' "$(in_fish 'vornjsondb list shop.db price --no')" \
+    $'--no-headers\tno line with the members\' names'
+same 'fish: choices' "$(in_fish 'vornjsondb list shop.db price --format ts')" tsv
+same 'fish: files' "$(in_fish 'vornjsondb list sh')" shop.db
+same 'fish: an odd name' "$(in_fish 'vornjsondb list evil.db "$"')" '$(touch ran) a:b'
 
 # zsh completes on a terminal only: one is made, with a key on it that completes and shows the line.
 # The function is loaded from the path, as it is from its installed place.
@@ -53,6 +64,9 @@ same 'zsh: subcommands' "$(in_zsh 'vornjsondb ini')" 'vornjsondb init '
 same 'zsh: tables' "$(in_zsh 'vornjsondb list shop.db pri')" 'vornjsondb list shop.db price '
 same 'zsh: options' "$(in_zsh 'vornjsondb list shop.db price --no')" 'vornjsondb list shop.db price --no-headers '
 same 'zsh: choices' "$(in_zsh 'vornjsondb list shop.db price --format ts')" 'vornjsondb list shop.db price --format tsv '
+same 'zsh: files' "$(in_zsh 'vornjsondb list sho')" 'vornjsondb list shop.db '
+same 'zsh: an odd name' "$(in_zsh 'vornjsondb list evil.db \$')" 'vornjsondb list evil.db \$\(touch\ ran\)\ a:b '
+same 'it was not run' "$(ls ran 2>/dev/null)" ''
 same 'zsh: shells' "$(in_zsh 'vornjsondb completion z')" 'vornjsondb completion zsh '
 
 # The table of exit codes: in the sources, in the manual and on the page.
@@ -76,11 +90,8 @@ for name in $names; do
     options=$(sed -n '/^Options/,$s/^  \(-., \|    \)\(--[a-z-]*\).*/\2/p' help)
     for option in $options; do
         same "$name $option: help" "$(grep -cE -- "$option( [^ ]+)?  +[^ ]" help)" 1
-        same "$name $option: bash" "$(grep -cE -- " $name\) words=.*$option\b" script.bash)" 1
-        same "$name $option: fish" \
-            "$(grep -cE -- "from $name' -l ${option#--}( |\$)" script.fish)" 1
-        same "$name $option: zsh" \
-            "$(sed -n "/^        $name) _arguments/,/;;/p" script.zsh | grep -cE -- "[',*]${option}[}['=]")" 1
+        same "$name $option: completion" \
+            "$("$VORNJSONDB" --complete "$name" shop.db "$option" | grep -c "^$option"$'\t.')" 1
         same "$name $option: manual" \
             "$(($(grep -cF -- "Fl \\-${option#--}" <(sed 's/\\-/-/g; s/Fl -/Fl \\-/g' script.man)) > 0))" 1
     done
