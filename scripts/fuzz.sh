@@ -41,7 +41,8 @@ for target in "${targets[@]}"; do
     fi
 done
 
-need_packages clang-14:clang++-14 libclang-rt-14-dev "${library_packages[@]}" libcsv-dev rapidjson-dev
+need_packages clang-14:clang++-14 libclang-rt-14-dev "${library_packages[@]}" libcsv-dev \
+    libutf8proc-dev rapidjson-dev
 
 folder=build/fuzz
 mkdir -p "$folder/objects" "$folder/findings" "$folder/figures"
@@ -90,7 +91,7 @@ link_target() {
     for source in "fuzz/$1.cpp" "${shared_sources[@]}"; do
         objects+=("$(object_of "$source")")
     done
-    clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$1" "${objects[@]}" -ljsoncpp -lsqlite3 -lcsv
+    clang++-14 "-fsanitize=fuzzer,$sanitizers" -o "$folder/$1" "${objects[@]}" -ljsoncpp -lsqlite3 -lcsv -lutf8proc
 }
 
 # run_target TARGET runs one target and prints a line of figures, or what went wrong.
