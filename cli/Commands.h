@@ -25,6 +25,8 @@ int RunDump(Context& Call);
 int RunLoad(Context& Call);
 int RunCompletion(Context& Call);
 
+void PutManual();  // as mdoc, to standard output
+
 }  // namespace VORN_JSON_DB::Cli
 
 #endif  // VORNJSONDB_CLI_COMMANDS_H

@@ -3,7 +3,6 @@
 
 #include "Commands.h"
 #include "Database.h"
-#include "Manual.h"
 #include "Parse.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -9,6 +9,7 @@
 #include <sstream>
 
 #include "../table/Affinity.h"
+#include "../table/Failure.h"
 #include "JsonCells.h"
 #include "input/ByteSource.h"
 
@@ -22,32 +23,6 @@ const char kTablesAndViews[] = "SELECT name FROM sqlite_master WHERE type IN ('t
 constexpr int kFlags[] = {SQLITE_OPEN_READONLY, SQLITE_OPEN_READWRITE,
                           SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE};
 
-StatusCode CodeOf(int nSqlite) {
-    switch (nSqlite & 255) {
-        case SQLITE_BUSY:
-        case SQLITE_LOCKED:
-            return StatusCode::kLocked;
-        case SQLITE_CONSTRAINT:
-            return StatusCode::kConstraint;
-        case SQLITE_INTERRUPT:
-            return StatusCode::kInterrupted;
-        case SQLITE_READONLY:
-            return StatusCode::kReadOnly;
-        case SQLITE_FULL:
-            return StatusCode::kDiskFull;
-        case SQLITE_CORRUPT:
-            return StatusCode::kCorrupt;
-        case SQLITE_NOTADB:
-            return StatusCode::kNotADatabase;
-        case SQLITE_CANTOPEN:
-        case SQLITE_IOERR:
-        case SQLITE_PERM:
-            return StatusCode::kIoError;
-        default:
-            return StatusCode::kMisuse;
-    }
-}
-
 std::string FileOf(sqlite3* pDb) {
     const char* const szFile = sqlite3_db_filename(pDb, "main");
     return szFile == nullptr || *szFile == '\0' ? "database" : szFile;
@@ -55,11 +30,12 @@ std::string FileOf(sqlite3* pDb) {
 
 [[noreturn]] void FailBySqlite(sqlite3* pDb, const std::string& strWhere) {
     std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
-    const StatusCode eCode = CodeOf(sqlite3_extended_errcode(pDb));
+    const StatusCode eCode =
+        vornjsondb::FailBySqlite(pDb, sqlite3_extended_errcode(pDb), {"", nullptr}).Code();
     if (eCode == StatusCode::kLocked) {
         strLine += " (waited " + Texts(pDb, "PRAGMA busy_timeout").at(0) + " ms)";
     }
-    Fail(ExitOf(eCode), strLine + HintFor(eCode));
+    Fail(ExitOf(eCode, kExitUnexpected), strLine + HintFor(eCode));
 }
 
 bool IsEmpty(const std::string& strFile) {
@@ -461,15 +437,19 @@ std::string GoneText(std::int64_t nGone) {
                             " gone, by the table's own ON CONFLICT REPLACE";
 }
 
-OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition)
-    : pDb(OpenDatabase(Call, eAccess)) {
-    CheckEncoding(Call, pDb.get());
+Options OptionsOf(const Context& Call) {
     Options How;
     How.blCompatible = false;
     How.nWaitMs = Call.WaitMs();
+    return How;
+}
+
+OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefinition)
+    : pDb(OpenDatabase(Call, eAccess)) {
+    CheckEncoding(Call, pDb.get());
     const std::string strTable = NameForSqlite(Call.TableName(), eAccess);
     const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), strTable);
-    const Status Opened = Records.Open(pDb.get(), strTable, jDefinition, How);
+    const Status Opened = Records.Open(pDb.get(), strTable, jDefinition, OptionsOf(Call));
     if (Opened.Code() == StatusCode::kNotFound) {
         FailNoTable(Call, pDb.get());
     }

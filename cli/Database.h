@@ -100,6 +100,8 @@ class Replacements {
 // "; 1 other record is gone, ..."; nothing for none.
 std::string GoneText(std::int64_t nGone);
 
+Options OptionsOf(const Context& Call);
+
 // A database with one table open, which is what most subcommands work on.
 struct OpenTable {
     using Definition = Json::Value (*)(const Context& Call, sqlite3* pDb,

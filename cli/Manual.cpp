@@ -1,7 +1,6 @@
 // vornjsondb(1), made from the table of subcommands.
 
-#include "Manual.h"
-
+#include "Commands.h"
 #include "Parse.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -118,11 +118,9 @@ int RunTables(Context& Call) {
         }
         jTables.append(std::move(jTable));
     }
-    if (Call.Has("--counts")) {
-        WriteObjects(Call, jTables, {"table", "records"});
-    } else {
-        WriteObjects(Call, jTables, {"table"});
-    }
+    std::vector<std::string> vecColumns = {"table", "records"};
+    vecColumns.resize(Call.Has("--counts") ? 2 : 1);
+    WriteObjects(Call, jTables, vecColumns);
     return kExitFine;
 }
 

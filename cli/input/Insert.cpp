@@ -62,7 +62,6 @@ class Import {
     void OpenFile();
     void FindDefinition();
     void LearnTypes();
-    Options Settings() const;
     std::string CreateSql() const;
     std::vector<std::string> Statements();
     int ShowDryRun();
@@ -233,7 +232,7 @@ std::vector<std::string> Import::Statements() {
     }
     SyncReport Report;
     if (m_blAdded) {
-        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, Settings()), m_Call.Db(),
+        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, OptionsOf(m_Call)), m_Call.Db(),
               kExitBadData);
         Check(m_Table.Sync(SyncMode::kLook, Report), m_Call.Db());
     }
@@ -266,16 +265,9 @@ int Import::ShowDryRun() {
     return kExitFine;
 }
 
-Options Import::Settings() const {
-    Options How;
-    How.blCompatible = false;
-    How.nWaitMs = m_Call.WaitMs();
-    return How;
-}
-
 // The table, its definition and the first records come to be at once.
 void Import::Prepare() {
-    Options How = Settings();
+    Options How = OptionsOf(m_Call);
     BeginChange(m_Call, m_pDb.get(), m_All);
     if (!m_blTableThere && TableExists(m_pDb.get(), m_strTable)) {
         Fail(kExitDuplicate, m_Call.Db() + ": another program has just made the table \"" +

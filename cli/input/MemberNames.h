@@ -41,7 +41,6 @@ class MemberNames {
     }
 
     const std::string& Name(size_t nMember) const { return *m_vecNames[nMember]; }
-    size_t Size() const { return m_vecNames.size(); }
 
   private:
     size_t Look(std::string_view strName);
