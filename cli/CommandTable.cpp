@@ -98,7 +98,8 @@ const std::vector<Command> kCommands = {
      "vornjsondb insert shop.db product new.csv --skip --errors bad.jsonl\n"
      "curl -s $URL | vornjsondb insert shop.db product - --upsert\n",
      "A file is a JSON list, an object with one such list, JSON Lines, CSV or TSV; - is\n"
-     "standard input. A new table gets the types of all records, so these are read twice.\n"
+     "standard input. A new table gets the types of all records: these are read twice, unless\n"
+     "a file's first ones tell them.\n"
      "All records of a call are stored, or none: from 1 GiB on, or with --batch, the batches\n"
      "before a failure stay. A record whose key is there already is a failure, unless --skip,\n"
      "--replace or --upsert is given. Ctrl-C undoes the batch that is under way.\n",

@@ -1,5 +1,7 @@
 #include "Inference.h"
 
+#include <algorithm>
+
 #include "Numbers.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -125,6 +127,11 @@ Json::Value Inference::Members() const {
         }
     }
     return jMembers;
+}
+
+bool Inference::AllHaveValues() const {
+    return std::all_of(m_vecSeen.begin(), m_vecSeen.end(),
+                       [](const Seen& Each) { return (Each.nKinds & ~kNull) != 0; });
 }
 
 std::vector<std::string> Inference::Names() const {

@@ -30,6 +30,9 @@ class Inference : public Sink {
     // As "member" of a definition has them: {"id": {"cpptype": "long long"}}.
     Json::Value Members() const;
 
+    // Whether each member had a value that is not null.
+    bool AllHaveValues() const;
+
     // In the order in which they were first seen.
     std::vector<std::string> Names() const;
 

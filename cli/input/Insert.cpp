@@ -22,6 +22,12 @@ namespace {
 constexpr std::int64_t kMostAtOnce = std::int64_t{1} << 30;
 constexpr std::int64_t kLargeBatch = 100000;
 
+// The first so many records mostly tell the types of all, which spares reading the input twice. It
+// is no more than a guess: all records are looked at while they are stored, and where they tell
+// otherwise it is done again, with what they tell together.
+constexpr std::int64_t kLookedAt = 1000;
+struct WrongGuess {};
+
 struct FlagRow {
     const char* szName;
     OnDuplicate eMode;
@@ -48,13 +54,19 @@ std::string Pretty(const Json::Value& jValue) {
     return Json::writeString(Builder, jValue);
 }
 
+bool ExitMayBeTypes(int nExit) {
+    return nExit != kExitInterrupted && nExit != kExitLocked && nExit != kExitIo;
+}
+
 class Import {
   public:
-    explicit Import(Context& Call)
+    // blMayGuess: WrongGuess may be thrown, and nothing has happened then.
+    Import(Context& Call, bool blMayGuess)
         : m_Call(Call),
           m_eOnDuplicate(ModeOf(Call)),
           m_Files(Call),
-          m_strTable(NameForSqlite(Call.TableName(), Access::kChange)) {}
+          m_strTable(NameForSqlite(Call.TableName(), Access::kChange)),
+          m_blMayGuess(blMayGuess) {}
 
     int Run();
 
@@ -62,6 +74,8 @@ class Import {
     void OpenFile();
     void FindDefinition();
     void LearnTypes();
+    bool MayGuess() const;
+    void CheckGuess();
     std::string CreateSql() const;
     std::vector<std::string> Statements();
     int ShowDryRun();
@@ -82,6 +96,9 @@ class Import {
     const Interrupt m_Guard;
     InputFiles m_Files;
     const std::string m_strTable;
+    const bool m_blMayGuess;
+    bool m_blGuessed = false;
+    Inference m_AllSeen;  // while records are stored into a table that was guessed
     Database m_pDb;
     bool m_blTableThere = false;
     bool m_blKept = false;    // the database keeps the definition, or will
@@ -116,6 +133,10 @@ int Import::Run() {
         return Finish();
     } catch (Error& Failed) {
         m_pProgress.reset();
+        // Other types might do with what is bad data to these.
+        if (m_blGuessed && ExitMayBeTypes(Failed.nExit)) {
+            throw WrongGuess();
+        }
         if (!m_Call.Has("--dry-run")) {
             Failed.strLine += WhatIsStored();
         }
@@ -177,18 +198,32 @@ void Import::FindDefinition() {
     CheckColumns();
 }
 
+// What is committed in parts cannot be done again, nor can what is read no second time by name.
+bool Import::MayGuess() const {
+    const std::vector<std::string> vecFiles = m_Call.WordsFrom(2);
+    const bool blFiles = std::count(vecFiles.begin(), vecFiles.end(), "-") == 0 &&
+                         m_Files.AllBytes() >= 0 && m_Files.AllBytes() <= kMostAtOnce;
+    return m_blMayGuess && blFiles && m_jDefinition.isNull() && !m_Call.Has("--batch") &&
+           !m_Call.Has("--errors") && !m_Call.Has("--dry-run");
+}
+
 void Import::LearnTypes() {
-    TypesSink Seen(m_Call.Has("--errors"), [this](std::int64_t nRecords) {
+    const std::int64_t nMost = MayGuess() ? kLookedAt : -1;
+    TypesSink Seen(m_Call.Has("--errors"), [this, nMost](std::int64_t nRecords) {
         m_pProgress->Tick(nRecords, m_Files.BytesRead());
-        return !Interrupt::Came();
+        return !Interrupt::Came() && nRecords != nMost;
     });
     m_pProgress = std::make_unique<Progress>("reading types", m_Files.AllBytes(), m_Call.Quiet());
     const bool blDone = m_Files.Read(
         Seen, [&](const std::string& strName, bool blCells) { Seen.Begin(strName, blCells); },
         true);
     m_pProgress.reset();
-    if (!blDone) {
+    if (Interrupt::Came()) {
         StopForInterrupt();
+    }
+    m_blGuessed = !blDone;
+    if (m_blGuessed && !Seen.AllHaveValues()) {
+        throw WrongGuess();
     }
     m_vecNotes = Seen.Notes();
     if (!m_jDefinition.isNull()) {
@@ -206,6 +241,15 @@ void Import::LearnTypes() {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
     }
     m_blToKeep = true;
+}
+
+void Import::CheckGuess() {
+    NoteNulls();
+    if (NewDefinition(m_Call, m_AllSeen.Members()) != m_jDefinition ||
+        m_AllSeen.Names() != m_vecColumns) {
+        throw WrongGuess();
+    }
+    m_vecNotes = m_AllSeen.Notes();
 }
 
 void Import::CheckColumns() const {
@@ -341,10 +385,15 @@ void Import::Load() {
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {
+        m_AllSeen.BeginInput(blCells);
         m_pSink->BeginInput(strName, blCells);
     };
-    if (!m_Files.Read(*m_pSink, fnBegin, false)) {
+    BothSinks Both(m_AllSeen, *m_pSink);
+    if (!m_Files.Read(m_blGuessed ? static_cast<Sink&>(Both) : *m_pSink, fnBegin, false)) {
         StopForInterrupt();
+    }
+    if (m_blGuessed) {
+        CheckGuess();
     }
     CommitBatch();
     m_pProgress.reset();
@@ -431,7 +480,11 @@ int Import::Finish() {
 }  // namespace
 
 int RunInsert(Context& Call) {
-    return Import(Call).Run();
+    try {
+        return Import(Call, true).Run();
+    } catch (const WrongGuess&) {
+        return Import(Call, false).Run();
+    }
 }
 
 }  // namespace VORN_JSON_DB::Cli
