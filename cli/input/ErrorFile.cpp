@@ -74,7 +74,7 @@ void ErrorFile::Add(const std::string& strInput, const Place& Where, const std::
 bool ErrorFile::WriteWaiting() {
     const bool blWritten = WriteAll(m_nFile, m_strWaiting.data(), m_strWaiting.size());
     const int nError = errno;
-    m_nWritten += blWritten ? static_cast<std::int64_t>(m_strWaiting.size()) : 0;
+    m_nWritten += blWritten ? static_cast<off_t>(m_strWaiting.size()) : 0;
     // A device has no end that could be moved.
     [[maybe_unused]] const int nCut = blWritten ? 0 : ftruncate(m_nFile, m_nWritten);
     errno = nError;

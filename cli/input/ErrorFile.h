@@ -3,7 +3,8 @@
 #ifndef VORNJSONDB_CLI_INPUT_ERROR_FILE_H
 #define VORNJSONDB_CLI_INPUT_ERROR_FILE_H
 
-#include <cstdint>
+#include <sys/types.h>
+
 #include <string>
 #include <vector>
 
@@ -32,7 +33,7 @@ class ErrorFile {
 
     const std::string m_strPath;
     int m_nFile = -1;
-    std::int64_t m_nWritten = 0;
+    off_t m_nWritten = 0;
     std::string m_strWaiting;
 };
 

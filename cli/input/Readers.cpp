@@ -39,6 +39,21 @@ const char* WideEncoding(std::string_view strText) {
     return nullptr;
 }
 
+// Takes the byte order mark off. False with strReason for text that is not UTF-8.
+bool SkipByteOrderMark(ByteSource& From, std::string& strReason) {
+    const std::string_view strFirst = From.Look();
+    if (const char* const szEncoding = WideEncoding(strFirst)) {
+        strReason = std::string("the input is ") + szEncoding + "; convert it with iconv -f " +
+                    szEncoding + " -t UTF-8";
+        return false;
+    }
+    if (strFirst.substr(0, 3) == "\xEF\xBB\xBF") {
+        char szMark[3];
+        From.Read(szMark, sizeof szMark);
+    }
+    return true;
+}
+
 }  // namespace
 
 ReadOutcome ReadRecords(ByteSource& From, const ReadOptions& How, Sink& To) {
@@ -58,20 +73,6 @@ ReadOutcome ReadRecords(ByteSource& From, const ReadOptions& How, Sink& To) {
         Result.strReason = std::strerror(From.Error());
     }
     return Result;
-}
-
-bool SkipByteOrderMark(ByteSource& From, std::string& strReason) {
-    const std::string_view strFirst = From.Look();
-    if (const char* const szEncoding = WideEncoding(strFirst)) {
-        strReason = std::string("the input is ") + szEncoding + "; convert it with iconv -f " +
-                    szEncoding + " -t UTF-8";
-        return false;
-    }
-    if (strFirst.substr(0, 3) == "\xEF\xBB\xBF") {
-        char szMark[3];
-        From.Read(szMark, sizeof szMark);
-    }
-    return true;
 }
 
 }  // namespace VORN_JSON_DB::Cli

@@ -58,9 +58,6 @@ ReadOptions GuessFormat(std::string_view strFirst);
 // "JSON Lines", "CSV with ;"
 std::string FormatText(const ReadOptions& How);
 
-// Takes the byte order mark off. False with strReason for text that is not UTF-8.
-bool SkipByteOrderMark(ByteSource& From, std::string& strReason);
-
 }  // namespace VORN_JSON_DB::Cli
 
 #endif  // VORNJSONDB_CLI_INPUT_READERS_H
