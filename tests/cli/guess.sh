@@ -78,6 +78,18 @@ for line in 999 1002 2999; do
     done
 done
 
+# Lists, in an object or not, behind a mark or not.
+for file in lines3 lines28 lines81 lines84; do
+    for around in '[ ]' '\xEF\xBB\xBF[ ]' '{"all":[ ]}'; do
+        {
+            printf "${around% *}"
+            sed '$!s/$/,/' $file
+            echo "${around#* }"
+        } >list.json
+        tells list.json --key id
+    done
+done
+
 # Several files, in one format or in two.
 at 1 '{"id": 7001, "a": 1, "z": 1}' >one
 at 1 '{"id": 7002, "a": 1.5}' | sed 's/"id": /&1/' >two
