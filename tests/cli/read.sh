@@ -65,9 +65,11 @@ sqlite3 own.db 'CREATE TABLE t (a); CREATE TABLE u (a); CREATE INDEX i ON u (a)'
 for name in sqlite_schema sqlite_master SQLite_Schema; do
     expect 0 "$tables" '' -- list own.db $name type=table --sort name --members type,name
     expect 0 3 '' -- count own.db $name
-    for words in 'update --where {"name":"t"} name=x' 'delete --all --yes' 'upsert name=x' 'index name' sync; do
+    for words in 'update 1 name=x' 'delete --all --yes' 'upsert name=x' 'index name' sync; do
+        read -r subcommand rest <<<"$words"
+        # shellcheck disable=SC2086  # several words
         expect 2 '' "error: table \"$name\" is SQLite's own and can only be read; tables are changed by init, sync and index" \
-            -- ${words%% *} own.db $name $(cut -s -d ' ' -f 2- <<<"$words")
+            -- "$subcommand" own.db $name $rest
     done
     expect 2 '' "error: table \"$name\" is SQLite's own and can only be read; tables are changed by init, sync and index" \
         -- insert own.db $name only.jsonl

@@ -65,7 +65,9 @@ expect 5 '' 'error: wide.db: there is no table "od"; did you mean "odd"?' -- sch
 # All that works on records says how to get there.
 other='error: wide.db: its texts are in UTF-16le, not in UTF-8; copy its tables by vornjsondb dump wide.db TABLE | vornjsondb load COPY'
 for words in 'schema --json' list count 'update 1 a=1' 'delete --all --yes' 'upsert a=1' index explain lint sync; do
-    expect 3 '' "$other" -- ${words%% *} wide.db odd $(cut -s -d ' ' -f 2- <<<"$words")
+    read -r subcommand rest <<<"$words"
+    # shellcheck disable=SC2086  # several words
+    expect 3 '' "$other" -- "$subcommand" wide.db odd $rest
 done
 expect 3 '' "$other" -- init wide.db new a:int
 echo '{"a": 1}' >wide.json
