@@ -96,7 +96,7 @@ bool IsNumberToSqlite(std::string_view strText) {
     const size_t nEnd = strText.find_last_not_of(kBlanks) + 1;
     const std::string strNumber(strText.substr(nBegin, nEnd - nBegin));
     char* pRead = nullptr;
-    std::strtod(strNumber.c_str(), &pRead);
+    static_cast<void>(std::strtod(strNumber.c_str(), &pRead));
     // The words for infinity and the hexadecimal numbers of C are texts to SQLite.
     return pRead == strNumber.data() + strNumber.size() &&
            strNumber.find_first_not_of("+-.0123456789eE") == std::string::npos;
