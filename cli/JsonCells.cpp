@@ -3,7 +3,7 @@
 #include <charconv>
 #include <cmath>
 
-#include "input/JsonQuote.h"
+#include "input/JsonText.h"
 #include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -149,7 +149,7 @@ report() {
 # The folders whose sources all targets share, and the command's readers, which know nothing of the command.
 libraries=(src table)
 mapfile -t shared_sources < <(find "${libraries[@]}" fuzz tests/support/JsonHelpers.cpp -name '*.cpp' ! -path 'fuzz/[a-z]*' | sort)
-readers=(ByteSource GuessFormat Inference Interrupt JsonHandler JsonLinesReader JsonQuote JsonReader LineBuffer
+readers=(ByteSource GuessFormat Inference Interrupt JsonHandler JsonLinesReader JsonReader JsonText LineBuffer
     MemberNames Numbers Readers SeparatedReader Utf8)
 readers=("${readers[@]/#/cli/input/}")
 shared_sources+=("${readers[@]/%/.cpp}")

@@ -9,7 +9,7 @@
 
 #include "../Command.h"
 #include "ByteSource.h"
-#include "JsonQuote.h"
+#include "JsonText.h"
 #include "Utf8.h"
 
 namespace VORN_JSON_DB::Cli {

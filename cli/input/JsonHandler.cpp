@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "JsonQuote.h"
+#include "JsonText.h"
 #include "Numbers.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -6,7 +6,7 @@
 #include "../Database.h"
 #include "../JsonCells.h"
 #include "InputFiles.h"
-#include "JsonQuote.h"
+#include "JsonText.h"
 #include "Numbers.h"
 
 namespace VORN_JSON_DB::Cli {
