@@ -34,7 +34,11 @@
 // Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for. And a progress
 // handler can interrupt a statement that has done its work: a call is then told as failed, and may
 // be done.
-// Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
+// Functions and hooks of the program that SQLite calls in the middle of a call, an SQL function in
+// a trigger say, cannot use the same Table, nor a Loader on it: each call returns kMisuse and does
+// nothing, and so do the Set calls of the Loader that is just writing. They must not move or
+// destroy it. Another Table on the connection is free, as far as SQLite is. Exceptions:
+// std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words
 //

@@ -120,6 +120,7 @@ Status Loader::Parts::End(const Status& Outcome) {
 }
 
 Status Loader::Parts::EndRecord(FindingList& vecFindings) {
+    const vornjsondb::Running Busy(Into, this);
     ++Now.nRecords;
     Status Outcome = Write(vecFindings);
     Values.Clear();
@@ -159,6 +160,9 @@ Loader::Loader() = default;
 Loader::~Loader() = default;
 
 Status Loader::Start(Table& Into, const LoadOptions& How) {
+    if (m_pParts && m_pParts->Into.pRunning != nullptr) {
+        return vornjsondb::CheckState(&m_pParts->Into, kDo, true);
+    }
     m_pParts.reset();
     Status Outcome = vornjsondb::CheckState(Into.m_pParts.get(), kDo, true);
     if (!Outcome.Ok()) {
@@ -201,7 +205,11 @@ Status Loader::EndRecord() {
 }
 
 Status Loader::Commit() {
-    return m_pParts && m_pParts->IsReady() ? m_pParts->Commit() : NotReady(m_pParts.get());
+    if (!m_pParts || !m_pParts->IsReady()) {
+        return NotReady(m_pParts.get());
+    }
+    const vornjsondb::Running Busy(m_pParts->Into, m_pParts.get());
+    return m_pParts->Commit();
 }
 
 const LoadCounts& Loader::Counts() const {

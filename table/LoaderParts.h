@@ -12,8 +12,11 @@ struct VORN_JSON_DB::Loader::Parts {
     Parts(Table::Parts& To, const LoadOptions& HowToLoad);
 
     // Whether a record can be written now; if not, State tells why: the failure that ended the
-    // load, or a callback that reads from the table.
-    bool IsReady() const { return Ended.Ok() && Into.nReading == 0; }
+    // load, a callback that reads from the table, or a call that has not returned.
+    bool IsReady() const { return Ended.Ok() && Into.nReading == 0 && Into.pRunning == nullptr; }
+
+    // Whether a call of this loader is running, which uses the values.
+    bool IsRunning() const { return Into.pRunning == this; }
     Status State() const;
 
     // What is wrong with the next record: with a member's last value, or at the two places behind

@@ -56,7 +56,7 @@ enum class Passed { kNull, kBoolean, kInteger, kReal, kText, kBlob };
 // Gives a member any value, or notes what is wrong with it. nValue: also of a boolean.
 void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dValue = 0,
          std::string_view strBytes = {}) {
-    if (pOf == nullptr) {
+    if (pOf == nullptr || pOf->IsRunning()) {
         return;
     }
     const auto nPlace = static_cast<size_t>(nMember);
@@ -95,8 +95,8 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
 // The values of a started load that a member can simply be given: the member is there, and nothing
 // is wrong so far that a new value might put right.
 vornjsondb::RecordValues* Simply(Parts* pOf, int nMember) {
-    const bool blSimply =
-        pOf != nullptr && pOf->nWrong == 0 && static_cast<size_t>(nMember) < pOf->Values.Size();
+    const bool blSimply = pOf != nullptr && pOf->nWrong == 0 && !pOf->IsRunning() &&
+                          static_cast<size_t>(nMember) < pOf->Values.Size();
     return blSimply ? &pOf->Values : nullptr;
 }
 
@@ -179,7 +179,7 @@ void Loader::SetBlob(int nMember, const void* pBytes, size_t nBytes) {
 void Loader::SetJson(int nMember, std::string_view strJson) {
     const auto nPlace = static_cast<size_t>(nMember);
     // mutate(hoisted): what follows gives another value.
-    if (!m_pParts || nPlace >= m_pParts->Values.Size()) {
+    if (!m_pParts || m_pParts->IsRunning() || nPlace >= m_pParts->Values.Size()) {
         SetNull(nMember);  // which says what is wrong
         return;
     }
@@ -221,7 +221,7 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
 }
 
 void Loader::Reject(const std::string& strReason) {
-    if (m_pParts) {
+    if (m_pParts && !m_pParts->IsRunning()) {
         // mutate(doubled): the last one counts.
         SetWrong(*m_pParts, m_pParts->WholePlace(), FindingCode::kRejected, strReason);
     }

@@ -70,34 +70,31 @@ bool TakeKey(Parts& Of, const Json::Value& jKey, FindingList& vecFindings) {
 }  // namespace
 
 Status Table::Get(const Json::Value& jKey, Json::Value& jRecord) {
-    constexpr char kDo[] = "get a record from";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!Outcome.Ok()) {
+    const auto fnGet = [&](Parts& From, const vornjsondb::Doing& What) -> Status {
+        FindingList vecFindings;
+        if (!TakeKey(From, jKey, vecFindings)) {
+            return vornjsondb::FromFindings(std::move(vecFindings), What);
+        }
+        vornjsondb::Statement Lent;
+        int nResult = SQLITE_OK;
+        Status Outcome = vornjsondb::FirstStep(
+            From, What, "key", [&] { return vornjsondb::SelectOneSql(From, false); },
+            [&](sqlite3_stmt* pStatement) {
+                int nNext = 1;
+                return From.Wanted.BindKey(pStatement, nNext);
+            },
+            Lent, nResult);
+        if (Outcome.Ok() && nResult == SQLITE_ROW) {
+            Json::Value jFound = From.WholeRow.Read(Lent.Get(), From.Codec);
+            jRecord.swapPayload(jFound);
+        } else if (Outcome.Ok()) {
+            return vornjsondb::Fail(
+                StatusCode::kNotFound, What,
+                vornjsondb::Concat({"no record has the key ", vornjsondb::Shown(jKey)}));
+        }
         return Outcome;
-    }
-    FindingList vecFindings;
-    const vornjsondb::Doing What = m_pParts->Do(kDo);
-    if (!TakeKey(*m_pParts, jKey, vecFindings)) {
-        return vornjsondb::FromFindings(std::move(vecFindings), What);
-    }
-    vornjsondb::Statement Lent;
-    int nResult = SQLITE_OK;
-    Outcome = vornjsondb::FirstStep(
-        *m_pParts, What, "key", [&] { return vornjsondb::SelectOneSql(*m_pParts, false); },
-        [&](sqlite3_stmt* pStatement) {
-            int nNext = 1;
-            return m_pParts->Wanted.BindKey(pStatement, nNext);
-        },
-        Lent, nResult);
-    if (Outcome.Ok() && nResult == SQLITE_ROW) {
-        Json::Value jFound = m_pParts->WholeRow.Read(Lent.Get(), m_pParts->Codec);
-        jRecord.swapPayload(jFound);
-    } else if (Outcome.Ok()) {
-        return vornjsondb::Fail(
-            StatusCode::kNotFound, What,
-            vornjsondb::Concat({"no record has the key ", vornjsondb::Shown(jKey)}));
-    }
-    return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "get a record from", false, fnGet);
 }
 
 }  // namespace VORN_JSON_DB

@@ -135,8 +135,11 @@ Table& Table::operator=(Table&& From) noexcept = default;
 
 Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                    const Options& How) {
-    if (m_pParts && m_pParts->nReading > 0) {
-        return vornjsondb::CheckState(m_pParts.get(), "open anew", true);
+    if (m_pParts) {
+        Status State = vornjsondb::CheckState(m_pParts.get(), "open anew", true);
+        if (!State.Ok()) {
+            return State;
+        }
     }
     // The arguments may be parts of what it was before.
     const std::unique_ptr<Parts> pBefore = std::move(m_pParts);
@@ -209,6 +212,9 @@ Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
     if (pParts == nullptr) {
         return Fail(StatusCode::kMisuse, Doing{szDo, nullptr}, "the table is not open");
     }
+    if (pParts->pRunning != nullptr) {
+        return Fail(StatusCode::kMisuse, pParts->Do(szDo), "another call on it has not returned");
+    }
     if (blChange && pParts->nReading > 0) {
         return Fail(StatusCode::kMisuse, pParts->Do(szDo), "a callback is reading from it");
     }
@@ -218,7 +224,11 @@ Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
 Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
                Callable<Status(Table::Parts&, const Doing&)> fnCall) {
     Status State = CheckState(pParts, szDo, blChange);
-    return State.Ok() ? fnCall(*pParts, pParts->Do(szDo)) : State;
+    if (!State.Ok()) {
+        return State;
+    }
+    const Running Now(*pParts, pParts);
+    return fnCall(*pParts, pParts->Do(szDo));
 }
 
 }  // namespace vornjsondb

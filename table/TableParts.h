@@ -44,6 +44,7 @@ struct VORN_JSON_DB::Table::Parts {
     vornjsondb::RecordValues Values;  // of the record that is being written
     vornjsondb::RecordValues Wanted;  // the key that is being looked for
     int nReading = 0;                 // callbacks that are running
+    const void* pRunning = nullptr;   // these parts or a Loader's, of whom a call is running
 };
 
 namespace vornjsondb {
@@ -55,7 +56,21 @@ using Table = VORN_JSON_DB::Table;
 // A failure when this SQLite, which may be another than the one compiled for, is too old.
 Status CheckVersion(int nVersion, const char* szVersion, const Doing& What);
 
-// A failure when the Table is not open, or is to be changed by a callback that reads from it.
+// A call that is running. In it SQLite may call the program, by an SQL function or a hook, and what
+// calls the same Table from there must find it busy: values and statements are in use.
+class Running {
+  public:
+    Running(Table::Parts& Of, const void* pWho) : m_Of(Of) { m_Of.pRunning = pWho; }
+    Running(const Running&) = delete;
+    Running& operator=(const Running&) = delete;
+    ~Running() { m_Of.pRunning = nullptr; }
+
+  private:
+    Table::Parts& m_Of;
+};
+
+// A failure when the Table is not open, when a call of it is running, or when it is to be changed
+// by a callback that reads from it.
 Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange);
 
 // What each public call begins with: fnCall, with the parts and what they are about to do, where

@@ -104,96 +104,96 @@ Status Compute(Parts& From, const Query& Which, const Doing& What, bool blExists
     return Outcome;
 }
 
-// Counts a callback that is running, also when it throws.
-class Reading {
+// A callback of the caller's that is running, also when it throws. Until it returns the call does
+// nothing, and others may.
+class Callback {
   public:
-    explicit Reading(int& nReading) : m_nReading(nReading) { ++m_nReading; }
-    Reading(const Reading&) = delete;
-    Reading& operator=(const Reading&) = delete;
-    ~Reading() { --m_nReading; }
+    explicit Callback(Parts& From) : m_From(From) {
+        m_From.pRunning = nullptr;
+        ++m_From.nReading;
+    }
+    Callback(const Callback&) = delete;
+    Callback& operator=(const Callback&) = delete;
+    ~Callback() {
+        --m_From.nReading;
+        m_From.pRunning = &m_From;
+    }
 
   private:
-    int& m_nReading;
+    Parts& m_From;
 };
 
 }  // namespace
 
 Status Table::First(const Query& Which, Json::Value& jRecord) {
-    constexpr char kDo[] = "get a record from";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!Outcome.Ok()) {
-        return Outcome;
-    }
-    bool blFound = false;
-    Outcome = SelectRecords(*m_pParts, Which, m_pParts->Do(kDo), [&](Json::Value& jFound) {
-        jRecord.swapPayload(jFound);
-        blFound = true;
-        return false;
-    });
-    return !Outcome.Ok() || blFound ? Outcome
-                                    : vornjsondb::Fail(StatusCode::kNotFound, m_pParts->Do(kDo),
-                                                       "the query selects none");
+    const auto fnFirst = [&](Parts& From, const Doing& What) {
+        bool blFound = false;
+        Status Outcome = SelectRecords(From, Which, What, [&](Json::Value& jFound) {
+            jRecord.swapPayload(jFound);
+            blFound = true;
+            return false;
+        });
+        return !Outcome.Ok() || blFound
+                   ? Outcome
+                   : vornjsondb::Fail(StatusCode::kNotFound, What, "the query selects none");
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "get a record from", false, fnFirst);
 }
 
 Status Table::List(const Query& Which, Json::Value& jRecords) {
-    constexpr char kDo[] = "list records of";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!Outcome.Ok()) {
+    const auto fnList = [&](Parts& From, const Doing& What) {
+        Json::Value jList(Json::arrayValue);
+        Status Outcome = SelectRecords(From, Which, What, [&](Json::Value& jRecord) {
+            jList.append(std::move(jRecord));
+            return true;
+        });
+        if (Outcome.Ok()) {
+            jRecords.swapPayload(jList);
+        }
         return Outcome;
-    }
-    Json::Value jList(Json::arrayValue);
-    Outcome = SelectRecords(*m_pParts, Which, m_pParts->Do(kDo), [&](Json::Value& jRecord) {
-        jList.append(std::move(jRecord));
-        return true;
-    });
-    if (Outcome.Ok()) {
-        jRecords.swapPayload(jList);
-    }
-    return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "list records of", false, fnList);
 }
 
 Status Table::Count(const Query& Which, std::int64_t& nRecords) {
-    constexpr char kDo[] = "count records of";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    return Outcome.Ok() ? Compute(*m_pParts, Which, m_pParts->Do(kDo), false, nRecords) : Outcome;
+    const auto fnCount = [&](Parts& From, const Doing& What) {
+        return Compute(From, Which, What, false, nRecords);
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "count records of", false, fnCount);
 }
 
 Status Table::Exists(const Query& Which, bool& blExists) {
-    constexpr char kDo[] = "look for records of";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    std::int64_t nFound = 0;
-    if (Outcome.Ok()) {
-        Outcome = Compute(*m_pParts, Which, m_pParts->Do(kDo), true, nFound);
-    }
-    if (Outcome.Ok()) {
-        blExists = nFound != 0;
-    }
-    return Outcome;
+    const auto fnExists = [&](Parts& From, const Doing& What) {
+        std::int64_t nFound = 0;
+        Status Outcome = Compute(From, Which, What, true, nFound);
+        if (Outcome.Ok()) {
+            blExists = nFound != 0;
+        }
+        return Outcome;
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "look for records of", false, fnExists);
 }
 
 Status Table::ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord) {
-    constexpr char kDo[] = "read records of";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!Outcome.Ok()) {
-        return Outcome;
-    }
-    const Reading Now(m_pParts->nReading);
-    return SelectRecords(*m_pParts, Which, m_pParts->Do(kDo),
-                         [&](const Json::Value& jRecord) { return fnRecord(jRecord); });
+    const auto fnRead = [&](Parts& From, const Doing& What) {
+        return SelectRecords(From, Which, What, [&](const Json::Value& jRecord) {
+            const Callback Now(From);
+            return fnRecord(jRecord);
+        });
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "read records of", false, fnRead);
 }
 
 Status Table::ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow) {
-    constexpr char kDo[] = "read records of";
-    Status Outcome = vornjsondb::CheckState(m_pParts.get(), kDo, false);
-    if (!Outcome.Ok()) {
-        return Outcome;
-    }
-    const Reading Now(m_pParts->nReading);
-    return Select(*m_pParts, Which, m_pParts->Do(kDo),
-                  [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
-                      const Row::Source From{pStatement, m_pParts->Of, vecColumns};
-                      return fnRow(Row(From));
-                  });
+    const auto fnRead = [&](Parts& From, const Doing& What) {
+        return Select(From, Which, What,
+                      [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
+                          const Row::Source Source{pStatement, From.Of, vecColumns};
+                          const Callback Now(From);
+                          return fnRow(Row(Source));
+                      });
+    };
+    return vornjsondb::Guarded(m_pParts.get(), "read records of", false, fnRead);
 }
 
 }  // namespace VORN_JSON_DB
