@@ -401,8 +401,10 @@ class Table {
     // Compares the definition with the real table, and replaces what is in vecFindings.
     Status Lint(FindingList& vecFindings);
 
-    // Adds columns and unique indexes that the definition has more than the table. Nothing is ever
-    // dropped, renamed, rebuilt or retyped; what would need that is a finding.
+    // Adds columns and unique indexes that the definition has more than the table. A unique index
+    // compares texts as their column does (COLLATE NOCASE, say), by which Get and Save find a key;
+    // conditions compare bytes, whatever the column says. Nothing is ever dropped, renamed, rebuilt
+    // or retyped; what would need that is a finding.
     Status Sync(SyncMode eMode, SyncReport& Report);
 
     // Members may be paths. pstrSql receives the statement. An index that is there is not made a

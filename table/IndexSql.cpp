@@ -9,12 +9,15 @@ namespace vornjsondb {
 namespace {
 
 // As conditions have it, so that SQLite finds the index: the same text for a place in JSON, and
-// texts in the order of their bytes.
-std::string TermSql(const Member& Of, const Place& Where) {
+// texts in the order of their bytes. What is unique is told by the column, as a key is found by it.
+std::string TermSql(sqlite3* pDb, const Members& Of, const Place& Where, bool blUnique) {
+    const Member& Indexed = Of.At(Where.nMember);
     if (!Where.strPath.empty()) {
-        return ValueAt(Of.strQuoted, Where.strPath);
+        return ValueAt(Indexed.strQuoted, Where.strPath);
     }
-    return Of.strQuoted + (IsOrderedAsText(Of) ? " COLLATE BINARY" : "");
+    const bool blByColumn = !IsOrderedAsText(Indexed) ||
+                            (blUnique && !IsBinary(CollationOf(pDb, Of.Table(), Indexed.strName)));
+    return Indexed.strQuoted + (blByColumn ? "" : " COLLATE BINARY");
 }
 
 bool EndsWith(const std::string& strText, const std::string& strEnd) {
@@ -47,7 +50,7 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vec
     for (const IndexTerm& Term : vecTerms) {
         // mutate(exchanged): in any order.
         strBase += "_" + Term.strName;
-        strTail += szBefore + TermSql(Of.At(Term.Where.nMember), Term.Where);
+        strTail += szBefore + TermSql(pDb, Of, Term.Where, blUnique);
         szBefore = ", ";
     }
     strTail += ')';

@@ -20,8 +20,8 @@ constexpr char kIndexesSql[] =
     "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name,"
     " coalesce((SELECT sql FROM sqlite_temp_schema WHERE type = 'index' AND name = Listed.name"
     " AND tbl_name = ?1 COLLATE NOCASE),"
-    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name))"
-    " FROM pragma_index_list(?1) AS Listed, pragma_index_info(Listed.name) AS Part"
+    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name)), Part.coll"
+    " FROM pragma_index_list(?1) AS Listed, pragma_index_xinfo(Listed.name) AS Part WHERE Part.key"
     " ORDER BY Listed.seq, Part.seqno";
 
 constexpr char kNameSql[] =
@@ -102,10 +102,28 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealI
     int nLast = -1;
     return ForEachRow(pDb, kIndexesSql, strTable, [&](const OwnStatement& pRow) {
         if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
-            vecIndexes.push_back(RealIndex{TextColumn(pRow, 3), NumberColumn(pRow, 1) != 0, {}});
+            vecIndexes.push_back(
+                RealIndex{TextColumn(pRow, 3), NumberColumn(pRow, 1) != 0, false, {}});
         }
-        vecIndexes.back().vecColumns.push_back(TextColumn(pRow, 2));
+        RealIndex& Index = vecIndexes.back();
+        const std::string strColumn = TextColumn(pRow, 2);
+        const std::string strCollation = CollationOf(pDb, strTable, strColumn);
+        // What is not one byte by byte may be equal in other ways.
+        Index.blFiner = Index.blFiner || (!IsBinary(strCollation) &&
+                                          !IsSameColumn(strCollation, TextColumn(pRow, 4)));
+        Index.vecColumns.push_back(strColumn);
     });
+}
+
+std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn) {
+    const char* szCollation = nullptr;
+    sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), strColumn.c_str(), nullptr,
+                                  &szCollation, nullptr, nullptr, nullptr);
+    return szCollation == nullptr ? "" : szCollation;
+}
+
+bool IsBinary(const std::string& strCollation) {
+    return strCollation.empty() || IsSameColumn(strCollation, "BINARY");
 }
 
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken) {

@@ -27,13 +27,18 @@ struct RealTable {
 
 struct RealIndex {
     std::string strSql;                   // its statement; empty: part of the table's own
-    bool blUnique;                        // among all rows
+    bool blUnique = false;                // among all rows
+    bool blFiner = false;                 // tells values apart that its columns compare as equal
     std::vector<std::string> vecColumns;  // empty texts: expressions
 };
 
 // All return SQLite's result. A table that is not there is no failure.
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes);
+
+// How the column compares texts, where a statement does not say it.
+std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn);
+bool IsBinary(const std::string& strCollation);
 
 // Whether a table, an index, a view or a trigger has that name, in any letter case.
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);

@@ -202,13 +202,16 @@ class TableCompare {
         const auto fnSame = [&vecNames](const std::vector<std::string>& vecOther) {
             return SameNames(vecNames, vecOther);
         };
+        const auto fnIndex = [&](bool blFiner) {
+            return std::any_of(
+                m_vecIndexes.begin(), m_vecIndexes.end(), [&](const RealIndex& Index) {
+                    return Index.blUnique && Index.blFiner == blFiner && fnSame(Index.vecColumns);
+                });
+        };
+        // How a primary key compares texts only its index tells.
         // mutate(exchanged): all only look.
-        return fnSame(m_Real.vecKey) ||
-               std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame) ||
-               std::any_of(m_vecIndexes.begin(), m_vecIndexes.end(),
-                           [&fnSame](const RealIndex& Index) {
-                               return Index.blUnique && fnSame(Index.vecColumns);
-                           });
+        return fnIndex(false) || (fnSame(m_Real.vecKey) && !fnIndex(true)) ||
+               std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame);
     }
 
     sqlite3* m_pDb;

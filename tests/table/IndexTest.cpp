@@ -86,6 +86,17 @@ TEST_F(IndexTest, SameIndexIsMadeOnce) {
     EXPECT_EQ(Index({"name"}), R"(CREATE INDEX "doc_name_4" ON "doc" ("name" COLLATE BINARY))");
 }
 
+// Conditions compare bytes, and so does an index for them; what is unique is told by the column.
+TEST_F(IndexTest, UniqueIndexComparesAsItsColumn) {
+    Run("DROP TABLE doc; CREATE TABLE doc (id INTEGER PRIMARY KEY, name TEXT COLLATE NOCASE)");
+    EXPECT_EQ(Index({"name"}), R"(CREATE INDEX "doc_name" ON "doc" ("name" COLLATE BINARY))");
+    const std::string strSql = Index({"name"}, true);
+    EXPECT_EQ(strSql, R"(CREATE UNIQUE INDEX "doc_name_2" ON "doc" ("name"))");
+    EXPECT_EQ(Index({"name"}, true), strSql);
+    Run("INSERT INTO doc VALUES (1, 'a')");
+    EXPECT_EQ(Create(R"({"id": 2, "name": "A"})").substr(0, 10), "duplicate:");
+}
+
 TEST_F(IndexTest, SameIndexOfATemporaryTableIsMadeOnce) {
     Run("CREATE TEMP TABLE doc (id INTEGER PRIMARY KEY, name TEXT)");
     const std::string strSql = Index({"name"});

@@ -279,6 +279,46 @@ TEST_F(SyncTest, NamesOfIndexesAreFree) {
     EXPECT_EQ(Lint(), "");
 }
 
+// A key is found as its column compares. An index that tells more keys apart would let an upsert
+// find one record and store another.
+TEST_F(SyncTest, KeyIsUniqueAsItsColumnCompares) {
+    constexpr char kByName[] = R"({"key": "name", "member": {"name": {"cpptype": "string"},
+        "size": {"cpptype": "int"}}})";
+    constexpr char kIndex[] = "CREATE UNIQUE INDEX \"item_name\" ON \"item\" (\"name\")\n";
+    for (const char* szColumns :
+         {"(name TEXT COLLATE NOCASE, size INT)",
+          "(name TEXT COLLATE NOCASE, size INT, PRIMARY KEY (name COLLATE BINARY))",
+          "(name TEXT COLLATE NOCASE, size INT, UNIQUE (name COLLATE BINARY))",
+          "(name TEXT COLLATE NOCASE, size INT, UNIQUE (name COLLATE RTRIM))"}) {
+        Meet(std::string("CREATE TABLE item ") + szColumns, kByName);
+        EXPECT_EQ(Lint(), "key-not-unique /item/key: the table can hold several rows with one key");
+        EXPECT_EQ(Sync(), kIndex) << szColumns;
+        EXPECT_EQ(Lint(), "");
+        EXPECT_EQ(Create(R"({"name": "ABC", "size": 1})"), R"({"name":"ABC","size":1})");
+        EXPECT_EQ(Get(R"("abc")"), R"({"name":"ABC","size":1})");
+        EXPECT_EQ(Create(R"({"name": "abc"})"),
+                  "duplicate: cannot save a record in table \"item\": UNIQUE constraint failed: "
+                  "item.name (name = \"abc\")");
+        EXPECT_EQ(Save(R"({"name": "abc", "size": 2})", OnDuplicate::kSkip),
+                  R"(skipped {"name":"ABC","size":1})");
+        EXPECT_EQ(Save(R"({"name": "abc", "size": 3})", OnDuplicate::kReplace),
+                  R"(replaced {"name":"ABC","size":3})");
+        EXPECT_EQ(Save(R"({"name": "abc", "size": 4})", OnDuplicate::kUpsert),
+                  R"(updated {"name":"ABC","size":4})");
+        EXPECT_EQ(Rows("SELECT * FROM item"), "ABC|4");
+        Run("DROP TABLE item");
+    }
+    for (const char* szColumns :
+         {"(name TEXT COLLATE NOCASE PRIMARY KEY, size INT)",
+          "(name TEXT COLLATE NOCASE PRIMARY KEY, size INT) WITHOUT ROWID",
+          "(name TEXT, size INT, PRIMARY KEY (name COLLATE NOCASE))",
+          "(name TEXT COLLATE NOCASE, size INT, UNIQUE (name COLLATE BINARY), UNIQUE (name))"}) {
+        Meet(std::string("CREATE TABLE item ") + szColumns, kByName);
+        EXPECT_EQ(Sync().find("CREATE"), std::string::npos) << szColumns;
+        Run("DROP TABLE item");
+    }
+}
+
 TEST_F(SyncTest, GoesWithTheCallersTransaction) {
     Meet("CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)",
          R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");
