@@ -20,6 +20,16 @@ std::string TermSql(sqlite3* pDb, const Members& Of, const Place& Where, bool bl
     return Indexed.strQuoted + (blByColumn ? "" : " COLLATE BINARY");
 }
 
+// SQLite keeps names that begin with "sqlite_" to itself.
+std::string BaseName(const std::string& strTable) {
+    return sqlite3_stricmp(strTable.c_str(), "sqlite") == 0 ? "index_" + strTable : strTable;
+}
+
+// An index of a table in the main database or a temporary one goes there by itself.
+std::string DatabasePrefix(const std::string& strDatabase) {
+    return strDatabase == "main" || strDatabase == "temp" ? "" : Quoted(strDatabase) + ".";
+}
+
 bool EndsWith(const std::string& strText, const std::string& strEnd) {
     return strText.size() >= strEnd.size() &&
            strText.compare(strText.size() - strEnd.size(), strEnd.size(), strEnd) == 0;
@@ -39,12 +49,12 @@ int FindFreeName(sqlite3* pDb, const std::string& strBase,
 
 }  // namespace
 
-int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vecIndexes,
+int PlanIndex(sqlite3* pDb, const Members& Of, const RealIndexes& There,
               const std::vector<IndexTerm>& vecTerms, bool blUnique,
               std::vector<std::string>& vecPlanned, IndexPlan& Out) {
     const std::string strHead = blUnique ? "CREATE UNIQUE INDEX " : "CREATE INDEX ";
     // mutate(exchanged): in any order.
-    std::string strBase = Of.Table();
+    std::string strBase = BaseName(Of.Table());
     std::string strTail = " ON " + Of.QuotedTable();
     const char* szBefore = " (";
     for (const IndexTerm& Term : vecTerms) {
@@ -54,11 +64,12 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vec
         szBefore = ", ";
     }
     strTail += ')';
-    for (const RealIndex& Index : vecIndexes) {
+    const std::string strCreate = strHead + DatabasePrefix(There.strDatabase);
+    for (const RealIndex& Index : There.vecAll) {
         // mutate(exchanged, hoisted): both only look, and what follows gives another plan.
         if (Index.strSql.compare(0, strHead.size(), strHead) == 0 &&
             EndsWith(Index.strSql, strTail)) {
-            Out = IndexPlan{Index.strSql, true};
+            Out = IndexPlan{strCreate + Index.strSql.substr(strHead.size()), true};
             return SQLITE_OK;
         }
     }
@@ -66,7 +77,7 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vec
     const int nResult = FindFreeName(pDb, strBase, vecPlanned, strName);
     // mutate(doubled, exchanged): it is only asked whether it is there, and in any order.
     vecPlanned.push_back(strName);
-    Out = IndexPlan{strHead + Quoted(strName) + strTail, false};
+    Out = IndexPlan{strCreate + Quoted(strName) + strTail, false};
     return nResult;
 }
 

@@ -27,7 +27,7 @@ struct IndexPlan {
 
 // Plans an index under a free name that tells its terms. vecPlanned are names that count as taken,
 // and the new one is added to them. Returns SQLite's result.
-int PlanIndex(sqlite3* pDb, const Members& Of, const std::vector<RealIndex>& vecIndexes,
+int PlanIndex(sqlite3* pDb, const Members& Of, const RealIndexes& There,
               const std::vector<IndexTerm>& vecTerms, bool blUnique,
               std::vector<std::string>& vecPlanned, IndexPlan& Out);
 

@@ -16,23 +16,34 @@ namespace {
 constexpr char kColumnsSql[] =
     "SELECT name, type, dflt_value, pk, \"notnull\", hidden FROM pragma_table_xinfo(?1)";
 
-constexpr char kIndexesSql[] =
-    "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name,"
-    " coalesce((SELECT sql FROM sqlite_temp_schema WHERE type = 'index' AND name = Listed.name"
-    " AND tbl_name = ?1 COLLATE NOCASE),"
-    " (SELECT sql FROM sqlite_schema WHERE type = 'index' AND name = Listed.name)), Part.coll"
-    " FROM pragma_index_list(?1) AS Listed, pragma_index_xinfo(Listed.name) AS Part WHERE Part.key"
-    " ORDER BY Listed.seq, Part.seqno";
+// A name finds a temporary table first, then one of the main database, then of the others in turn.
+constexpr char kDatabaseSql[] =
+    "SELECT Db.name FROM pragma_database_list AS Db"
+    " WHERE EXISTS (SELECT 1 FROM pragma_table_xinfo(?1, Db.name))"
+    " ORDER BY Db.name <> 'temp', Db.seq LIMIT 1";
 
+// In any database: a statement that names one of them looks for clashes in others, too.
 constexpr char kNameSql[] =
-    "SELECT 1 FROM (SELECT name FROM sqlite_schema UNION ALL SELECT name FROM sqlite_temp_schema)"
-    " WHERE name = ?1 COLLATE NOCASE";
+    "SELECT 1 FROM pragma_table_xinfo(?1) UNION ALL SELECT 1 FROM pragma_index_xinfo(?1)";
+
+std::string IndexesSql(const std::string& strDatabase) {
+    const std::string strText = Enclosed(strDatabase, '\'');
+    return Concat(
+        {"SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name, Part.coll,"
+         " (SELECT sql FROM ",
+         Quoted(strDatabase),
+         ".sqlite_schema WHERE type = 'index' AND name = Listed.name)"
+         " FROM pragma_index_list(?1, ",
+         strText, ") AS Listed, pragma_index_xinfo(Listed.name, ", strText,
+         ") AS Part WHERE Part.key ORDER BY Listed.seq, Part.seqno"});
+}
 
 // Calls fnRow for each row of a statement about the name.
 template <typename PerRow>
-int ForEachRow(sqlite3* pDb, const char* szSql, const std::string& strName, PerRow&& fnRow) {
+int ForEachRow(sqlite3* pDb, const std::string& strSql, const std::string& strName,
+               PerRow&& fnRow) {
     OwnStatement pStatement;
-    int nResult = PrepareFor(pDb, szSql, strName, pStatement);
+    int nResult = PrepareFor(pDb, strSql, strName, pStatement);
     if (nResult == SQLITE_OK) {
         while ((nResult = sqlite3_step(pStatement.get())) == SQLITE_ROW) {
             fnRow(pStatement);
@@ -98,19 +109,25 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     return nResult;
 }
 
-int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes) {
+int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out) {
+    const int nResult = ForEachRow(pDb, kDatabaseSql, strTable, [&](const OwnStatement& pRow) {
+        Out.strDatabase = TextColumn(pRow, 0);
+    });
+    if (nResult != SQLITE_OK) {
+        return nResult;
+    }
     int nLast = -1;
-    return ForEachRow(pDb, kIndexesSql, strTable, [&](const OwnStatement& pRow) {
+    return ForEachRow(pDb, IndexesSql(Out.strDatabase), strTable, [&](const OwnStatement& pRow) {
         if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
-            vecIndexes.push_back(
-                RealIndex{TextColumn(pRow, 3), NumberColumn(pRow, 1) != 0, false, {}});
+            Out.vecAll.push_back(
+                RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, {}});
         }
-        RealIndex& Index = vecIndexes.back();
+        RealIndex& Index = Out.vecAll.back();
         const std::string strColumn = TextColumn(pRow, 2);
         const std::string strCollation = CollationOf(pDb, strTable, strColumn);
         // What is not one byte by byte may be equal in other ways.
         Index.blFiner = Index.blFiner || (!IsBinary(strCollation) &&
-                                          !IsSameColumn(strCollation, TextColumn(pRow, 4)));
+                                          !IsSameColumn(strCollation, TextColumn(pRow, 3)));
         Index.vecColumns.push_back(strColumn);
     });
 }

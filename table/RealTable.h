@@ -32,15 +32,20 @@ struct RealIndex {
     std::vector<std::string> vecColumns;  // empty texts: expressions
 };
 
+struct RealIndexes {
+    std::string strDatabase = "main";  // or "temp", or as it was attached
+    std::vector<RealIndex> vecAll;
+};
+
 // All return SQLite's result. A table that is not there is no failure.
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
-int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, std::vector<RealIndex>& vecIndexes);
+int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
 
 // How the column compares texts, where a statement does not say it.
 std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn);
 bool IsBinary(const std::string& strCollation);
 
-// Whether a table, an index, a view or a trigger has that name, in any letter case.
+// Whether a table, a view or an index has that name, in any letter case.
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);
 
 // Whether two SQL expressions without names have one value; as JSON, where both are JSON. What

@@ -20,8 +20,9 @@ int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out) {
     return nResult;
 }
 
-int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnStatement& Out) {
-    const int nResult = Prepare(pDb, szSql, Out);
+int PrepareFor(sqlite3* pDb, const std::string& strSql, const std::string& strText,
+               OwnStatement& Out) {
+    const int nResult = Prepare(pDb, strSql, Out);
     return nResult == SQLITE_OK ? sqlite3_bind_text(Out.get(), 1, strText.data(),
                                                     static_cast<int>(strText.size()), SQLITE_STATIC)
                                 : nResult;

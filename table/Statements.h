@@ -24,7 +24,8 @@ using OwnStatement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out);
 
 // The same with the first parameter bound to the text, which the caller keeps.
-int PrepareFor(sqlite3* pDb, const char* szSql, const std::string& strText, OwnStatement& Out);
+int PrepareFor(sqlite3* pDb, const std::string& strSql, const std::string& strText,
+               OwnStatement& Out);
 
 // NULL is the empty text.
 std::string TextColumn(const OwnStatement& pStatement, int nColumn);

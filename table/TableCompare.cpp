@@ -33,7 +33,7 @@ class TableCompare {
         blFound = !m_Real.vecColumns.empty();
         // mutate(exchanged): in any order.
         if (nResult == SQLITE_OK && blFound) {
-            nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_vecIndexes);
+            nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_Indexes);
         }
         // mutate(exchanged): what is not there is not compared.
         if (nResult != SQLITE_OK || !blFound) {
@@ -180,8 +180,7 @@ class TableCompare {
             return SQLITE_OK;
         }
         IndexPlan Plan;
-        const int nResult =
-            PlanIndex(m_pDb, m_Of, m_vecIndexes, vecTerms, true, m_vecPlanned, Plan);
+        const int nResult = PlanIndex(m_pDb, m_Of, m_Indexes, vecTerms, true, m_vecPlanned, Plan);
         // mutate(doubled): it is only asked whether it is there.
         m_vecUniqueByPlan.push_back(vecNames);
         m_pvecStatements->push_back(Plan.strSql);
@@ -204,7 +203,7 @@ class TableCompare {
         };
         const auto fnIndex = [&](bool blFiner) {
             return std::any_of(
-                m_vecIndexes.begin(), m_vecIndexes.end(), [&](const RealIndex& Index) {
+                m_Indexes.vecAll.begin(), m_Indexes.vecAll.end(), [&](const RealIndex& Index) {
                     return Index.blUnique && Index.blFiner == blFiner && fnSame(Index.vecColumns);
                 });
         };
@@ -220,7 +219,7 @@ class TableCompare {
     std::vector<std::string>* m_pvecStatements;
     FindingList& m_vecFindings;
     RealTable m_Real;
-    std::vector<RealIndex> m_vecIndexes;
+    RealIndexes m_Indexes;
     std::vector<std::string> m_vecPlanned;                    // names of indexes
     std::vector<std::vector<std::string>> m_vecUniqueByPlan;  // their columns
 };

@@ -37,12 +37,12 @@ std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
 }
 
 int RunPlan(Parts& Into, const std::vector<IndexTerm>& vecTerms, bool blUnique, IndexPlan& Plan) {
-    std::vector<vornjsondb::RealIndex> vecIndexes;
+    vornjsondb::RealIndexes There;
     std::vector<std::string> vecPlanned;
-    int nResult = vornjsondb::ReadRealIndexes(Into.pDb, Into.Of.Table(), vecIndexes);
+    int nResult = vornjsondb::ReadRealIndexes(Into.pDb, Into.Of.Table(), There);
     if (nResult == SQLITE_OK) {
-        nResult = vornjsondb::PlanIndex(Into.pDb, Into.Of, vecIndexes, vecTerms, blUnique,
-                                        vecPlanned, Plan);
+        nResult =
+            vornjsondb::PlanIndex(Into.pDb, Into.Of, There, vecTerms, blUnique, vecPlanned, Plan);
     }
     return nResult == SQLITE_OK && !Plan.blThere
                ? sqlite3_exec(Into.pDb, Plan.strSql.c_str(), nullptr, nullptr, nullptr)

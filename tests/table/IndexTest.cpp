@@ -105,6 +105,34 @@ TEST_F(IndexTest, SameIndexOfATemporaryTableIsMadeOnce) {
     EXPECT_EQ(Rows("SELECT name FROM sqlite_temp_schema WHERE type = 'index'"), "doc_name");
 }
 
+// It goes where the table is, under a name that is free there, and is found there again.
+TEST_F(IndexTest, TableOfAnAttachedDatabaseGetsItsIndexThere) {
+    Run("DROP TABLE doc; ATTACH ':memory:' AS \"a \"\"b\"; ATTACH ':memory:' AS other;"
+        "CREATE TABLE \"a \"\"b\".doc (id INTEGER PRIMARY KEY, name TEXT, size INT);"
+        "CREATE TABLE other.doc (id INTEGER PRIMARY KEY, size INT);"
+        "CREATE INDEX other.doc_size ON doc (size); CREATE TABLE t (x);"
+        "CREATE UNIQUE INDEX doc_name ON t (x); CREATE TABLE other.doc_name_3 (x)");
+    const std::string strSql = Index({"name"});
+    EXPECT_EQ(strSql, R"(CREATE INDEX "a ""b"."doc_name_2" ON "doc" ("name" COLLATE BINARY))");
+    EXPECT_EQ(Index({"name"}), strSql);
+    EXPECT_EQ(Index({"name"}, true),
+              R"(CREATE UNIQUE INDEX "a ""b"."doc_name_4" ON "doc" ("name" COLLATE BINARY))");
+    EXPECT_EQ(Index({"size"}), R"(CREATE INDEX "a ""b"."doc_size_2" ON "doc" ("size"))");
+    EXPECT_EQ(Rows("SELECT name FROM \"a \"\"b\".sqlite_schema WHERE type = 'index'"),
+              "doc_name_2;doc_name_4;doc_size_2");
+    EXPECT_EQ(Rows("SELECT name FROM sqlite_schema WHERE type = 'index'"), "doc_name");
+    Run("DETACH other");
+    EXPECT_EQ(Index({"name"}), strSql);
+}
+
+TEST_F(IndexTest, NameOfAnIndexIsNoneOfSqlitesOwn) {
+    Open(R"({"SQLite": {"key": "id", "member": {"id": {"cpptype": "int"},
+                                                "a": {"cpptype": "int"}}}})");
+    const std::string strSql = Index({"a"});
+    EXPECT_EQ(strSql, R"(CREATE INDEX "index_SQLite_a" ON "SQLite" ("a"))");
+    EXPECT_EQ(Index({"a"}), strSql);
+}
+
 TEST_F(IndexTest, WhatCannotBeIndexed) {
     EXPECT_EQ(Index({}),
               "refused: cannot create an index on table \"doc\": the list names no member "
@@ -124,6 +152,9 @@ TEST_F(IndexTest, WhatCannotBeIndexed) {
                                        return true;
                                    })),
               "ok");
+    Run("DROP TABLE doc");
+    EXPECT_EQ(Index({"size"}),
+              "refused: cannot create an index on table \"doc\": no such table: main.doc");
 }
 
 TEST_F(IndexTest, UniqueIndexOnAPathIsKept) {

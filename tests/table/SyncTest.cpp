@@ -319,6 +319,20 @@ TEST_F(SyncTest, KeyIsUniqueAsItsColumnCompares) {
     }
 }
 
+TEST_F(SyncTest, TableOfAnAttachedDatabaseGrowsThere) {
+    Meet(
+        "ATTACH ':memory:' AS other; CREATE TABLE other.item (id INTEGER);"
+        "INSERT INTO item VALUES (1); CREATE TABLE item_id (x)",
+        R"({"key": "id", "member": {"id": {"cpptype": "int"},
+             "a": {"cpptype": "int", "unique": true}}})");
+    EXPECT_EQ(Sync(),
+              "ALTER TABLE \"item\" ADD COLUMN \"a\" INTEGER\n"
+              "CREATE UNIQUE INDEX \"other\".\"item_a\" ON \"item\" (\"a\")\n"
+              "CREATE UNIQUE INDEX \"other\".\"item_id_2\" ON \"item\" (\"id\")\n");
+    EXPECT_EQ(Sync(), "");
+    EXPECT_EQ(Get("1"), R"({"id":1})");
+}
+
 TEST_F(SyncTest, GoesWithTheCallersTransaction) {
     Meet("CREATE TABLE item (id INTEGER PRIMARY KEY); INSERT INTO item VALUES (1)",
          R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");
