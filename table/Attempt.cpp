@@ -74,6 +74,13 @@ int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
     }
     if (nResult == SQLITE_INTERRUPT) {
         RunOnce(pBegin);
+        sqlite3* const pDb = sqlite3_db_handle(pBegin);
+        // A changed schema has all statements prepared anew, and SQLite's parser looks for
+        // interrupts at blanks and at the end of a text without a semicolon. This one gets through
+        // to be interrupted when it runs, and would do next to nothing otherwise.
+        if (sqlite3_get_autocommit(pDb) == 0) {
+            sqlite3_exec(pDb, "PRAGMA\"incremental_vacuum\"(1);", nullptr, nullptr, nullptr);
+        }
     }
     return nResult;
 }

@@ -41,6 +41,11 @@ class InterruptTest : public TableTest {
         return strOpen + Rows("SELECT id, name FROM task ORDER BY id");
     }
 
+    std::string Schema() {
+        return Rows("SELECT sql FROM sqlite_schema WHERE name LIKE 'task%'") +
+               (sqlite3_get_autocommit(m_pDb) == 0 ? " open" : "");
+    }
+
     Status SaveOne(OnDuplicate eOnDuplicate) {
         Json::Value jStored;
         return m_Table.Save(Parse(R"({"id": 1, "name": "b"})"), eOnDuplicate, &jStored);
@@ -82,6 +87,9 @@ class InterruptTest : public TableTest {
 
     const char* m_szAt = "";
 };
+
+constexpr char kGrown[] = R"({"task": {"key": "id", "member": {"id": {"cpptype": "int"},
+    "name": {"cpptype": "string", "unique": true}, "more": {"cpptype": "int"}}}})";
 
 TEST_F(InterruptTest, CallIsUndone) {
     for (const char* szAt : {"SELECT", "COMMIT"}) {
@@ -152,6 +160,46 @@ TEST_F(InterruptTest, WhatIsToldIsTrueWhereverAProgressHandlerStopsIt) {
                       Run(Outcome.Ok() ? "ROLLBACK" : "SELECT 1");
                       All.Rollback().Ignore();
                   });
+}
+
+// A schema that was changed is undone with the rest, and what SQLite knows of it, too.
+TEST_F(InterruptTest, SchemaIsWholeOrAsItWas) {
+    const std::string strBefore = Schema();
+    const auto fnIndex = [this] { return m_Table.CreateIndex({"name"}, false); };
+    const auto fnSync = [this] {
+        Table Grown;
+        const Status Opened = Grown.Open(m_pDb, "task", Parse(kGrown));
+        SyncReport Report;
+        return Opened.Ok() ? Grown.Sync(SyncMode::kChange, Report) : Opened;
+    };
+    struct Case {
+        std::string strDo;
+        std::function<Status()> fnDo;
+        const char* szTakeBack;
+    };
+    const Case aCases[] = {{"create an index on", fnIndex, "DROP INDEX task_name"},
+                           {"bring the definition into", fnSync,
+                            "DROP INDEX task_name; ALTER TABLE task DROP COLUMN more"}};
+    for (const Case& Each : aCases) {
+        const std::string strTold =
+            "interrupted: cannot " + Each.strDo + " table \"task\": interrupted";
+        for (const char* szAt : {"BEGIN", "CREATE", "COMMIT"}) {
+            EXPECT_EQ(InterruptAt(szAt, Each.fnDo), strTold) << szAt;
+            EXPECT_EQ(Schema(), strBefore) << szAt;
+        }
+        for (const char* szAt : {"CREATE", "RELEASE"}) {
+            Run("BEGIN; INSERT INTO task (id) VALUES (2)");
+            EXPECT_EQ(InterruptAt(szAt, Each.fnDo), strTold + "; the transaction is undone")
+                << szAt;
+            EXPECT_EQ(Schema(), strBefore) << szAt;
+            EXPECT_EQ(Ids(), "1|a") << szAt;
+        }
+        InterruptEach([] {}, Each.fnDo,
+                      [&](const Status& Outcome) {
+                          Run(Outcome.Ok() ? Each.szTakeBack : "SELECT 1");
+                          EXPECT_EQ(Schema(), strBefore) << Text(Outcome);
+                      });
+    }
 }
 
 TEST_F(InterruptTest, LoadIsUndone) {
