@@ -29,9 +29,12 @@ void RecordValues::Prepare(size_t nMember) {
     const Range& Fits = RangeOf(*Of.pType);
     Slot& Into = m_vecSlots[nMember];
     // mutate(exchanged): in any order.
-    if (!Of.blGenerated && (!m_blCompatible || Of.pType->pfnRead != nullptr)) {
+    if (!m_blCompatible || Of.pType->pfnRead != nullptr) {
         // mutate(dropped): the longer way gives the same.
         Into.eKind = Of.Kind();
+    }
+    if (Of.blGenerated) {
+        RefuseAlways(nMember);
     }
     // mutate(dropped, exchanged): the longer way gives the same, and in any order.
     Into.nLeast = Fits.nLeast;
@@ -108,7 +111,7 @@ void RecordValues::LookAtJson(size_t nMember, const Json::Value& jValue, Finding
     const Member& Into = m_Of.At(nMember);
     const Misfit eMisfit = FitJson(*Into.pType, jValue, m_blCompatible, m_Codec,
                                    m_vecSlots[nMember].strBytes, Give(nMember));
-    if (eMisfit != Misfit::kNone || Into.blGenerated) {
+    if (eMisfit != Misfit::kNone || m_vecSlots[nMember].blComputed) {
         Refuse(Into, eMisfit, jValue, vecFindings);
     }
 }
@@ -144,10 +147,15 @@ bool RecordValues::HasKey(FindingList& vecFindings) const {
         Report(vecFindings, FindingCode::kNoKey, "", kNoKeyText);
     }
     for (const size_t nMember : m_Of.Key()) {
+        const Member& Of = m_Of.At(nMember);
         // mutate(exchanged): both only look.
         if (!Has(nMember) || At(nMember).eKind == BoundValue::Kind::kNull) {
-            Report(vecFindings, FindingCode::kMissingKey, Below("", m_Of.At(nMember).strName),
-                   Concat({"the key's member ", m_Of.At(nMember).strQuoted, " has no value"}));
+            const bool blComputed = m_vecSlots[nMember].blComputed;
+            Report(
+                vecFindings, FindingCode::kMissingKey, Below("", Of.strName),
+                Concat({"the key's member ", Of.strQuoted,
+                        blComputed ? " is computed by the table, and no record can bring its value"
+                                   : " has no value"}));
         }
     }
     return vecFindings.empty();

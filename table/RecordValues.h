@@ -73,8 +73,11 @@ class RecordValues {
         return blFits;
     }
 
-    // From now on every value of the member is looked at.
-    void LookAlways(size_t nMember) { m_vecSlots[nMember].eKind = BoundKind::kNone; }
+    // From now on every value of the member is refused: the table computes it.
+    void RefuseAlways(size_t nMember) {
+        m_vecSlots[nMember].eKind = BoundKind::kNone;
+        m_vecSlots[nMember].blComputed = true;
+    }
 
     // Gives members that the record lacks the definition's defaults, if it has any, which must fit
     // like any value.
@@ -106,6 +109,7 @@ class RecordValues {
         BoundKind eKind = BoundKind::kNone;  // of values that are taken without a look
         std::int64_t nLeast = 0;             // of whole numbers among them
         std::int64_t nMost = 0;
+        bool blComputed = false;  // by the table, so that a value is refused
     };
     void Prepare(size_t nMember);
     static void Grow(std::string& strOwn, size_t nBytes);

@@ -121,9 +121,7 @@ void Table::Parts::Learn(const RealTable& Real) {
         if (Column.blGenerated && nMember != vornjsondb::Members::kNone) {
             // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);
-            // mutate(exchanged): in any order.
-            Values.LookAlways(nMember);
-            Wanted.LookAlways(nMember);
+            Values.RefuseAlways(nMember);
         }
     }
 }
