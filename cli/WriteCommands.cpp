@@ -26,20 +26,13 @@ int ReportCount(const Context& Call, const char* szDone, std::int64_t nRecords,
     return kExitFine;
 }
 
-bool IsView(const OpenTable& Open) {
-    return !Texts(Open.pDb.get(),
-                  "SELECT 1 FROM sqlite_master WHERE type = 'view' AND name = ?1 COLLATE NOCASE",
-                  Open.Records.Name())
-                .empty();
-}
-
 // Runs a change and counts its records. SQLite does not count what the triggers of a view do: there
 // all that are found count.
 template <typename Change>
 Status Counted(OpenTable& Open, const Query& Which, std::int64_t& nRecords,
                const Change& fnChange) {
     std::int64_t nFound = 0;
-    if (IsView(Open)) {
+    if (Open.Records.IsView()) {
         Status Looked = Open.Records.Count(Which, nFound);
         if (!Looked.Ok()) {
             return Looked;

@@ -367,6 +367,7 @@ class Table {
     const Json::Value& Definition() const;               // without entries of other tables
     const std::vector<std::string>& Members() const;     // in byte order, which loaders count by
     const std::vector<std::string>& KeyMembers() const;  // empty: the table has no key
+    bool IsView() const;  // when it was opened; its INSTEAD OF triggers then do what is written
     sqlite3* Connection() const;
 
     // Writes one record. pjStored, where given, receives the row as it is stored, with keys and
@@ -392,8 +393,8 @@ class Table {
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
     // Sets members of all records that the query selects, or removes these records. A query
-    // without a condition, with sorting or with paging is refused. SQLite counts no rows of a
-    // view, whose triggers do the work.
+    // without a condition, with sorting or with paging is refused. Of a view no rows are counted:
+    // SQLite does not know what its triggers do.
     Status Update(const Query& Which, const Json::Value& jMembers, std::int64_t* pnRows = nullptr);
     Status Remove(const Query& Which, std::int64_t* pnRows = nullptr);
     Status RemoveAll(std::int64_t* pnRows = nullptr);

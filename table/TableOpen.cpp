@@ -189,6 +189,10 @@ const std::vector<std::string>& Table::KeyMembers() const {
     return m_pParts ? m_pParts->vecKeyNames : vornjsondb::None<std::vector<std::string>>();
 }
 
+bool Table::IsView() const {
+    return m_pParts && m_pParts->blView;
+}
+
 sqlite3* Table::Connection() const {
     return m_pParts ? m_pParts->pDb : nullptr;
 }

@@ -130,7 +130,18 @@ TEST_F(SchemaTest, ViewOfAnotherDatabaseIsOneToo) {
         "CREATE VIEW other.item AS SELECT id, name, size FROM base;"
         "CREATE TRIGGER other.i INSTEAD OF INSERT ON item BEGIN"
         " INSERT INTO base VALUES (new.id, new.name, new.size); END");
+    EXPECT_TRUE(m_Table.IsView());
     EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+}
+
+TEST_F(SchemaTest, TableSaysWhetherItIsAView) {
+    EXPECT_FALSE(m_Table.IsView());
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY)");
+    EXPECT_FALSE(m_Table.IsView());
+    Meet("CREATE TEMP VIEW Item AS SELECT 1 AS id");
+    EXPECT_TRUE(m_Table.IsView());
+    Meet("DROP VIEW item");
+    EXPECT_FALSE(m_Table.IsView());
 }
 
 TEST_F(SchemaTest, KeyThatTheDatabaseFillsInIsNotReadBackWithoutARowid) {
