@@ -19,8 +19,8 @@
 // 1  Limits
 //
 // The connection is the caller's and must outlive what works on it: a Table keeps prepared
-// statements, and sqlite3_close refuses while one lives. So a Loader goes before its Table, and
-// Table and Transaction go before the connection.
+// statements, and sqlite3_close refuses while one lives. So Table, Loader and Transaction go before
+// the connection, in any order. A Loader keeps what it needs of its Table.
 // Threads: one at a time for a connection and all that works on it. Any number of threads may each
 // have their own; nothing is shared between them.
 // SQLite 3.35 or later. Databases are UTF-8; Table::Open refuses UTF-16.
@@ -36,9 +36,9 @@
 // be done.
 // Functions and hooks of the program that SQLite calls in the middle of a call, an SQL function in
 // a trigger say, cannot use the same Table, nor a Loader on it: each call returns kMisuse and does
-// nothing, and so do the Set calls of the Loader that is just writing. They must not move or
-// destroy it. Another Table on the connection is free, as far as SQLite is. Exceptions:
-// std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
+// nothing, and so do the Set calls of the Loader that is just writing. Nor may they destroy it.
+// Another Table on the connection is free, as far as SQLite is.
+// Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
 //
 // 2  Words
 //
@@ -356,10 +356,10 @@ class Table {
     Table& operator=(const Table&) = delete;
 
     // Must come first; a table that is open already becomes another one, or is closed by a failure,
-    // but not in a callback of its own nor while a Loader works on it. Copies its arguments but the
-    // connection. A null definition is made from the real table. kNotFound: there is no such table
-    // and Options do not say how to make one. Columns that the table lacks, or has more, are no
-    // failure: see Lint and Sync.
+    // but not in a callback of its own. A Loader goes on with what it was. Copies its arguments but
+    // the connection. A null definition is made from the real table. kNotFound: there is no such
+    // table and Options do not say how to make one. Columns that the table lacks, or has more, are
+    // no failure: see Lint and Sync.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 
@@ -387,8 +387,8 @@ class Table {
     Status Exists(const Query& Which, bool& blExists);
 
     // One row at a time, in constant memory, until the callback returns false. In it the table can
-    // be read, but calls that change it, and Open, return kMisuse; and it must not be moved or
-    // destroyed.
+    // be read, and the Table moved and destroyed; but calls that change it, and Open, return
+    // kMisuse.
     Status ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord);
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
@@ -425,7 +425,7 @@ class Table {
 
   private:
     friend class Loader;
-    std::unique_ptr<Parts> m_pParts;
+    std::shared_ptr<Parts> m_pParts;  // shared with loaders, and with calls that call back
 };
 
 // 7  Many records

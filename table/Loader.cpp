@@ -21,12 +21,13 @@ Status NotReady(const Loader::Parts* pParts) {
 
 }  // namespace
 
-Loader::Parts::Parts(Table::Parts& To, const LoadOptions& HowToLoad)
-    : Into(To),
+Loader::Parts::Parts(std::shared_ptr<Table::Parts> pTo, const LoadOptions& HowToLoad)
+    : pOwn(std::move(pTo)),
+      Into(*pOwn),
       How(HowToLoad),
-      Values(To.Of, To.Codec, To.How.blCompatible, To.How.blIgnoreUnknown),
-      vecWrong(To.Of.Size() + 2),
-      Writer(To, Values) {}
+      Values(Into.Of, Into.Codec, Into.How.blCompatible, Into.How.blIgnoreUnknown),
+      vecWrong(Into.Of.Size() + 2),
+      Writer(Into, Values) {}
 
 void Loader::Parts::SetWrong(size_t nPlace, FindingList& vecFindings) {
     SetRight(nPlace);
@@ -168,13 +169,12 @@ Status Loader::Start(Table& Into, const LoadOptions& How) {
     if (!Outcome.Ok()) {
         return Outcome;
     }
-    Table::Parts& To = *Into.m_pParts;
-    if (How.eOnDuplicate != OnDuplicate::kStop && To.Of.Key().empty()) {
+    if (How.eOnDuplicate != OnDuplicate::kStop && Into.m_pParts->Of.Key().empty()) {
         FindingList vecFindings;
         Report(vecFindings, vornjsondb::FindingCode::kNoKey, "", vornjsondb::kNoKeyText);
-        return vornjsondb::FromFindings(std::move(vecFindings), To.Do(kDo));
+        return vornjsondb::FromFindings(std::move(vecFindings), Into.m_pParts->Do(kDo));
     }
-    m_pParts = std::make_unique<Parts>(To, How);
+    m_pParts = std::make_unique<Parts>(Into.m_pParts, How);
     return Outcome;
 }
 

@@ -9,7 +9,7 @@
 #include "RecordWriter.h"
 
 struct VORN_JSON_DB::Loader::Parts {
-    Parts(Table::Parts& To, const LoadOptions& HowToLoad);
+    Parts(std::shared_ptr<Table::Parts> pTo, const LoadOptions& HowToLoad);
 
     // Whether a record can be written now; if not, State tells why: the failure that ended the
     // load, a callback that reads from the table, or a call that has not returned.
@@ -31,6 +31,7 @@ struct VORN_JSON_DB::Loader::Parts {
     Status EndRecord(FindingList& vecFindings);
     Status Commit();
 
+    const std::shared_ptr<Table::Parts> pOwn;  // which may be no Table's any more
     Table::Parts& Into;
     const LoadOptions How;
     vornjsondb::RecordValues Values;

@@ -140,7 +140,7 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
         }
     }
     // The arguments may be parts of what it was before.
-    const std::unique_ptr<Parts> pBefore = std::move(m_pParts);
+    const std::shared_ptr<Parts> pBefore = std::move(m_pParts);
     const Doing What{"open", &strName};
     // mutate(exchanged): it only looks.
     if (pDb == nullptr) {
@@ -160,7 +160,7 @@ Status Table::Open(sqlite3* pDb, const std::string& strName, const Json::Value& 
             }
         }
         FindingList vecFindings;
-        auto pParts = std::make_unique<Parts>(
+        auto pParts = std::make_shared<Parts>(
             pDb, strName, jDefinition.isNull() ? jMade : jDefinition, How, vecFindings);
         Status Outcome = vornjsondb::FromFindings(std::move(vecFindings), What);
         if (Outcome.Ok()) {

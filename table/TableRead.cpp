@@ -175,16 +175,18 @@ Status Table::Exists(const Query& Which, bool& blExists) {
 }
 
 Status Table::ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord) {
+    const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
     const auto fnRead = [&](Parts& From, const Doing& What) {
         return SelectRecords(From, Which, What, [&](const Json::Value& jRecord) {
             const Callback Now(From);
             return fnRecord(jRecord);
         });
     };
-    return vornjsondb::Guarded(m_pParts.get(), "read records of", false, fnRead);
+    return vornjsondb::Guarded(pOwn.get(), "read records of", false, fnRead);
 }
 
 Status Table::ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow) {
+    const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
     const auto fnRead = [&](Parts& From, const Doing& What) {
         return Select(From, Which, What,
                       [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
@@ -193,7 +195,7 @@ Status Table::ForEachRow(const Query& Which, const std::function<bool(const Row&
                           return fnRow(Row(Source));
                       });
     };
-    return vornjsondb::Guarded(m_pParts.get(), "read records of", false, fnRead);
+    return vornjsondb::Guarded(pOwn.get(), "read records of", false, fnRead);
 }
 
 }  // namespace VORN_JSON_DB

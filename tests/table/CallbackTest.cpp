@@ -225,6 +225,39 @@ TEST_F(CallbackTest, CallbackOfForEachReadsAndWhatSqliteCallsDoesNot) {
               R"({"id":1,"name":"a"}{"id":1,"name":"a"} {"id":2,"name":"b"}{"id":2,"name":"b"} )");
 }
 
+TEST_F(CallbackTest, TableMayBeMovedAndDestroyedWhereItIsRead) {
+    Table Other;
+    std::string strSeen;
+    EXPECT_EQ(Text(m_Table.ForEach(Query().Sort("id"),
+                                   [&](const Json::Value& jRecord) {
+                                       strSeen += Text(jRecord);
+                                       std::swap(Other, m_Table);
+                                       return true;
+                                   })),
+              "ok");
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Sort("id"),
+                                      [&](const Row& Each) {
+                                          m_Table = Table();
+                                          strSeen += Each.Name(2) + " " + std::string(Each.Text(2));
+                                          return true;
+                                      })),
+              "ok");
+    EXPECT_EQ(strSeen, R"({"id":1,"name":"a"}{"id":2,"name":"b"}name aname b)");
+    EXPECT_EQ(Text(m_Table.RemoveAll()),
+              "misuse: cannot remove all records from: the table is not open");
+}
+
+TEST_F(CallbackTest, LoaderGoesOnWithoutItsTable) {
+    EXPECT_EQ(Text(m_Load.Start(m_Table, {OnDuplicate::kReplace})), "ok");
+    EXPECT_EQ(Text(m_Load.Add(Parse(R"({"id": 3, "name": "c"})"))), "ok");
+    Table Other = std::move(m_Table);
+    EXPECT_EQ(Text(m_Load.Add(Parse(R"({"id": 4, "name": "d"})"))), "ok");
+    EXPECT_EQ(Text(Other.Open(m_pDb, "none", Parse(kTasks))).substr(0, 8), "refused:");
+    EXPECT_EQ(Text(m_Load.Add(Parse(R"({"id": 4, "name": "e"})"))), "ok");
+    EXPECT_EQ(Text(m_Load.Commit()), "ok");
+    EXPECT_EQ(Ids(), "1|a;2|b;3|c;4|e");
+}
+
 TEST_F(CallbackTest, CallbackThatThrowsEndsItsCall) {
     try {
         m_Table.ForEach(Query(), [](const Json::Value&) -> bool { throw 1; }).Ignore();
