@@ -173,6 +173,67 @@ TEST_F(EdgesTest, JsonOfALoaderMayBeForNoMemberAndMayBeAText) {
     EXPECT_EQ(Rows("SELECT id, json, done FROM doc"), R"(1|"x"|0)");
 }
 
+TEST_F(EdgesTest, ConnectionThatMayOnlyReadSaysSo) {
+    EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+    Run("PRAGMA query_only = ON");
+    const std::string strWhy = ": attempt to write a readonly database";
+    const std::string strSave = "read-only: cannot save a record in table \"doc\"" + strWhy;
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"id": 2})"))), strSave);
+    for (const OnDuplicate eMode :
+         {OnDuplicate::kStop, OnDuplicate::kSkip, OnDuplicate::kReplace, OnDuplicate::kUpsert}) {
+        EXPECT_EQ(Save(R"({"id": 1, "name": "b"})", eMode), strSave);
+    }
+    const Query One = Query().Where("id", 1);
+    EXPECT_EQ(Text(m_Table.Update(One, Parse(R"({"name": "b"})"))),
+              "read-only: cannot update records of table \"doc\"" + strWhy);
+    EXPECT_EQ(Text(m_Table.Remove(One)),
+              "read-only: cannot remove records from table \"doc\"" + strWhy);
+    EXPECT_EQ(Text(m_Table.RemoveAll()),
+              "read-only: cannot remove all records from table \"doc\"" + strWhy);
+    EXPECT_EQ(Text(m_Table.CreateIndex({"name"}, false)),
+              "read-only: cannot create an index on table \"doc\"" + strWhy);
+    SyncReport Report;
+    EXPECT_EQ(Text(m_Table.Sync(SyncMode::kChange, Report)),
+              "read-only: cannot bring the definition into table \"doc\"" + strWhy);
+    EXPECT_EQ(Text(m_Table.Sync(SyncMode::kLook, Report)), "ok");
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
+    EXPECT_EQ(
+        Text(Into.Add(Parse(R"({"id": 2})"))),
+        "read-only: cannot load record 1 into table \"doc\": cannot begin a transaction" + strWhy);
+    Transaction All;
+    EXPECT_EQ(Text(All.Begin(m_pDb)), "read-only: cannot begin a transaction" + strWhy);
+    EXPECT_EQ(Text(All.Begin(m_pDb, Transaction::Mode::kDeferred)), "ok");
+    EXPECT_EQ(Get("1"), R"({"id":1,"name":"a"})");
+    EXPECT_EQ(Text(All.Commit()), "ok");
+    EXPECT_EQ(Lint(), "");
+}
+
+// JsonCpp makes three bytes of a low surrogate, and no JSON of a high one that none follows.
+TEST_F(EdgesTest, HalvesOfSurrogatePairsAreTexts) {
+    const Json::Value jRecord =
+        Parse(R"({"id": 1, "name": "a\udc00", "map": {"k\udfff": "\udc00"}, "tags": ["\udc01"]})");
+    EXPECT_EQ(jRecord["name"].asString(), "a\xed\xb0\x80");
+    Json::Value jStored;
+    EXPECT_EQ(Text(m_Table.Create(jRecord, &jStored)), "ok");
+    EXPECT_EQ(jStored, jRecord);
+    EXPECT_EQ(Ids(Query().Where("name", jRecord["name"])), "1");
+    EXPECT_EQ(Ids(Query().Where("map", jRecord["map"])), "1");
+    EXPECT_EQ(Ids(Query().Where("map.k\xed\xbf\xbf", "\xed\xb0\x80")), "1");
+    EXPECT_EQ(Ids(Query().Where("tags", Op::kContains, jRecord["tags"][0])), "1");
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table, {OnDuplicate::kUpsert})), "ok");
+    Into.SetInteger(Into.MemberIndex("id"), 1);
+    Into.SetJson(Into.MemberIndex("tags"), R"(["\udc02"])");
+    EXPECT_EQ(Text(Into.EndRecord()), "ok");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
+    EXPECT_EQ(Rows("SELECT tags FROM doc"), "[\"\xed\xb0\x82\"]");
+    Into.SetJson(Into.MemberIndex("tags"), R"(["\ud800"])");
+    EXPECT_EQ(Text(Into.EndRecord()),
+              "refused: cannot load record 2 into table \"doc\": member \"tags\": "
+              R"("[""\ud800""]" is no JSON [wrong-kind /tags])");
+}
+
 TEST_F(EdgesTest, WordsGoOnInUnderscoresDollarsAndOtherAlphabets) {
     for (const char* szSql : {"where_", "where$", "where\xc3\xa9", "$where", "9where"}) {
         EXPECT_FALSE(vornjsondb::HoldsWord(szSql, "WHERE")) << szSql;
