@@ -21,6 +21,8 @@ BEFORE_BLOCK = re.compile(r"(?:\)|\belse|\bdo|\btry|\bconst|\bnoexcept|-> [\w:*&
 DECLARATION = re.compile(r"(?:static |constexpr |const )*[\w:]+(?:<[^;=]*>)?(?: const)?[ &*]+(\w+)(?=[ ;({\[])")
 # Neighbours that set members of one value; each of another name, so in any order.
 SETS_MEMBER = re.compile(r'[\w.]+\[" +"\] = [^();]*;$')
+# A member of a value or of what it points to is set, to something without it.
+SETS_FIELD = re.compile(r"(\w+(?:\.\w+)*)(?:\.|->)(\w+) = ((?:(?!\b\1\b)[^;])*);$")
 # A lambda that takes what it names by reference: where it stands it does nothing yet.
 LAMBDA = re.compile(r"const auto \w+ = \[&\]")
 CALL = re.compile(r"((?:\w+(?:\.|->|::))*)(\w+)\(")
@@ -30,7 +32,9 @@ LOOKS = re.compile(
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
-    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size)$"
+    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf"
+    r"|FindGroupKey|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextOf|isalnum|isdigit|isfinite|fabs"
+    r"|all_of|any_of|sqlite3_(?:column_int|get_autocommit|stricmp))$"
 )
 
 
@@ -220,6 +224,8 @@ class Effect:
         """Whether exchanging the two may show; local: the names that nobody sees after leaving."""
         if SETS_MEMBER.match(self.text) and SETS_MEMBER.match(other.text):
             return False
+        if sets_other_fields(self.text, other.text):
+            return False
         return (
             (self.anything and other.anything)
             or bool(self.written & other.names or other.written & self.names)
@@ -228,14 +234,28 @@ class Effect:
         )
 
 
+def sets_other_fields(first, second):
+    """Whether two statements set two members of one value, in any order.
+
+    >>> sets_other_fields("Out.n = a.n;", "Out.s = b;"), sets_other_fields("Out.n = a;", "Out.s = Out.n;")
+    (True, False)
+    """
+    one, two = SETS_FIELD.match(first), SETS_FIELD.match(second)
+    if one is None or two is None or one[1] != two[1] or one[2] == two[2]:
+        return False
+    return not any(lasting_calls(one[3])) and not any(lasting_calls(two[3]))
+
+
 def guards(first, second):
     """Whether the order of two conditions may show: one of them does something, or the first keeps the
     second from looking behind a pointer or iterator.
 
     >>> guards("p != nullptr", "p->x"), guards("a > 0", "b > 0"), guards("a", "f(b)")
     (True, False, True)
+    >>> guards("a == 1", "(a == 2 && b)"), guards("p != q", "(!IsSet(p) || b)")
+    (False, True)
     """
     if any(lasting_calls(first)) or any(lasting_calls(second)) or re.search(r"[^=!<>]=[^=]", first + second):
         return True
     names = set(re.findall(r"(?<![\w*.>])\w+\b(?!\s*(?:\(|\[|->|\.|::))", first))
-    return any(re.search(rf"(?:\*|\((?:[^()]*, )?){name}\b|\b{name}(?:\[|->|\.)", second) for name in names)
+    return any(re.search(rf"(?:\*|\w\((?:[^()]*, )?){name}\b|\b{name}(?:\[|->|\.)", second) for name in names)

@@ -32,7 +32,6 @@ std::string WaitedText(int nWaitMs) {
 }
 
 Status InTransaction(sqlite3* pDb, const Status& Outcome) {
-    // mutate(exchanged): both only look.
     const bool blGone = !Outcome.Ok() && sqlite3_get_autocommit(pDb) != 0;
     return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
 }
@@ -99,7 +98,6 @@ int Whole::Begin() {
     if (nResult == SQLITE_OK && m_blSavepoint) {
         nResult = Take("SAVEPOINT vornjsondb", First);
     }
-    // mutate(exchanged): a transaction that did not begin is not undone either way.
     if (nResult == SQLITE_OK) {
         nResult = m_blSavepoint ? First.Finish() : RunOnce(m_Kept.Begin());
     }
@@ -118,7 +116,6 @@ int Whole::Keep() {
 // A full disk and an interrupt may have undone the whole transaction already; a ROLLBACK would then
 // fail and hide the reason.
 Whole::~Whole() {
-    // mutate(exchanged): both only look.
     if (m_blOpen && sqlite3_get_autocommit(m_pDb) == 0) {
         const int nResult = Undo(m_Undo.Get(), m_Kept.Begin());
         // mutate(hoisted, sunk): after a ROLLBACK there is nothing to COMMIT, which is ignored.

@@ -12,13 +12,11 @@ namespace {
 
 bool IsOfName(char c) {
     const auto nByte = static_cast<unsigned char>(c);
-    // mutate(exchanged): all only look.
     return std::isalnum(nByte) != 0 || c == '_' || nByte >= 0x80;
 }
 
 // One word for SQLite: nothing in it ends the name, so it can go into a statement.
 bool IsWord(const std::string& strName) {
-    // mutate(exchanged): both only look.
     return std::isdigit(static_cast<unsigned char>(strName[0])) == 0 &&
            std::all_of(strName.begin(), strName.end(), IsOfName);
 }
@@ -49,7 +47,6 @@ bool BareNames::Has(const std::string& strName) const {
     if (nResult == SQLITE_NOMEM) {
         throw std::bad_alloc();
     }
-    // mutate(exchanged): both only look.
     return nResult == SQLITE_ROW && sqlite3_column_int(pStatement.get(), 0) == 7;
 }
 

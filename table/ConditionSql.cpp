@@ -174,7 +174,6 @@ void AppendConditions(const std::vector<Condition>& vecWhere, const Members& Of,
         // mutate(exchanged): in any order.
         nLeaves += Each.Root().nLeaves;
         // All of all is all: one chain, whoever grouped it.
-        // mutate(exchanged): both only look.
         if (Each.Root().eKind == Kind::kAll && !Each.Root().vecParts.empty()) {
             AddNodes(Each.Root().vecParts, vecNodes);
         } else {

@@ -60,7 +60,6 @@ void Report(FindingList& vecFindings, FindingCode eCode, std::string_view strPat
 void Report(FindingList& vecFindings, Finding Row, std::string_view strPath,
             std::string_view strMessage) {
     if (vecFindings.size() < kMostFindings) {
-        // mutate(exchanged): in any order.
         Row.strPath = strPath;
         Row.strMessage = strMessage;
         vecFindings.push_back(std::move(Row));

@@ -69,7 +69,6 @@ Misfit CheckTree(const Json::Value& jValue) {
 // Whether a member of that type takes JSON that begins so.
 bool TakesJson(const MemberType& Type, char cFirst) {
     const BoundKind eKind = Type.Bound.eKind;
-    // mutate(exchanged): all only look.
     return eKind == BoundKind::kJson || (eKind == BoundKind::kObject && cFirst == '{') ||
            (eKind == BoundKind::kList && cFirst == '[');
 }
@@ -81,7 +80,6 @@ Misfit Readable(const MemberType& Type, bool blCompatible) {
 // A whole number beyond 63 bits, which SQLite has no integers for: at most a real that equals it.
 Misfit FitHuge(const MemberType& Type, std::uint64_t nValue, bool blCompatible, BoundValue& Out) {
     const double dValue = static_cast<double>(nValue);
-    // mutate(exchanged): of a cast beyond the range only UndefinedBehaviorSanitizer knows.
     const bool blExact = dValue < 2 * kTwoTo63 && static_cast<std::uint64_t>(dValue) == nValue;
     const bool blReal = Type.Bound.eKind == BoundKind::kReal || Type.Bound.eKind == BoundKind::kAny;
     return blReal && !blExact ? Misfit::kRange : FitReal(Type, dValue, blCompatible, Out);
@@ -144,7 +142,6 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
     const BoundForm& Form = Type.Bound;
     // mutate(hoisted, exchanged): what follows gives its own.
     if (Form.eKind == BoundKind::kReal) {
-        // mutate(exchanged): in any order.
         Out.eKind = BoundValue::Kind::kReal;
         Out.dValue = static_cast<double>(nValue);
         const bool blExact =
@@ -155,7 +152,6 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
     if (Form.eKind == BoundKind::kAny) {
         return Readable(Type, blCompatible);
     }
-    // mutate(exchanged): a reference only looks.
     if (Form.eKind != BoundKind::kInteger) {
         return Misfit::kKind;
     }
@@ -169,7 +165,6 @@ Misfit FitInteger(const MemberType& Type, std::int64_t nValue, bool blCompatible
 
 Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundValue& Out) {
     const BoundForm& Form = Type.Bound;
-    // mutate(exchanged): in any order.
     Out.eKind = BoundValue::Kind::kReal;
     Out.dValue = dValue;
     if (std::isnan(dValue)) {
@@ -184,7 +179,6 @@ Misfit FitReal(const MemberType& Type, double dValue, bool blCompatible, BoundVa
         return blWhole ? FitInteger(Type, static_cast<std::int64_t>(dValue), blCompatible, Out)
                        : Misfit::kKind;
     }
-    // mutate(exchanged): both only look.
     if (Form.eKind != BoundKind::kReal && Form.eKind != BoundKind::kAny) {
         return Misfit::kKind;
     }
@@ -207,7 +201,6 @@ Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompati
 
 Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompatible,
                BoundValue& Out) {
-    // mutate(exchanged): in any order.
     Out.eKind = BoundValue::Kind::kBlob;
     Out.strBytes = strBytes;
     return Type.Bound.eKind == BoundKind::kAny ? Readable(Type, blCompatible) : Misfit::kKind;

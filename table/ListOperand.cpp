@@ -32,7 +32,6 @@ size_t CharacterBytes(std::string_view strText) {
     }
     // Overlong forms, surrogates, beyond the last character.
     const unsigned nSecond = At(1);
-    // mutate(exchanged): all only look.
     const bool blBad = (nFirst == 0xe0 && nSecond < 0xa0) || (nFirst == 0xed && nSecond > 0x9f) ||
                        (nFirst == 0xf0 && nSecond < 0x90) || (nFirst == 0xf4 && nSecond > 0x8f);
     return blBad ? 0 : nBytes;

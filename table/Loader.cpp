@@ -70,11 +70,9 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);
     }
-    // mutate(exchanged): both only look.
     if (!vecFindings.empty()) {
         return vornjsondb::FromFindings(std::move(vecFindings), What);
     }
-    // mutate(exchanged): both only look.
     const bool blBegun = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) == 0;
     if (!blBegun) {
         Status Begun = Begin(What);
@@ -99,7 +97,6 @@ Status Loader::Parts::Fail(const Status& Outcome) {
     const bool blBad = eCode == StatusCode::kRefused || eCode == StatusCode::kDuplicate ||
                        eCode == StatusCode::kConstraint;
     Now.nFailed += blBad ? 1 : 0;
-    // mutate(exchanged): both only look.
     const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
     return blBad && !blGone && How.blGoOnAfterBad ? Outcome : End(Outcome);
 }
@@ -115,7 +112,7 @@ Status Loader::Parts::End(const Status& Outcome) {
         }
     }
     Now.nInserted = Kept.nInserted;
-    Now.nReplaced = Kept.nReplaced;  // mutate(exchanged): in any order.
+    Now.nReplaced = Kept.nReplaced;
     Now.nSkipped = Kept.nSkipped;
     return Ended;
 }

@@ -57,7 +57,6 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
-        // mutate(exchanged): in any order.
         const std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {

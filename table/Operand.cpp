@@ -90,7 +90,6 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
     }
     // mutate(hoisted, exchanged): no value is of two kinds, and what follows gives its own.
     if (jValue.isString()) {
-        // mutate(exchanged): in any order.
         Out.eKind = ValueKind::kText;
         Out.Value = BoundText(BytesOf(jValue));
         if (Out.Value.strBytes.find('\0') != std::string_view::npos) {
@@ -104,7 +103,6 @@ bool OperandReader::ReadJson(const Json::Value& jValue, Operand& Out, Problem& W
                                  : (jValue.isObject() ? ValueKind::kObject : ValueKind::kNumber);
     // mutate(hoisted): what follows gives its own.
     if (jValue.type() != Json::realValue && jValue.isInt64()) {
-        // mutate(exchanged): in any order.
         Out.Value.eKind = BoundValue::Kind::kInteger;
         Out.Value.nValue = jValue.asInt64();
         return true;
@@ -127,7 +125,6 @@ BoundValue OperandReader::Keep(std::string strText) {
 
 BoundValue BoundText(std::string_view strText) {
     BoundValue Text;
-    // mutate(exchanged): in any order.
     Text.eKind = BoundValue::Kind::kText;
     Text.strBytes = strText;
     return Text;

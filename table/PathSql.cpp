@@ -19,7 +19,6 @@ bool IsNumber(std::string_view strText) {
 // SQLite has no escape for what would end the name or begin one.
 bool IsReachable(std::string_view strName) {
     return std::none_of(strName.begin(), strName.end(), [](char c) {
-        // mutate(exchanged): all only look.
         return c == '"' || c == '\\' || static_cast<unsigned char>(c) < ' ';
     });
 }

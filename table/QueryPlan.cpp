@@ -20,7 +20,6 @@ bool IsPaged(const Query& Which) {
 
 BoundValue Integer(std::int64_t nValue) {
     BoundValue Value;
-    // mutate(exchanged): in any order.
     Value.eKind = BoundValue::Kind::kInteger;
     Value.nValue = nValue;
     return Value;

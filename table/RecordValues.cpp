@@ -28,7 +28,6 @@ void RecordValues::Prepare(size_t nMember) {
     const Member& Of = m_Of.At(nMember);
     const Range& Fits = RangeOf(*Of.pType);
     Slot& Into = m_vecSlots[nMember];
-    // mutate(exchanged): in any order.
     if (!m_blCompatible || Of.pType->pfnRead != nullptr) {
         // mutate(dropped): the longer way gives the same.
         Into.eKind = Of.Kind();
@@ -36,7 +35,7 @@ void RecordValues::Prepare(size_t nMember) {
     if (Of.blGenerated) {
         RefuseAlways(nMember);
     }
-    // mutate(dropped, exchanged): the longer way gives the same, and in any order.
+    // mutate(dropped): the longer way gives the same.
     Into.nLeast = Fits.nLeast;
     // mutate(dropped): the longer way gives the same.
     Into.nMost = m_blCompatible ? Fits.nMostRead : Fits.nMost;

@@ -83,7 +83,6 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
     : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
     for (size_t i = 0; i < m_vecColumns.size(); ++i) {
         const Member& Shown = Of.At(m_vecColumns[i]);
-        // mutate(exchanged): both only look.
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
                                 (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
         // Members are numbered in the order of their names.

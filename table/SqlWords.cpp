@@ -19,7 +19,6 @@ constexpr Enclosure kEnclosures[] = {{"'", "'"}, {"\"", "\""}, {"`", "`"},
 
 bool IsOfWord(char c) {
     const auto nByte = static_cast<unsigned char>(c);
-    // mutate(exchanged): all only look.
     return std::isalnum(nByte) != 0 || c == '_' || c == '$' || nByte >= 0x80;
 }
 

@@ -81,9 +81,7 @@ bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
     if (itFound == m_vecKept.rend()) {
         return false;
     }
-    // mutate(exchanged): in any order.
     Lent.m_pHome = this;
-    // mutate(exchanged): in any order.
     Lent.m_pStatement = std::move(itFound->pStatement);
     Lent.m_strShape = std::move(itFound->strShape);
     m_vecKept.erase(std::next(itFound).base());
@@ -99,7 +97,6 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
     // mutate(hoisted, sunk): without a statement nobody asks for its shape and home.
     if (nResult == SQLITE_OK) {
         Lent.m_strShape = strShape;
-        // mutate(exchanged): in any order.
         Lent.m_pStatement = std::move(pStatement);
         Lent.m_pHome = this;
     }

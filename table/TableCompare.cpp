@@ -73,7 +73,6 @@ class TableCompare {
 
     // The column that is the rowid never holds NULL.
     bool IsRowid(const RealColumn& Column) const {
-        // mutate(exchanged): all only look.
         return m_Real.vecKey.size() == 1 && m_Real.vecKey[0] == Column.strName &&
                sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
     }
@@ -165,7 +164,6 @@ class TableCompare {
         std::vector<IndexTerm> vecTerms;
         for (const size_t nMember : vecMembers) {
             const Member& Of = m_Of.At(nMember);
-            // mutate(exchanged): both only look.
             if (blKey && ColumnOf(Of) == nullptr) {
                 return SQLITE_OK;  // told already
             }
@@ -208,7 +206,6 @@ class TableCompare {
                 });
         };
         // How a primary key compares texts only its index tells.
-        // mutate(exchanged): all only look.
         return fnIndex(false) || (fnSame(m_Real.vecKey) && !fnIndex(true)) ||
                std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame);
     }

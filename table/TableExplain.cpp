@@ -90,7 +90,6 @@ Status Table::Explain(const Query& Which, Plan& Found) {
             return Outcome;
         }
         const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
-        // mutate(exchanged): both only look.
         if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "/where",
@@ -118,7 +117,6 @@ Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
         }
         const bool blSearched =
             vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
-        // mutate(exchanged): both only look.
         if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "",

@@ -106,7 +106,6 @@ const char* BehindValue(const char* p, int nLevel) {
 }  // namespace
 
 bool IsWrittenJson(const char* szText, size_t nLength) {
-    // mutate(exchanged): both only look.
     return (*szText == '[' || *szText == '{') && BehindValue(szText, 0) == szText + nLength;
 }
 
