@@ -210,24 +210,33 @@ Status CheckVersion(int nVersion, const char* szVersion, const Doing& What) {
     return {};
 }
 
-Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
+namespace {
+
+const char* WhyNot(const Table::Parts* pParts, bool blChange) {
     if (pParts == nullptr) {
-        return Fail(StatusCode::kMisuse, Doing{szDo, nullptr}, "the table is not open");
+        return "the table is not open";
     }
     if (pParts->pRunning != nullptr) {
-        return Fail(StatusCode::kMisuse, pParts->Do(szDo), "another call on it has not returned");
+        return "another call on it has not returned";
     }
-    if (blChange && pParts->nReading > 0) {
-        return Fail(StatusCode::kMisuse, pParts->Do(szDo), "a callback is reading from it");
+    return blChange && pParts->nReading > 0 ? "a callback is reading from it" : nullptr;
+}
+
+}  // namespace
+
+Status CheckState(const Table::Parts* pParts, const char* szDo, bool blChange) {
+    const char* const szWhy = WhyNot(pParts, blChange);
+    if (szWhy == nullptr) {
+        return {};
     }
-    return {};
+    const Doing What = pParts == nullptr ? Doing{szDo, nullptr} : pParts->Do(szDo);
+    return Fail(StatusCode::kMisuse, What, szWhy);
 }
 
 Status Guarded(Table::Parts* pParts, const char* szDo, bool blChange,
                Callable<Status(Table::Parts&, const Doing&)> fnCall) {
-    Status State = CheckState(pParts, szDo, blChange);
-    if (!State.Ok()) {
-        return State;
+    if (WhyNot(pParts, blChange) != nullptr) {
+        return CheckState(pParts, szDo, blChange);
     }
     const Running Now(*pParts, pParts);
     return fnCall(*pParts, pParts->Do(szDo));
