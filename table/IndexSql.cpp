@@ -8,6 +8,10 @@ namespace vornjsondb {
 
 namespace {
 
+bool HasOwnCollation(sqlite3* pDb, const Members& Of, const Member& Indexed) {
+    return !IsBinary(CollationOf(pDb, Of.Table(), Indexed.strName));
+}
+
 // As conditions have it, so that SQLite finds the index: the same text for a place in JSON, and
 // texts in the order of their bytes. What is unique is told by the column, as a key is found by it.
 std::string TermSql(sqlite3* pDb, const Members& Of, const Place& Where, bool blUnique) {
@@ -15,19 +19,26 @@ std::string TermSql(sqlite3* pDb, const Members& Of, const Place& Where, bool bl
     if (!Where.strPath.empty()) {
         return ValueAt(Indexed.strQuoted, Where.strPath);
     }
-    const bool blByColumn = !IsOrderedAsText(Indexed) ||
-                            (blUnique && !IsBinary(CollationOf(pDb, Of.Table(), Indexed.strName)));
-    return Indexed.strQuoted + (blByColumn ? "" : " COLLATE BINARY");
+    if (!IsOrderedAsText(Indexed) || (blUnique && HasOwnCollation(pDb, Of, Indexed))) {
+        return Indexed.strQuoted;
+    }
+    return Indexed.strQuoted + " COLLATE BINARY";
 }
 
 // SQLite keeps names that begin with "sqlite_" to itself.
 std::string BaseName(const std::string& strTable) {
-    return sqlite3_stricmp(strTable.c_str(), "sqlite") == 0 ? "index_" + strTable : strTable;
+    if (sqlite3_stricmp(strTable.c_str(), "sqlite") == 0) {
+        return "index_" + strTable;
+    }
+    return strTable;
 }
 
 // An index of a table in the main database or a temporary one goes there by itself.
 std::string DatabasePrefix(const std::string& strDatabase) {
-    return strDatabase == "main" || strDatabase == "temp" ? "" : Quoted(strDatabase) + ".";
+    if (strDatabase == "main" || strDatabase == "temp") {
+        return {};
+    }
+    return Quoted(strDatabase) + ".";
 }
 
 bool EndsWith(const std::string& strText, const std::string& strEnd) {

@@ -124,10 +124,12 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
         }
         RealIndex& Index = Out.vecAll.back();
         const std::string strColumn = TextColumn(pRow, 2);
-        const std::string strCollation = CollationOf(pDb, strTable, strColumn);
-        // What is not one byte by byte may be equal in other ways.
-        Index.blFiner = Index.blFiner || (!IsBinary(strCollation) &&
-                                          !IsSameColumn(strCollation, TextColumn(pRow, 3)));
+        const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
+        const std::string strOfIndex = TextColumn(pRow, 3);
+        // Collations have names like columns.
+        if (!IsBinary(strOfColumn) && !IsSameColumn(strOfColumn, strOfIndex)) {
+            Index.blFiner = true;
+        }
         Index.vecColumns.push_back(strColumn);
     });
 }
