@@ -32,9 +32,11 @@ LOOKS = re.compile(
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
-    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf"
-    r"|FindGroupKey|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextOf|isalnum|isdigit|isfinite|fabs"
-    r"|all_of|any_of|sqlite3_(?:column_int|get_autocommit|stricmp))$"
+    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey"
+    r"|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextColumn|TextOf"
+    r"|Below|Concat|DigitsOf|Enclosed|Quoted|Shown|ShownText"
+    r"|isalnum|isdigit|isfinite|fabs|all_of|any_of|compare|string|string_view"
+    r"|sqlite3_(?:column_int|get_autocommit|stricmp))$"
 )
 
 
@@ -214,7 +216,7 @@ class Effect:
             self.anything = True
         elif not name.startswith("pfn"):
             self.written.add(object_name.group(1))
-        if not name.startswith(("append", "push")):
+        if not name.startswith(("append", "emplace", "push")):
             self.written |= given
 
     def is_needed_by(self, other):
@@ -248,14 +250,17 @@ def sets_other_fields(first, second):
 
 def guards(first, second):
     """Whether the order of two conditions may show: one of them does something, or the first keeps the
-    second from looking behind a pointer or iterator.
+    second from looking behind a pointer or iterator. A text has no behind.
 
     >>> guards("p != nullptr", "p->x"), guards("a > 0", "b > 0"), guards("a", "f(b)")
     (True, False, True)
     >>> guards("a == 1", "(a == 2 && b)"), guards("p != q", "(!IsSet(p) || b)")
     (False, True)
+    >>> guards("IsOf(strA)", "strA.find(b)"), guards("IsIn(itA)", "itA.find(b)")
+    (False, True)
     """
     if any(lasting_calls(first)) or any(lasting_calls(second)) or re.search(r"[^=!<>]=[^=]", first + second):
         return True
     names = set(re.findall(r"(?<![\w*.>])\w+\b(?!\s*(?:\(|\[|->|\.|::))", first))
-    return any(re.search(rf"(?:\*|\w\((?:[^()]*, )?){name}\b|\b{name}(?:\[|->|\.)", second) for name in names)
+    behind = {name: r"\[|->" if name.startswith("str") else r"\[|->|\." for name in names}
+    return any(re.search(rf"(?:\*|\w\((?:[^()]*, )?){name}\b|\b{name}(?:{behind[name]})", second) for name in names)

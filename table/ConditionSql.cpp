@@ -142,7 +142,6 @@ class ConditionWriter {
     }
 
     static std::string PathOf(const Node& Leaf) {
-        // mutate(exchanged): a path for nobody only takes time.
         if (!Leaf.strPath.empty()) {
             return Leaf.strPath;
         }

@@ -86,7 +86,7 @@ int PlanIndex(sqlite3* pDb, const Members& Of, const RealIndexes& There,
     }
     std::string strName;
     const int nResult = FindFreeName(pDb, strBase, vecPlanned, strName);
-    // mutate(doubled, exchanged): it is only asked whether it is there, and in any order.
+    // mutate(doubled): it is only asked whether it is there.
     vecPlanned.push_back(strName);
     Out = IndexPlan{strCreate + Quoted(strName) + strTail, false};
     return nResult;

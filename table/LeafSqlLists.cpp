@@ -56,7 +56,6 @@ bool LeafSql::WriteIn(const Operator& Row, const Json::Value& jList, Problem& Wh
 
 bool LeafSql::WriteContains(const Json::Value& jElement, Problem& Why) {
     Operand What;
-    // mutate(exchanged): a name for nobody only takes time.
     if (!m_Reader.ReadJson(jElement, What, Why)) {
         return false;
     }

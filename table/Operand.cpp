@@ -54,8 +54,7 @@ bool OperandReader::ReadColumn(const Member& Of, const Json::Value& jValue, Oper
                                Problem& Why) {
     std::string strJson;
     const Misfit eMisfit = FitJson(*Of.pType, jValue, false, m_Codec, strJson, Out.Value);
-    // mutate(hoisted, exchanged): the value of what is refused is not used, and a name for nobody
-    // only takes time.
+    // mutate(hoisted): the value of what is refused is not used.
     if (eMisfit == Misfit::kNone) {
         // mutate(exchanged): a text is one wherever it is kept.
         if (!strJson.empty()) {

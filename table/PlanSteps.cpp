@@ -33,8 +33,8 @@ int ReadPlanSteps(sqlite3* pDb, const std::string& strSql, std::vector<std::stri
             vecOpen.pop_back();
         }
         const std::string strIndent = vecOpen.back().second;
-        // mutate(exchanged): in any order.
         vecSteps.push_back(strIndent + TextColumn(pStatement, 3));
+        // mutate(doubled): the last one of a number counts.
         vecOpen.emplace_back(sqlite3_column_int(pStatement.get(), 0), strIndent + "  ");
     }
     return nResult == SQLITE_DONE ? SQLITE_OK : nResult;

@@ -26,16 +26,17 @@ constexpr char kDatabaseSql[] =
 constexpr char kNameSql[] =
     "SELECT 1 FROM pragma_table_xinfo(?1) UNION ALL SELECT 1 FROM pragma_index_xinfo(?1)";
 
+// A row for each column of each index.
 std::string IndexesSql(const std::string& strDatabase) {
+    static constexpr char kHead[] =
+        "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name, Part.coll,"
+        " (SELECT sql FROM ";
+    static constexpr char kOfDatabase[] =
+        ".sqlite_schema WHERE type = 'index' AND name = Listed.name) FROM pragma_index_list(?1, ";
+    static constexpr char kParts[] = ") AS Listed, pragma_index_xinfo(Listed.name, ";
+    static constexpr char kInOrder[] = ") AS Part WHERE Part.key ORDER BY Listed.seq, Part.seqno";
     const std::string strText = Enclosed(strDatabase, '\'');
-    return Concat(
-        {"SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name, Part.coll,"
-         " (SELECT sql FROM ",
-         Quoted(strDatabase),
-         ".sqlite_schema WHERE type = 'index' AND name = Listed.name)"
-         " FROM pragma_index_list(?1, ",
-         strText, ") AS Listed, pragma_index_xinfo(Listed.name, ", strText,
-         ") AS Part WHERE Part.key ORDER BY Listed.seq, Part.seqno"});
+    return Concat({kHead, Quoted(strDatabase), kOfDatabase, strText, kParts, strText, kInOrder});
 }
 
 // Calls fnRow for each row of a statement about the name.

@@ -35,7 +35,6 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     if (nResult == SQLITE_OK) {
         nResult = sqlite3_step(pStatement.get());
     }
-    // mutate(exchanged): where there is no row its columns are empty.
     if (nResult != SQLITE_ROW) {
         return FailBySqlite(pDb, nResult, What);
     }

@@ -81,7 +81,6 @@ class WhereParser {
         for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
             const std::string strKey(Name.pBegin, Name.pEnd);
-            // mutate(exchanged): in any order.
             const std::string strBelow = Below(strPath, strKey);
             const GroupKey* pGroup = FindGroupKey(strKey);
             if (!IsOperator(Name)) {
