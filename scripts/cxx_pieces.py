@@ -35,7 +35,7 @@ LOOKS = re.compile(
     r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey"
     r"|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextColumn|TextOf"
     r"|Below|Concat|DigitsOf|Enclosed|Quoted|Shown|ShownText"
-    r"|isalnum|isdigit|isfinite|fabs|all_of|any_of|compare|string|string_view"
+    r"|Lower|isalnum|isdigit|isfinite|fabs|all_of|any_of|compare|string|string_view"
     r"|sqlite3_(?:column_int|get_autocommit|stricmp))$"
 )
 

@@ -16,8 +16,11 @@ char Lower(char c) {
 }
 
 // How many single slips lie between the two: a letter that is wrong, missing, too many, or has
-// changed places with its neighbour. Letter case is none.
+// changed places with its neighbour. Letter case is none. Of long texts more than are ever near.
 size_t Slips(std::string_view strLeft, std::string_view strRight) {
+    if (std::max(strLeft.size(), strRight.size()) > kLongestCompared) {
+        return kLongestCompared;
+    }
     size_t nRows[3][kLongestCompared + 1] = {};
     size_t* pTwoUp = nRows[0];
     size_t* pUp = nRows[1];
@@ -49,9 +52,6 @@ std::string Nearest(std::string_view strTyped, const std::vector<std::string>& v
     const std::string* pNearest = nullptr;
     size_t nFewest = 1 + std::min<size_t>(3, 1 + strTyped.size() / 4);
     for (const std::string& strCandidate : vecCandidates) {
-        if (std::max(strTyped.size(), strCandidate.size()) > kLongestCompared) {
-            continue;
-        }
         const size_t nSlips = Slips(strTyped, strCandidate);
         if (nSlips < nFewest && nSlips < strCandidate.size()) {
             nFewest = nSlips;

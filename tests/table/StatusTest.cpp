@@ -177,6 +177,8 @@ TEST(NearestTest, SlipsAreUnderstood) {
         EXPECT_EQ(Each.szMeant, vornjsondb::Nearest(Each.szTyped, vecNames)) << Each.szTyped;
     }
     EXPECT_EQ("", vornjsondb::Nearest(std::string(65, 'x'), {std::string(65, 'x')}));
+    EXPECT_EQ("", vornjsondb::Nearest("zzzzab", {"yyyyba"}));
+    EXPECT_EQ("", vornjsondb::Nearest("xyzmore", {"bmore"}));
     EXPECT_EQ(" (did you mean \"size\"?)", vornjsondb::Suggestion("szie", vecNames));
     EXPECT_EQ("", vornjsondb::Suggestion("colour", vecNames));
 }
