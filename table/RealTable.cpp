@@ -139,11 +139,11 @@ std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::st
     const char* szCollation = nullptr;
     sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), strColumn.c_str(), nullptr,
                                   &szCollation, nullptr, nullptr, nullptr);
-    return szCollation == nullptr ? "" : szCollation;
+    return szCollation == nullptr ? "BINARY" : szCollation;
 }
 
 bool IsBinary(const std::string& strCollation) {
-    return strCollation.empty() || IsSameColumn(strCollation, "BINARY");
+    return sqlite3_stricmp(strCollation.c_str(), "BINARY") == 0;
 }
 
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken) {

@@ -163,15 +163,15 @@ Status Table::Count(const Query& Which, std::int64_t& nRecords) {
 }
 
 Status Table::Exists(const Query& Which, bool& blExists) {
+    std::int64_t nFound = 0;
     const auto fnExists = [&](Parts& From, const Doing& What) {
-        std::int64_t nFound = 0;
-        Status Outcome = Compute(From, Which, What, true, nFound);
-        if (Outcome.Ok()) {
-            blExists = nFound != 0;
-        }
-        return Outcome;
+        return Compute(From, Which, What, true, nFound);
     };
-    return vornjsondb::Guarded(m_pParts.get(), "look for records of", false, fnExists);
+    Status Outcome = vornjsondb::Guarded(m_pParts.get(), "look for records of", false, fnExists);
+    if (Outcome.Ok()) {
+        blExists = nFound != 0;
+    }
+    return Outcome;
 }
 
 Status Table::ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord) {
