@@ -34,7 +34,7 @@ LOOKS = re.compile(
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
     r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey"
     r"|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextColumn|TextOf"
-    r"|Below|Concat|DigitsOf|Enclosed|Quoted|Shown|ShownText"
+    r"|Below|Concat|DigitsOf|Do|Enclosed|Quoted|Shown|ShownText"
     r"|Lower|isalnum|isdigit|isfinite|fabs|all_of|any_of|compare|string|string_view"
     r"|sqlite3_(?:column_int|get_autocommit|stricmp))$"
 )

@@ -106,6 +106,7 @@ Status Table::Parts::Meet() {
 
 void Table::Parts::Learn(const RealTable& Real) {
     strRowid = Real.strRowid;
+    // mutate(exchanged): in any order.
     blView = Real.blView;
     if (Of.Key().empty()) {
         // mutate(doubled): the same key once more.

@@ -88,6 +88,8 @@ class InterruptTest : public TableTest {
     const char* m_szAt = "";
 };
 
+constexpr char kMade[] =
+    R"({"made": {"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}}})";
 constexpr char kGrown[] = R"({"task": {"key": "id", "member": {"id": {"cpptype": "int"},
     "name": {"cpptype": "string", "unique": true}, "more": {"cpptype": "int"}}}})";
 
@@ -200,6 +202,25 @@ TEST_F(InterruptTest, SchemaIsWholeOrAsItWas) {
                           EXPECT_EQ(Schema(), strBefore) << Text(Outcome);
                       });
     }
+}
+
+// Whatever was not read to its end is not taken for all that there is.
+TEST_F(InterruptTest, OpeningIsToldAsInterruptedWhereverItIs) {
+    Options How;
+    How.blCreateTable = true;
+    Table Made;
+    InterruptEach(
+        [&] {
+            Made = Table();
+            Run("DROP TABLE IF EXISTS made");
+        },
+        [&] { return Made.Open(m_pDb, "made", Parse(kMade), How); },
+        [&](const Status& Outcome) {
+            EXPECT_EQ(Text(Outcome),
+                      Outcome.Ok() ? "ok" : "interrupted: cannot open table \"made\": interrupted");
+            EXPECT_EQ(sqlite3_get_autocommit(m_pDb), 1);
+        });
+    EXPECT_EQ(Made.KeyMembers(), std::vector<std::string>{"id"});
 }
 
 TEST_F(InterruptTest, LoadIsUndone) {
