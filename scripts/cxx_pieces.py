@@ -32,10 +32,10 @@ LOOKS = re.compile(
     r"|(?:is|as|Is)[A-Z]\w*|size|length|empty|begin|end|data|c_str|find|type|front|back|get|name|str\w*cmp|str\w*chr"
     r"|strlen|strstr|mem(?:cmp|chr|berName)|max|min|equal|nullSingleton"
     r"|Length|Is|NameOf|Find|FindMember|Members|Declared|DeclaredMembers|AreNamed|Type\w*|Compare|LacksDefaults|ToString"
-    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey"
+    r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey|HasRowidKey"
     r"|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextColumn|TextOf"
     r"|Below|Concat|DigitsOf|Do|Enclosed|Quoted|Shown|ShownText"
-    r"|Lower|isalnum|isdigit|isfinite|fabs|all_of|any_of|compare|string|string_view"
+    r"|Lower|isalnum|isdigit|isfinite|fabs|all_of|any_of|count|compare|string|string_view"
     r"|sqlite3_(?:column_int|get_autocommit|stricmp))$"
 )
 

@@ -78,8 +78,8 @@ class DefinitionLint {
         const std::string strPath = PathOf(strName);
         if (jEntry.isObject()) {
             LintKeys(jEntry, kMemberKeys, strPath, m_vecFindings);
-            LintFlags(jEntry, strPath);
         }
+        LintFlags(jEntry, strPath);
         LintName(strName, strPath);
         const MemberType& Type = TypeOfMember(jEntry);
         if (Type.Bound.eKind == BoundKind::kNone) {

@@ -54,6 +54,23 @@ TEST_F(DefinitionLintTest, WhatNoHandleTakes) {
               "unknown-key /t/key: 5 is no member that can be a key");
 }
 
+// As one reads a definition: the table, then member by member, its keys before what they say.
+TEST_F(DefinitionLintTest, FindingsAreInTheOrderOfTheDefinition) {
+    const FindingList vecFound = LintDefinition("a b", Parse(R"({"a b": {"membr": 1, "member": {
+        "c d": {"cpptype": "double", "notnull": 1, "unique": 1, "cppDefaultValue": "x"},
+        "z": {"cpptype": "int"}}}})"));
+    std::string strOrder;
+    for (const Finding& Each : vecFound) {
+        strOrder += std::string(Each.szCode) + " " + Each.strPath + "\n";
+    }
+    EXPECT_EQ(strOrder,
+              "misspelt-key /a b/membr\nold-name /a b\n"
+              "misspelt-key /a b/member/c d/notnull\nbad-flag /a b/member/c d/unique\n"
+              "old-name /a b/member/c d\nold-type /a b/member/c d/cpptype\n"
+              "bad-default /a b/member/c d/cppDefaultValue\n"
+              "no-last-default /a b/member/z\n");
+}
+
 TEST_F(DefinitionLintTest, NamesOfMembers) {
     const std::string strOldName =
         ": a VornJsonDbApi writes names as they stand, and SQL reads another thing";
