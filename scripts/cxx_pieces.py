@@ -35,8 +35,8 @@ LOOKS = re.compile(
     r"|Joined|Ignore|Ok|Key|Has|At|Kind|Code|Names|Size|BehindValue|BytesOf|BoundText|ColumnOf|FindGroupKey|HasRowidKey"
     r"|fnIndex|fnSame|HasOwnIndex|HasScan|Name|QuotedTable|RangeOf|Root|Table|TextColumn|TextOf"
     r"|Below|Concat|DigitsOf|Do|Enclosed|Quoted|Shown|ShownText"
-    r"|Lower|isalnum|isdigit|isfinite|fabs|all_of|any_of|count|compare|string|string_view"
-    r"|sqlite3_(?:column_int|get_autocommit|stricmp))$"
+    r"|Lower|milliseconds|zero|isalnum|isdigit|isfinite|fabs|all_of|any_of|count|compare|string|string_view"
+    r"|sqlite3_(?:column_int|db_handle|get_autocommit|stricmp))$"
 )
 
 

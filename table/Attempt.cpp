@@ -72,12 +72,14 @@ int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
         nResult = RunEnd(pUndo);  // a progress handler may be satisfied
     }
     if (nResult == SQLITE_INTERRUPT) {
+        // mutate(doubled): what is undone is not there to be undone again.
         RunOnce(pBegin);
         sqlite3* const pDb = sqlite3_db_handle(pBegin);
         // A changed schema has all statements prepared anew, and SQLite's parser looks for
         // interrupts at blanks and at the end of a text without a semicolon. This one gets through
         // to be interrupted when it runs, and would do next to nothing otherwise.
         if (sqlite3_get_autocommit(pDb) == 0) {
+            // mutate(doubled): what is undone is not there to be undone again.
             sqlite3_exec(pDb, "PRAGMA\"incremental_vacuum\"(1);", nullptr, nullptr, nullptr);
         }
     }
@@ -88,6 +90,7 @@ int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
 int Whole::Begin() {
     m_blSavepoint = sqlite3_get_autocommit(m_pDb) == 0;
     int nResult = m_Kept.KeepBegin();
+    // mutate(exchanged): in any order.
     if (nResult == SQLITE_OK) {
         nResult = Take(m_blSavepoint ? "ROLLBACK TO vornjsondb" : "ROLLBACK", m_Undo);
     }
@@ -134,16 +137,13 @@ Status AttemptWhole(sqlite3* pDb, Statements& Kept, int nWaitMs, const Doing& Wh
                     Callable<Status()> fnSteps) {
     return Attempt(pDb, nWaitMs, [&]() -> Status {
         Whole All(pDb, Kept);
-        int nResult = All.Begin();
+        const int nResult = All.Begin();
         if (nResult != SQLITE_OK) {
             return FailBySqlite(pDb, nResult, What);
         }
         Status Outcome = fnSteps();
         if (Outcome.Ok()) {
-            nResult = All.Keep();
-            if (nResult != SQLITE_OK) {
-                Outcome = FailBySqlite(pDb, nResult, What);
-            }
+            Outcome = FromSqlite(pDb, All.Keep(), What);
         }
         return Outcome;
     });

@@ -164,6 +164,27 @@ TEST_F(InterruptTest, WhatIsToldIsTrueWhereverAProgressHandlerStopsIt) {
                   });
 }
 
+// Nothing that a host may have denied is needed to undo a record.
+TEST_F(InterruptTest, CallIsUndoneWithoutAPragma) {
+    int nPragmas = 0;
+    const auto fnDeny = [](void* pnPragmas, int nAction, const char*, const char*, const char*,
+                           const char*) {
+        const bool blPragma = nAction == SQLITE_PRAGMA;
+        *static_cast<int*>(pnPragmas) += blPragma ? 1 : 0;
+        return blPragma ? SQLITE_DENY : SQLITE_OK;
+    };
+    EXPECT_EQ(InterruptAt("COMMIT",
+                          [&] {
+                              sqlite3_set_authorizer(m_pDb, fnDeny, &nPragmas);
+                              Status Outcome = SaveOne(OnDuplicate::kUpsert);
+                              sqlite3_set_authorizer(m_pDb, nullptr, nullptr);
+                              return Outcome;
+                          }),
+              "interrupted: cannot save a record in table \"task\": interrupted");
+    EXPECT_EQ(Ids(), "1|a");
+    EXPECT_EQ(nPragmas, 0);
+}
+
 // A schema that was changed is undone with the rest, and what SQLite knows of it, too.
 TEST_F(InterruptTest, SchemaIsWholeOrAsItWas) {
     const std::string strBefore = Schema();
