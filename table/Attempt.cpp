@@ -67,6 +67,7 @@ int RunEnd(sqlite3_stmt* pEnd) {
 }
 
 int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
+    sqlite3* const pDb = sqlite3_db_handle(pBegin);
     int nResult = RunEnd(pUndo);
     if (nResult == SQLITE_INTERRUPT) {
         nResult = RunEnd(pUndo);  // a progress handler may be satisfied
@@ -74,7 +75,6 @@ int Undo(sqlite3_stmt* pUndo, sqlite3_stmt* pBegin) {
     if (nResult == SQLITE_INTERRUPT) {
         // mutate(doubled): what is undone is not there to be undone again.
         RunOnce(pBegin);
-        sqlite3* const pDb = sqlite3_db_handle(pBegin);
         // A changed schema has all statements prepared anew, and SQLite's parser looks for
         // interrupts at blanks and at the end of a text without a semicolon. This one gets through
         // to be interrupted when it runs, and would do next to nothing otherwise.
