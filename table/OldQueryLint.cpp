@@ -70,6 +70,7 @@ class OldQueryLint {
             }
             return false;
         }
+        // mutate(exchanged): in any order.
         if (IsOldKey(strName)) {
             Report(m_vecFindings, LintCode::kHidesQueryKey, strPath,
                    Quoted(strName) + " is a condition and a key of the query at once");
@@ -159,6 +160,7 @@ class OldQueryLint {
 
     void LintTail() {
         const Json::Value* pjSort = FindMember(m_jQuery, kOldSort);
+        // mutate(exchanged): what follows finds something only where nothing is sorted.
         if (pjSort != nullptr && pjSort->isString()) {
             Report(
                 m_vecFindings, LintCode::kSortsNothing, Below("", kOldSort),
@@ -168,7 +170,9 @@ class OldQueryLint {
                    Shown(*pjSort) + " is no member's name");
         }
         LintPair(kOldDirection, kOldSort);
+        // mutate(exchanged): only one of the two finds anything.
         LintPair(kOldOffset, kOldLimit);
+        // mutate(hoisted): of a key that is not there nothing is told.
         if (FindMember(m_jQuery, kOldLimit) != nullptr) {
             LintCount(kOldLimit);
             LintCount(kOldOffset);
@@ -176,6 +180,7 @@ class OldQueryLint {
     }
 
     void LintPair(const char* szKey, const char* szNeeded) {
+        // mutate(exchanged): both only look.
         if (FindMember(m_jQuery, szKey) != nullptr && FindMember(m_jQuery, szNeeded) == nullptr) {
             Report(m_vecFindings, LintCode::kOldIgnoresKey, Below("", szKey),
                    Quoted(szKey) + " counts only beside " + Quoted(szNeeded));

@@ -167,6 +167,10 @@ TEST_F(OldQueryLintTest, PagingKeys) {
            "old-reading-only /limit: \"limit\" counts for recList and recGetOne alone; "
            "old-reading-only /offset: \"offset\" counts for recList and recGetOne alone",
            "3");
+    Expect(R"({"id": 1, "sort_direction": "desc", "offset": 1})",
+           "old-ignores-key /sort_direction: \"sort_direction\" counts only beside \"sort_by\"; "
+           "old-ignores-key /offset: \"offset\" counts only beside \"limit\"",
+           "1");
     Expect(R"({"done": true, "offset": 1})",
            "old-ignores-key /offset: \"offset\" counts only beside \"limit\"", "1,3");
     Expect(R"({"id": 1, "limit": null})", "bad-count /limit: \"limit\" is null, no whole number",
