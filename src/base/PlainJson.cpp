@@ -155,7 +155,9 @@ class PlainReader {
 bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
     // mutate(exchanged): behind a text that is not plain strOut is in any state.
     for (const char* p = pBegin; p != pEnd; ++p) {
-        if (*p == '"' || *p == '\\' || static_cast<unsigned char>(*p) < 0x20) {
+        const auto c = static_cast<unsigned char>(*p);
+        // Small letters, and all that are none of ASCII's, are known by the first of these.
+        if (c <= '\\' && (c == '\\' || c == '"' || c < 0x20)) {
             return false;
         }
     }
@@ -168,13 +170,10 @@ bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut);
 
 bool WriteArray(const Json::Value& jArray, int nLevel, std::string& strOut) {
     strOut += '[';
-    Json::ArrayIndex nNext = 0;
+    Json::ArrayIndex nStored = 0;
     const Json::Value::const_iterator itEnd = jArray.end();
     for (Json::Value::const_iterator it = jArray.begin(); it != itEnd; ++it) {
-        if (it.index() != nNext) {
-            return false;
-        }
-        if (nNext++ > 0) {
+        if (nStored++ > 0) {
             strOut += ',';
         }
         if (!WriteValue(*it, nLevel, strOut)) {
@@ -182,7 +181,7 @@ bool WriteArray(const Json::Value& jArray, int nLevel, std::string& strOut) {
         }
     }
     strOut += ']';
-    return true;
+    return nStored == jArray.size();
 }
 
 bool WriteObject(const Json::Value& jObject, int nLevel, std::string& strOut) {
