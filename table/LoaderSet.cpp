@@ -110,15 +110,6 @@ std::unique_ptr<Json::CharReader> StrictReader() {
     return std::unique_ptr<Json::CharReader>(Builder.newCharReader());
 }
 
-// Most texts are just as they will be stored, and need no reading.
-bool SetWritten(Parts& Of, size_t nPlace, std::string_view strJson) {
-    const vornjsondb::Member& Into = Of.Into.Of.At(nPlace);
-    // mutate(exchanged): the longer way refuses a generated member as well.
-    return vornjsondb::IsWrittenJson(strJson.data(), strJson.size()) && !Into.blGenerated &&
-           FitWritten(*Into.pType, strJson, Of.Into.How.blCompatible, Of.Values.Give(nPlace)) ==
-               Misfit::kNone;
-}
-
 bool Parse(Parts& Of, std::string_view strJson, Json::Value& jOut) {
     // mutate(exchanged): a reader may be made early.
     if (vornjsondb::ReadPlainJson(strJson.data(), strJson.size(), jOut)) {
@@ -166,7 +157,7 @@ void Loader::SetText(int nMember, std::string_view strText) {
     const auto nPlace = static_cast<size_t>(nMember);
     // mutate(sunk): the longer way gives the same.
     if (pInto != nullptr && pInto->FitsText(nPlace, strText)) {
-        pInto->Give(nPlace).SetText(pInto->Copied(nPlace, strText));
+        pInto->GiveText(nPlace, pInto->Copied(nPlace, strText));
     } else {
         Set(m_pParts.get(), nMember, Passed::kText, 0, 0, strText);
     }
@@ -186,7 +177,10 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
     // mutate(exchanged): the one knows nothing of the other.
     m_pParts->SetRight(nPlace);
     strJson = m_pParts->Values.Copied(nPlace, strJson);
-    if (SetWritten(*m_pParts, nPlace, strJson)) {
+    // Most texts are just as they will be stored, and need no reading.
+    // mutate(false, exchanged): the longer way gives the same.
+    if (vornjsondb::IsWrittenJson(strJson.data(), strJson.size()) &&
+        m_pParts->Values.TakeWritten(nPlace, strJson)) {
         return;
     }
     FindingList vecFindings;

@@ -4,11 +4,18 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
+#include "../src/base/PlainJson.h"
 #include "Concat.h"
 #include "FindingCodes.h"
 #include "Nearest.h"
 
 namespace vornjsondb {
+
+namespace {
+
+constexpr size_t kShortText = 64;
+
+}  // namespace
 
 RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatible,
                            bool blIgnoreUnknown)
@@ -51,27 +58,28 @@ void RecordValues::Clear() {
 }
 
 bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
-    // mutate(exchanged): what is refused is not written.
     Clear();
-    if (!jRecord.isObject() || jRecord.empty()) {
+    Json::ArrayIndex nLeft = jRecord.isObject() ? jRecord.size() : 0;
+    if (nLeft == 0) {
         Report(vecFindings, FindingCode::kNotARecord, "",
                Concat({Shown(jRecord), " is no record: an object with members is expected"}));
         return false;
     }
     // Records and definition are sorted alike: one step a member.
-    const std::vector<std::string>& vecNames = m_Of.Names();
+    const std::string* const pNames = m_Of.Names().data();
+    const size_t nNames = m_Of.Names().size();
     size_t nNext = 0;
-    const Json::Value::const_iterator itEnd = jRecord.end();
-    for (Json::Value::const_iterator it = jRecord.begin(); it != itEnd; ++it) {
-        const MemberName Name = NameOf(it);
-        int nOrder = 1;
-        while (nNext < vecNames.size() && (nOrder = Compare(NameOf(vecNames[nNext]), Name)) < 0) {
+    for (Json::Value::const_iterator it = jRecord.begin(); nLeft > 0; --nLeft, ++it) {
+        const std::string_view strName = NameOf(it).View();
+        bool blIsNext = false;
+        while (nNext < nNames && !(blIsNext = pNames[nNext] == strName) &&
+               pNames[nNext] < strName) {
             ++nNext;
         }
-        if (nNext < vecNames.size() && nOrder == 0) {
+        if (blIsNext) {
             SetJson(nNext++, *it, vecFindings);
         } else if (!m_blIgnoreUnknown) {
-            RefuseUnknown(std::string(Name.pBegin, Name.pEnd), vecFindings);
+            RefuseUnknown(std::string(strName), vecFindings);
         }
     }
     return vecFindings.empty();
@@ -81,14 +89,9 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
     bool blTaken = false;
     // mutate(exchanged): the longer way gives the same.
     switch (jValue.type()) {
-        case Json::stringValue: {
-            const std::string_view strText = BytesOf(jValue);
-            blTaken = FitsText(nMember, strText);
-            if (blTaken) {
-                Give(nMember).SetText(strText);
-            }
+        case Json::stringValue:
+            blTaken = TakeText(nMember, BytesOf(jValue));
             break;
-        }
         case Json::intValue:
             // mutate(dropped): the longer way gives the same.
             blTaken = TakeInteger(nMember, jValue.asInt64());
@@ -97,6 +100,14 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
             // mutate(dropped): the longer way gives the same.
             blTaken = TakeBoolean(nMember, jValue.asBool());
             break;
+        case Json::arrayValue:
+            // mutate(dropped): the longer way gives the same.
+            blTaken = TakeTree(nMember, jValue, BoundKind::kList);
+            break;
+        case Json::objectValue:
+            // mutate(dropped): the longer way gives the same.
+            blTaken = TakeTree(nMember, jValue, BoundKind::kObject);
+            break;
         default:
             break;
     }
@@ -104,6 +115,32 @@ void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingLis
     if (!blTaken) {
         LookAtJson(nMember, jValue, vecFindings);
     }
+}
+
+// A short text goes where the last one of its length is bound, which is cheaper than to bind it.
+bool RecordValues::TakeText(size_t nMember, std::string_view strText) {
+    const bool blFits = FitsText(nMember, strText);
+    if (blFits) {
+        // mutate(any): a text is stored wherever it is kept.
+        const bool blCopy =
+            strText.size() == At(nMember).strBytes.size() && strText.size() <= kShortText;
+        GiveText(nMember, blCopy ? Copied(nMember, strText) : strText);
+    }
+    return blFits;
+}
+
+// Plain JSON is written without a look before.
+bool RecordValues::TakeTree(size_t nMember, const Json::Value& jValue, BoundKind eKind) {
+    Slot& Of = m_vecSlots[nMember];
+    if (Of.eKind != eKind) {
+        return false;
+    }
+    Of.strBytes.clear();
+    const bool blPlain = WritePlainJson(jValue, Of.strBytes);
+    if (blPlain) {
+        GiveText(nMember, Of.strBytes);
+    }
+    return blPlain;
 }
 
 void RecordValues::LookAtJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
@@ -160,16 +197,20 @@ bool RecordValues::HasKey(FindingList& vecFindings) const {
     return vecFindings.empty();
 }
 
-int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo) const {
+int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo, bool blAgain) {
     const char* pGiven = m_strGiven.data();
     const Member* pMember = m_Of.All().data();
     int nParameter = nNext;
-    for (const Slot& Each : m_vecSlots) {
+    for (Slot& Each : m_vecSlots) {
         if (*pGiven == '1' && (blKeyToo || !pMember->blKey)) {
-            const int nResult = Each.Value.Bind(pStatement, nParameter++);
-            if (nResult != SQLITE_OK) {
-                return nResult;
+            if (!blAgain || !Each.blBound) {
+                const int nResult = Each.Value.Bind(pStatement, nParameter);
+                if (nResult != SQLITE_OK) {
+                    return nResult;
+                }
+                Each.blBound = true;
             }
+            ++nParameter;
         }
         ++pGiven;
         ++pMember;

@@ -31,9 +31,9 @@ class RecordValues {
 
     // One member: for a Fit... function to fill, and from JSON.
     BoundValue& Give(size_t nMember) {
-        m_strGiven[nMember] = '1';
-        m_blEmpty = false;
-        return m_vecSlots[nMember].Value;
+        Slot& Of = Mark(nMember);
+        Of.blBound = false;
+        return Of.Value;
     }
     void SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
 
@@ -61,16 +61,42 @@ class RecordValues {
         const bool blFits =
             Of.eKind == BoundKind::kInteger && nValue >= Of.nLeast && nValue <= Of.nMost;
         if (blFits) {
-            Give(nMember).SetInteger(nValue);
+            GiveInteger(nMember, nValue);
         }
         return blFits;
     }
     bool TakeBoolean(size_t nMember, bool blValue) {
         const bool blFits = m_vecSlots[nMember].eKind == BoundKind::kBoolean;
         if (blFits) {
-            Give(nMember).SetInteger(blValue ? 1 : 0);
+            GiveInteger(nMember, blValue ? 1 : 0);
         }
         return blFits;
+    }
+    // JSON text as it will be stored.
+    bool TakeWritten(size_t nMember, std::string_view strJson) {
+        const bool blFits = m_vecSlots[nMember].eKind ==
+                            (strJson[0] == '[' ? BoundKind::kList : BoundKind::kObject);
+        if (blFits) {
+            GiveText(nMember, strJson);
+        }
+        return blFits;
+    }
+
+    // Gives a value that fits. What a statement has bound already is not bound again: it knows
+    // where a text is and how long, and what stands there may be another one by now.
+    void GiveInteger(size_t nMember, std::int64_t nValue) {
+        Slot& Of = Mark(nMember);
+        // mutate(doubled): nothing is new in between.
+        Of.blBound =
+            Of.blBound && Of.Value.eKind == BoundValue::Kind::kInteger && Of.Value.nValue == nValue;
+        Of.Value.SetInteger(nValue);
+    }
+    void GiveText(size_t nMember, std::string_view strText) {
+        Slot& Of = Mark(nMember);
+        const std::string_view strBefore = Of.Value.strBytes;
+        Of.blBound = Of.blBound && Of.Value.eKind == BoundValue::Kind::kText &&
+                     strBefore.data() == strText.data() && strBefore.size() == strText.size();
+        Of.Value.SetText(strText);
     }
 
     // From now on every value of the member is refused: the table computes it.
@@ -96,8 +122,9 @@ class RecordValues {
     const std::string& Given() const { return m_strGiven; }
 
     // Binds the members that the record has, from nNext on, which is moved past them; the key's
-    // among them or not.
-    int BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo) const;
+    // among them or not. blAgain: the statement is that of the call before, for the same members,
+    // and needs only what is new.
+    int BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo, bool blAgain = false);
 
     // Binds the key, from nNext on.
     int BindKey(sqlite3_stmt* pStatement, int& nNext) const;
@@ -106,12 +133,20 @@ class RecordValues {
     struct Slot {
         BoundValue Value;
         std::string strBytes;
+        bool blBound = false;                // mutate(false to true): the first call binds all.
         BoundKind eKind = BoundKind::kNone;  // of values that are taken without a look
         std::int64_t nLeast = 0;             // of whole numbers among them
         std::int64_t nMost = 0;
         bool blComputed = false;  // by the table, so that a value is refused
     };
     void Prepare(size_t nMember);
+    Slot& Mark(size_t nMember) {
+        m_strGiven[nMember] = '1';
+        m_blEmpty = false;
+        return m_vecSlots[nMember];
+    }
+    bool TakeText(size_t nMember, std::string_view strText);
+    bool TakeTree(size_t nMember, const Json::Value& jValue, BoundKind eKind);
     static void Grow(std::string& strOwn, size_t nBytes);
 
     // Apart, so that records that fit pass by them.

@@ -100,10 +100,13 @@ int RecordWriter::Take(Verb eVerb, Statement& Held) {
 // Runs one statement to its end. nRows, 0 before: how many it found or changed.
 int RecordWriter::Run(Verb eVerb, int& nRows) {
     Statement& Held = m_aHeld[static_cast<size_t>(eVerb)];
-    int nResult = Held.IsFor(m_Values.Given()) ? SQLITE_OK : Take(eVerb, Held);
+    const bool blHeld = Held.IsFor(m_Values.Given());
+    int nResult = blHeld ? SQLITE_OK : Take(eVerb, Held);
     int nNext = 1;
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
-        nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate);
+        const bool blAgain = blHeld && m_pBound == &Held;
+        nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate, blAgain);
+        m_pBound = nResult == SQLITE_OK ? &Held : nullptr;
     }
     if (nResult == SQLITE_OK && (eVerb == Verb::kFind || eVerb == Verb::kUpdate)) {
         nResult = m_Values.BindKey(Held.Get(), nNext);

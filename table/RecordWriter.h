@@ -35,7 +35,8 @@ class RecordWriter {
 
     Table::Parts& m_Into;
     RecordValues& m_Values;
-    Statement m_aHeld[5];  // the last one of each verb
+    Statement m_aHeld[5];                 // the last one of each verb
+    const Statement* m_pBound = nullptr;  // the one of them that has the values before bound
 };
 
 // " WHERE "task"."id" = ?": parameters in the key's order.
