@@ -245,10 +245,10 @@ struct Query {
     // The same for a chain that begins with Query(): what it is kept as takes it without a copy.
     Query&& Where(Condition Added) && { return std::move(Where(std::move(Added))); }
     Query&& Where(std::string strMember, Json::Value jValue) && {
-        return std::move(Where(std::move(strMember), std::move(jValue)));
+        return std::move(Take(strMember, Op::kEqual, jValue));
     }
     Query&& Where(std::string strMember, Op eOp, Json::Value jOperand) && {
-        return std::move(Where(std::move(strMember), eOp, std::move(jOperand)));
+        return std::move(Take(strMember, eOp, jOperand));
     }
     Query&& Sort(std::string strTerm) && { return std::move(Sort(std::move(strTerm))); }
     Query&& Limit(std::int64_t nRows) && { return std::move(Limit(nRows)); }
@@ -263,6 +263,9 @@ struct Query {
     std::int64_t nOffset = 0;
     std::vector<std::string> vecMembers;  // empty: all
     FindingList vecFindings;
+
+  private:
+    Query& Take(std::string& strMember, Op eOp, Json::Value& jOperand);
 };
 
 // The text with \ before each %, _ and \, to be part of a "$like" pattern.

@@ -123,11 +123,15 @@ Query& Query::Where(Condition Added) & {
 }
 
 Query& Query::Where(std::string strMember, Json::Value jValue) & {
-    vecWhere.emplace_back(Leaf(strMember, Op::kEqual, jValue));
-    return *this;
+    return Take(strMember, Op::kEqual, jValue);
 }
 
 Query& Query::Where(std::string strMember, Op eOp, Json::Value jOperand) & {
+    return Take(strMember, eOp, jOperand);
+}
+
+// A condition of what it is given.
+Query& Query::Take(std::string& strMember, Op eOp, Json::Value& jOperand) {
     vecWhere.emplace_back(Leaf(strMember, eOp, jOperand));
     return *this;
 }

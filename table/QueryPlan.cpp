@@ -50,6 +50,61 @@ void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindi
         return;
     }
     CheckPage(Which, eUse, vecFindings);
+    m_pWhich = &Which;
+    // mutate(exchanged): nobody asks for it before.
+    m_eUse = eUse;
+    // mutate(true, sunk): what is plain may be written early.
+    if (!ResolvePlain(Which)) {
+        Write(Which, eUse, vecFindings);
+    }
+}
+
+// Most queries compare one member with one value. Their shape is told by the member's place, and
+// their SQL is needed only for a statement that is not there yet.
+bool QueryPlan::ResolvePlain(const Query& Which) {
+    // mutate(true): the longer way gives the same.
+    if (Which.vecWhere.size() != 1 || !Which.vecSort.empty() || !Which.vecMembers.empty() ||
+        m_Sql.pfnLiteral != nullptr) {
+        return false;
+    }
+    const VORN_JSON_DB::Condition::Node& Leaf = Which.vecWhere[0].Root();
+    Place Where;
+    Problem Why;
+    Operand What;
+    // mutate(== to !=): the longer way gives the same.
+    const bool blPlain =
+        Leaf.eKind == VORN_JSON_DB::Condition::Node::Kind::kLeaf &&
+        RowOf(Leaf.eOp).eForm == OperandForm::kValue &&
+        FindPlace(m_Of, Leaf.strMember, Where, Why) && Where.strPath.empty() &&
+        m_Of.At(Where.nMember).Kind() != BoundKind::kAny &&
+        OperandReader(m_Of, m_Codec, m_Sql.listTexts).Read(Where, Leaf.jOperand, What, Why);
+    if (blPlain) {
+        const bool blPaged = IsPaged(Which);
+        // No SQL begins so.
+        m_strShape = blPaged ? '\2' : '\1';
+        // mutate(doubled, exchanged): in any order, once or twice.
+        m_strShape += static_cast<char>(Leaf.eOp);
+        // mutate(doubled): told twice, it tells the same members apart.
+        m_strShape.append(reinterpret_cast<const char*>(&Where.nMember), sizeof Where.nMember);
+        // mutate(exchanged): in any order.
+        m_aPlain[0] = What.Value;
+        // mutate(exchanged): in any order.
+        m_aPlain[1] = Integer(Which.nLimit);
+        m_aPlain[2] = Integer(Which.nOffset);
+        m_nPlain = blPaged ? 3 : 1;
+    }
+    return blPlain;
+}
+
+void QueryPlan::WritePlain() {
+    // mutate(> to >=): what is empty stays empty.
+    if (m_nPlain > 0 && m_Sql.strSql.empty()) {
+        FindingList vecNone;
+        Write(*m_pWhich, m_eUse, vecNone);
+    }
+}
+
+void QueryPlan::Write(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
     m_Sql.strSql.reserve(kUsualStatement);
     m_Sql.vecValues.reserve(kUsualValues);
     AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
@@ -141,23 +196,29 @@ void QueryPlan::AppendPage(const Query& Which) {
     m_Sql.Add(Integer(Which.nOffset));
 }
 
-std::string_view QueryPlan::Condition() const {
+std::string_view QueryPlan::Condition() {
+    WritePlain();
     return std::string_view(m_Sql.strSql).substr(0, m_nConditionEnd);
 }
 
-void QueryPlan::AppendWhere(std::string& strSql) const {
-    if (m_nConditionEnd > 0) {
-        strSql.append(" WHERE ").append(Condition());
+void QueryPlan::AppendWhere(std::string& strSql) {
+    const std::string_view strCondition = Condition();
+    if (!strCondition.empty()) {
+        strSql.append(" WHERE ").append(strCondition);
     }
 }
 
-void QueryPlan::AppendTail(std::string& strSql) const {
+void QueryPlan::AppendTail(std::string& strSql) {
+    WritePlain();
     strSql.append(m_Sql.strSql, m_nConditionEnd, m_nTailEnd - m_nConditionEnd);
 }
 
 int QueryPlan::Bind(sqlite3_stmt* pStatement, int nFirst) const {
-    for (const BoundValue& Value : m_Sql.vecValues) {
-        const int nResult = Value.Bind(pStatement, nFirst++);
+    const bool blPlain = m_nPlain > 0;
+    const BoundValue* const pFirst = blPlain ? m_aPlain : m_Sql.vecValues.data();
+    const size_t nValues = blPlain ? m_nPlain : m_Sql.vecValues.size();
+    for (size_t i = 0; i < nValues; ++i) {
+        const int nResult = pFirst[i].Bind(pStatement, nFirst++);
         if (nResult != SQLITE_OK) {
             return nResult;
         }

@@ -38,11 +38,13 @@ class QueryPlan {
 
     // Alike only for queries that give the same SQL, whatever their values: a key for the
     // statement. Any bytes.
-    const std::string& Shape() const { return m_Sql.strSql; }
+    const std::string& Shape() const { return m_nPlain > 0 ? m_strShape : m_Sql.strSql; }
 
     // The same with a letter for what the statement does, at the end, which spares a copy. Asked
     // for once.
-    const std::string& ShapeFor(char cUse) { return m_Sql.strSql += cUse; }
+    const std::string& ShapeFor(char cUse) {
+        return (m_nPlain > 0 ? m_strShape : m_Sql.strSql) += cUse;
+    }
 
     // The members to read, in the order of the result's columns: vecAll where the query names none.
     const std::vector<size_t>& Columns(const std::vector<size_t>& vecAll) const {
@@ -50,15 +52,18 @@ class QueryPlan {
     }
 
     // "<condition>", the same behind " WHERE ", and " ORDER BY ... LIMIT ? OFFSET ?"; or nothing.
-    std::string_view Condition() const;
-    void AppendWhere(std::string& strSql) const;
-    void AppendTail(std::string& strSql) const;
+    std::string_view Condition();
+    void AppendWhere(std::string& strSql);
+    void AppendTail(std::string& strSql);
 
     // Binds all values of both, from parameter nFirst on. Texts are not copied: query and plan
     // must live until the statement is reset. Returns SQLite's result.
     int Bind(sqlite3_stmt* pStatement, int nFirst) const;
 
   private:
+    bool ResolvePlain(const VORN_JSON_DB::Query& Which);
+    void Write(const VORN_JSON_DB::Query& Which, QueryUse eUse, FindingList& vecFindings);
+    void WritePlain();
     void ResolveMembers(const VORN_JSON_DB::Query& Which, FindingList& vecFindings);
     void ResolveSort(const VORN_JSON_DB::Query& Which, bool blPaged, FindingList& vecFindings);
     void AppendSort(size_t nMember, const std::string& strPath, bool blDescending);
@@ -70,6 +75,13 @@ class QueryPlan {
     size_t m_nConditionEnd = 0;
     size_t m_nTailEnd = 0;
     std::vector<size_t> m_vecColumns;
+
+    // Of a plain query, whose SQL is written when it is asked for.
+    const VORN_JSON_DB::Query* m_pWhich = nullptr;
+    QueryUse m_eUse = QueryUse::kRead;
+    std::string m_strShape;
+    BoundValue m_aPlain[3];  // mutate(3 to 4): one more is not used.
+    size_t m_nPlain = 0;     // 0: it is none
 };
 
 }  // namespace vornjsondb

@@ -37,21 +37,16 @@ std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
 }
 
 Statement::Statement(Statement&& From) noexcept
-    : m_pHome(From.m_pHome),
-      m_pStatement(std::move(From.m_pStatement)),
-      m_strShape(std::move(From.m_strShape)) {}
+    : m_pHome(From.m_pHome), m_pLent(std::move(From.m_pLent)) {}
 
 Statement& Statement::operator=(Statement&& From) noexcept {
-    // mutate(exchanged): in any order.
     std::swap(m_pHome, From.m_pHome);
-    // mutate(exchanged): in any order.
-    std::swap(m_pStatement, From.m_pStatement);
-    std::swap(m_strShape, From.m_strShape);
+    std::swap(m_pLent, From.m_pLent);
     return *this;
 }
 
 Statement::~Statement() {
-    if (m_pStatement) {
+    if (m_pLent) {
         m_pHome->GiveBack(*this);
     }
 }
@@ -63,7 +58,7 @@ int Statement::Finish(int* pnRows) const {
             ++*pnRows;
         }
     }
-    const int nReset = sqlite3_reset(m_pStatement.get());
+    const int nReset = sqlite3_reset(Get());
     return nResult == SQLITE_DONE ? nReset : nResult;
 }
 
@@ -74,16 +69,16 @@ Statements::Statements(sqlite3* pDb, size_t nMost)
 }
 
 bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
-    const auto itFound =
-        std::find_if(m_vecKept.rbegin(), m_vecKept.rend(),
-                     [strShape](const Kept& Each) { return Each.strShape == strShape; });
+    const auto itFound = std::find_if(m_vecKept.rbegin(), m_vecKept.rend(),
+                                      [strShape](const std::unique_ptr<Statement::Kept>& pEach) {
+                                          return pEach->strShape == strShape;
+                                      });
     // mutate(exchanged): without a statement nobody asks for its home.
     if (itFound == m_vecKept.rend()) {
         return false;
     }
     Lent.m_pHome = this;
-    Lent.m_pStatement = std::move(itFound->pStatement);
-    Lent.m_strShape = std::move(itFound->strShape);
+    Lent.m_pLent = std::move(*itFound);
     m_vecKept.erase(std::next(itFound).base());
     return true;
 }
@@ -92,12 +87,12 @@ int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, S
     if (TakeKept(strShape, Lent)) {
         return SQLITE_OK;
     }
-    OwnStatement pStatement;
-    const int nResult = Prepare(m_pDb, fnSql(), pStatement);
+    auto pMade = std::make_unique<Statement::Kept>();
+    const int nResult = Prepare(m_pDb, fnSql(), pMade->pStatement);
     // mutate(hoisted, sunk): without a statement nobody asks for its shape and home.
     if (nResult == SQLITE_OK) {
-        Lent.m_strShape = strShape;
-        Lent.m_pStatement = std::move(pStatement);
+        pMade->strShape = strShape;
+        Lent.m_pLent = std::move(pMade);
         Lent.m_pHome = this;
     }
     return nResult;
@@ -111,17 +106,15 @@ int Statements::KeepBegin() {
 }
 
 void Statements::GiveBack(Statement& Lent) {
-    // mutate(exchanged): in any order.
-    sqlite3_reset(Lent.m_pStatement.get());
-    // mutate(exchanged): in any order.
-    sqlite3_clear_bindings(Lent.m_pStatement.get());
+    sqlite3_reset(Lent.Get());
+    sqlite3_clear_bindings(Lent.Get());
     if (m_nMost == 0) {
         return;
     }
     if (m_vecKept.size() == m_nMost) {
         m_vecKept.erase(m_vecKept.begin());
     }
-    m_vecKept.push_back(Kept{std::move(Lent.m_strShape), std::move(Lent.m_pStatement)});
+    m_vecKept.push_back(std::move(Lent.m_pLent));
 }
 
 }  // namespace vornjsondb

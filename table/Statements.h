@@ -43,8 +43,8 @@ class Statement {
     Statement& operator=(Statement&& From) noexcept;
     ~Statement();
 
-    sqlite3_stmt* Get() const { return m_pStatement.get(); }
-    int Step() const { return sqlite3_step(m_pStatement.get()); }
+    sqlite3_stmt* Get() const { return m_pLent ? m_pLent->pStatement.get() : nullptr; }
+    int Step() const { return sqlite3_step(Get()); }
 
     // Steps to the end, counting rows, and resets; the result of whichever failed first, or
     // SQLITE_OK. A statement has done its work only then: a commit may fail as late as in the
@@ -53,16 +53,21 @@ class Statement {
 
     // Whether its shape is a letter and the text.
     bool IsFor(std::string_view strRest) const {
-        return m_strShape.size() == strRest.size() + 1 &&
-               std::string_view(m_strShape).substr(1) == strRest;
+        // mutate(exchanged): all only look.
+        return m_pLent && m_pLent->strShape.size() == strRest.size() + 1 &&
+               std::string_view(m_pLent->strShape).substr(1) == strRest;
     }
 
   private:
     friend class Statements;
 
+    struct Kept {
+        std::string strShape;
+        OwnStatement pStatement;
+    };
+
     Statements* m_pHome = nullptr;
-    OwnStatement m_pStatement;
-    std::string m_strShape;
+    std::unique_ptr<Kept> m_pLent;
 };
 
 // Keeps the statements that were used last, each under a text that tells its shape. One that is on
@@ -86,17 +91,12 @@ class Statements {
   private:
     friend class Statement;
 
-    struct Kept {
-        std::string strShape;
-        OwnStatement pStatement;
-    };
-
     bool TakeKept(std::string_view strShape, Statement& Lent);
     void GiveBack(Statement& Lent);
 
     sqlite3* m_pDb;
     size_t m_nMost;
-    std::vector<Kept> m_vecKept;  // the one used last at the end
+    std::vector<std::unique_ptr<Statement::Kept>> m_vecKept;  // the one used last at the end
     OwnStatement m_pBegin;
 };
 

@@ -20,7 +20,8 @@ class ConditionSql : public QueryTest {
         const Members Of("doc", Parse(kDocs), vecFindings);
         vornjsondb::JsonCodec Codec;
         QueryPlan Plan(Of, Codec);
-        Plan.Resolve(Query(Parse(strQuery)), QueryUse::kRead, vecFindings);
+        const Query Which(Parse(strQuery));
+        Plan.Resolve(Which, QueryUse::kRead, vecFindings);
         EXPECT_EQ("", Text(vecFindings));
         std::string strSql = "EXPLAIN QUERY PLAN SELECT * FROM doc";
         Plan.AppendWhere(strSql);
@@ -465,6 +466,8 @@ TEST_F(ConditionSql, ShapesAreAlikeWhereOnlyValuesDiffer) {
     EXPECT_EQ(Shape(R"({"where": {"id": {"$in": [1]}}})"),
               Shape(R"({"where": {"id": {"$in": [1, 2, 3]}}})"));
     EXPECT_EQ(Shape(R"({"limit": 1})"), Shape(R"({"offset": 3})"));
+    EXPECT_EQ(Shape(R"({"where": {"id": 1}, "limit": 1})"),
+              Shape(R"({"where": {"id": 2}, "offset": 3})"));
     EXPECT_EQ(Shape(R"({"where": {"name": {"$prefix": ""}}})"),
               Shape(R"({"where": {"name": {"$prefix": "a"}}})"));
     const char* const kDifferent[] = {"{}",
@@ -476,7 +479,14 @@ TEST_F(ConditionSql, ShapesAreAlikeWhereOnlyValuesDiffer) {
                                       R"({"where": {"id": 1}})",
                                       R"({"where": {"size": 1}})",
                                       R"({"where": {"id": {"$ne": 1}}})",
+                                      R"({"where": {"id": {"$null": true}}})",
                                       R"({"where": {"id": 1}, "members": ["id"]})",
+                                      R"({"where": {"id": 1}, "sort": ["id"]})",
+                                      R"({"where": {"id": 1}, "limit": 1})",
+                                      R"({"where": {"id": 1, "size": 1}})",
+                                      R"({"where": {"$not": {"id": 1}}})",
+                                      R"({"where": {"any": 1}})",
+                                      R"({"where": {"any": "a"}})",
                                       R"({"where": {"map.a": 1}})",
                                       R"({"where": {"map.a": 0.5}})",
                                       R"({"where": {"map.b": 1}})",
@@ -501,6 +511,10 @@ TEST_F(ConditionSql, SortingEndsWithTheKeyAndPagingIsBound) {
         R"( ORDER BY CASE WHEN json_valid("map") THEN json_extract("map", '$."a"') END DESC, )"
         R"("any" COLLATE BINARY, "done", "id")",
         Sql(Query().Sort("-map.a").Sort("any").Sort("done")));
+    EXPECT_EQ(R"( WHERE "id" IS ? ORDER BY "id" LIMIT ? OFFSET ?)",
+              Sql(Query().Where("id", 1).Limit(5)));
+    EXPECT_EQ(R"( WHERE "id" IS ? LIMIT ? OFFSET ?)",
+              Sql(Query().Where("id", 1).Limit(5), QueryUse::kCount));
     EXPECT_EQ(R"( WHERE "id" IS {1} ORDER BY "id" LIMIT {-1} OFFSET {3})",
               Sql(Query().Where("id", 1).Offset(3), QueryUse::kRead, WriteShown));
 }
