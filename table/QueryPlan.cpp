@@ -1,48 +1,11 @@
+// What each query needs; what only a new statement or a query of many parts needs is in a file of
+// its own.
+
 #include "QueryPlan.h"
-
-#include <algorithm>
-
-#include "../src/base/SqlText.h"
-#include "Concat.h"
-#include "ConditionSql.h"
 
 namespace vornjsondb {
 
-namespace {
-
 using VORN_JSON_DB::Query;
-
-constexpr size_t kUsualValues = 4;  // an operand or two, and a page
-
-bool IsPaged(const Query& Which) {
-    return Which.nLimit != -1 || Which.nOffset != 0;
-}
-
-BoundValue Integer(std::int64_t nValue) {
-    BoundValue Value;
-    Value.eKind = BoundValue::Kind::kInteger;
-    Value.nValue = nValue;
-    return Value;
-}
-
-void CheckPage(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
-    if (Which.nLimit < -1) {
-        Report(vecFindings, FindingCode::kBadCount, "/limit", "the limit is less than 0");
-    }
-    if (Which.nOffset < 0) {
-        Report(vecFindings, FindingCode::kBadCount, "/offset", "the offset is less than 0");
-    }
-    if (eUse == QueryUse::kChange && (IsPaged(Which) || !Which.vecSort.empty())) {
-        Report(vecFindings, FindingCode::kPagedChange, "",
-               "a change reaches all records that the conditions select, in no order");
-    }
-    if (eUse == QueryUse::kChange && Which.vecWhere.empty()) {
-        Report(vecFindings, FindingCode::kNoCondition, "/where",
-               "the query has no condition and would reach every record");
-    }
-}
-
-}  // namespace
 
 void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
     vecFindings = Which.vecFindings;
@@ -89,128 +52,11 @@ bool QueryPlan::ResolvePlain(const Query& Which) {
         // mutate(exchanged): in any order.
         m_aPlain[0] = What.Value;
         // mutate(exchanged): in any order.
-        m_aPlain[1] = Integer(Which.nLimit);
-        m_aPlain[2] = Integer(Which.nOffset);
+        m_aPlain[1].SetInteger(Which.nLimit);
+        m_aPlain[2].SetInteger(Which.nOffset);
         m_nPlain = blPaged ? 3 : 1;
     }
     return blPlain;
-}
-
-void QueryPlan::WritePlain() {
-    // mutate(> to >=): what is empty stays empty.
-    if (m_nPlain > 0 && m_Sql.strSql.empty()) {
-        FindingList vecNone;
-        Write(*m_pWhich, m_eUse, vecNone);
-    }
-}
-
-void QueryPlan::Write(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
-    m_Sql.strSql.reserve(kUsualStatement);
-    m_Sql.vecValues.reserve(kUsualValues);
-    AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
-    m_nConditionEnd = m_Sql.strSql.size();
-    if (eUse == QueryUse::kRead) {
-        ResolveMembers(Which, vecFindings);
-        ResolveSort(Which, IsPaged(Which), vecFindings);
-    }
-    if (eUse != QueryUse::kChange && IsPaged(Which)) {
-        AppendPage(Which);
-    }
-    m_nTailEnd = m_Sql.strSql.size();
-    for (const size_t nMember : m_vecColumns) {
-        // mutate(doubled): told twice, it tells the same columns apart.
-        Append(m_Sql.strSql, {" ", DigitsOf(static_cast<std::int64_t>(nMember))});
-    }
-}
-
-// Any number of names in any order, the same ones too: each member once, in the members' order.
-void QueryPlan::ResolveMembers(const Query& Which, FindingList& vecFindings) {
-    std::string strNamed(Which.vecMembers.empty() ? 0 : m_Of.Size(), '0');
-    for (size_t i = 0; i < Which.vecMembers.size(); ++i) {
-        Place Where;
-        Problem Why;
-        if (FindPlace(m_Of, Which.vecMembers[i], Where, Why) && !Where.strPath.empty()) {
-            Why = {FindingCode::kBadMembers,
-                   Concat({ShownText(Which.vecMembers[i]), " is a path"})};
-        }
-        if (!Why.strMessage.empty()) {
-            Report(vecFindings, Why.eCode,
-                   Below("/members", DigitsOf(static_cast<std::int64_t>(i))), Why.strMessage);
-            continue;
-        }
-        strNamed[Where.nMember] = '1';
-    }
-    for (size_t i = 0; i < strNamed.size(); ++i) {
-        if (strNamed[i] == '1') {
-            m_vecColumns.push_back(i);
-        }
-    }
-}
-
-// The key comes last, so that pages follow each other without gaps, whatever sorting leaves open.
-void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFindings) {
-    std::vector<size_t> vecSorted;
-    for (size_t i = 0; i < Which.vecSort.size(); ++i) {
-        const std::string& strTerm = Which.vecSort[i];
-        Place Where;
-        Problem Why;
-        bool blFound = FindPlace(m_Of, strTerm, Where, Why);
-        const bool blDescending = !blFound && strTerm[0] == '-';
-        if (blDescending) {
-            blFound = FindPlace(m_Of, std::string_view(strTerm).substr(1), Where, Why);
-        }
-        if (!blFound) {
-            Report(vecFindings, Why.eCode, Below("/sort", DigitsOf(static_cast<std::int64_t>(i))),
-                   Why.strMessage);
-            continue;
-        }
-        // mutate(exchanged): in any order.
-        AppendSort(Where.nMember, Where.strPath, blDescending);
-        // mutate(doubled): it is only asked whether it is there.
-        vecSorted.push_back(Where.strPath.empty() ? Where.nMember : Members::kNone);
-    }
-    for (const size_t nMember : m_Of.Key()) {
-        const bool blSorted = std::count(vecSorted.begin(), vecSorted.end(), nMember) > 0;
-        if (!blSorted && (blPaged || !vecSorted.empty())) {
-            AppendSort(nMember, {}, false);
-        }
-    }
-}
-
-void QueryPlan::AppendSort(size_t nMember, const std::string& strPath, bool blDescending) {
-    const Member& Of = m_Of.At(nMember);
-    m_Sql.strSql += m_Sql.strSql.size() == m_nConditionEnd ? " ORDER BY " : ", ";
-    if (!strPath.empty()) {
-        m_Sql.strSql += ValueAt(Of.strColumn, strPath);
-    } else {
-        m_Sql.strSql += Of.strColumn;
-        m_Sql.strSql += IsOrderedAsText(Of) ? " COLLATE BINARY" : "";
-    }
-    m_Sql.strSql += blDescending ? " DESC" : "";
-}
-
-void QueryPlan::AppendPage(const Query& Which) {
-    m_Sql.strSql += " LIMIT ";
-    m_Sql.Add(Integer(Which.nLimit));
-    m_Sql.strSql += " OFFSET ";
-    m_Sql.Add(Integer(Which.nOffset));
-}
-
-std::string_view QueryPlan::Condition() {
-    WritePlain();
-    return std::string_view(m_Sql.strSql).substr(0, m_nConditionEnd);
-}
-
-void QueryPlan::AppendWhere(std::string& strSql) {
-    const std::string_view strCondition = Condition();
-    if (!strCondition.empty()) {
-        strSql.append(" WHERE ").append(strCondition);
-    }
-}
-
-void QueryPlan::AppendTail(std::string& strSql) {
-    WritePlain();
-    strSql.append(m_Sql.strSql, m_nConditionEnd, m_nTailEnd - m_nConditionEnd);
 }
 
 int QueryPlan::Bind(sqlite3_stmt* pStatement, int nFirst) const {

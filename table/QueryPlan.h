@@ -61,6 +61,11 @@ class QueryPlan {
     int Bind(sqlite3_stmt* pStatement, int nFirst) const;
 
   private:
+    static bool IsPaged(const VORN_JSON_DB::Query& Which) {
+        return Which.nLimit != -1 || Which.nOffset != 0;
+    }
+    static void CheckPage(const VORN_JSON_DB::Query& Which, QueryUse eUse,
+                          FindingList& vecFindings);
     bool ResolvePlain(const VORN_JSON_DB::Query& Which);
     void Write(const VORN_JSON_DB::Query& Which, QueryUse eUse, FindingList& vecFindings);
     void WritePlain();
