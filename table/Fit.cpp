@@ -103,7 +103,8 @@ Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompati
         }
         strJson = Codec.Write(jValue);
     }
-    return FitWritten(Type, strJson, blCompatible, Out);
+    Out.SetText(strJson);
+    return Readable(Type, blCompatible);
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
@@ -204,12 +205,6 @@ Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompati
     Out.eKind = BoundValue::Kind::kBlob;
     Out.strBytes = strBytes;
     return Type.Bound.eKind == BoundKind::kAny ? Readable(Type, blCompatible) : Misfit::kKind;
-}
-
-Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompatible,
-                  BoundValue& Out) {
-    Out.SetText(strJson);
-    return TakesJson(Type, strJson[0]) ? Readable(Type, blCompatible) : Misfit::kKind;
 }
 
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,

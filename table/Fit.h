@@ -32,6 +32,12 @@ struct BoundValue {
         strBytes = strText;
     }
 
+    // Whether it is a text that stands there, with as many bytes.
+    bool IsTextAt(std::string_view strText) const {
+        return eKind == Kind::kText && strBytes.data() == strText.data() &&
+               strBytes.size() == strText.size();
+    }
+
     int Bind(sqlite3_stmt* pStatement, int nParameter) const;  // SQLite's result
 };
 
@@ -61,10 +67,6 @@ Misfit FitText(const MemberType& Type, std::string_view strValue, bool blCompati
                BoundValue& Out);
 Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompatible,
                BoundValue& Out);
-
-// For JSON text just as it is stored, not empty.
-Misfit FitWritten(const MemberType& Type, std::string_view strJson, bool blCompatible,
-                  BoundValue& Out);
 
 // For every kind of value, null included. strJson keeps the text of a JSON member.
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,

@@ -93,9 +93,8 @@ class RecordValues {
     }
     void GiveText(size_t nMember, std::string_view strText) {
         Slot& Of = Mark(nMember);
-        const std::string_view strBefore = Of.Value.strBytes;
-        Of.blBound = Of.blBound && Of.Value.eKind == BoundValue::Kind::kText &&
-                     strBefore.data() == strText.data() && strBefore.size() == strText.size();
+        // mutate(doubled): nothing is new in between.
+        Of.blBound = Of.blBound && Of.Value.IsTextAt(strText);
         Of.Value.SetText(strText);
     }
 

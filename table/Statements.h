@@ -53,9 +53,7 @@ class Statement {
 
     // Whether its shape is a letter and the text.
     bool IsFor(std::string_view strRest) const {
-        // mutate(exchanged): all only look.
-        return m_pLent && m_pLent->strShape.size() == strRest.size() + 1 &&
-               std::string_view(m_pLent->strShape).substr(1) == strRest;
+        return m_pLent && std::string_view(m_pLent->strShape).substr(1) == strRest;
     }
 
   private:
