@@ -93,7 +93,6 @@ class RecordValues {
     }
     void GiveText(size_t nMember, std::string_view strText) {
         Slot& Of = Mark(nMember);
-        // mutate(doubled): nothing is new in between.
         Of.blBound = Of.blBound && Of.Value.IsTextAt(strText);
         Of.Value.SetText(strText);
     }
