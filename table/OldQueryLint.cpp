@@ -80,7 +80,7 @@ class OldQueryLint {
         if (jValue.isArray()) {
             LintList(Type, jValue, strPath);
         } else {
-            LintValue(Type, Type.eCondition, jValue, strPath);
+            LintValue(Type, Type.eCondition, jValue, strPath, false);
         }
         return true;
     }
@@ -109,15 +109,25 @@ class OldQueryLint {
         } else {
             const bool blFlag = Type.eCondition == ConditionForm::kBoolean;
             LintValue(Type, blFlag ? ConditionForm::kBareText : Type.eCondition, jList[0],
-                      Below(strPath, "0"));
+                      Below(strPath, "0"), true);
+        }
+    }
+
+    // In the place of a bare value it leaves nothing: "id=" or, of a list, "id in ()".
+    void LintNull(ConditionForm eForm, bool blOfList, const std::string& strPath) {
+        if (eForm == ConditionForm::kBareText && !blOfList) {
+            Report(m_vecFindings, LintCode::kOldRefuses, strPath,
+                   m_strMember + ": null leaves a gap in the statement, which SQLite refuses");
+        } else {
+            Report(m_vecFindings, LintCode::kOldNull, strPath,
+                   m_strMember + ": null " + OfNull(eForm));
         }
     }
 
     void LintValue(const MemberType& Type, ConditionForm eForm, const Json::Value& jValue,
-                   const std::string& strPath) {
+                   const std::string& strPath, bool blOfList) {
         if (jValue.isNull()) {
-            Report(m_vecFindings, LintCode::kOldNull, strPath,
-                   m_strMember + ": null " + OfNull(eForm));
+            LintNull(eForm, blOfList, strPath);
         } else if (IsRefused(eForm, jValue)) {
             Report(
                 m_vecFindings, LintCode::kOldRefuses, strPath,
@@ -145,7 +155,7 @@ class OldQueryLint {
             case ConditionForm::kBoolean:
                 return "asks for false";
             default:
-                return "leaves a gap: the statement is refused, or selects nothing";
+                return "selects nothing";
         }
     }
 

@@ -98,14 +98,15 @@ TEST_F(OldQueryLintTest, NullIsNotIsNull) {
            "12");
     Expect(R"({"done": null})", "old-null /done: member \"done\": null asks for false", "2");
     Expect(R"({"map": null})", "old-null /map: member \"map\": null asks for the text null", "");
-    Expect(R"({"id": null})",
-           "old-null /id: member \"id\": null leaves a gap: the statement is refused, or selects "
-           "nothing",
-           "-1");
-    Expect(R"({"id": [null]})",
-           "old-null /id/0: member \"id\": null leaves a gap: the statement is refused, or "
-           "selects nothing",
-           "");
+    Expect(
+        R"({"id": null})",
+        "old-refuses /id: member \"id\": null leaves a gap in the statement, which SQLite refuses",
+        "-1");
+    Expect(
+        R"({"id": null, "name": "a"})",
+        "old-refuses /id: member \"id\": null leaves a gap in the statement, which SQLite refuses",
+        "-1");
+    Expect(R"({"id": [null]})", "old-null /id/0: member \"id\": null selects nothing", "");
 }
 
 TEST_F(OldQueryLintTest, ValuesOfAnotherKindAreRefusedOrConverted) {
