@@ -27,7 +27,8 @@
 // Waiting: outside of a transaction a locked database is waited for, five seconds unless told
 // otherwise, and the whole call is tried again. Inside a transaction that is open already a lock is
 // reported at once, because the other side may be waiting for just this transaction. The caller's
-// busy handler is neither replaced nor removed.
+// busy handler is neither replaced nor removed; what it waits is part of the time, which it can
+// overrun in the last try.
 // A call that changes something is whole or nothing, inside a transaction of the caller's too. Some
 // failures may undo that transaction with it, as SQLite works: a full disk, an interrupt, and what
 // the table's own SQL answers with ROLLBACK. Then the message ends in "the transaction is undone".

@@ -40,18 +40,12 @@ Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce) {
     if (sqlite3_get_autocommit(pDb) == 0) {
         return InTransaction(pDb, fnOnce());
     }
-    Status Outcome = fnOnce();
-    if (!IsLock(Outcome)) {
-        return Outcome;
-    }
     Patience Left(nWaitMs);
-    while (Left.Wait()) {
+    Status Outcome = fnOnce();
+    while (IsLock(Outcome) && Left.Wait()) {
         Outcome = fnOnce();
-        if (!IsLock(Outcome)) {
-            return Outcome;
-        }
     }
-    return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
+    return IsLock(Outcome) ? Amended(Outcome, Retry::kCall, WaitedText(nWaitMs)) : Outcome;
 }
 
 int RunOnce(sqlite3_stmt* pStatement) {

@@ -14,8 +14,9 @@
 
 namespace vornjsondb {
 
-// The time that a call may wait for a lock. SQLite's own busy handler, which is the caller's, may
-// block at each try as well, so the clock decides and not the number of tries.
+// The time that a call may wait for a lock, from before its first try on: SQLite's own busy
+// handler, which is the caller's, may block at each try as well. So the clock decides and not the
+// number of tries.
 class Patience {
   public:
     explicit Patience(int nWaitMs);

@@ -101,8 +101,8 @@ Status Transaction::Commit() {
             StatusCode::kMisuse, What, "a failure has undone it, or a statement has ended it");
         return vornjsondb::Amended(Gone, Retry::kTransaction, "");
     }
-    int nResult = vornjsondb::RunEnd(m_pEnd);
     vornjsondb::Patience Left(m_nWaitMs);
+    int nResult = vornjsondb::RunEnd(m_pEnd);
     while (nResult == SQLITE_BUSY && Left.Wait()) {
         nResult = vornjsondb::RunEnd(m_pEnd);
     }

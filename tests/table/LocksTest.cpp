@@ -185,6 +185,30 @@ TEST_F(LocksTest, CallersBusyHandlerStays) {
     EXPECT_EQ(1, s_nCalls);
 }
 
+TEST_F(LocksTest, WhatTheCallersBusyHandlerWaitsCounts) {
+    FakeTime Time;
+    sqlite3_busy_handler(
+        m_pDb,
+        [](void* pTime, int nCalls) {
+            static_cast<FakeTime*>(pTime)->Sleep(4998000000);
+            return nCalls == 0 ? 1 : 0;
+        },
+        &Time);
+    Other("BEGIN IMMEDIATE");
+    EXPECT_EQ("locked: cannot save a record in table \"task\": database is locked (waited 5000 ms)",
+              Create(1));
+    EXPECT_EQ((std::vector<long>{4998, 4998}), Time.Pauses());
+    Other("COMMIT; BEGIN; SELECT * FROM task");
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    EXPECT_EQ("ok", Create(1));
+    EXPECT_EQ("locked: cannot commit a transaction: database is locked (waited 5000 ms)",
+              Text(All.Commit()));
+    EXPECT_EQ((std::vector<long>{4998, 4998, 4998, 4998}), Time.Pauses());
+    Other("COMMIT");
+    sqlite3_busy_handler(m_pDb, nullptr, nullptr);
+}
+
 TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
     Other("BEGIN IMMEDIATE");
     const FakeTime Time([this](int nPause) {
