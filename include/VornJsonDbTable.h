@@ -466,6 +466,7 @@ class Loader {
     // Returns what is wrong with this record; its message has the number, from 1.
     // Nothing of a bad record is stored. Without blGoOnAfterBad it ends the load, as other failures
     // do with it: all later calls return the first failure, and what was not committed is undone.
+    // So does a lock, whose advice is kTransaction: Start again, behind the nCommitted records.
     Status Add(const Json::Value& jRecord);
 
     // The same in steps: set members by their place in Table::Members(), in any order, the last
@@ -484,7 +485,7 @@ class Loader {
     Status EndRecord();
 
     // Needed at the end; useful between, where a stop must not lose what was done. After kLocked
-    // all is still there, and Commit can be called again.
+    // with the advice kCall all is still there, and Commit can be called again.
     Status Commit();
 
     const LoadCounts& Counts() const;

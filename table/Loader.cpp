@@ -102,7 +102,8 @@ Status Loader::Parts::Fail(const Status& Outcome) {
 }
 
 Status Loader::Parts::End(const Status& Outcome) {
-    Ended = Outcome;
+    const bool blLock = vornjsondb::IsLock(Outcome);
+    Ended = blLock ? vornjsondb::Amended(Outcome, Retry::kTransaction, "") : Outcome;
     // mutate(true, sunk): to roll back nothing fails, which is ignored.
     if (All.IsOpen()) {
         const bool blThere = sqlite3_get_autocommit(Into.pDb) == 0;

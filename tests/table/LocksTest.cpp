@@ -220,10 +220,12 @@ TEST_F(LocksTest, LoaderWaitsToBeginAndKeepsWhatItCannotCommitYet) {
     EXPECT_EQ("ok", Text(Into.Start(m_Table)));
     EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
     EXPECT_EQ((std::vector<long>{1, 2}), Time.Pauses());
+    const Status Outcome = Into.Commit();
     EXPECT_EQ(
         "locked: cannot load records into table \"task\": cannot commit a transaction: database is "
         "locked (waited 5000 ms)",
-        Text(Into.Commit()));
+        Text(Outcome));
+    EXPECT_EQ(Retry::kCall, Outcome.Advice());
     Other("COMMIT");
     EXPECT_EQ("ok", Text(Into.Commit()));
     EXPECT_EQ(1, Into.Counts().nCommitted);
@@ -241,10 +243,14 @@ TEST_F(LocksTest, LoaderEndsWhenAFullTransactionCannotBeCommitted) {
     const std::string strLocked =
         "locked: cannot load records into table \"task\": cannot commit a transaction: database is "
         "locked (waited 5000 ms)";
-    EXPECT_EQ(strLocked, Text(Into.Add(Parse(R"({"id": 2})"))));
+    const Status Locked = Into.Add(Parse(R"({"id": 2})"));
+    EXPECT_EQ(strLocked, Text(Locked));
+    EXPECT_EQ(Retry::kTransaction, Locked.Advice());
     EXPECT_EQ(0, Into.Counts().nInserted);
     Other("COMMIT");
-    EXPECT_EQ(strLocked, Text(Into.Commit()));
+    const Status Later = Into.Commit();
+    EXPECT_EQ(strLocked, Text(Later));
+    EXPECT_EQ(Retry::kTransaction, Later.Advice());
     EXPECT_EQ("ok", Create(1));
     EXPECT_EQ(R"({"done":false,"id":1})", Text(m_jStored));
 }
@@ -259,9 +265,13 @@ TEST_F(LocksTest, LoaderThatCannotBeginNamesTheTable) {
         "locked: cannot load record 1 into table \"task\": cannot begin a transaction: database is "
         "locked (waited 5000 ms)",
         Text(Outcome));
-    EXPECT_EQ(Retry::kCall, Outcome.Advice());
+    EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
     EXPECT_EQ(SQLITE_BUSY, Outcome.SqliteCode());
     Other("COMMIT");
+    EXPECT_EQ(Text(Outcome), Text(Into.Add(Parse(R"({"id": 1})"))));
+    EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+    EXPECT_EQ("ok", Text(Into.Add(Parse(R"({"id": 1})"))));
+    EXPECT_EQ("ok", Text(Into.Commit()));
 }
 
 }  // namespace
