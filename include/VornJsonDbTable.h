@@ -362,7 +362,8 @@ class Table {
     // Must come first; a table that is open already becomes another one, or is closed by a failure,
     // but not in a callback of its own. A Loader goes on with what it was. Copies its arguments but
     // the connection. A null definition is made from the real table. kNotFound: there is no such
-    // table and Options do not say how to make one. Columns that the table lacks, or has more, are
+    // table and Options do not say how to make one, or their statement makes another, which is
+    // undone. Columns that the table lacks, or has more, are
     // no failure: see Lint and Sync.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());

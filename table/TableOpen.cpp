@@ -47,14 +47,18 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
     return {};
 }
 
-// The reason is taken before what was begun is undone.
-Status RunWhole(Table::Parts& Into, const std::string& strSql, const Doing& What) {
+// Runs the statement that makes the table, and reads what it made. The caller's may make another
+// one, which is undone. The reason is taken before what was begun is undone.
+Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
     vornjsondb::Whole All(Into.pDb, Into.Kept);
     int nResult = All.Begin();
     if (nResult == SQLITE_OK) {
-        nResult = sqlite3_exec(Into.pDb, strSql.c_str(), nullptr, nullptr, nullptr);
+        nResult = sqlite3_exec(Into.pDb, Into.How.strSqlCreate.c_str(), nullptr, nullptr, nullptr);
     }
     if (nResult == SQLITE_OK) {
+        nResult = vornjsondb::ReadRealTable(Into.pDb, Into.Of.Table(), Real);
+    }
+    if (nResult == SQLITE_OK && !Real.vecColumns.empty()) {
         nResult = All.Keep();
     }
     return vornjsondb::FromSqlite(Into.pDb, nResult, What);
@@ -79,19 +83,17 @@ Status Table::Parts::Meet() {
         return Outcome;
     }
     RealTable Real;
-    int nResult = vornjsondb::ReadRealTable(pDb, Of.Table(), Real);
+    const int nResult = vornjsondb::ReadRealTable(pDb, Of.Table(), Real);
     const bool blCreate = How.blCreateTable || !How.strSqlCreate.empty();
     // mutate(hoisted): who creates nothing does not ask for the SQL.
     if (nResult == SQLITE_OK && Real.vecColumns.empty() && blCreate) {
         if (How.strSqlCreate.empty()) {
             How.strSqlCreate = vornjsondb::CreateTableSql(Of, {});
         }
-        Outcome = RunWhole(*this, How.strSqlCreate, What);
-        // mutate(exchanged): after a failure nobody asks what was read.
+        Outcome = CreateReal(*this, What, Real);
         if (!Outcome.Ok()) {
             return Outcome;
         }
-        nResult = vornjsondb::ReadRealTable(pDb, Of.Table(), Real);
     }
     if (nResult != SQLITE_OK) {
         return FailBySqlite(pDb, nResult, What);
