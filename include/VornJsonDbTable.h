@@ -413,8 +413,8 @@ class Table {
     // or retyped; what would need that is a finding.
     Status Sync(SyncMode eMode, SyncReport& Report);
 
-    // Members may be paths. pstrSql receives the statement. An index that is there is not made a
-    // second time.
+    // Members may be paths, none twice. pstrSql receives the statement. An index that is there is
+    // not made a second time.
     Status CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                        std::string* pstrSql = nullptr);
 

@@ -49,6 +49,9 @@ Json::Value Describe(const RealTable& Real) {
 
 Status DefinitionOf(sqlite3* pDb, const std::string& strTable, Json::Value& jDefinition) try {
     const vornjsondb::Doing What{"describe", &strTable};
+    if (pDb == nullptr) {
+        return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no connection");
+    }
     RealTable Real;
     const int nResult = vornjsondb::ReadRealTable(pDb, strTable, Real);
     if (nResult != SQLITE_OK) {

@@ -20,6 +20,7 @@
     X(kBadName, "bad-name", kError, "give the member another name")                               \
     X(kSameColumn, "same-column", kError, "give one of the two another name")                     \
     X(kUnknownKey, "unknown-key", kError, "name members of the definition in \"key\"")            \
+    X(kNamedTwice, "named-twice", kError, "name each member once")                                \
     X(kNoKey, "no-key", kError, "name the key in the definition: {\"key\": \"<member>\"}")        \
     /* records */                                                                                 \
     X(kNotARecord, "not-a-record", kError, "pass an object with at least one member")             \

@@ -96,6 +96,9 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,
                    Concat({Shown(jName), " is no member that can be a key",
                            Suggestion(strName, m_vecNames)}));
+        } else if (std::count(vecNames.begin(), vecNames.end(), strName) > 0) {
+            Report(vecFindings, FindingCode::kNamedTwice, strPath,
+                   Concat({ShownText(strName), " is named twice"}));
         }
         vecNames.push_back(strName);
     }

@@ -1,8 +1,10 @@
 // Indexes on members and on places in JSON members.
 
+#include <algorithm>
 #include <utility>
 
 #include "Attempt.h"
+#include "Concat.h"
 #include "FindingCodes.h"
 #include "IndexSql.h"
 #include "TableParts.h"
@@ -17,6 +19,12 @@ using vornjsondb::IndexPlan;
 using vornjsondb::IndexTerm;
 using Parts = Table::Parts;
 
+bool HasTerm(const std::vector<IndexTerm>& vecTerms, const vornjsondb::Place& Where) {
+    return std::any_of(vecTerms.begin(), vecTerms.end(), [&Where](const IndexTerm& Term) {
+        return Term.Where.nMember == Where.nMember && Term.Where.strPath == Where.strPath;
+    });
+}
+
 std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
                                const std::vector<std::string>& vecMembers,
                                FindingList& vecFindings) {
@@ -30,6 +38,10 @@ std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
         if (!vornjsondb::FindPlace(Of, Term.strName, Term.Where, Why)) {
             vornjsondb::Report(vecFindings, Why.eCode, vornjsondb::Below("", std::to_string(i)),
                                Why.strMessage);
+        } else if (HasTerm(vecTerms, Term.Where)) {
+            vornjsondb::Report(
+                vecFindings, FindingCode::kNamedTwice, vornjsondb::Below("", std::to_string(i)),
+                vornjsondb::Concat({vornjsondb::ShownText(Term.strName), " is named twice"}));
         }
         vecTerms.push_back(std::move(Term));
     }

@@ -54,6 +54,8 @@ const CodeCase kCodeCases[] = {
     {"same-column", Call::kDefinition,
      R"({"member": {"a": {"cpptype": "int"}, "A": {"cpptype": "int"}}})"},
     {"unknown-key", Call::kDefinition, R"({"key": "b", "member": {"a": {"cpptype": "int"}}})"},
+    {"named-twice", Call::kDefinition,
+     R"({"key": ["a", "a"], "member": {"a": {"cpptype": "int"}}})"},
     {"bad-default", Call::kDefinition,
      R"({"member": {"a": {"cpptype": "int", "cppDefaultValue": "x"}}})"},
     {"misspelt-key", Call::kDefinition, R"({"keys": "a", "member": {"a": {"cpptype": "int"}}})"},

@@ -157,6 +157,12 @@ TEST_F(IndexTest, WhatCannotBeIndexed) {
               "refused: cannot create an index on table \"doc\": no such table: main.doc");
 }
 
+TEST_F(IndexTest, NoTermStandsTwice) {
+    EXPECT_EQ(Index({"id", "size", "id", "map.a", "map", "map.b", "map.a"}),
+              "refused: cannot create an index on table \"doc\": \"id\" is named twice "
+              "[named-twice /2] [named-twice /6]");
+}
+
 TEST_F(IndexTest, UniqueIndexOnAPathIsKept) {
     EXPECT_EQ(Index({"map.a"}, true).substr(0, 19), "CREATE UNIQUE INDEX");
     EXPECT_EQ(Create(R"({"id": 1, "map": {"a": "x"}})"), R"({"id":1,"map":{"a":"x"}})");
