@@ -183,7 +183,8 @@ class [[nodiscard]] Status {
 // Within JSON some versions of SQLite, 3.40 among them, end a text at a NUL byte: paths and
 // "$contains" then see what stands before it, and operands of theirs with a NUL byte are refused.
 // A member of a JSON type is compared whole with {member: value}.
-// Unknown members, unknown operators and values that a member's type cannot have are findings.
+// Unknown members, unknown operators and values that a member's type cannot have are findings, in
+// "sort" and "members" of a query that only counts, too.
 
 enum class Op {       // true for a record whose member
     kEqual,           // "$eq", or a plain value: equals the operand; null means is NULL

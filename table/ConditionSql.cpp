@@ -146,8 +146,8 @@ class ConditionWriter {
             return Leaf.strPath;
         }
         const std::string strMember = Below("/where", Leaf.strMember);
-        return Leaf.eOp == VORN_JSON_DB::Op::kEqual ? strMember
-                                                    : Below(strMember, RowOf(Leaf.eOp).szName);
+        const bool blNamed = Leaf.eOp != VORN_JSON_DB::Op::kEqual && IsOperator(Leaf.eOp);
+        return blNamed ? Below(strMember, RowOf(Leaf.eOp).szName) : strMember;
     }
 
     LeafSql m_Leaf;

@@ -66,6 +66,9 @@ bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
     }
     m_pMember = &m_Of.At(m_Where.nMember);
     m_blPath = !m_Where.strPath.empty();
+    if (!IsOperator(Leaf.eOp)) {
+        return Why.Tell(FindingCode::kUnknownOperator, "there is no operator of this number");
+    }
     const Operator& Row = RowOf(Leaf.eOp);
     if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
         return Why.Tell(

@@ -59,6 +59,10 @@ constexpr const char* kForeign[][2] = {
 
 }  // namespace
 
+bool IsOperator(Op eOp) {
+    return static_cast<size_t>(eOp) < std::size(kOperators);
+}
+
 const Operator& RowOf(Op eOp) {
     return kOperators[static_cast<size_t>(eOp)];
 }

@@ -39,6 +39,8 @@ constexpr unsigned BitOf(BoundKind eKind) {
 // Of places inside of JSON members.
 constexpr unsigned kPathBit = BitOf(BoundKind::kAny) << 1U;
 
+// Whether it is one: any number can be made an Op.
+bool IsOperator(VORN_JSON_DB::Op eOp);
 const Operator& RowOf(VORN_JSON_DB::Op eOp);
 
 // nullptr: no such operator.

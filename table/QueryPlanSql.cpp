@@ -47,9 +47,14 @@ void QueryPlan::Write(const Query& Which, QueryUse eUse, FindingList& vecFinding
     m_Sql.vecValues.reserve(kUsualValues);
     AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
     m_nConditionEnd = m_Sql.strSql.size();
-    if (eUse == QueryUse::kRead) {
-        ResolveMembers(Which, vecFindings);
+    ResolveMembers(Which, vecFindings);
+    if (eUse != QueryUse::kChange) {
         ResolveSort(Which, IsPaged(Which), vecFindings);
+    }
+    // Names are looked at for all; what they say is for those who read.
+    if (eUse != QueryUse::kRead) {
+        m_vecColumns.clear();
+        m_Sql.strSql.resize(m_nConditionEnd);
     }
     if (eUse != QueryUse::kChange && IsPaged(Which)) {
         AppendPage(Which);

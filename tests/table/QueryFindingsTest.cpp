@@ -48,6 +48,44 @@ class DeepList {
 
 // ---- what is wrong ------------------------------------------------------------------------------
 
+TEST_F(QueryFindings, NamesAreLookedAtWhateverTheCallDoesWithThem) {
+    const Query Which(Parse(R"({"where": {"id": 1}, "sort": ["nmae"], "members": ["*"]})"));
+    const std::string strMembers =
+        "refused: cannot # table \"doc\": table \"doc\" has no member \"*\" "
+        "[unknown-member /members/0]";
+    const std::string strBoth = strMembers + " [unknown-member /sort/0]";
+    std::int64_t nRows = 7;
+    bool blExists = true;
+    EXPECT_EQ(Text(m_Table.Count(Which, nRows)), Replaced(strBoth, "#", "count records of"));
+    EXPECT_EQ(Text(m_Table.Exists(Which, blExists)), Replaced(strBoth, "#", "look for records of"));
+    const Query Change = Query().Where("id", 1).Members({"*"});
+    EXPECT_EQ(Text(m_Table.Update(Change, Parse(R"({"size": 1})"), &nRows)),
+              Replaced(strMembers, "#", "update records of"));
+    EXPECT_EQ(Text(m_Table.Remove(Change, &nRows)),
+              Replaced(strMembers, "#", "remove records from"));
+    EXPECT_EQ(nRows, 7);
+}
+
+TEST_F(QueryFindings, CountHasNeitherMembersNorOrder) {
+    const Query Which = Query().Where("id", 1).Members({"name"}).Sort("-size").Limit(1);
+    std::int64_t nRows = 7;
+    bool blExists = true;
+    EXPECT_EQ(Text(m_Table.Count(Which, nRows)), "ok");
+    EXPECT_EQ(Text(m_Table.Exists(Which, blExists)), "ok");
+    EXPECT_EQ(nRows, 0);
+    EXPECT_FALSE(blExists);
+    EXPECT_EQ(Text(m_Table.Remove(Query().Where("id", 1).Members({"name"}), &nRows)), "ok");
+}
+
+TEST_F(QueryFindings, NumberOfNoOperatorIsNone) {
+    Json::Value jFound;
+    for (const int nOp : {-1, 13, 99}) {
+        EXPECT_EQ(Text(m_Table.List(Query().Where("id", static_cast<Op>(nOp), 1), jFound)),
+                  "refused: cannot list records of table \"doc\": there is no operator of this "
+                  "number [unknown-operator /where/id]");
+    }
+}
+
 TEST_F(QueryFindings, FindingsOfTheNotation) {
     struct Case {
         const char* szQuery;
@@ -418,7 +456,7 @@ TEST_F(QueryFindings, QueryThatCannotBeReadTellsNoMore) {
 }
 
 TEST_F(QueryFindings, MembersAreOnlyForWhatIsRead) {
-    EXPECT_EQ(Sql(Query().Where("id", 1).Members({"nope"}), QueryUse::kCount),
+    EXPECT_EQ(Sql(Query().Where("id", 1).Members({"name"}), QueryUse::kCount),
               " WHERE \"id\" IS ?");
 }
 
