@@ -392,7 +392,8 @@ class Table {
     Status Count(const Query& Which, std::int64_t& nRecords);
     Status Exists(const Query& Which, bool& blExists);
 
-    // One row at a time, in constant memory, until the callback returns false. In it the table can
+    // One row at a time, in constant memory, until the callback, which must not be empty, returns
+    // false. In it the table can
     // be read, and the Table moved and destroyed; but calls that change it, and Open, return
     // kMisuse.
     Status ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord);

@@ -104,6 +104,10 @@ Status Compute(Parts& From, const Query& Which, const Doing& What, bool blExists
     return Outcome;
 }
 
+Status NoCallback(const Doing& What) {
+    return vornjsondb::Fail(StatusCode::kMisuse, What, "there is no callback");
+}
+
 // A callback of the caller's that is running, also when it throws. Until it returns the call does
 // nothing, and others may.
 class Callback {
@@ -177,10 +181,11 @@ Status Table::Exists(const Query& Which, bool& blExists) {
 Status Table::ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord) {
     const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
     const auto fnRead = [&](Parts& From, const Doing& What) {
-        return SelectRecords(From, Which, What, [&](const Json::Value& jRecord) {
+        const auto fnEach = [&](const Json::Value& jRecord) {
             const Callback Now(From);
             return fnRecord(jRecord);
-        });
+        };
+        return fnRecord ? SelectRecords(From, Which, What, fnEach) : NoCallback(What);
     };
     return vornjsondb::Guarded(pOwn.get(), "read records of", false, fnRead);
 }
@@ -188,12 +193,12 @@ Status Table::ForEach(const Query& Which, const std::function<bool(const Json::V
 Status Table::ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow) {
     const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
     const auto fnRead = [&](Parts& From, const Doing& What) {
-        return Select(From, Which, What,
-                      [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
-                          const Row::Source Source{pStatement, From.Of, vecColumns};
-                          const Callback Now(From);
-                          return fnRow(Row(Source));
-                      });
+        const auto fnEach = [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
+            const Row::Source Source{pStatement, From.Of, vecColumns};
+            const Callback Now(From);
+            return fnRow(Row(Source));
+        };
+        return fnRow ? Select(From, Which, What, fnEach) : NoCallback(What);
     };
     return vornjsondb::Guarded(pOwn.get(), "read records of", false, fnRead);
 }

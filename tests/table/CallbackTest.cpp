@@ -258,6 +258,25 @@ TEST_F(CallbackTest, LoaderGoesOnWithoutItsTable) {
     EXPECT_EQ(Ids(), "1|a;2|b;3|c;4|e");
 }
 
+TEST_F(CallbackTest, LoaderThatHasCommittedGoesOnWhereItsTableBecameAnother) {
+    EXPECT_EQ(Text(m_Load.Start(m_Table)), "ok");
+    EXPECT_EQ(Text(m_Load.Add(Parse(R"({"id": 3, "name": "c"})"))), "ok");
+    EXPECT_EQ(Text(m_Load.Commit()), "ok");
+    EXPECT_EQ(Text(m_Table.Open(m_pDb, "task", Json::Value())), "ok");
+    EXPECT_EQ(Text(m_Load.Add(Parse(R"({"id": 4, "name": "d"})"))), "ok");
+    EXPECT_EQ(Text(m_Load.Commit()), "ok");
+    EXPECT_EQ(Text(m_Load.Start(m_Table)), "ok");
+    EXPECT_EQ(Ids(), "1|a;2|b;3|c;4|d");
+}
+
+// The parameter alone is enough: no row is looked at.
+TEST_F(CallbackTest, WithoutACallbackNothingIsRead) {
+    EXPECT_EQ(Text(m_Table.ForEach(Query(), nullptr)),
+              "misuse: cannot read records of table \"task\": there is no callback");
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Where("nosuch", 1), nullptr)),
+              "misuse: cannot read records of table \"task\": there is no callback");
+}
+
 TEST_F(CallbackTest, CallbackThatThrowsEndsItsCall) {
     try {
         m_Table.ForEach(Query(), [](const Json::Value&) -> bool { throw 1; }).Ignore();
