@@ -63,14 +63,17 @@
 //    "unsigned int", "unsigned", "uid_t"         whole number, 0 to 2^32 - 1   integer
 //    "long", "long long", "time_t"               whole number of 64 bits       integer
 //    "unsigned long", "unsigned long long"       whole number, 0 to 2^63 - 1   integer
-//    "double", "float"                           number, but not NaN           real
+//    "double", "float"                           number (1), but not NaN       real
 //    "Json::objectValue", "Json::arrayValue"     object; list                  JSON text
 //    "Json::Value"                               any JSON but null             JSON text
 //    "any"                                       text or number                as it is
 //
+// (1) A whole number that no double holds exactly, such as 2^53 + 1, is out of range.
+//
 // A null is SQL's NULL for every type. A value of another kind or range is refused, never
-// converted. A stored value that does not fit its member's type, put there by another program, is
-// read as what it is.
+// converted; so is a record without its key where the next one that the table hands out is beyond
+// the member's range. A stored value that does not fit its member's type, put there by another
+// program, is read as what it is.
 //
 // Record: a JSON object whose members are the definition's. A member that is absent is not
 // written; in a new row it gets its default.

@@ -98,9 +98,11 @@ Status Loader::Parts::Fail(const Status& Outcome) {
                        eCode == StatusCode::kConstraint;
     Now.nFailed += blBad ? 1 : 0;
     const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
-    return blBad && !blGone && How.blGoOnAfterBad ? Outcome : End(Outcome);
+    const bool blGoOn = How.blGoOnAfterBad && !Writer.HasStored();
+    return blBad && !blGone && blGoOn ? Outcome : End(Outcome);
 }
 
+// Nothing is left that a further call could go on with, so a lock asks for all of it anew.
 Status Loader::Parts::End(const Status& Outcome) {
     const bool blLock = vornjsondb::IsLock(Outcome);
     Ended = blLock ? vornjsondb::Amended(Outcome, Retry::kTransaction, "") : Outcome;
@@ -164,6 +166,9 @@ Status Loader::Start(Table& Into, const LoadOptions& How) {
     }
     m_pParts.reset();
     Status Outcome = vornjsondb::CheckState(Into.m_pParts.get(), kDo, true);
+    if (Outcome.Ok()) {
+        Outcome = vornjsondb::CheckMode(How.eOnDuplicate, Into.m_pParts->Do(kDo));
+    }
     if (!Outcome.Ok()) {
         return Outcome;
     }

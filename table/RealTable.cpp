@@ -135,6 +135,11 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
     });
 }
 
+bool IsRowid(const RealTable& Real, const RealColumn& Column) {
+    return Real.vecKey.size() == 1 && Real.vecKey[0] == Column.strName &&
+           sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
+}
+
 std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn) {
     const char* szCollation = nullptr;
     sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), strColumn.c_str(), nullptr,

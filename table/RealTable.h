@@ -41,6 +41,9 @@ struct RealIndexes {
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
 
+// Whether the column is the rowid itself, which never holds NULL: SQLite hands out values.
+bool IsRowid(const RealTable& Real, const RealColumn& Column);
+
 // How the column compares texts, where a statement does not say it.
 std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn);
 bool IsBinary(const std::string& strCollation);

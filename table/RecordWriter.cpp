@@ -66,6 +66,14 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
 
 }  // namespace
 
+Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What) {
+    const bool blMode =
+        static_cast<size_t>(eOnDuplicate) <= static_cast<size_t>(OnDuplicate::kUpsert);
+    return blMode ? Status()
+                  : Fail(VORN_JSON_DB::StatusCode::kMisuse, What,
+                         "there is no OnDuplicate of this number");
+}
+
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
@@ -159,10 +167,25 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         nResult = Run(Verb::kUpdate, nChanged);
     }
     if (nResult == SQLITE_OK) {
-        return {};
+        return m_Into.HandsOut(m_Values) ? CheckRowid(What) : Status();
     }
     const Status Failed = FailBySqlite(m_Into.pDb, nResult, What);
     return Failed.Code() == StatusCode::kDuplicate ? WithValues(Failed) : Failed;
+}
+
+// No key that SQLite hands out is one that the member could not be given.
+Status RecordWriter::CheckRowid(const Doing& What) {
+    const Member& Key = m_Into.Of.At(m_Into.nHandedOut);
+    const std::int64_t nRowid = sqlite3_last_insert_rowid(m_Into.pDb);
+    BoundValue Value;
+    FindingList vecFindings;
+    const Misfit eMisfit = FitInteger(*Key.pType, nRowid, m_Into.How.blCompatible, Value);
+    if (eMisfit != Misfit::kNone) {
+        m_blStored = true;
+        ReportMisfit(eMisfit, Key, Concat({DigitsOf(nRowid), ", which the table hands out,"}),
+                     Below("", Key.strName), vecFindings);
+    }
+    return FromFindings(std::move(vecFindings), What);
 }
 
 // SQLite names the columns, "task.id, task.name"; the values are told beside them.

@@ -24,6 +24,9 @@ class RecordWriter {
     // tells.
     Status Write(OnDuplicate eOnDuplicate, const Doing& What, Written& eWritten);
 
+    // Whether a failure has stored the record all the same, which only its transaction can undo.
+    bool HasStored() const { return m_blStored; }
+
   private:
     enum class Verb { kInsert, kInsertNew, kReplace, kUpdate, kFind };
     static char LetterOf(Verb eVerb) { return "INRUF"[static_cast<size_t>(eVerb)]; }
@@ -32,12 +35,17 @@ class RecordWriter {
     int Take(Verb eVerb, Statement& Held);
     std::string Sql(Verb eVerb) const;
     Status WithValues(const Status& Failed) const;
+    Status CheckRowid(const Doing& What);
 
     Table::Parts& m_Into;
     RecordValues& m_Values;
+    bool m_blStored = false;
     Statement m_aHeld[5];                 // the last one of each verb
     const Statement* m_pBound = nullptr;  // the one of them that has the values before bound
 };
+
+// A failure for a number that is none of its values.
+Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What);
 
 // " WHERE "task"."id" = ?": parameters in the key's order.
 std::string WhereKey(const Members& Of);

@@ -71,12 +71,6 @@ class TableCompare {
         return itFound == m_Real.vecColumns.end() ? nullptr : &*itFound;
     }
 
-    // The column that is the rowid never holds NULL.
-    bool IsRowid(const RealColumn& Column) const {
-        return m_Real.vecKey.size() == 1 && m_Real.vecKey[0] == Column.strName &&
-               sqlite3_stricmp(Column.strType.c_str(), "INTEGER") == 0;
-    }
-
     int CompareMember(size_t nMember) {
         const Member& Of = m_Of.At(nMember);
         const RealColumn* pColumn = ColumnOf(Of);
@@ -97,7 +91,7 @@ class TableCompare {
                     Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
                     " affinity and changes what is stored");
         }
-        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(*pColumn) && !m_Real.blView) {
+        if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(m_Real, *pColumn) && !m_Real.blView) {
             Add(LintCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
         }
         return CompareDefault(Of, *pColumn);

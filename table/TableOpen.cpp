@@ -1,5 +1,6 @@
 // A Table's life: opening, and what is the same for all of its operations.
 
+#include <limits>
 #include <numeric>
 #include <utility>
 
@@ -64,6 +65,12 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
     return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
+bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
+                   const vornjsondb::Member& Of) {
+    return IsRowid(Real, Column) && Of.Kind() == vornjsondb::BoundKind::kInteger &&
+           vornjsondb::RangeOf(*Of.pType).nMostRead < std::numeric_limits<std::int64_t>::max();
+}
+
 }  // namespace
 
 Table::Parts::Parts(sqlite3* pDbOpen, const std::string& strTable, const Json::Value& jDefinition,
@@ -124,6 +131,9 @@ void Table::Parts::Learn(const RealTable& Real) {
             // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);
             Values.RefuseAlways(nMember);
+        }
+        if (nMember != vornjsondb::Members::kNone && IsNarrowRowid(Real, Column, Of.At(nMember))) {
+            nHandedOut = nMember;
         }
     }
 }

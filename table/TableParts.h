@@ -32,10 +32,20 @@ struct VORN_JSON_DB::Table::Parts {
 
     void Learn(const vornjsondb::RealTable& Real);
 
+    // Whether the record leaves it to SQLite to hand out its rowid, of which the member does not
+    // hold every value.
+    bool HandsOut(const vornjsondb::RecordValues& Record) const {
+        return nHandedOut != vornjsondb::Members::kNone &&
+               (!Record.Has(nHandedOut) ||
+                Record.At(nHandedOut).eKind == vornjsondb::BoundValue::Kind::kNull);
+    }
+
     sqlite3* pDb;
     Options How;
     vornjsondb::Members Of;
     std::vector<std::string> vecKeyNames;
+    size_t nHandedOut =
+        vornjsondb::Members::kNone;  // the member that is the rowid, if it is narrower
     std::string strRowid;  // a name of the rowid that no column has; empty: rows have none
     bool blView = false;   // whose triggers do the work, of which SQLite counts nothing
     vornjsondb::Statements Kept;

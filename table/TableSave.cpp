@@ -48,10 +48,10 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
                : FailBySqlite(From.pDb, nResult, What);
 }
 
-// A single statement is whole by itself.
-bool IsOneStatement(OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
+// A single statement is whole by itself, as long as nothing is looked at behind it.
+bool IsOneStatement(const Parts& Into, OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
     const bool blOne = eOnDuplicate == OnDuplicate::kStop || eOnDuplicate == OnDuplicate::kSkip;
-    return blOne && pjStored == nullptr;
+    return blOne && pjStored == nullptr && !Into.HandsOut(Into.Values);
 }
 
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
@@ -83,7 +83,7 @@ Status Write(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, 
         }
         return Outcome;
     };
-    return IsOneStatement(eOnDuplicate, pjStored)
+    return IsOneStatement(Into, eOnDuplicate, pjStored)
                ? vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, fnSteps)
                : vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnSteps);
 }
@@ -96,7 +96,11 @@ Status Table::Create(const Json::Value& jRecord, Json::Value* pjStored) {
 
 Status Table::Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate, Json::Value* pjStored,
                    Written* peWritten) {
-    const auto fnSave = [&](Parts& Into, const Doing& What) {
+    const auto fnSave = [&](Parts& Into, const Doing& What) -> Status {
+        Status Mode = vornjsondb::CheckMode(eOnDuplicate, What);
+        if (!Mode.Ok()) {
+            return Mode;
+        }
         Json::Value jStored;
         Written eWritten = Written::kInserted;
         Status Outcome = Write(Into, jRecord, eOnDuplicate, What,

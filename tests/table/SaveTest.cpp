@@ -244,6 +244,66 @@ TEST_F(SaveTest, ColumnCalledRowidIsNotTheRowid) {
 }
 
 // A trigger on the key has nothing to do with a change of other members.
+TEST_F(SaveTest, NumberOfNoModeIsRefused) {
+    Open();
+    for (const int nMode : {-1, 4, 99}) {
+        const auto eMode = static_cast<OnDuplicate>(nMode);
+        EXPECT_EQ(Text(m_Table.Save(Parse(R"({"id": 1})"), eMode)),
+                  "misuse: cannot save a record in table \"task\": there is no OnDuplicate of this "
+                  "number");
+        Loader Load;
+        EXPECT_EQ(Text(Load.Start(m_Table, {eMode})),
+                  "misuse: cannot load records into table \"task\": there is no OnDuplicate of "
+                  "this number");
+    }
+    EXPECT_EQ(Rows("SELECT * FROM task"), "");
+}
+
+TEST_F(SaveTest, KeyThatTheTableHandsOutFitsItsMember) {
+    Open();
+    EXPECT_EQ(Create(R"({"id": 2147483646})"), R"({"done":false,"id":2147483646})");
+    EXPECT_EQ(Create(R"({"name": "last"})"), R"({"done":false,"id":2147483647,"name":"last"})");
+    const std::string strOut =
+        "refused: cannot save a record in table \"task\": member \"id\": 2147483648, which the "
+        "table "
+        "hands out, is out of range: expected is a whole number from -2147483648 to 2147483647 "
+        "[out-of-range /id]";
+    EXPECT_EQ(Create(R"({"name": "beyond"})"), strOut);
+    EXPECT_EQ(Create(R"({"id": null, "name": "beyond"})"), strOut);
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"name": "beyond"})"))), strOut);
+    Run("BEGIN; UPDATE task SET name = 'x'");
+    EXPECT_EQ(Text(m_Table.Create(Parse(R"({"name": "beyond"})"))), strOut);
+    Run("COMMIT");
+    EXPECT_EQ(Rows("SELECT id, name FROM task"), "2147483646|x;2147483647|x");
+}
+
+TEST_F(SaveTest, KeyBeyondItsMemberEndsALoad) {
+    Open();
+    LoadOptions How;
+    How.blGoOnAfterBad = true;
+    Loader Load;
+    EXPECT_EQ(Text(Load.Start(m_Table, How)), "ok");
+    EXPECT_EQ(Text(Load.Add(Parse(R"({"id": 2147483647})"))), "ok");
+    const std::string strOut =
+        "refused: cannot load record 2 into table \"task\": member \"id\": 2147483648, which the "
+        "table hands out, is out of range: expected is a whole number from -2147483648 to "
+        "2147483647 [out-of-range /id]";
+    EXPECT_EQ(Text(Load.Add(Parse(R"({"name": "beyond"})"))), strOut);
+    EXPECT_EQ(Text(Load.Commit()), strOut);
+    EXPECT_EQ(Rows("SELECT * FROM task"), "");
+}
+
+// The rowid is another number there.
+TEST_F(SaveTest, RowidThatIsNotTheKeyMayBeGreater) {
+    Options How;
+    How.strSqlCreate = "CREATE TABLE t (id INT, name TEXT)";
+    Open(R"({"t": {"key": "id", "member": {"id": {"cpptype": "int"},
+        "name": {"cpptype": "string"}}}})",
+         How);
+    Run("INSERT INTO t (rowid) VALUES (3000000000)");
+    EXPECT_EQ(Create(R"({"name": "a"})"), R"({"name":"a"})");
+}
+
 TEST_F(SaveTest, UpsertLeavesTheKeyAlone) {
     Open();
     Run("INSERT INTO task (id, name) VALUES (1, 'a');"
