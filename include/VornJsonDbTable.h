@@ -39,7 +39,13 @@
 // a trigger say, cannot use the same Table, nor a Loader on it: each call returns kMisuse and does
 // nothing, and so do the Set calls of the Loader that is just writing. Nor may they destroy it.
 // Another Table on the connection is free, as far as SQLite is.
-// Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is logged.
+// Locale: with setlocale to a decimal comma some versions of SQLite, 3.40 among them, read
+// fractions inside of JSON wrongly. There paths and "$contains" are refused, and so is Open of a
+// table with an index on a path, of which a write would spoil the index: call setlocale(LC_NUMERIC,
+// "C"), and before Open. With std::locale::global to one, JsonCpp (1.9.5, 1.9.6) reads fractions in
+// stored JSON as texts, null or other numbers, and refuses them in Loader::SetJson: keep numbers
+// classic. Exceptions: std::bad_alloc, and what a callback of the caller's throws. Nothing is
+// logged.
 //
 // 2  Words
 //
@@ -183,6 +189,7 @@ class [[nodiscard]] Status {
 // Each condition is true or false, never unknown: "$ne", "$nin" and "$not" are true for NULL.
 // An empty "$in" selects nothing and an empty "$or" is refused: no condition is ever dropped.
 // A path leads into a JSON member: "address.city", "tags[0]". What is absent there counts as null.
+// A blob of another program's whose bytes are JSON is looked into by paths and "$contains", too.
 // Within JSON some versions of SQLite, 3.40 among them, end a text at a NUL byte: paths and
 // "$contains" then see what stands before it, and operands of theirs with a NUL byte are refused.
 // A member of a JSON type is compared whole with {member: value}.

@@ -55,6 +55,8 @@
     X(kNoJsonMember, "no-json-member", kError, "name the member alone")                           \
     X(kBadPath, "bad-path", kError, "write a path as in \"address.city\" and \"tags[0]\"")        \
     X(kNumberInPath, "number-in-path", kError, "write an index in brackets: \"tags[0]\"")         \
+    X(kDecimalPoint, "decimal-point", kError,                                                     \
+      "call setlocale(LC_NUMERIC, \"C\") behind any other setlocale")                             \
     X(kNulInJson, "nul-in-json", kError, "compare up to the NUL byte, or encode binary data")     \
     X(kBadPattern, "bad-pattern", kError, "escape text by EscapeLike")                            \
     X(kTooManyValues, "too-many-values", kError, "ask several times, with a part of the list")    \

@@ -70,6 +70,7 @@ bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
         return Why.Tell(FindingCode::kUnknownOperator, "there is no operator of this number");
     }
     const Operator& Row = RowOf(Leaf.eOp);
+    m_Out.blReadsJson = m_Out.blReadsJson || m_blPath || Leaf.eOp == Op::kContains;
     if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
         return Why.Tell(
             FindingCode::kWrongOperator,

@@ -21,6 +21,7 @@ struct BoundSql {
     std::vector<BoundValue> vecValues;         // in the order of the question marks
     std::forward_list<std::string> listTexts;  // that values point to
     WriteLiteral pfnLiteral = nullptr;         // nullptr: values are bound
+    bool blReadsJson = false;                  // a path or "$contains" is in it
 
     void Add(const BoundValue& Value);
 };

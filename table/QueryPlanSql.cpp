@@ -5,6 +5,7 @@
 #include "../src/base/SqlText.h"
 #include "Concat.h"
 #include "ConditionSql.h"
+#include "DecimalPoint.h"
 #include "QueryPlan.h"
 
 namespace vornjsondb {
@@ -50,6 +51,9 @@ void QueryPlan::Write(const Query& Which, QueryUse eUse, FindingList& vecFinding
     ResolveMembers(Which, vecFindings);
     if (eUse != QueryUse::kChange) {
         ResolveSort(Which, IsPaged(Which), vecFindings);
+    }
+    if (m_Sql.blReadsJson) {
+        CheckFractions("/where", vecFindings);
     }
     // Names are looked at for all; what they say is for those who read.
     if (eUse != QueryUse::kRead) {
@@ -107,6 +111,7 @@ void QueryPlan::ResolveSort(const Query& Which, bool blPaged, FindingList& vecFi
                    Why.strMessage);
             continue;
         }
+        m_Sql.blReadsJson = m_Sql.blReadsJson || !Where.strPath.empty();
         // mutate(exchanged): in any order.
         AppendSort(Where.nMember, Where.strPath, blDescending);
         // mutate(doubled): it is only asked whether it is there.

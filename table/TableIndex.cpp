@@ -5,6 +5,7 @@
 
 #include "Attempt.h"
 #include "Concat.h"
+#include "DecimalPoint.h"
 #include "FindingCodes.h"
 #include "IndexSql.h"
 #include "TableParts.h"
@@ -42,6 +43,8 @@ std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
             vornjsondb::Report(
                 vecFindings, FindingCode::kNamedTwice, vornjsondb::Below("", std::to_string(i)),
                 vornjsondb::Concat({vornjsondb::ShownText(Term.strName), " is named twice"}));
+        } else if (!Term.Where.strPath.empty()) {
+            vornjsondb::CheckFractions(vornjsondb::Below("", std::to_string(i)), vecFindings);
         }
         vecTerms.push_back(std::move(Term));
     }

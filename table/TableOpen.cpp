@@ -7,6 +7,7 @@
 #include "Attempt.h"
 #include "Concat.h"
 #include "CreateStatement.h"
+#include "DecimalPoint.h"
 #include "FindingCodes.h"
 #include "RealTable.h"
 #include "TableParts.h"
@@ -65,6 +66,22 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
     return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
+// Whatever is written into an index on a place in JSON is wrong for every other program.
+Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
+    vornjsondb::RealIndexes There;
+    const int nResult = vornjsondb::ReadRealIndexes(Of.pDb, Of.Of.Table(), There);
+    if (nResult != SQLITE_OK) {
+        return FailBySqlite(Of.pDb, nResult, What);
+    }
+    FindingList vecFindings;
+    for (const vornjsondb::RealIndex& Index : There.vecAll) {
+        if (Index.strSql.find("json_") != std::string::npos) {
+            vornjsondb::CheckFractions("", vecFindings);
+        }
+    }
+    return vornjsondb::FromFindings(std::move(vecFindings), What);
+}
+
 bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
                    const vornjsondb::Member& Of) {
     return IsRowid(Real, Column) && Of.Kind() == vornjsondb::BoundKind::kInteger &&
@@ -110,7 +127,10 @@ Status Table::Parts::Meet() {
         return vornjsondb::Fail(StatusCode::kNotFound, What, "there is no such table");
     }
     Learn(Real);
-    return {};
+    if (vornjsondb::MisreadsFractions()) {
+        Outcome = CheckIndexes(*this, What);
+    }
+    return Outcome;
 }
 
 void Table::Parts::Learn(const RealTable& Real) {

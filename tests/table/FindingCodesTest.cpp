@@ -7,6 +7,7 @@
 
 #include "../../table/FindingCodes.h"
 #include "../../table/LintCodes.h"
+#include "FakeLocale.h"
 #include "QueryFixture.h"
 
 namespace VORN_JSON_DB {
@@ -209,6 +210,11 @@ class FindingCodesTest : public TableTest {
         Options How;
         How.blCreateTable = true;
         EXPECT_EQ(Text(NoKey.Open(m_pDb, "n", Parse(strNoKey), How)), "ok");
+        FindingList vecInComma;
+        {
+            const FakeLocale Comma;
+            vecInComma = m_Table.List(Query().Sort("j.x"), jOut).Findings();
+        }
         Loader Into;
         EXPECT_EQ(Text(Into.Start(m_Table)), "ok");
         Into.Reject("line 11 ends in a quote");
@@ -218,6 +224,7 @@ class FindingCodesTest : public TableTest {
                 m_Table.List(Query().Where("id", Op::kIn, jMany), jOut).Findings(),
                 m_Table.List(Query().Where(Condition::Any(vecParts)), jOut).Findings(),
                 m_Table.List(Query().Where(Deep), jOut).Findings(),
+                vecInComma,
                 NoKey.Save(Parse(R"({"a": 1})"), OnDuplicate::kUpsert).Findings(),
                 Into.EndRecord().Findings()};
     }

@@ -302,6 +302,11 @@ TEST_F(SaveTest, RowidThatIsNotTheKeyMayBeGreater) {
          How);
     Run("INSERT INTO t (rowid) VALUES (3000000000)");
     EXPECT_EQ(Create(R"({"name": "a"})"), R"({"name":"a"})");
+    How.strSqlCreate = "CREATE TABLE d (id INTEGER PRIMARY KEY)";
+    How.blCompatible = false;
+    Open(R"({"d": {"member": {"id": {"cpptype": "double"}}}})", How);
+    Run("INSERT INTO d VALUES (3000000000)");
+    EXPECT_EQ(Create(R"({"id": null})"), R"({"id":3000000001.0})");
 }
 
 TEST_F(SaveTest, UpsertLeavesTheKeyAlone) {
