@@ -78,6 +78,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
                 Member{strName, strQuoted, Concat({m_strQuotedTable, ".", strQuoted}), &Type,
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
                        IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false});
+            m_vecByColumn.insert(PlaceOfColumn(strName), m_vecNames.size());
             m_vecNames.push_back(strName);
         }
     }
@@ -134,12 +135,20 @@ bool IsSameColumn(const std::string& strLeft, const std::string& strRight) {
     return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
 }
 
+// Its place in m_vecByColumn, or where it would stand.
+std::vector<size_t>::const_iterator Members::PlaceOfColumn(const std::string& strColumn) const {
+    return std::lower_bound(m_vecByColumn.begin(), m_vecByColumn.end(), strColumn,
+                            [this](size_t nMember, const std::string& strWanted) {
+                                return sqlite3_stricmp(m_vecNames[nMember].c_str(),
+                                                       strWanted.c_str()) < 0;
+                            });
+}
+
 size_t Members::FindColumn(const std::string& strColumn) const {
-    size_t nMember = 0;
-    while (nMember < m_vecNames.size() && !IsSameColumn(m_vecNames[nMember], strColumn)) {
-        ++nMember;
-    }
-    return nMember < m_vecNames.size() ? nMember : kNone;
+    const auto itPlace = PlaceOfColumn(strColumn);
+    const bool blFound =
+        itPlace != m_vecByColumn.end() && IsSameColumn(m_vecNames[*itPlace], strColumn);
+    return blFound ? *itPlace : kNone;
 }
 
 bool Members::HasRowidKey() const {

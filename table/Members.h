@@ -70,6 +70,7 @@ class Members {
     const std::string& QuotedTable() const { return m_strQuotedTable; }
 
   private:
+    std::vector<size_t>::const_iterator PlaceOfColumn(const std::string& strColumn) const;
     void AddAll(const Json::Value& jMembers, FindingList& vecFindings);
     void TakeKey(const Json::Value& jKey, FindingList& vecFindings);
 
@@ -78,6 +79,7 @@ class Members {
     Json::Value m_jDefinition;  // this table's entry alone; defaults point into it
     std::vector<Member> m_vecAll;
     std::vector<std::string> m_vecNames;
+    std::vector<size_t> m_vecByColumn;  // places, in the order of columns
     std::vector<size_t> m_vecKey;
 };
 
