@@ -40,6 +40,8 @@ TEST_F(DecimalPointTest, WhatWouldNotBeFoundIsRefused) {
     EXPECT_EQ(CountOf(Query().Where(Condition::Not({"map.a", Op::kLess, 1.5}))), strRefused);
     EXPECT_EQ(CountOf(Query().Where("tags", Op::kContains, 1.5)), strRefused);
     EXPECT_EQ(CountOf(Query().Sort("-map.a")), strRefused);
+    EXPECT_EQ(CountOf(Query().Where("map.a", 1.5).Where("tags", Op::kContains, 1.5).Sort("map.a")),
+              strRefused);
     EXPECT_EQ(Text(m_Table.Update(Query().Where("map.a", 1.5), Parse(R"({"size": 1})"), &nRows)),
               Refused("update records of", "/where"));
     EXPECT_EQ(Text(m_Table.ToOldQuery(Query().Where("map.a", 1.5), OldCall::kRead, jOld)),
