@@ -28,6 +28,7 @@ bool ReadsFractions() {
 }  // namespace
 
 bool MisreadsFractions() {
+    // NOLINTNEXTLINE(concurrency-mt-unsafe): only setlocale at the same time harms it, as all else
     return *nl_langinfo(RADIXCHAR) != '.' && !ReadsFractions();
 }
 
