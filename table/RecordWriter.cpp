@@ -167,8 +167,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         nResult = Run(Verb::kUpdate, nChanged);
     }
     if (nResult == SQLITE_OK) {
-        const bool blHandedOut = eWritten == Written::kInserted && m_Into.HandsOut(m_Values);
-        return blHandedOut ? CheckRowid(What) : Status();
+        return m_Into.HandsOut(m_Values) ? CheckRowid(What) : Status();
     }
     const Status Failed = FailBySqlite(m_Into.pDb, nResult, What);
     return Failed.Code() == StatusCode::kDuplicate ? WithValues(Failed) : Failed;
