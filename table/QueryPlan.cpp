@@ -36,8 +36,8 @@ bool QueryPlan::ResolvePlain(const Query& Which) {
     Operand What;
     // mutate(== to !=): the longer way gives the same.
     const bool blPlain =
-        Leaf.eKind == VORN_JSON_DB::Condition::Node::Kind::kLeaf &&
-        IsOperator(Leaf.eOp) && RowOf(Leaf.eOp).eForm == OperandForm::kValue &&
+        Leaf.eKind == VORN_JSON_DB::Condition::Node::Kind::kLeaf && IsOperator(Leaf.eOp) &&
+        RowOf(Leaf.eOp).eForm == OperandForm::kValue &&
         FindPlace(m_Of, Leaf.strMember, Where, Why) && Where.strPath.empty() &&
         m_Of.At(Where.nMember).Kind() != BoundKind::kAny &&
         OperandReader(m_Of, m_Codec, m_Sql.listTexts).Read(Where, Leaf.jOperand, What, Why);
