@@ -197,6 +197,7 @@ const std::vector<Command> kCommands = {
     {"completion",
      "Write the completion script of a shell",
      "bash|zsh|fish|man",
+     "mkdir -p ~/.local/share/bash-completion/completions ~/.config/fish/completions\n"
      "vornjsondb completion bash > ~/.local/share/bash-completion/completions/vornjsondb\n"
      "vornjsondb completion fish > ~/.config/fish/completions/vornjsondb.fish\n",
      "man writes the manual page.\n",

@@ -1,6 +1,11 @@
 // completion: what shells offer for a word that is being typed. Their scripts ask the command
 // itself, so that they never run what a table is called as if it were theirs.
 
+#include <algorithm>
+#include <cctype>
+#include <cstdlib>
+#include <cstring>
+
 #include "Commands.h"
 #include "Database.h"
 #include "Parse.h"
@@ -9,17 +14,13 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-// Words are handed over as they are, and each candidate is a line: the word, a tab, and its help.
-// Where there is none the shell offers files.
+// Each candidate is a line: the word, a tab, and its help. Where there is none the shell offers
+// files. Bash neither takes quotes off the words that it hands over nor quotes what it is offered.
 constexpr char kBash[] =
     R"sh(_vornjsondb() {
-    local word=${COMP_WORDS[COMP_CWORD]}
-    mapfile -t COMPREPLY < <(vornjsondb --complete "${COMP_WORDS[@]:1:COMP_CWORD}" 2>/dev/null | cut -f 1)
-    if ((${#COMPREPLY[@]} == 0)); then
-        mapfile -t COMPREPLY < <(compgen -f -- "$word")
-    fi
+    mapfile -t COMPREPLY < <(vornjsondb --complete-bash "${COMP_WORDS[@]:1:COMP_CWORD}" 2>/dev/null)
 }
-complete -o filenames -F _vornjsondb vornjsondb
+complete -o default -F _vornjsondb vornjsondb
 )sh";
 
 // What is read from the function path is the function's body at first, so that it calls what it
@@ -63,23 +64,82 @@ struct PageRow {
 
 constexpr PageRow kPages[] = {{"bash", kBash}, {"zsh", kZsh}, {"fish", kFish}, {"man", nullptr}};
 
+// What a word means that was typed into bash, and the quote that is open at its end, or 0.
+std::string Unquoted(const std::string& strTyped, char& cQuote) {
+    std::string strWord;
+    cQuote = '\0';
+    for (std::size_t nAt = 0; nAt < strTyped.size(); ++nAt) {
+        const char c = strTyped[nAt];
+        const char cNext = nAt + 1 < strTyped.size() ? strTyped[nAt + 1] : '\0';
+        const bool blEscape =
+            c == '\\' && (cQuote == '\0' || (cQuote == '"' && std::strchr("$`\"\\", cNext)));
+        if (blEscape && cNext != '\0') {
+            strWord += strTyped[++nAt];
+        } else if (c == cQuote) {
+            cQuote = '\0';
+        } else if (cQuote == '\0' && (c == '"' || c == '\'')) {
+            cQuote = c;
+        } else {
+            strWord += c;
+        }
+    }
+    return strWord;
+}
+
+// The word as bash has to read it, behind the quote that is open.
+std::string QuotedForBash(const std::string& strWord, char cQuote) {
+    std::string strQuoted;
+    for (const char c : strWord) {
+        const bool blPlain = static_cast<unsigned char>(c) >= 0x80 ||
+                             std::isalnum(static_cast<unsigned char>(c)) != 0 ||
+                             std::strchr("_-./,@%+", c) != nullptr;
+        if (cQuote == '\'') {
+            strQuoted += c == '\'' ? R"('\'')" : std::string(1, c);
+        } else {
+            const bool blEscape = cQuote == '"' ? std::strchr("$`\"\\", c) != nullptr : !blPlain;
+            strQuoted += blEscape ? "\\" : "";
+            strQuoted += c;
+        }
+    }
+    return strQuoted;
+}
+
+bool HasControls(const std::string& strWord) {
+    return std::any_of(strWord.begin(), strWord.end(), [](unsigned char c) { return c < ' '; });
+}
+
 class Offers {
   public:
     explicit Offers(std::string strTyped) : m_strTyped(std::move(strTyped)) {}
+    Offers(std::string strTyped, char cQuote)
+        : m_strTyped(std::move(strTyped)), m_blBash(true), m_cQuote(cQuote) {}
 
+    const std::string& Typed() const { return m_strTyped; }
+
+    // A word with a newline or a tab cannot stand in a line of its own.
     void Add(const std::string& strWord, const char* szHelp = "") const {
-        if (strWord.compare(0, m_strTyped.size(), m_strTyped) == 0) {
-            Put(strWord + "\t" + szHelp + "\n");
+        if (strWord.compare(0, m_strTyped.size(), m_strTyped) != 0 || HasControls(strWord)) {
+            return;
         }
+        Put(m_blBash ? QuotedForBash(strWord, m_cQuote) + "\n" : strWord + "\t" + szHelp + "\n");
     }
 
   private:
     const std::string m_strTyped;
+    const bool m_blBash = false;
+    const char m_cQuote = '\0';
 };
+
+// The shell would do it before the command is called.
+std::string WithHome(const std::string& strFile) {
+    const char* const szHome = std::getenv("HOME");
+    return strFile.compare(0, 2, "~/") == 0 && szHome != nullptr ? szHome + strFile.substr(1)
+                                                                 : strFile;
+}
 
 void OfferTables(const std::string& strDb, const Offers& To) {
     Context Call;
-    Call.vecWords = {strDb};
+    Call.vecWords = {WithHome(strDb)};
     Call.mapOptions["--wait"] = {"0"};
     try {
         for (const std::string& strName : TableNames(OpenDatabase(Call, Access::kRead).get())) {
@@ -90,11 +150,7 @@ void OfferTables(const std::string& strDb, const Offers& To) {
     }
 }
 
-}  // namespace
-
-void PutCandidates(const std::vector<std::string>& vecWords) {
-    const std::string strTyped = vecWords.empty() ? "" : vecWords.back();
-    const Offers To(strTyped);
+void Offer(const std::vector<std::string>& vecWords, const Offers& To) {
     if (vecWords.size() < 2) {
         for (const Command& Row : AllCommands()) {
             To.Add(Row.szName, Row.szHelp);
@@ -113,7 +169,7 @@ void PutCandidates(const std::vector<std::string>& vecWords) {
         for (const std::string& strChoice : Choices(pBefore->szValue)) {
             To.Add(strChoice);
         }
-    } else if (strTyped.compare(0, 1, "-") == 0) {
+    } else if (To.Typed().compare(0, 1, "-") == 0) {
         for (const Option& Row : vecOptions) {
             To.Add(Row.szName, Row.szHelp);
         }
@@ -124,6 +180,17 @@ void PutCandidates(const std::vector<std::string>& vecWords) {
     } else if (vecWords.size() == 3 && std::string(pOf->szWords).find("TABLE") <= 4) {
         OfferTables(vecWords[1], To);
     }
+}
+
+}  // namespace
+
+void PutCandidates(std::vector<std::string> vecWords, bool blBash) {
+    char cQuote = '\0';
+    for (std::string& strWord : vecWords) {
+        strWord = blBash ? Unquoted(strWord, cQuote) : strWord;
+    }
+    const std::string strTyped = vecWords.empty() ? "" : vecWords.back();
+    Offer(vecWords, blBash ? Offers(strTyped, cQuote) : Offers(strTyped));
 }
 
 int RunCompletion(Context& Call) {

@@ -219,8 +219,9 @@ std::vector<std::string> Choices(const char* szValue) {
 }
 
 bool Parse(int nArguments, char** pszArguments, Context& Call) {
-    if (nArguments > 1 && std::strcmp(pszArguments[1], "--complete") == 0) {
-        PutCandidates({pszArguments + 2, pszArguments + nArguments});
+    const std::string strFirst = nArguments > 1 ? pszArguments[1] : "";
+    if (strFirst == "--complete" || strFirst == "--complete-bash") {
+        PutCandidates({pszArguments + 2, pszArguments + nArguments}, strFirst == "--complete-bash");
         return false;
     }
     std::vector<std::string> vecWords;

@@ -13,8 +13,9 @@ namespace VORN_JSON_DB::Cli {
 // False: help or version was asked for and is written. A wrong command line is an Error.
 bool Parse(int nArguments, char** pszArguments, Context& Call);
 
-// Writes what the last word may become, which is being typed.
-void PutCandidates(const std::vector<std::string>& vecWords);
+// Writes what the last word may become, which is being typed. In bash words come with the quotes
+// that were typed, and go so that they can stand in the line.
+void PutCandidates(std::vector<std::string> vecWords, bool blBash);
 
 const Command* FindCommand(const std::string& strName);  // null: there is none
 const Option* FindOption(const std::vector<Option>& vecOptions, const std::string& strName);

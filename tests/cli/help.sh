@@ -21,12 +21,49 @@ same 'bash: subcommands' "$(in_bash vornjsondb in)" 'insert init index'
 same 'bash: tables' "$(in_bash vornjsondb list shop.db pr)" 'price product'
 same 'bash: options' "$(in_bash vornjsondb list shop.db price --no)" '--no-headers'
 same 'bash: choices' "$(in_bash vornjsondb list shop.db price --format js)" 'json jsonl'
-same 'bash: files' "$(in_bash vornjsondb list sh)" 'shop.db'
 same 'bash: shells' "$(in_bash vornjsondb completion f)" 'fish'
 
-# What a table is called is never run.
-sqlite3 evil.db 'CREATE TABLE "$(touch ran) a:b" (a); CREATE TABLE plain (a)'
-same 'bash: an odd name' "$(in_bash vornjsondb list evil.db '$')" '$(touch ran) a:b'
+# What a table is called is never run: in a real bash, with a key on it that completes, and one that
+# shows the line.
+sqlite3 evil.db 'CREATE TABLE "$(touch ran) a:b" (a); CREATE TABLE "`touch ran`" (a); CREATE TABLE "it'"'"'s" (a);
+    CREATE TABLE "a ""b" (a); CREATE TABLE "plain" (a);' "CREATE TABLE \"x
+\$(touch ran)\" (a)"
+cp evil.db "a b.db"
+cat >bash.py <<'END'
+import os, pty, sys
+pid, terminal = pty.fork()
+if pid == 0:
+    os.environ['PS1'] = ''
+    os.environ['HISTFILE'] = ''
+    os.environ['HOME'] = os.getcwd()
+    os.execvp('bash', ['bash', '--norc', '-i'])
+def send(text):
+    os.write(terminal, text.encode())
+def until(mark):
+    seen = b''
+    while not seen.endswith(mark):
+        seen += os.read(terminal, 1)
+    return seen
+send("""bind 'set enable-bracketed-paste off'; bind 'set bell-style none'; source script.bash; shown() { printf '\\n<%s>%s\\n' "$READLINE_LINE" done; READLINE_LINE=; READLINE_POINT=0; }; bind -x '"\\C-x": shown'; printf 'rea%s\\n' dy\n""")
+until(b'ready\r\n')
+send(sys.argv[1] + '\t\x18')
+print(until(b'>done\r\n').decode().rsplit('\n<', 1)[1][:-7])
+END
+typed() {
+    python3 bash.py "$1"
+}
+same 'bash: a name in $( )' "$(typed 'vornjsondb list evil.db \$')" 'vornjsondb list evil.db \$\(touch\ ran\)\ a\:b '
+same 'bash: a name in backquotes' "$(typed 'vornjsondb list evil.db \`')" 'vornjsondb list evil.db \`touch\ ran\` '
+same 'bash: all names' "$(in_bash vornjsondb list evil.db '' | tr -d '\n')" '\$\(touch\ ran\)\ a\:b \`touch\ ran\` a\ \"b it\'"'"'s plain'
+same 'bash: within double quotes' "$(typed 'vornjsondb list evil.db "a ')" 'vornjsondb list evil.db "a \"b" '
+same 'bash: within single quotes' "$(typed "vornjsondb list evil.db 'it")" "vornjsondb list evil.db 'it'\\''s' "
+same 'bash: a database in quotes' "$(typed 'vornjsondb list "a b.db" pl')" 'vornjsondb list "a b.db" plain '
+same 'bash: a database with a blank' "$(typed 'vornjsondb list a\ b.db pl')" 'vornjsondb list a\ b.db plain '
+same 'bash: a database at home' "$(typed 'vornjsondb list ~/evil.db pl')" 'vornjsondb list ~/evil.db plain '
+same 'bash: a database as file' "$(typed 'vornjsondb list sh')" 'vornjsondb list shop.db '
+same 'bash: a dump as file' "$(typed 'vornjsondb load shop.db script.b')" 'vornjsondb load shop.db script.bash '
+mkdir plain
+same 'bash: a table called like a folder' "$(typed 'vornjsondb list evil.db pl')" 'vornjsondb list evil.db plain '
 same 'it was not run' "$(ls ran 2>/dev/null)" ''
 
 in_fish() {
@@ -40,6 +77,7 @@ same 'fish: options' "$(in_fish 'vornjsondb list shop.db price --no')" \
 same 'fish: choices' "$(in_fish 'vornjsondb list shop.db price --format ts')" tsv
 same 'fish: files' "$(in_fish 'vornjsondb list sh')" shop.db
 same 'fish: an odd name' "$(in_fish 'vornjsondb list evil.db "$"')" '$(touch ran) a:b'
+same 'fish: a database at home' "$(HOME=$PWD in_fish 'vornjsondb list ~/evil.db pl')" plain
 
 # zsh completes on a terminal only: one is made, with a key on it that completes and shows the line.
 # The function is loaded from the path, as it is from its installed place.
@@ -66,6 +104,8 @@ same 'zsh: options' "$(in_zsh 'vornjsondb list shop.db price --no')" 'vornjsondb
 same 'zsh: choices' "$(in_zsh 'vornjsondb list shop.db price --format ts')" 'vornjsondb list shop.db price --format tsv '
 same 'zsh: files' "$(in_zsh 'vornjsondb list sho')" 'vornjsondb list shop.db '
 same 'zsh: an odd name' "$(in_zsh 'vornjsondb list evil.db \$')" 'vornjsondb list evil.db \$\(touch\ ran\)\ a:b '
+same 'zsh: a name in backquotes' "$(in_zsh 'vornjsondb list evil.db \`')" 'vornjsondb list evil.db \`touch\ ran\` '
+same 'zsh: a database at home' "$(HOME=$PWD in_zsh 'vornjsondb list ~/evil.db pl')" 'vornjsondb list ~/evil.db plain '
 same 'it was not run' "$(ls ran 2>/dev/null)" ''
 same 'zsh: shells' "$(in_zsh 'vornjsondb completion z')" 'vornjsondb completion zsh '
 
