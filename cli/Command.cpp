@@ -9,6 +9,7 @@
 
 #include "../table/Nearest.h"
 #include "JsonCells.h"
+#include "input/LockWait.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -94,6 +95,10 @@ void Fail(int nExit, const std::string& strLine) {
     throw Error{nExit, OneLine(strLine), {}};
 }
 
+void FailInterrupted() {
+    Fail(kExitInterrupted, "interrupted");
+}
+
 int ExitOf(StatusCode eCode, int nRefused) {
     if (eCode == StatusCode::kRefused) {
         return nRefused;
@@ -130,7 +135,8 @@ std::string LineOf(const Status& Outcome) {
             return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
-    return Outcome.Message() + HintFor(Outcome.Code());
+    const bool blLocked = Outcome.Code() == StatusCode::kLocked;
+    return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) + HintFor(Outcome.Code());
 }
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {

@@ -41,6 +41,7 @@ struct Error {
 };
 
 [[noreturn]] void Fail(int nExit, const std::string& strLine);
+[[noreturn]] void FailInterrupted();  // by Ctrl-C
 
 // Throws what a failed Status stands for: "WHERE: message; remedy". What kRefused is depends on who
 // wrote the arguments: a person at the shell (usage) or the data (kExitBadData).

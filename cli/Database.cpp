@@ -12,6 +12,7 @@
 #include "../table/Failure.h"
 #include "JsonCells.h"
 #include "input/ByteSource.h"
+#include "input/LockWait.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -33,7 +34,7 @@ std::string FileOf(sqlite3* pDb) {
     const StatusCode eCode =
         vornjsondb::FailBySqlite(pDb, sqlite3_extended_errcode(pDb), {"", nullptr}).Code();
     if (eCode == StatusCode::kLocked) {
-        strLine += " (waited " + Texts(pDb, "PRAGMA busy_timeout").at(0) + " ms)";
+        strLine = WithWait(std::move(strLine));
     }
     Fail(ExitOf(eCode, kExitUnexpected), strLine + HintFor(eCode));
 }
@@ -133,7 +134,7 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
         Fail(kExitIo, strFile + ": " + sqlite3_errstr(nResult) + "; is it a file?");
     }
     sqlite3_extended_result_codes(pDb, 1);
-    sqlite3_busy_timeout(pDb, Call.WaitMs());
+    WaitForLocks(pDb, Call.WaitMs());
     // SQLite looks into the file no sooner than now.
     int nLooked = Look(pDb);
     if (nLooked == SQLITE_READONLY_ROLLBACK) {
@@ -166,7 +167,7 @@ void CheckEncoding(const Context& Call, sqlite3* pDb) {
 }
 
 void BeginChange(const Context& Call, sqlite3* pDb, Transaction& All) {
-    const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, Call.WaitMs());
+    const Status Begun = All.Begin(pDb, Transaction::Mode::kImmediate, kWaitedBySqlite);
     CheckInPlace(Call, pDb);
     Check(Begun, Call.Db());
 }
@@ -437,10 +438,10 @@ std::string GoneText(std::int64_t nGone) {
                             " gone, by the table's own ON CONFLICT REPLACE";
 }
 
-Options OptionsOf(const Context& Call) {
+Options HowToOpen() {
     Options How;
     How.blCompatible = false;
-    How.nWaitMs = Call.WaitMs();
+    How.nWaitMs = kWaitedBySqlite;
     return How;
 }
 
@@ -449,7 +450,7 @@ OpenTable::OpenTable(const Context& Call, Access eAccess, Definition pfnDefiniti
     CheckEncoding(Call, pDb.get());
     const std::string strTable = NameForSqlite(Call.TableName(), eAccess);
     const Json::Value jDefinition = pfnDefinition(Call, pDb.get(), strTable);
-    const Status Opened = Records.Open(pDb.get(), strTable, jDefinition, OptionsOf(Call));
+    const Status Opened = Records.Open(pDb.get(), strTable, jDefinition, HowToOpen());
     if (Opened.Code() == StatusCode::kNotFound) {
         FailNoTable(Call, pDb.get());
     }

@@ -100,7 +100,7 @@ class Replacements {
 // "; 1 other record is gone, ..."; nothing for none.
 std::string GoneText(std::int64_t nGone);
 
-Options OptionsOf(const Context& Call);
+Options HowToOpen();
 
 // A database with one table open, which is what most subcommands work on.
 struct OpenTable {

@@ -3,13 +3,16 @@
 
 #include <cmath>
 #include <cstdio>
-#include <fstream>
-#include <iostream>
+#include <cstring>
 #include <limits>
 
 #include "Commands.h"
 #include "Database.h"
 #include "JsonCells.h"
+#include "input/ByteSource.h"
+#include "input/Interrupt.h"
+#include "input/LineBuffer.h"
+#include "input/LockWait.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -145,24 +148,28 @@ Described Describe(const Context& Call, sqlite3* pDb) {
 // Lines with their numbers, from a file or standard input.
 class LineReader {
   public:
-    explicit LineReader(std::string strFile) : m_strFile(std::move(strFile)) {
-        if (m_strFile != "-") {
-            m_File.open(m_strFile, std::ios::binary);
-            if (!m_File) {
-                Fail(kExitIo, m_strFile + ": cannot be opened; check the name");
-            }
+    explicit LineReader(const std::string& strFile)
+        : m_Lines(m_File, std::numeric_limits<std::size_t>::max()) {
+        if (!m_File.Open(strFile)) {
+            FailToRead("check name and permissions");
         }
     }
 
     bool Next() {
-        ++m_nLine;
-        return static_cast<bool>(std::getline(m_strFile == "-" ? std::cin : m_File, m_strLine));
+        const bool blThere = m_Lines.Next();
+        if (Interrupt::Came()) {
+            FailInterrupted();
+        }
+        if (m_File.Error() != 0) {
+            FailToRead("check the disk");
+        }
+        m_strLine.assign(blThere ? m_Lines.Begin() : "", blThere ? m_Lines.Size() : 0);
+        m_nLine += 1;
+        return blThere;
     }
 
     const std::string& Line() const { return m_strLine; }
-    std::string Place() const {
-        return (m_strFile == "-" ? "standard input" : m_strFile) + ":" + std::to_string(m_nLine);
-    }
+    std::string Place() const { return m_File.Name() + ":" + std::to_string(m_nLine); }
     Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
 
     [[noreturn]] void FailHere(const std::string& strWhat) const {
@@ -170,8 +177,12 @@ class LineReader {
     }
 
   private:
-    std::string m_strFile;
-    std::ifstream m_File;
+    [[noreturn]] void FailToRead(const char* szHint) const {
+        Fail(kExitIo, m_File.Name() + ": " + std::strerror(m_File.Error()) + "; " + szHint);
+    }
+
+    ByteSource m_File;
+    LineBuffer m_Lines;
     std::string m_strLine;
     std::int64_t m_nLine = 0;
 };
@@ -309,7 +320,7 @@ int RunDump(Context& Call) {
     const Database pDb = OpenDatabase(Call, Access::kRead);
     // Description and rows are of one moment.
     Transaction All;
-    Check(All.Begin(pDb.get(), Transaction::Mode::kDeferred, Call.WaitMs()), Call.Db());
+    Check(All.Begin(pDb.get(), Transaction::Mode::kDeferred, kWaitedBySqlite), Call.Db());
     const Described Found = Describe(Call, pDb.get());
     const Statement pRow = Prepare(pDb.get(), Found.strSelect);
     Checksum Sum;
@@ -332,7 +343,9 @@ int RunDump(Context& Call) {
     return kExitFine;
 }
 
-int RunLoad(Context& Call) {
+namespace {
+
+int Load(const Context& Call) {
     LineReader From(Call.vecWords.size() > 1 ? Call.vecWords[1] : "-");
     if (!From.Next()) {
         From.FailHere("it is empty");
@@ -365,6 +378,18 @@ int RunLoad(Context& Call) {
                     " into table \"" + strTable + "\"",
                 jResult);
     return kExitFine;
+}
+
+}  // namespace
+
+int RunLoad(Context& Call) {
+    const Interrupt Guard;
+    try {
+        return Load(Call);
+    } catch (Error& Failed) {
+        Failed.strLine += Failed.nExit == kExitInterrupted ? " (nothing is stored)" : "";
+        throw;
+    }
 }
 
 }  // namespace VORN_JSON_DB::Cli

@@ -88,7 +88,6 @@ class Import {
     void NoteNulls();
     void Keep();
     int Finish();
-    [[noreturn]] void StopForInterrupt();
     std::string WhatIsStored() const;
 
     Context& m_Call;
@@ -149,10 +148,6 @@ std::string Import::WhatIsStored() const {
                           : " (the first " + std::to_string(m_nStored) +
                                 " records are dealt with "
                                 "and stay)";
-}
-
-void Import::StopForInterrupt() {
-    Fail(kExitInterrupted, "interrupted");
 }
 
 // What only looks makes no file.
@@ -219,7 +214,7 @@ void Import::LearnTypes() {
         true);
     m_pProgress.reset();
     if (Interrupt::Came()) {
-        StopForInterrupt();
+        FailInterrupted();
     }
     m_blGuessed = !blDone;
     if (m_blGuessed && !Seen.AllHaveValues()) {
@@ -276,7 +271,7 @@ std::vector<std::string> Import::Statements() {
     }
     SyncReport Report;
     if (m_blAdded) {
-        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, OptionsOf(m_Call)), m_Call.Db(),
+        Check(m_Table.Open(m_pDb.get(), m_strTable, m_jDefinition, HowToOpen()), m_Call.Db(),
               kExitBadData);
         Check(m_Table.Sync(SyncMode::kLook, Report), m_Call.Db());
     }
@@ -311,7 +306,7 @@ int Import::ShowDryRun() {
 
 // The table, its definition and the first records come to be at once.
 void Import::Prepare() {
-    Options How = OptionsOf(m_Call);
+    Options How = HowToOpen();
     BeginChange(m_Call, m_pDb.get(), m_All);
     if (!m_blTableThere && TableExists(m_pDb.get(), m_strTable)) {
         Fail(kExitDuplicate, m_Call.Db() + ": another program has just made the table \"" +
@@ -390,7 +385,7 @@ void Import::Load() {
     };
     BothSinks Both(m_AllSeen, *m_pSink);
     if (!m_Files.Read(m_blGuessed ? static_cast<Sink&>(Both) : *m_pSink, fnBegin, false)) {
-        StopForInterrupt();
+        FailInterrupted();
     }
     if (m_blGuessed) {
         CheckGuess();

@@ -46,7 +46,7 @@ same 'after a crash' "$(sqlite3 killed.db 'SELECT count(*), min(text) = max(text
 # Other files.
 expect 7 '' 'error: none: No such file or directory; check name and permissions' -- insert all.db t none
 expect 7 '' 'error: folder: Is a directory; check name and permissions' -- insert all.db t folder
-expect 7 '' 'error: none: cannot be opened; check the name' -- load all.db none
+expect 7 '' 'error: none: No such file or directory; check name and permissions' -- load all.db none
 expect 7 '' 'error: none: No such file or directory; check the name' -- list all.db t --def none
 : | TMPDIR=/none "$VORNJSONDB" insert new.db t - 2>err
 same 'exit without a temporary folder' $? 7
@@ -215,6 +215,20 @@ END
 same 'ended by the signal' \
     "$(python3 interrupt.py "$VORNJSONDB" insert all.db t feed --format jsonl)" -2
 
+# So it does where load waits for more, and what load has made goes again.
+"$VORNJSONDB" dump all.db t >t.dump
+"$VORNJSONDB" load loaded.db feed 2>err &
+pid=$!
+exec 3>feed
+head -n 3 t.dump >&3
+until [[ -e loaded.db ]]; do sleep 0.01; done
+kill -INT "$pid"
+wait "$pid"
+same 'exit of load after Ctrl-C' $? 130
+exec 3>&-
+same 'load after Ctrl-C' "$(cat err)" 'error: interrupted (nothing is stored)'
+same 'load leaves' "$(ls | grep loaded)" ''
+
 # A file that is new to one call may hold what another has stored since: the second waits for its input
 # until then. It neither removes the file nor stores into a table that has other types.
 mkfifo slow
@@ -315,6 +329,25 @@ expect 6 '' "error: all.db: cannot begin a transaction: $locked" -- \
 expect 6 '' "error: all.db: cannot create an index on table \"t\": $locked" -- index all.db t text --wait 10
 "$VORNJSONDB" doctor all.db >out
 same 'who holds it' "$(grep writes out | sed 's/[0-9]\+/N/')" 'lock          process N (sqlite3) writes'
+# Ctrl-C ends the waiting, and the whole time is what --wait says: another one that waits longer and began
+# later is not the first to give up.
+"$VORNJSONDB" insert all.db t lines --wait 600000 2>err &
+pid=$!
+until [[ $(cut -d ' ' -f 3 /proc/$pid/stat) == S && $(sed -n 's/^SigCgt:.*\(.\)$/\1/p' /proc/$pid/status) == [2367abef] ]]; do sleep 0.01; done
+kill -INT "$pid"
+wait "$pid"
+same 'exit after Ctrl-C while it waits' $? 130
+same 'Ctrl-C while it waits' "$(cat err)" 'error: interrupted (nothing is stored)'
+: >order
+{
+    "$VORNJSONDB" update all.db t 1 text=x --wait 2000 2>err
+    echo first >>order
+} &
+pid=$!
+sqlite3 -cmd '.timeout 3000' all.db 'BEGIN IMMEDIATE' 2>/dev/null
+echo second >>order
+wait "$pid"
+same 'who gave up' "$(cat order)" $'first\nsecond'
 : >go
 wait
 finish
