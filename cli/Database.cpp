@@ -115,6 +115,20 @@ void GoByColumns(const Json::Value& jColumns, Json::Value& jTable) {
 
 }  // namespace
 
+namespace {
+
+Json::Value ParseKept(const Context& Call, const std::string& strTable,
+                      const std::string& strText) {
+    try {
+        return ParseJson(strText, Call.Db() + ": the kept definition of \"" + strTable + "\"");
+    } catch (Error& Failed) {
+        Failed.strLine += "; give one by --def FILE, which vornjsondb sync keeps in its place";
+        throw;
+    }
+}
+
+}  // namespace
+
 void CloseDatabase::operator()(sqlite3* pDb) const {
     if (!strMade.empty()) {
         RemoveEmpty(pDb, strMade);
@@ -358,7 +372,8 @@ Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string
         }
         return jDefinition;
     }
-    if (!TableExists(pDb, kKeptTable)) {
+    // One that outlived its table says nothing about the next one of that name.
+    if (!TableExists(pDb, kKeptTable) || !TableExists(pDb, strTable)) {
         return {};
     }
     const Statement pLook = Prepare(pDb,
@@ -368,8 +383,7 @@ Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string
     if (!Step(pLook.get())) {
         return {};
     }
-    const Json::Value jKept = ParseJson(
-        ColumnText(pLook.get(), 1), Call.Db() + ": the kept definition of \"" + strTable + "\"");
+    const Json::Value jKept = ParseKept(Call, strTable, ColumnText(pLook.get(), 1));
     // To SQLite a table is the same in any letter case.
     const std::string strKept = ColumnText(pLook.get(), 0);
     Json::Value jDefinition;
@@ -388,6 +402,14 @@ Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::stri
         GoByColumns(jReal[strTable]["member"], jDefinition[strTable]);
     }
     return jDefinition;
+}
+
+std::vector<std::string> LeftOverDefinitions(sqlite3* pDb) {
+    if (!TableExists(pDb, kKeptTable)) {
+        return {};
+    }
+    return Texts(pDb, std::string("SELECT name FROM ") + kKeptTable + " k WHERE NOT EXISTS (" +
+                          kTablesAndViews + " AND name = k.name COLLATE NOCASE) ORDER BY name");
 }
 
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition) {

@@ -46,6 +46,8 @@ Json::Value KnownDefinition(const Context& Call, sqlite3* pDb, const std::string
 // The same, but what the database keeps goes by the columns: another program may have added,
 // renamed or dropped some since.
 Json::Value CurrentDefinition(const Context& Call, sqlite3* pDb, const std::string& strTable);
+// The tables that are gone, and whose definitions the database still keeps.
+std::vector<std::string> LeftOverDefinitions(sqlite3* pDb);
 // Keeps it in the database, in the table vornjsondb_definition. For a transaction of the caller's.
 void KeepDefinition(sqlite3* pDb, const std::string& strTable, const Json::Value& jDefinition);
 

@@ -103,6 +103,23 @@ FindingList FindingsOf(const Context& Call) {
     return vecFindings;
 }
 
+// Another program has dropped or renamed their tables.
+void AppendLeftOver(sqlite3* pDb, Json::Value& jFindings) {
+    for (const std::string& strTable : LeftOverDefinitions(pDb)) {
+        Json::Value jFinding;
+        jFinding["table"] = strTable;
+        jFinding["severity"] = "warning";
+        jFinding["code"] = "left-over";
+        jFinding["path"] = vornjsondb::Below("", strTable);
+        jFinding["message"] =
+            "a definition of table \"" + strTable + "\" is kept, but the table is gone";
+        jFinding["remedy"] =
+            "it is replaced when the table is made anew; a table that was renamed gets one by "
+            "vornjsondb sync --def";
+        jFindings.append(std::move(jFinding));
+    }
+}
+
 }  // namespace
 
 int RunTables(Context& Call) {
@@ -259,10 +276,12 @@ int ExitBy(const Json::Value& jFindings) {
 
 int RunLint(Context& Call) {
     std::vector<std::string> vecTables = Call.WordsFrom(1);
-    if (vecTables.empty()) {
-        vecTables = TableNames(OpenDatabase(Call, Access::kRead).get());
-    }
     Json::Value jFindings(Json::arrayValue);
+    if (vecTables.empty()) {
+        const Database pDb = OpenDatabase(Call, Access::kRead);
+        vecTables = TableNames(pDb.get());
+        AppendLeftOver(pDb.get(), jFindings);
+    }
     for (const std::string& strTable : vecTables) {
         Call.vecWords.resize(1);
         Call.vecWords.push_back(strTable);

@@ -122,4 +122,29 @@ same 'doctor waited' "$(cat err)" \
     'error: shop.db: database is locked (waited 10 ms); try again, or wait longer with --wait MS'
 : >go
 wait
+
+# A definition that outlived its table governs nothing, is told, and is replaced.
+echo '[{"id": 1, "code": "a"}]' >old.json
+echo '[{"n": "text"}]' >other.json
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (old.json: JSON)' -- insert gone.db prod old.json --key id
+sqlite3 gone.db 'DROP TABLE prod'
+left='a definition of table "prod" is kept, but the table is gone'
+remedy='it is replaced when the table is made anew; a table that was renamed gets one by vornjsondb sync --def'
+expect 0 "table,severity,code,path,message,remedy
+prod,warning,left-over,/prod,\"${left//\"/\"\"}\",$remedy" '' -- lint gone.db --format csv
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (other.json: JSON)' -- insert gone.db prod other.json
+expect 0 '[{"n":"text"}]' '' -- list gone.db prod
+expect 0 '' 'no findings' -- lint gone.db
+sqlite3 gone.db 'ALTER TABLE prod RENAME TO p2'
+expect 0 "table,severity,code,path,message,remedy
+prod,warning,left-over,/prod,\"${left//\"/\"\"}\",$remedy" '' -- lint gone.db --format csv
+
+# One that is no JSON is named, with the way out.
+expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (old.json: JSON)' -- insert bad.db t old.json --key id
+"$VORNJSONDB" schema bad.db t --json >t.def
+sqlite3 bad.db "UPDATE vornjsondb_definition SET definition = '{'"
+expect 3 '' 'error: bad.db: the kept definition of "t": Line 1, Column 2: Missing '"'}'"' or object member name; it must be JSON; give one by --def FILE, which vornjsondb sync keeps in its place' \
+    -- list bad.db t
+expect 0 '' 'nothing to do' -- sync bad.db t --def t.def
+expect 0 '[{"id":1,"code":"a"}]' '' -- list bad.db t
 finish
