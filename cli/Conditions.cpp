@@ -5,6 +5,7 @@
 
 #include "Database.h"
 #include "JsonCells.h"
+#include "input/Numbers.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -32,18 +33,11 @@ void CheckMember(const Table& Of, const std::string& strMember) {
     }
 }
 
-// A word such as 5, true, null or {"a":1}; all else is text that came without its quotes.
+// A word such as 5, true, null or {"a":1}; all else is text that came without its quotes, as do
+// dates, addresses and versions.
 bool LooksLikeJson(const std::string& strWord) {
-    if (strWord == "true" || strWord == "false" || strWord == "null") {
-        return true;
-    }
-    const std::size_t nDigit = strWord.compare(0, 1, "-") == 0 ? 1 : 0;
-    const bool blDigit =
-        strWord.size() > nDigit && strWord[nDigit] >= '0' && strWord[nDigit] <= '9';
-    const bool blNumber =
-        blDigit && strWord.find_first_not_of("0123456789+-.eE") == std::string::npos &&
-        (strWord[nDigit] != '0' || strWord.size() == nDigit + 1 || strWord[nDigit + 1] == '.');
-    return blNumber || strWord.find_first_of("{[\"") == 0;
+    return strWord == "true" || strWord == "false" || strWord == "null" || IsJsonNumber(strWord) ||
+           strWord.find_first_of("{[\"") == 0;
 }
 
 Json::Value TypedValue(const Table& Of, const std::string& strMember, const std::string& strText) {
@@ -69,7 +63,8 @@ constexpr SignRow kSigns[] = {{">=", "$gte"}, {"<=", "$lte"}, {"!=", "$ne"},
 void CheckSigns(const Table& Of, const std::string& strWord) {
     for (const SignRow& Row : kSigns) {
         const std::size_t nAt = strWord.find(Row.szSign);
-        if (nAt > strWord.find('=') || !IsMember(Of, BaseOf(Of, strWord.substr(0, nAt)))) {
+        if (nAt == std::string::npos || nAt > strWord.find('=') ||
+            !IsMember(Of, BaseOf(Of, strWord.substr(0, nAt)))) {
             continue;
         }
         const std::string strText = strWord.substr(nAt + std::strlen(Row.szSign));
@@ -108,7 +103,10 @@ Assignment ParseAssignment(const Table& Of, const std::string& strWord) {
         CheckSigns(Of, strWord);
     }
     if (nEquals == std::string::npos) {
-        Fail(kExitUsage, "\"" + strWord + "\" is not of the form member=value");
+        Fail(
+            kExitUsage,
+            "\"" + strWord + "\" is not of the form member=value" +
+                (IsMember(Of, strWord) ? "; write what the member is: " + strWord + "=VALUE" : ""));
     }
     const std::string strMember = strWord.substr(0, nEquals);
     const std::string strText = strWord.substr(nEquals + 1);
@@ -128,6 +126,9 @@ Json::Value ParseAssignments(const Table& Of, const std::vector<std::string>& ve
         Assignment Parsed = ParseAssignment(Of, strWord);
         if (!IsMember(Of, Parsed.strMember)) {
             Fail(kExitUsage, "\"" + Parsed.strMember + "\" is part of a member; set it whole");
+        }
+        if (jMembers.isMember(Parsed.strMember)) {
+            Fail(kExitUsage, "member \"" + Parsed.strMember + "\" is set twice; set it once");
         }
         jMembers[Parsed.strMember] = std::move(Parsed.jValue);
     }

@@ -34,19 +34,20 @@ size_t IntegerLength(std::string_view strText) {
     return nEnd == nSign || blZeroFirst ? 0 : nEnd;
 }
 
-// Whether the rest is \.[0-9]+([eE][+-]?[0-9]+)?
+// Whether all of it is ([eE][+-]?[0-9]+)?
+bool IsPower(std::string_view strText) {
+    if (strText.empty() || (strText[0] != 'e' && strText[0] != 'E')) {
+        return strText.empty();
+    }
+    const bool blSign = strText.size() > 1 && (strText[1] == '+' || strText[1] == '-');
+    const size_t nDigits = blSign ? 2 : 1;
+    return nDigits < strText.size() && SkipDigits(strText, nDigits) == strText.size();
+}
+
+// Whether all of it is \.[0-9]+([eE][+-]?[0-9]+)?
 bool IsFraction(std::string_view strText) {
-    const size_t nEnd = SkipDigits(strText, 1);
-    if (strText.substr(0, 1) != "." || nEnd == 1 || nEnd == strText.size()) {
-        return strText.substr(0, 1) == "." && nEnd > 1;
-    }
-    if (strText[nEnd] != 'e' && strText[nEnd] != 'E') {
-        return false;
-    }
-    const bool blSign =
-        nEnd + 1 < strText.size() && (strText[nEnd + 1] == '+' || strText[nEnd + 1] == '-');
-    const size_t nPower = nEnd + (blSign ? 2 : 1);
-    return nPower < strText.size() && SkipDigits(strText, nPower) == strText.size();
+    const size_t nEnd = strText.substr(0, 1) == "." ? SkipDigits(strText, 1) : 0;
+    return nEnd > 1 && IsPower(strText.substr(nEnd));
 }
 
 }  // namespace
@@ -84,6 +85,12 @@ Value CellNumber(std::string_view strCell) {
         Found.eKind = Value::Kind::kReal;
     }
     return Found;
+}
+
+bool IsJsonNumber(std::string_view strText) {
+    const size_t nInteger = IntegerLength(strText);
+    const std::string_view strRest = strText.substr(nInteger);
+    return nInteger > 0 && (IsPower(strRest) || IsFraction(strRest));
 }
 
 // Blanks around it, a plus and a point at either end do not matter.

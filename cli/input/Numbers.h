@@ -24,6 +24,9 @@ Value CellNumber(std::string_view strCell);
 // For a column that is known to be real.
 bool ToReal(std::string_view strNumber, double& dReal);
 
+// Whether a text is a number as JSON writes it.
+bool IsJsonNumber(std::string_view strText);
+
 // Whether SQLite stores a text as a number in a column of numbers.
 bool IsNumberToSqlite(std::string_view strText);
 

@@ -25,6 +25,12 @@ expect 2 '' 'error: "name!=tea" is not of the form member=value; write --where '
 expect 2 '' 'error: "tags[0]<=b" is not of the form member=value; write --where '"'{\"tags[0]\": {\"\$lte\": \"b\"}}'" -- \
     count shop.db product 'tags[0]<=b'
 expect 0 0 '' -- count shop.db product 'tags[0]=a>b'
+expect 2 '' 'error: "name" is not of the form member=value; write what the member is: name=VALUE' -- \
+    list shop.db product name
+sqlite3 shop.db 'CREATE TABLE e ("" INT)'
+expect 2 '' 'error: "" is not of the form member=value; write what the member is: =VALUE' -- list shop.db e ''
+expect 2 '' 'error: member "name" is set twice; set it once' -- update shop.db product 1 name=a name=b
+expect 2 '' 'error: member "id" is set twice; set it once' -- upsert shop.db product id=1 id:=2
 expect 2 '' 'error: --limit is given more than once; give it once' -- list shop.db product --limit 1 -l 2
 expect 0 '[{"id":1,"name":"tea, \"green\""}]' '' -- \
     list shop.db product --members id --members name --sort name,id --sort -price --limit 1 --offset 1

@@ -74,4 +74,22 @@ for name in sqlite_schema sqlite_master SQLite_Schema; do
     expect 2 '' "error: table \"$name\" is SQLite's own and can only be read; tables are changed by init, sync and index" \
         -- insert own.db $name only.jsonl
 done
+
+# In columns that are not text a word is JSON where all of it is, and else a text.
+sqlite3 any.db "CREATE TABLE ev (id INTEGER PRIMARY KEY, day DATE, at DATETIME, ver, ip NUMERIC);
+    INSERT INTO ev VALUES (1, '2026-01-01', '12:00', '1.2.3', '192.168.0.1'), (2, 20260101, 5.5, '1.2', 1e3),
+        (3, '007', '-', '1.', '1e')"
+for word in day=2026-01-01 at=12:00 ver=1.2.3 ip=192.168.0.1; do
+    expect 0 1 '' -- count any.db ev $word
+done
+for word in day=20260101 at=5.5 ip=1e3 ip=1000 ip=1.0E+3; do
+    expect 0 '[{"id":2}]' '' -- list any.db ev $word --members id
+done
+for word in day=007 at=- ver=1. ip=1e; do
+    expect 0 '[{"id":3}]' '' -- list any.db ev $word --members id
+done
+expect 0 '' 'updated 1 record' -- update any.db ev 1 day=2026-02-02 ver=10.0.0.1
+expect 0 '{"id":1,"day":"2026-02-02","at":"12:00","ver":"10.0.0.1","ip":"192.168.0.1"}' '' -- get any.db ev 1
+expect 2 '' 'error: ver: Line 1, Column 3: Missing '"','"' or '"']'"' in array declaration; it must be JSON' -- \
+    count any.db ev 'ver=[1'
 finish
