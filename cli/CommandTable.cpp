@@ -13,7 +13,9 @@ const Option kLimit{"--limit", "-l", "N", "at most so many records"};
 const Option kOffset{"--offset", "-o", "N", "leave out so many records first"};
 const Option kMembers{"--members", "-m", "MEMBERS", "only these, parted by commas", true};
 const Option kFormat{"--format", "-f", "json|jsonl|csv|tsv|table",
-                     "table is what a terminal gets, json all else"};
+                     "table is what a terminal gets, json a file or a pipe"};
+const Option kShape{"--format", "-f", "json|jsonl|csv|tsv|table",
+                    "table, unless this or --json says otherwise"};
 const Option kNulls{"--nulls", "", "omit|keep",
                     "members that are NULL, in JSON: leave out or null"};
 const Option kNoHeaders{"--no-headers", "", "", "no line with the members' names"};
@@ -56,7 +58,7 @@ const std::vector<Command> kCommands = {
      "DB",
      "vornjsondb tables shop.db --counts\n",
      "",
-     {{"--counts", "-c", "", "count the records, too"}, kFormat, kNoHeaders},
+     {{"--counts", "-c", "", "count the records, too"}, kShape, kNoHeaders},
      RunTables},
     {"schema",
      "Show how tables were created",
@@ -140,7 +142,7 @@ const std::vector<Command> kCommands = {
      "vornjsondb index shop.db product\n"
      "vornjsondb index shop.db product size price\n",
      "",
-     {{"--unique", "-u", "", "no two records may have the same values"}, kFormat, kNoHeaders},
+     {{"--unique", "-u", "", "no two records may have the same values"}, kShape, kNoHeaders},
      RunIndex},
     {"explain",
      "Show SQL, plan and advice for a query",
@@ -162,7 +164,7 @@ const std::vector<Command> kCommands = {
      "vornjsondb lint shop.db\n"
      "vornjsondb lint shop.db product --def product.def\n",
      "With an error among the findings the exit code is 3.\n",
-     {kFormat, kNoHeaders},
+     {kShape, kNoHeaders},
      RunLint},
     {"sync",
      "Extend a table to its definition",
@@ -177,7 +179,7 @@ const std::vector<Command> kCommands = {
      "DB",
      "vornjsondb doctor shop.db\n",
      "With a fault found the exit code is 3. Locks are known on Linux only.\n",
-     {kFormat, kNoHeaders},
+     {kShape, kNoHeaders},
      RunDoctor},
     {"dump",
      "Write a table with all that belongs to it as JSON Lines",

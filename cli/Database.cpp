@@ -24,6 +24,11 @@ const char kTablesAndViews[] = "SELECT name FROM sqlite_master WHERE type IN ('t
 constexpr int kFlags[] = {SQLITE_OPEN_READONLY, SQLITE_OPEN_READWRITE,
                           SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE};
 
+std::string FolderOf(const std::string& strFile) {
+    const std::size_t nSlash = strFile.rfind('/');
+    return nSlash == std::string::npos ? "." : strFile.substr(0, nSlash + 1);
+}
+
 std::string FileOf(sqlite3* pDb) {
     const char* const szFile = sqlite3_db_filename(pDb, "main");
     return szFile == nullptr || *szFile == '\0' ? "database" : szFile;
@@ -37,6 +42,26 @@ std::string FileOf(sqlite3* pDb) {
         strLine = WithWait(std::move(strLine));
     }
     Fail(ExitOf(eCode, kExitUnexpected), strLine + HintFor(eCode));
+}
+
+// Bytes 18 and 19 of a database tell its journal: 2 is a WAL.
+bool HasWal(const std::string& strFile) {
+    ByteSource File;
+    char szHeader[20];
+    return File.Open(strFile) && File.Read(szHeader, sizeof szHeader) == sizeof szHeader &&
+           szHeader[18] == 2;
+}
+
+// Reading it as it stands would miss what others write meanwhile, so that a copy is the way.
+void CheckFolderOfWal(const std::string& strFile) {
+    const std::string strFolder = FolderOf(strFile);
+    if (access(strFolder.c_str(), W_OK) != 0 && HasWal(strFile)) {
+        Fail(kExitIo, strFile +
+                          ": it is in WAL mode, in which SQLite writes beside the file even "
+                          "to read it, and its folder cannot be written to: " +
+                          std::strerror(errno) + "; copy it, with " + strFile +
+                          "-wal if there is one, to a folder that can be");
+    }
 }
 
 bool IsEmpty(const std::string& strFile) {
@@ -65,10 +90,7 @@ void CheckFile(const std::string& strFile, Access eAccess) {
         Fail(kExitUsage, "\"" + strFile + "\" names no file; name the file of a database");
     }
     if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
-        const std::size_t nSlash = strFile.rfind('/');
-        const std::string strFolder =
-            nSlash == std::string::npos ? "." : strFile.substr(0, nSlash + 1);
-        if (access(strFolder.c_str(), W_OK | X_OK) != 0) {
+        if (access(FolderOf(strFile).c_str(), W_OK | X_OK) != 0) {
             Fail(kExitIo, strFile + ": " + std::strerror(errno) + "; check the folder");
         }
         return;
@@ -158,6 +180,10 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
         nLooked = Look(pDb);
     }
     if (nLooked != SQLITE_OK) {
+        const int nPrimary = nLooked & 0xFF;
+        if (nPrimary == SQLITE_CANTOPEN || nPrimary == SQLITE_READONLY) {
+            CheckFolderOfWal(strFile);
+        }
         FailBySqlite(pDb, strFile);
     }
     return pOwner;

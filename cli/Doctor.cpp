@@ -44,6 +44,22 @@ std::string ProcessName(const std::string& strPid) {
     return strName.empty() ? "unknown" : strName;
 }
 
+// A process may hold several locks, and stands in one row.
+void AddMeaning(const std::string& strProcess, const std::string& strMeaning, Json::Value& jRows) {
+    for (Json::Value& jRow : jRows) {
+        const std::string strResult = jRow["result"].asString();
+        if (strResult.compare(0, strProcess.size(), strProcess) == 0) {
+            const bool blSaid = strResult.find(strMeaning, strProcess.size()) != std::string::npos;
+            jRow["result"] = strResult + (blSaid ? "" : ", " + strMeaning);
+            return;
+        }
+    }
+    Json::Value jRow;
+    jRow["check"] = "lock";
+    jRow["result"] = strProcess + " " + strMeaning;
+    jRows.append(std::move(jRow));
+}
+
 // "1: POSIX  ADVISORY  WRITE 123 08:01:4567 1073741825 1073741825". The own look at the file is
 // over, so that this process is not among them.
 void AppendLocks(const std::string& strFile, const char* szSuffix, Json::Value& jRows) {
@@ -65,11 +81,8 @@ void AppendLocks(const std::string& strFile, const char* szSuffix, Json::Value& 
         }
         for (const LockRow& Row : kLocks) {
             if (std::string(Row.szFile) == szSuffix && nFirst >= Row.nFirst && nLast <= Row.nLast) {
-                Json::Value jRow;
-                jRow["check"] = "lock";
-                jRow["result"] =
-                    "process " + strPid + " (" + ProcessName(strPid) + ") " + Row.szMeaning;
-                jRows.append(std::move(jRow));
+                AddMeaning("process " + strPid + " (" + ProcessName(strPid) + ")", Row.szMeaning,
+                           jRows);
                 break;
             }
         }

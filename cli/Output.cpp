@@ -72,7 +72,16 @@ std::vector<int> PlacesIn(const Row& Of, const std::vector<std::string>& vecMemb
     return vecPlaces;
 }
 
-Cell CellOf(const Json::Value& jValue, std::string& strText) {
+std::string Listed(const Json::Value& jTexts) {
+    std::string strList;
+    for (const Json::Value& jText : jTexts) {
+        strList += (strList.empty() ? "" : ", ") + jText.asString();
+    }
+    return strList;
+}
+
+// A list of texts, such as the members of an index, is one only where a format has lists.
+Cell CellOf(const Json::Value& jValue, bool blJson, std::string& strText) {
     Cell Value;
     if (jValue.isBool()) {
         Value.eKind = Row::Kind::kBoolean;
@@ -81,8 +90,9 @@ Cell CellOf(const Json::Value& jValue, std::string& strText) {
         Value.eKind = Row::Kind::kInteger;
         Value.nValue = jValue.asInt64();
     } else if (!jValue.isNull()) {
-        Value.eKind = jValue.isString() ? Row::Kind::kText : Row::Kind::kJson;
-        strText = jValue.isString() ? jValue.asString() : CompactJson(jValue);
+        const bool blList = jValue.isArray();
+        Value.eKind = blList && blJson ? Row::Kind::kJson : Row::Kind::kText;
+        strText = !blList ? jValue.asString() : blJson ? CompactJson(jValue) : Listed(jValue);
         Value.strText = strText;
     }
     return Value;
@@ -161,16 +171,17 @@ void WriteObjects(const Context& Call, const Json::Value& jObjects,
         vecShown.push_back({strName, false});
     }
     // Read by people, unless a format is asked for.
-    std::unique_ptr<RecordOutput> pTo = TableOutput(true);
+    std::unique_ptr<RecordOutput> pTo = TableOutput(!Call.Has("--no-headers"));
     if (Call.Json() || Call.Has("--format")) {
         pTo = ChooseOutput(Call);
     }
+    const bool blJson = Call.Text("--format", Call.Json() ? "json" : "").compare(0, 4, "json") == 0;
     pTo->Begin(vecShown);
     for (const Json::Value& jObject : jObjects) {
         std::vector<std::string> vecTexts(vecColumns.size());
         std::vector<Cell> vecCells(vecColumns.size());
         for (std::size_t nColumn = 0; nColumn < vecColumns.size(); ++nColumn) {
-            vecCells[nColumn] = CellOf(jObject[vecColumns[nColumn]], vecTexts[nColumn]);
+            vecCells[nColumn] = CellOf(jObject[vecColumns[nColumn]], blJson, vecTexts[nColumn]);
         }
         pTo->Record(vecCells);
     }

@@ -163,6 +163,21 @@ int RunSchema(Context& Call) {
     return kExitFine;
 }
 
+namespace {
+
+void ShowNewTable(const Context& Call, const Json::Value& jDefinition, const std::string& strSql) {
+    if (Call.Json()) {
+        Json::Value jShown;
+        jShown["definition"] = jDefinition;
+        jShown["create"] = strSql;
+        Put(CompactJson(jShown) + "\n");
+    } else {
+        Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
+    }
+}
+
+}  // namespace
+
 int RunInit(Context& Call) {
     const bool blFile = Call.Has("--def");
     if (blFile == (Call.vecWords.size() > 2)) {
@@ -181,7 +196,7 @@ int RunInit(Context& Call) {
           kExitBadData);
     CheckDefaults(Call.TableName(), jDefinition);
     if (Call.Has("--dry-run")) {
-        Put(CompactJson(jDefinition) + "\n" + strSql + ";\n");
+        ShowNewTable(Call, jDefinition, strSql);
         return kExitFine;
     }
     const Database pDb = OpenDatabase(Call, Access::kCreate);
@@ -214,17 +229,18 @@ int RunIndex(Context& Call) {
         Call.Report((blMade ? "" : "there already: ") + strSql, jResult);
         return kExitFine;
     }
-    const Statement pLook = Prepare(
-        Open.pDb.get(),
-        "SELECT l.name, l.\"unique\", (SELECT group_concat(coalesce(i.name, '(expression)'), ', ') "
-        "FROM pragma_index_info(l.name) i) FROM pragma_index_list(?1) l ORDER BY l.name",
-        Call.TableName());
+    const Statement pLook =
+        Prepare(Open.pDb.get(), "SELECT name, \"unique\" FROM pragma_index_list(?1) ORDER BY name",
+                Call.TableName());
     Json::Value jIndexes(Json::arrayValue);
     while (Step(pLook.get())) {
         Json::Value jIndex;
         jIndex["index"] = ColumnText(pLook.get(), 0);
         jIndex["unique"] = sqlite3_column_int(pLook.get(), 1) != 0;
-        jIndex["members"] = ColumnText(pLook.get(), 2);
+        jIndex["members"] = Strings(
+            Texts(Open.pDb.get(),
+                  "SELECT coalesce(name, '(expression)') FROM pragma_index_info(?1) ORDER BY seqno",
+                  jIndex["index"].asString()));
         jIndexes.append(std::move(jIndex));
     }
     WriteObjects(Call, jIndexes, {"index", "unique", "members"});
@@ -324,7 +340,7 @@ int RunSync(Context& Call) {
         Put(strStatement + ";\n");
     }
     PutFindings(Done.vecFindings);
-    if (Done.vecStatements.empty() && Done.vecFindings.empty()) {
+    if (Done.vecStatements.empty() && nExit == kExitFine) {
         Call.Say("nothing to do");
     }
     return nExit;

@@ -13,8 +13,19 @@ expect 0 '' 'CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -
     index shop.db product name
 expect 0 '' 'there already: CREATE INDEX "product_name" ON "product" ("name" COLLATE BINARY)' -- \
     index shop.db product name
-expect 0 '[{"index":"product_name","unique":false,"members":"name"}]' '' -- \
+expect 0 '[{"index":"product_name","unique":false,"members":["name"]}]' '' -- \
     index shop.db product --json
+expect 0 'index         unique  members
+------------  ------  -------
+product_name  false   name' '' -- index shop.db product
+expect 0 'product_name  false  name' '' -- index shop.db product --no-headers
+sqlite3 comma.db 'CREATE TABLE t ("a,b", c); CREATE UNIQUE INDEX i ON t ("a,b", c); CREATE INDEX j ON t (c + 1)'
+expect 0 '[{"index":"i","unique":true,"members":["a,b","c"]},
+ {"index":"j","unique":false,"members":["(expression)"]}]' '' -- index comma.db t --json
+expect 0 'i,true,"a,b, c"
+j,false,(expression)' '' -- index comma.db t --format csv --no-headers
+expect 0 '{"create":"CREATE TABLE IF NOT EXISTS \"u\" (\"a\" INTEGER)","definition":{"u":{"member":{"a":{"cpptype":"int"}}}}}' \
+    '' -- init comma.db u a:int --dry-run --json
 expect 0 'SELECT "product"."id" FROM "product" WHERE "product"."price" IS ?
   SCAN product
 warning: all records are looked at, which an index spares on "price"; create one by vornjsondb index, where the table is or gets large' \
@@ -102,4 +113,22 @@ same 'the exit where a key is missing' $? 3
 same 'what can be done' "$(head -n 1 found)" 'ALTER TABLE "bare" ADD COLUMN "b" TEXT;'
 "$VORNJSONDB" sync bare.db bare --def bare.def --dry-run --json >found
 same 'the same in JSON' $? 3
+
+# A sync that leaves warnings only says that it had nothing to do.
+sqlite3 warned.db 'CREATE TABLE t (id INTEGER PRIMARY KEY, a TEXT)'
+echo '{"t": {"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}}}' >warned.def
+"$VORNJSONDB" sync warned.db t --def warned.def >out 2>err
+same 'sync with warnings' "$(cut -d : -f 1 out) $(cat err)" 'warning nothing to do'
+
+# A process stands in one row, whatever it holds.
+cat >wal.py <<'END'
+import sqlite3, subprocess, sys
+database = sqlite3.connect('warned.db', isolation_level=None)
+database.executescript("PRAGMA journal_mode = wal; BEGIN IMMEDIATE; INSERT INTO t VALUES (1, 'x');")
+database.execute('SELECT * FROM t').fetchone()
+print(subprocess.run([sys.argv[1], 'doctor', 'warned.db'], capture_output=True, text=True).stdout)
+END
+python3 wal.py "$VORNJSONDB" | grep process | sed 's/[0-9][0-9]*/N/' >out
+same 'processes' "$(wc -l <out)" 1
+same 'what it does' "$(sed 's/.*) //' out | tr -d , | tr ' ' '\n' | sort | xargs)" 'reads writes'
 finish

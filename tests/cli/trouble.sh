@@ -99,11 +99,20 @@ expect 7 '' 'error: locked/all.db: cannot remove records from table "t": attempt
 expect 7 '' 'error: locked/new.db: Permission denied; check the folder' -- insert locked/new.db t lines
 expect 7 '' 'error: locked/errors: Permission denied; name another file for --errors (nothing is stored)' \
     -- insert new.db t lines --errors locked/errors
+# SQLite needs a file beside a database in WAL mode.
+mkdir medium && cp all.db medium/wal.db
+sqlite3 medium/wal.db 'PRAGMA journal_mode = wal' >out
+chmod 444 medium/wal.db && chmod 555 medium
+for words in 'list %s t' 'tables %s' 'doctor %s' 'dump %s t'; do
+    # shellcheck disable=SC2059,SC2046  # the words have the place for the file
+    expect 7 '' 'error: medium/wal.db: it is in WAL mode, in which SQLite writes beside the file even to read it, and its folder cannot be written to: Permission denied; copy it, with medium/wal.db-wal if there is one, to a folder that can be' \
+        -- $(printf "$words" medium/wal.db)
+done
 chmod 000 readonly.db
 expect 7 '' 'error: readonly.db: Permission denied; check its permissions' -- count readonly.db t
 expect 7 '' 'error: readonly.db: Permission denied; check name and permissions' -- insert new.db t readonly.db
 VORNJSONDB=$original
-chmod -R u+w locked
+chmod -R u+w locked medium
 
 # Outputs that take nothing, or no more.
 written='cannot write: %s; what was written so far is not all'
@@ -328,7 +337,7 @@ expect 6 '' "error: all.db: cannot begin a transaction: $locked" -- \
     upsert all.db t id=1 --wait 10
 expect 6 '' "error: all.db: cannot create an index on table \"t\": $locked" -- index all.db t text --wait 10
 "$VORNJSONDB" doctor all.db >out
-same 'who holds it' "$(grep writes out | sed 's/[0-9]\+/N/')" 'lock          process N (sqlite3) writes'
+same 'who holds it' "$(grep writes out | sed 's/[0-9]\+/N/')" 'lock          process N (sqlite3) writes, reads'
 # Ctrl-C ends the waiting, and the whole time is what --wait says: another one that waits longer and began
 # later is not the first to give up.
 "$VORNJSONDB" insert all.db t lines --wait 600000 2>err &
