@@ -226,17 +226,45 @@ std::string ReadFile(const std::string& strFile) {
     return strText;
 }
 
+namespace {
+
+// The reader knows infinite numbers by their name only.
+std::string WithInfinity(const std::string& strText) {
+    constexpr char kTooGreat[] = "1e999";
+    std::string strOut;
+    bool blInText = false;
+    for (std::size_t nAt = 0; nAt < strText.size(); ++nAt) {
+        const char c = strText[nAt];
+        const bool blAlone = nAt == 0 || std::strchr(" \t\n\r:,[-", strText[nAt - 1]) != nullptr;
+        if (!blInText && blAlone && strText.compare(nAt, 5, kTooGreat) == 0) {
+            strOut += "Infinity";
+            nAt += 4;
+            continue;
+        }
+        strOut += c;
+        blInText = blInText != (c == '"');
+        if (blInText && c == '\\' && nAt + 1 < strText.size()) {
+            strOut += strText[++nAt];
+        }
+    }
+    return strOut;
+}
+
+}  // namespace
+
 Json::Value ParseJson(const std::string& strText, const std::string& strWhere, int nExit) {
     Json::CharReaderBuilder Builder;
     Json::CharReaderBuilder::strictMode(&Builder.settings_);
     Builder["strictRoot"] = false;
+    const std::string strRead = WithInfinity(strText);
+    Builder["allowSpecialFloats"] = strRead.size() != strText.size();
     Json::Value jValue;
     std::string strErrors;
     bool blParsed = false;
     try {
         const std::unique_ptr<Json::CharReader> pReader(Builder.newCharReader());
         blParsed =
-            pReader->parse(strText.data(), strText.data() + strText.size(), &jValue, &strErrors);
+            pReader->parse(strRead.data(), strRead.data() + strRead.size(), &jValue, &strErrors);
     } catch (const Json::Exception& Failed) {
         strErrors = Failed.what();
     }

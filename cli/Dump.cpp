@@ -1,7 +1,6 @@
 // dump and load: one table as JSON Lines, exact. The first line describes the table, each further
 // one is a row as a list, and the last one has a count and a checksum, so that a cut file is found.
 
-#include <cmath>
 #include <cstdio>
 #include <cstring>
 #include <limits>
@@ -69,22 +68,10 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
         case SQLITE_INTEGER:
             return AppendInteger(strOut, sqlite3_column_int64(pRow, nColumn));
         case SQLITE_FLOAT:
-            // No reader of JSON has to take 1e999.
-            if (std::isinf(sqlite3_column_double(pRow, nColumn))) {
-                strOut += sqlite3_column_double(pRow, nColumn) > 0 ? R"({"$real":"inf"})"
-                                                                   : R"({"$real":"-inf"})";
-                return;
-            }
-            return AppendReal(strOut, sqlite3_column_double(pRow, nColumn));
+            return AppendExactReal(strOut, sqlite3_column_double(pRow, nColumn));
         case SQLITE_TEXT:
             sqlite3_column_text(pRow, nColumn);  // from now on UTF-8, whatever the database has
-            if (IsUtf8(Bytes())) {
-                return AppendJsonString(strOut, Bytes());
-            }
-            strOut += R"({"$text":true,"encoded":")";
-            AppendBase64(strOut, Bytes());
-            strOut += "\"}";
-            return;
+            return AppendExactText(strOut, Bytes());
         case SQLITE_BLOB:
             return AppendBlob(strOut, Bytes());
         default:

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "input/JsonText.h"
+#include "input/Sink.h"
 #include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -93,9 +94,26 @@ std::string FromBase64(const std::string& strText, bool& blRight) {
 }
 
 void AppendBlob(std::string& strOut, std::string_view strBytes) {
-    strOut += R"({"$base64":true,"encoded":")";
+    strOut += kBlobBegin;
     AppendBase64(strOut, strBytes);
     strOut += "\"}";
+}
+
+void AppendExactText(std::string& strOut, std::string_view strText) {
+    if (IsUtf8(strText)) {
+        return AppendQuoted(strText, strOut);
+    }
+    strOut += kTextBegin;
+    AppendBase64(strOut, strText);
+    strOut += "\"}";
+}
+
+void AppendExactReal(std::string& strOut, double dValue) {
+    if (std::isinf(dValue)) {
+        strOut += dValue > 0 ? kInfinity : kMinusInfinity;
+    } else {
+        AppendReal(strOut, dValue);
+    }
 }
 
 bool IsUtf8(std::string_view strText) {

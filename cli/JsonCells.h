@@ -23,6 +23,10 @@ void AppendBase64(std::string& strOut, std::string_view strBytes);
 std::string FromBase64(const std::string& strText, bool& blRight);
 // {"$base64": true, "encoded": "..."}, as other tools write bytes, too.
 void AppendBlob(std::string& strOut, std::string_view strBytes);
+// {"$text": true, "encoded": "..."} for a text that is no UTF-8, {"$real": "inf"} for a number
+// without an end: nothing is lost.
+void AppendExactText(std::string& strOut, std::string_view strText);
+void AppendExactReal(std::string& strOut, double dValue);
 bool IsUtf8(std::string_view strText);
 
 // On one line, in the order of JsonCpp, texts as UTF-8.

@@ -237,11 +237,13 @@ class JsonWriter : public RecordOutput {
                 m_strLine += "null";
                 return;
             case Row::Kind::kText:
-                return AppendJsonString(m_strLine, Value.strText);
+                return AppendExactText(m_strLine, Value.strText);
+            case Row::Kind::kReal:
+                return AppendExactReal(m_strLine, Value.dValue);
             case Row::Kind::kJson:
                 // Whoever made the table may have put any text there.
                 return IsJson(Value.strText) ? AppendJson(m_strLine, Value.strText)
-                                             : AppendJsonString(m_strLine, Value.strText);
+                                             : AppendExactText(m_strLine, Value.strText);
             case Row::Kind::kBlob:
                 return AppendBlob(m_strLine, Value.strText);
             default:

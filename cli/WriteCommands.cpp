@@ -93,7 +93,10 @@ void CheckStorable(const Table& Of, const Json::Value& jMembers) {
     const std::vector<std::string> vecNumbers = NumberColumns(Of.Connection(), Of.Name());
     for (auto itMember = jMembers.begin(); itMember != jMembers.end(); ++itMember) {
         const Json::Value& jType = jTypes[itMember.name()]["cpptype"];
-        if (itMember->isObject() && itMember->isMember("$base64") && jType == "any") {
+        const bool blMarked =
+            itMember->isObject() && (itMember->isMember("$base64") || itMember->isMember("$text") ||
+                                     itMember->isMember("$real"));
+        if (blMarked && jType == "any") {
             Fail(kExitUsage, "member \"" + itMember.name() +
                                  "\": bytes are written by insert alone; give it the record on "
                                  "standard input, with --upsert");

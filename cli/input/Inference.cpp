@@ -23,6 +23,19 @@ unsigned OfInteger(std::int64_t nValue) {
     return nValue > kMostExact || nValue < -kMostExact ? kInteger | kInexact : kInteger;
 }
 
+unsigned KindOfJson(std::string_view strJson) {
+    if (strJson.substr(0, kBlobBegin.size()) == kBlobBegin) {
+        return kBlob;
+    }
+    if (strJson.substr(0, kTextBegin.size()) == kTextBegin) {
+        return kText;
+    }
+    if (strJson == kInfinity || strJson == kMinusInfinity) {
+        return kReal;
+    }
+    return strJson[0] == '{' ? kObject : kList;
+}
+
 unsigned KindsOf(const Value& Given) {
     switch (Given.eKind) {
         case Value::Kind::kNull:
@@ -38,10 +51,7 @@ unsigned KindsOf(const Value& Given) {
         case Value::Kind::kText:
             return kText;
         default:
-            if (Given.strText.substr(0, kBlobBegin.size()) == kBlobBegin) {
-                return kBlob;
-            }
-            return Given.strText[0] == '{' ? kObject : kList;
+            return KindOfJson(Given.strText);
     }
 }
 

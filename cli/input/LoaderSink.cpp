@@ -1,5 +1,6 @@
 #include "LoaderSink.h"
 
+#include <cmath>
 #include <utility>
 
 #include "../Command.h"
@@ -106,21 +107,35 @@ void LoaderSink::SetText(const Column& Into, std::string_view strText) {
     }
 }
 
-// A member of type "any" takes bytes; else a list or an object is refused there.
-void LoaderSink::SetObject(const Column& Into, std::string_view strJson) {
-    bool blBytes = Into.eKind == BoundKind::kAny && strJson.size() > kBlobBegin.size() + 1 &&
-                   strJson.substr(0, kBlobBegin.size()) == kBlobBegin;
-    if (blBytes) {
-        strJson.remove_suffix(2);  // of the text and of the object
-        const std::string strBytes =
-            FromBase64(std::string(strJson.substr(kBlobBegin.size())), blBytes);
-        if (blBytes) {
-            return m_Into.SetBlob(Into.nLoader, strBytes.data(), strBytes.size());
-        }
-        m_Into.Reject("member \"" + Into.strName + R"(": its "encoded" is no base64)");
-        return;
+// What the base64 of {"$base64":true,"encoded":"..."} stands for; false: it is not of this form.
+bool LoaderSink::Decode(const Column& Into, std::string_view strBegin, std::string_view strJson) {
+    if (strJson.size() < strBegin.size() + 2 || strJson.substr(0, strBegin.size()) != strBegin) {
+        return false;
     }
-    m_Into.SetJson(Into.nLoader, strJson);
+    strJson.remove_prefix(strBegin.size());
+    strJson.remove_suffix(2);  // of the text and of the object
+    bool blRight = false;
+    m_strBytes = FromBase64(std::string(strJson), blRight);
+    if (!blRight) {
+        m_Into.Reject("member \"" + Into.strName + R"(": its "encoded" is no base64)");
+    }
+    return true;
+}
+
+// What stands for a value that JSON has not goes where such a value may be. Else a list or an
+// object is refused there.
+void LoaderSink::SetObject(const Column& Into, std::string_view strJson) {
+    const bool blAny = Into.eKind == BoundKind::kAny;
+    if (blAny && Decode(Into, kBlobBegin, strJson)) {
+        m_Into.SetBlob(Into.nLoader, m_strBytes.data(), m_strBytes.size());
+    } else if ((blAny || Into.eKind == BoundKind::kText) && Decode(Into, kTextBegin, strJson)) {
+        m_Into.SetText(Into.nLoader, m_strBytes);
+    } else if ((blAny || Into.eKind == BoundKind::kReal) &&
+               (strJson == kInfinity || strJson == kMinusInfinity)) {
+        m_Into.SetReal(Into.nLoader, strJson == kInfinity ? HUGE_VAL : -HUGE_VAL);
+    } else {
+        m_Into.SetJson(Into.nLoader, strJson);
+    }
 }
 
 // Into a real column the nearest double; else the digits.

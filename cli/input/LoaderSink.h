@@ -45,6 +45,7 @@ class LoaderSink : public Sink {
     void SetText(const Column& Into, std::string_view strText);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
+    bool Decode(const Column& Into, std::string_view strBegin, std::string_view strJson);
     void SetObject(const Column& Into, std::string_view strJson);
     void SetWide(const Column& Into, std::string_view strNumber);
     void NotStored(const Place& Where, const std::string& strReason);
@@ -55,6 +56,7 @@ class LoaderSink : public Sink {
     const bool m_blMode;
     const std::function<bool()> m_fnAfter;
     std::string m_strInput;
+    std::string m_strBytes;  // of a value that came encoded
     bool m_blCells = false;
     std::vector<Column> m_vecColumns;  // of the input
     const std::vector<std::string> m_vecNumberColumns;

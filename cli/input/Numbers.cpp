@@ -1,6 +1,7 @@
 #include "Numbers.h"
 
 #include <charconv>
+#include <cmath>
 #include <cstdlib>
 #include <string>
 
@@ -53,6 +54,10 @@ bool IsFraction(std::string_view strText) {
 }  // namespace
 
 bool ToReal(std::string_view strNumber, double& dReal) {
+    if (strNumber == "1e999" || strNumber == "-1e999") {
+        dReal = strNumber[0] == '-' ? -HUGE_VAL : HUGE_VAL;
+        return true;
+    }
     return Converts(strNumber, dReal);
 }
 

@@ -21,7 +21,7 @@ Value JsonNumber(std::string_view strNumber);
 // zeros, a plus, blanks and "405E10", which is a code more often than a number, stay as they are.
 Value CellNumber(std::string_view strCell);
 
-// For a column that is known to be real.
+// For a column that is known to be real. 1e999 is infinite there, as it is to SQLite.
 bool ToReal(std::string_view strNumber, double& dReal);
 
 // Whether a text is a number as JSON writes it.

@@ -26,8 +26,12 @@ struct Value {
     std::string_view strText;  // lives as long as the call that it is passed to
 };
 
-// How bytes that are no text begin in JSON: {"$base64":true,"encoded":"..."}, as list writes them.
+// What JSON has no values for, as list and dump write it: bytes, texts that are no UTF-8 (how these
+// begin; base64 follows), and the numbers beyond all others.
 constexpr std::string_view kBlobBegin = R"({"$base64":true,"encoded":")";
+constexpr std::string_view kTextBegin = R"({"$text":true,"encoded":")";
+constexpr std::string_view kInfinity = R"({"$real":"inf"})";
+constexpr std::string_view kMinusInfinity = R"({"$real":"-inf"})";
 
 // Where a record is.
 struct Place {

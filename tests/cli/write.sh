@@ -120,4 +120,30 @@ expect 0 '' '' -- delete shop.db product 2 --quiet
 expect 0 '' 'deleted 1 record' -- delete shop.db product --where '{"id": {"$lt": 0}}'
 expect 0 '' 'deleted 1 record' -- delete shop.db product --all --yes
 expect 0 0 '' -- count shop.db product
+
+# What JSON has no values for comes back all the same.
+sqlite3 exact.db "CREATE TABLE t (id INTEGER PRIMARY KEY, a TEXT, b, c REAL);
+    INSERT INTO t VALUES (1, cast(x'ff41' AS TEXT), cast(x'ff42' AS TEXT), 9e999), (2, 'x', -9e999, -9e999),
+        (3, 'y', x'ff', 0.5)"
+expect 0 '{"id":1,"a":{"$text":true,"encoded":"/0E="},"b":{"$text":true,"encoded":"/0I="},"c":{"$real":"inf"}}
+{"id":2,"a":"x","b":{"$real":"-inf"},"c":{"$real":"-inf"}}
+{"id":3,"a":"y","b":{"$base64":true,"encoded":"/w=="},"c":0.5}' '' -- list exact.db t --format jsonl
+values='SELECT id, typeof(a), hex(a), typeof(b), hex(b), c FROM t'
+"$VORNJSONDB" list exact.db t --format jsonl | "$VORNJSONDB" insert new.db t - --key id 2>err
+same 'into a new table' "$(sqlite3 new.db "$values")" "$(sqlite3 exact.db "$values")"
+"$VORNJSONDB" list exact.db t --format json >exact.json
+sqlite3 exact.db 'DELETE FROM t'
+"$VORNJSONDB" insert exact.db t exact.json --quiet
+same 'into the same table' "$(sqlite3 exact.db "$values")" "$(sqlite3 new.db "$values")"
+"$VORNJSONDB" list exact.db t --members id,c --format csv >exact.csv
+"$VORNJSONDB" insert exact.db t exact.csv --upsert --quiet
+same 'by CSV' "$(sqlite3 exact.db 'SELECT c FROM t')" $'Inf\n-Inf\n0.5'
+expect 0 '[{"id":1}]' '' -- list exact.db t c=1e999 --members id
+expect 0 '[{"id":2}]' '' -- list exact.db t b=-1e999 --members id
+expect 0 '[{"id":2}]' '' -- list exact.db t --where '{"c": {"$in": [-1e999, 7]}, "a": {"$ne": "1e999"}}' --members id
+echo '{"id": 4, "a": {"$text":true,"encoded":"!"}}' >wrong.json
+expect 3 '' 'error: wrong.json:1: cannot load record 1 into table "t": member "a": its "encoded" is no base64; correct the record where it comes from (nothing is stored)' \
+    -- insert exact.db t wrong.json
+expect 2 '' 'error: member "b": bytes are written by insert alone; give it the record on standard input, with --upsert' -- \
+    update exact.db t 1 'b={"$text":true,"encoded":"/0E="}'
 finish
