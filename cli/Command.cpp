@@ -10,6 +10,7 @@
 #include "../table/Nearest.h"
 #include "JsonCells.h"
 #include "input/LockWait.h"
+#include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -68,23 +69,39 @@ void CheckOutput(bool blWritten) {
     }
 }
 
-// Names and values in a message may come from anywhere, and must not steer the terminal. U+0080 to
-// U+009F do so, too; in UTF-8 they begin with the byte C2.
+void AppendEscaped(std::string& strLine, std::string_view strBytes) {
+    constexpr char kDigits[] = "0123456789abcdef";
+    for (const char c : strBytes) {
+        const auto nByte = static_cast<unsigned char>(c);
+        strLine += std::string("\\x") + kDigits[nByte >> 4U] + kDigits[nByte & 15U];
+    }
+}
+
+// What steers a terminal: the controls, and the marks that turn the direction of what follows.
+bool Steers(std::int32_t nCode) {
+    const bool blControl = nCode < ' ' || (nCode >= 0x7F && nCode < 0xA0);
+    const bool blMark = nCode == 0x61C || (nCode >= 0x200E && nCode <= 0x200F) ||
+                        (nCode >= 0x2028 && nCode <= 0x202E) ||
+                        (nCode >= 0x2066 && nCode <= 0x2069);
+    return blControl || blMark;
+}
+
+// Names and values in a message may come from anywhere, and must not steer the terminal.
 std::string OneLine(const std::string& strText) {
     std::string strLine;
-    bool blAfterC2 = false;
-    for (const char c : strText) {
-        const auto nByte = static_cast<unsigned char>(c);
-        if (nByte == '\n' || nByte == '\r') {
+    std::size_t nAt = 0;
+    while (nAt < strText.size()) {
+        std::int32_t nCode = 0;
+        const std::size_t nLength = ReadCharacter(std::string_view(strText).substr(nAt), nCode);
+        const std::string_view strOne = std::string_view(strText).substr(nAt, nLength);
+        if (nCode == '\n' || nCode == '\r') {
             strLine += ' ';
-        } else if (nByte < ' ' || nByte == 0x7F || (blAfterC2 && nByte < 0xA0)) {
-            constexpr char kDigits[] = "0123456789abcdef";
-            strLine.resize(strLine.size() - (blAfterC2 && nByte >= 0x80 ? 1 : 0));
-            strLine += std::string("\\x") + kDigits[nByte >> 4U] + kDigits[nByte & 15U];
+        } else if (Steers(nCode)) {
+            AppendEscaped(strLine, strOne);
         } else {
-            strLine += c;
+            strLine += strOne;
         }
-        blAfterC2 = nByte == 0xC2;
+        nAt += nLength;
     }
     return strLine;
 }
@@ -175,7 +192,9 @@ std::vector<std::string> Context::Names(const char* szOption) const {
         while (nBegin <= strList.size()) {
             const std::size_t nEnd = std::min(strList.find(',', nBegin), strList.size());
             vecNames.push_back(strList.substr(nBegin, nEnd - nBegin));
-            nBegin = nEnd + 1;
+            // "id, name" is natural to type.
+            nBegin = std::max(
+                nEnd + 1, std::min(strList.find_first_not_of(' ', nEnd + 1), strList.size() + 1));
         }
     }
     return vecNames;

@@ -91,8 +91,9 @@ struct Context {
 
     bool Has(const char* szOption) const { return mapOptions.count(szOption) != 0; }
     std::string Text(const char* szOption, const std::string& strDefault = "") const;
-    std::vector<std::string> List(const char* szOption) const;   // as often as given
-    std::vector<std::string> Names(const char* szOption) const;  // the same; commas part them
+    std::vector<std::string> List(const char* szOption) const;  // as often as given
+    std::vector<std::string> Names(
+        const char* szOption) const;  // the same; commas part them, and blanks
     std::int64_t Whole(const char* szOption, std::int64_t nDefault) const;  // usage error, if none
 
     bool Quiet() const { return Has("--quiet"); }

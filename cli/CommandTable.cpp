@@ -104,7 +104,8 @@ const std::vector<Command> kCommands = {
      "a file's first ones tell them.\n"
      "All records of a call are stored, or none: from 1 GiB on, or with --batch, the batches\n"
      "before a failure stay. A record whose key is there already is a failure, unless --skip,\n"
-     "--replace or --upsert is given. Ctrl-C undoes the batch that is under way.\n",
+     "--replace or --upsert is given. Ctrl-C undoes the batch that is under way. A record has at\n"
+     "most 16 MiB of text.\n",
      {{"--key", "-k", "MEMBERS", "what tells a record from all others", true},
       {"--not-null", "", "MEMBERS", "members of a new table that must have a value", true},
       {"--default", "", "MEMBER=VALUE", "what a new table gives where a member is missing", true},

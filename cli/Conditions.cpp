@@ -75,6 +75,19 @@ void CheckSigns(const Table& Of, const std::string& strWord) {
     }
 }
 
+// "price desc" is how SQL says it.
+void CheckSort(const Table& Of, const std::string& strTerm) {
+    const std::size_t nBlank = strTerm.find(' ');
+    const std::string strMember = strTerm.substr(0, nBlank);
+    if (nBlank == std::string::npos || IsMember(Of, BaseOf(Of, strTerm)) ||
+        !IsMember(Of, strMember)) {
+        return;
+    }
+    const bool blDown = sqlite3_stricmp(strTerm.c_str() + nBlank, " desc") == 0;
+    Fail(kExitUsage,
+         "--sort: no member \"" + strTerm + "\"; write " + (blDown ? "-" : "") + strMember);
+}
+
 Json::Value ParseWhere(const std::string& strText) {
     if (strText.find_first_of("{[") == std::string::npos) {
         Fail(kExitUsage,
@@ -180,6 +193,7 @@ Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::st
         Which.Where(std::move(Parsed.strMember), Op::kEqual, std::move(Parsed.jValue));
     }
     for (std::string& strTerm : Call.Names("--sort")) {
+        CheckSort(Of, strTerm);
         Which.Sort(std::move(strTerm));
     }
     Which.Limit(Call.Whole("--limit", -1));

@@ -29,10 +29,8 @@ std::string FolderOf(const std::string& strFile) {
     return nSlash == std::string::npos ? "." : strFile.substr(0, nSlash + 1);
 }
 
-std::string FileOf(sqlite3* pDb) {
-    const char* const szFile = sqlite3_db_filename(pDb, "main");
-    return szFile == nullptr || *szFile == '\0' ? "database" : szFile;
-}
+// As it was typed: SQLite itself knows the whole path.
+std::string g_strOpened = "database";
 
 [[noreturn]] void FailBySqlite(sqlite3* pDb, const std::string& strWhere) {
     std::string strLine = strWhere + ": " + sqlite3_errmsg(pDb);
@@ -160,6 +158,7 @@ void CloseDatabase::operator()(sqlite3* pDb) const {
 
 Database OpenDatabase(const Context& Call, Access eAccess) {
     const std::string& strFile = Call.Db();
+    g_strOpened = strFile;
     CheckFile(strFile, eAccess);
     const bool blNew = access(strFile.c_str(), F_OK) != 0;
     sqlite3* pDb = nullptr;
@@ -286,7 +285,7 @@ Statement Prepare(sqlite3* pDb, const std::string& strSql) {
     sqlite3_stmt* pStatement = nullptr;
     if (sqlite3_prepare_v2(pDb, strSql.c_str(), static_cast<int>(strSql.size()) + 1, &pStatement,
                            nullptr) != SQLITE_OK) {
-        FailBySqlite(pDb, FileOf(pDb));
+        FailBySqlite(pDb, g_strOpened);
     }
     return Statement(pStatement);
 }
@@ -310,7 +309,7 @@ std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
 bool Step(sqlite3_stmt* pStatement) {
     const int nResult = sqlite3_step(pStatement);
     if (nResult != SQLITE_ROW && nResult != SQLITE_DONE) {
-        FailBySqlite(sqlite3_db_handle(pStatement), FileOf(sqlite3_db_handle(pStatement)));
+        FailBySqlite(sqlite3_db_handle(pStatement), g_strOpened);
     }
     return nResult == SQLITE_ROW;
 }
@@ -404,6 +403,10 @@ std::string NumberColumnText(const std::string& strColumn, std::string_view strT
 void CheckNewName(const std::string& strTable) {
     if (strTable.empty()) {
         Fail(kExitUsage, "the name of the new table is empty; give it one");
+    }
+    if (sqlite3_strnicmp(strTable.c_str(), "sqlite_", 7) == 0) {
+        Fail(kExitUsage,
+             "\"" + strTable + "\": names that begin with sqlite_ are SQLite's own; take another");
     }
 }
 

@@ -114,7 +114,9 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     std::vector<std::string> vecColumns = Texts(
         pDb, "SELECT name FROM pragma_table_xinfo(?1) WHERE hidden = 0 ORDER BY cid", strTable);
     const std::string strRowid = RowidName(pDb, strTable);
-    if (!strRowid.empty()) {
+    // SQLite reads no more columns at a time than a table may have.
+    const int nMost = sqlite3_limit(pDb, SQLITE_LIMIT_COLUMN, -1);
+    if (!strRowid.empty() && vecColumns.size() < static_cast<std::size_t>(nMost)) {
         vecColumns.insert(vecColumns.begin(), strRowid);
     }
     for (const std::string& strColumn : vecColumns) {

@@ -51,7 +51,9 @@ void PutManual() {
     }
     Put(".Sh ENVIRONMENT\n.Bl -tag -width Ds\n"
         ".It Ev COLUMNS\nThe width of tables, where the terminal does not tell.\n"
-        ".It Ev NO_COLOR\nIf set and not empty, there are no colours.\n.El\n"
+        ".It Ev NO_COLOR\nIf set and not empty, there are no colours.\n"
+        ".It Ev TMPDIR\nWhere standard input is copied to be read twice, instead of\n.Pa /tmp .\n"
+        ".El\n"
         ".Sh FILES\nA database keeps definitions in its table\n.Ql vornjsondb_definition .\n"
         ".Sh EXIT STATUS\n"
         ".Bl -tag -width Ds\n");

@@ -118,7 +118,12 @@ void CheckOptionName(const std::string& strWord, const Command& Of) {
         vecNames.emplace_back(Row.szName);
     }
     const std::string strName = strWord.substr(0, strWord.find('='));
-    const std::string strHint = NearestHint(strName, vecNames);
+    // The rest of a name is forgotten more often than it is mistyped.
+    const auto itBegun = std::find_if(vecNames.begin(), vecNames.end(), [&](const auto& strEach) {
+        return strName.size() > 3 && strEach.compare(0, strName.size(), strName) == 0;
+    });
+    const std::string strHint = itBegun != vecNames.end() ? "; did you mean \"" + *itBegun + "\"?"
+                                                          : NearestHint(strName, vecNames);
     FailUsage("unknown option \"" + strName + "\" of " + Of.szName,
               strHint.empty() ? std::string("; see vornjsondb ") + Of.szName +
                                     " --help, and put -- before words that begin with a dash"
@@ -228,6 +233,16 @@ bool Parse(int nArguments, char** pszArguments, Context& Call) {
     for (int nAt = 1; nAt < nArguments; ++nAt) {
         vecWords.push_back(Marked(pszArguments[nAt]));
     }
+    if (strFirst == "help") {
+        vecWords.erase(vecWords.begin());
+        const Command* const pOf = TakeCommand(vecWords);
+        if (pOf != nullptr) {
+            PutHelp(*pOf);
+        } else {
+            PutOverview();
+        }
+        return false;
+    }
     Call.pCommand = TakeCommand(vecWords);
     const auto Asked = [&vecWords](const char* szLong, const char* szShort) {
         return !vecWords.empty() && (vecWords[0] == szLong || vecWords[0] == szShort);
@@ -242,10 +257,17 @@ bool Parse(int nArguments, char** pszArguments, Context& Call) {
         return false;
     }
     if (Call.pCommand == nullptr) {
-        FailUsage("there is no subcommand", "");
+        FailUsage(vecWords.empty()
+                      ? "there is no subcommand"
+                      : "there is no subcommand, and no option \"" + vecWords[0] + "\"",
+                  "");
     }
     try {
         ParseWords(std::move(vecWords), Call);
+    } catch (const CLI::ArgumentMismatch& Failed) {
+        // "--sql: 1 required ..."
+        const std::string strText = Failed.what();
+        FailUsage(strText.substr(0, strText.find(':')) + " lacks its value", "", Call.pCommand);
     } catch (const CLI::ParseError& Failed) {
         FailUsage(Failed.what(), "", Call.pCommand);
     }

@@ -1,5 +1,6 @@
 #include "Progress.h"
 
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -51,6 +52,12 @@ std::string Bar(double dPart) {
            std::to_string(static_cast<int>(dPart * 100)) + " %";
 }
 
+size_t Width() {
+    winsize Size{};
+    const bool blKnown = ioctl(STDERR_FILENO, TIOCGWINSZ, &Size) == 0 && Size.ws_col > 1;
+    return blKnown ? Size.ws_col : 80;
+}
+
 void Write(const std::string& strText) {
     static_cast<void>(std::fwrite(strText.data(), 1, strText.size(), stderr));
     static_cast<void>(std::fflush(stderr));
@@ -96,7 +103,10 @@ void Progress::Look(std::int64_t nRecords, std::int64_t nBytes) {
     m_nLastRecords = nRecords;
     m_nLastBytes = nBytes;
     m_blDrawn = true;
-    Write("\r" + Line(m_strWhat, nRecords, nBytes, m_nAllBytes, m_dRecords, m_dBytes) + "\x1b[K");
+    // A line that wraps would stay.
+    const std::string strLine =
+        Line(m_strWhat, nRecords, nBytes, m_nAllBytes, m_dRecords, m_dBytes);
+    Write("\r" + strLine.substr(0, Width() - 1) + "\x1b[K");
 }
 
 void Progress::Clear() {

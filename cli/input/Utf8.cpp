@@ -35,19 +35,25 @@ size_t FindOther(std::string_view strBytes, unsigned char cLeast) {
         if (nPlain == 8) {
             continue;
         }
-        utf8proc_int32_t nCode = 0;
-        const utf8proc_ssize_t nLength =
-            utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(strBytes.data()) + i,
-                             static_cast<utf8proc_ssize_t>(strBytes.size() - i), &nCode);
-        if (nLength <= 0 || nCode < cLeast) {
+        std::int32_t nCode = 0;
+        const size_t nLength = ReadCharacter(strBytes.substr(i), nCode);
+        if (nCode < cLeast) {
             return i;
         }
-        i += static_cast<size_t>(nLength);
+        i += nLength;
     }
     return std::string_view::npos;
 }
 
 }  // namespace
+
+size_t ReadCharacter(std::string_view strBytes, std::int32_t& nCode) {
+    nCode = -1;
+    const utf8proc_ssize_t nLength =
+        utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(strBytes.data()),
+                         static_cast<utf8proc_ssize_t>(strBytes.size()), &nCode);
+    return nLength > 0 ? static_cast<size_t>(nLength) : 1;
+}
 
 bool IsUtf8WithoutControls(std::string_view strBytes) {
     return FindOther(strBytes, ' ') == std::string_view::npos;

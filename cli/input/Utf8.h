@@ -4,6 +4,7 @@
 #define VORNJSONDB_CLI_INPUT_UTF8_H
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -14,6 +15,9 @@ size_t FindNoUtf8(std::string_view strBytes);
 
 // Whether all is UTF-8, with none of the characters below a blank.
 bool IsUtf8WithoutControls(std::string_view strBytes);
+
+// The length of the character that the bytes begin with; 1, and a negative code, where it is none.
+size_t ReadCharacter(std::string_view strBytes, std::int32_t& nCode);
 
 // With U+FFFD for each byte that is no part of UTF-8.
 std::string WithoutBadBytes(std::string_view strBytes);

@@ -51,6 +51,23 @@ same 'a missing file stays missing' "$(ls none.db 2>&1)" \
 printf 'This is a text and no database, long enough to have a header of its own, as it were....%100s' ' ' >text
 expect 7 '' 'error: text: file is not a database; name an SQLite database first' -- list text product
 
+expect 2 '' 'error: unknown option "--form" of list; did you mean "--format"?' -- list shop.db product --form csv
+expect 2 '' 'error: there is no subcommand, and no option "--list"; see vornjsondb --help' -- --list
+expect 2 '' 'error: --sql lacks its value; see vornjsondb explain --help' -- explain shop.db product --sql
+expect 0 '[{"id":1,"price":5.0}]' '' -- list shop.db product id=1 --members 'id, price' --sort 'id, -price'
+expect 2 '' 'error: --sort: no member "price desc"; write -price' -- list shop.db product --sort 'price desc'
+expect 2 '' 'error: --sort: no member "price ASC"; write price' -- list shop.db product --sort 'id,price ASC'
+expect 2 '' 'error: "sqlite_x": names that begin with sqlite_ are SQLite'"'"'s own; take another' -- init shop.db sqlite_x a:int
+# Neither what turns the direction of a line nor bytes that are no text reach the terminal.
+expect 2 '' 'error: table "product" has no member "s\xe2\x80\xae"; see vornjsondb schema' -- \
+    list shop.db product $'s\xe2\x80\xae=1'
+expect 5 '' 'error: shop.db: table "heap" has no record with the key "\xff漢\x1b\xc2\x9b"' -- \
+    get shop.db heap $'\xff漢\x1b\xc2\x9b'
+# The file is named as it was typed, by SQLite's own errors, too.
+sqlite3 -cmd '.dbconfig defensive off' module.db "PRAGMA writable_schema = 1;
+    INSERT INTO sqlite_master VALUES ('table', 'v', 'v', 0, 'CREATE VIRTUAL TABLE v USING unheard')" >out
+expect 1 '' 'error: module.db: no such module: unheard' -- tables module.db --counts
+
 "$VORNJSONDB" list shop.db product >/dev/full 2>err
 same 'exit with a full output' $? 7
 same 'error with a full output' "$(cat err)" \
@@ -124,7 +141,7 @@ same 'bad records' "$(grep -c . bad)" 1
 expect 0 0 '' -- count shop.db undone
 
 # What a message quotes does not steer the terminal.
-expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\x9b0m b"; see vornjsondb tables' -- \
+expect 5 '' 'error: shop.db: there is no table "a\x1b[31m\xc2\x9b0m b"; see vornjsondb tables' -- \
     list shop.db $'a\e[31m\u009b0m\nb'
 echo '[{"id": 9, "name": "x"}]' >$'a\e[31m.json'
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (a\x1b[31m.json: JSON)' -- \

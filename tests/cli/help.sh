@@ -109,6 +109,11 @@ same 'zsh: a database at home' "$(HOME=$PWD in_zsh 'vornjsondb list ~/evil.db pl
 same 'it was not run' "$(ls ran 2>/dev/null)" ''
 same 'zsh: shells' "$(in_zsh 'vornjsondb completion z')" 'vornjsondb completion zsh '
 
+# help is --help.
+same 'help' "$("$VORNJSONDB" help)" "$("$VORNJSONDB" --help)"
+same 'help of a subcommand' "$("$VORNJSONDB" help insert)" "$("$VORNJSONDB" insert --help)"
+expect 2 '' 'error: unknown subcommand "insrt"; did you mean "insert"?' -- help insrt
+
 # The table of exit codes: in the sources, in the manual and on the page.
 root=$(dirname "$0")/../..
 codes=$(sed -n 's/^    kExit[A-Za-z]* = \([0-9]*\),*$/\1/p' "$root/cli/Command.h")

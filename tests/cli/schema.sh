@@ -131,4 +131,11 @@ END
 python3 wal.py "$VORNJSONDB" | grep process | sed 's/[0-9][0-9]*/N/' >out
 same 'processes' "$(wc -l <out)" 1
 same 'what it does' "$(sed 's/.*) //' out | tr -d , | tr ' ' '\n' | sort | xargs)" 'reads writes'
+
+# As many columns as SQLite has.
+columns=$(seq -s , -f 'c%.0f' 2000)
+sqlite3 widest.db "CREATE TABLE w ($columns); INSERT INTO w (c1, c2000) VALUES (1, 'x'), (2, 'y')"
+"$VORNJSONDB" dump widest.db w >w.dump
+expect 0 '' 'loaded 2 rows into table "w"' -- load copy.db w.dump
+same 'the widest table' "$(sqlite3 copy.db 'SELECT c1, c2, c2000 FROM w')" $'1||x\n2||y'
 finish
