@@ -205,6 +205,6 @@ expect 0 '{"j":"no json"}
 {"j": [1, 1e2] }
 {"j":1}
 {"j":"[1] x"}
-{"j":"�"}
+{"j":{"$text":true,"encoded":"/w=="}}
 {"j":"\"\n\""}' '' -- list other.db t --format jsonl
 finish
