@@ -23,7 +23,9 @@ bool IsFoundByIndex(const Node& Leaf) {
         case Op::kIn:
             return !Leaf.jOperand.empty();
         default:
-            return true;
+            // JSON's true within a value is neither a number nor a text, which an index has.
+            return !Leaf.jOperand.isBool() ||
+                   Leaf.strMember.find_first_of(".[") == std::string::npos;
     }
 }
 

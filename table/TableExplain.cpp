@@ -21,10 +21,11 @@ using vornjsondb::LintCode;
 using vornjsondb::OwnStatement;
 using Parts = Table::Parts;
 
+// Each needs an index of its own.
 std::string Joined(const std::vector<std::string>& vecNames) {
     std::string strJoined;
     for (const std::string& strName : vecNames) {
-        strJoined += (strJoined.empty() ? "" : ", ") + vornjsondb::Quoted(strName);
+        strJoined += (strJoined.empty() ? "" : ", and one on ") + vornjsondb::Quoted(strName);
     }
     return strJoined;
 }

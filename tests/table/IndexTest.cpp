@@ -254,7 +254,7 @@ TEST_F(IndexTest, ListsAreFoundByAnIndex) {
 
 TEST_F(IndexTest, AdviceNamesWhatEveryPartNeeds) {
     EXPECT_EQ(ExplainWhere(R"({"$or": [{"size": 5}, {"name": "a"}]})"),
-              FullScan("\"size\", \"name\""));
+              FullScan("\"size\", and one on \"name\""));
     EXPECT_EQ(ExplainWhere(R"({"size": {"$ne": 5}, "name": "a"})"), FullScan("\"name\""));
     EXPECT_EQ(ExplainWhere(R"({"$or": [{"size": 5}, {"rate": {"$ne": 1}}], "name": "a"})"),
               FullScan("\"name\""));
@@ -267,7 +267,8 @@ TEST_F(IndexTest, NoAdviceWhereNoIndexHelps) {
     for (const char* szWhere :
          {R"({"size": {"$ne": 5}})", R"({"size": {"$in": []}})", R"({"name": {"$like": "a%"}})",
           R"({"size": {"$null": false}})", R"({"$not": {"size": 5}})",
-          R"({"$or": [{"size": 5}, {"size": {"$ne": 6}}]})", "{}"}) {
+          R"({"$or": [{"size": 5}, {"size": {"$ne": 6}}]})", R"({"map.a": true})",
+          R"({"tags[0]": false})", "{}"}) {
         EXPECT_EQ(ExplainWhere(szWhere), "SCAN doc\n") << szWhere;
     }
     for (const char* szWhere : {R"({"tags": {"$contains": 1}})", R"({"size": {"$nin": [5]}})"}) {
