@@ -122,8 +122,8 @@ class Import {
 };
 
 int Import::Run() {
-    OpenFile();
     try {
+        OpenFile();
         FindDefinition();
         if (m_Call.Has("--dry-run")) {
             return ShowDryRun();
@@ -136,7 +136,9 @@ int Import::Run() {
         if (m_blGuessed && ExitMayBeTypes(Failed.nExit)) {
             throw WrongGuess();
         }
-        if (!m_Call.Has("--dry-run")) {
+        // A file that cannot be opened says enough.
+        const bool blOpen = m_pDb != nullptr || Failed.nExit == kExitInterrupted;
+        if (blOpen && !m_Call.Has("--dry-run")) {
             Failed.strLine += WhatIsStored();
         }
         throw;

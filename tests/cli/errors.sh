@@ -80,6 +80,13 @@ mkfifo go
 until [[ -s held ]]; do sleep 0.05; done
 expect 6 '' 'error: shop.db: database is locked (waited 10 ms); try again, or wait longer with --wait MS' \
     -- list shop.db product --wait 10
+"$VORNJSONDB" insert shop.db product /dev/null --wait 600000 2>err &
+pid=$!
+until [[ $(sed -n 's/^SigCgt:.*\(.\)$/\1/p' /proc/$pid/status) == [2367abef] ]]; do sleep 0.01; done
+kill -INT "$pid"
+wait "$pid"
+same 'exit after Ctrl-C while nobody may read' $? 130
+same 'Ctrl-C while nobody may read' "$(cat err)" 'error: interrupted (nothing is stored)'
 : >go
 wait
 rm go
