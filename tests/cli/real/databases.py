@@ -7,6 +7,7 @@ What the command says is compared with what SQLite says by itself.
 import base64
 import glob
 import json
+import math
 import shutil
 import sqlite3
 import sys
@@ -122,10 +123,13 @@ def IsValue(found, stored, declared):
     if isinstance(stored, bytes):
         return found == {'$base64': ('boolean', True), 'encoded': base64.b64encode(stored).decode()}
     if isinstance(stored, str):
-        # JSON has no bytes that are not UTF-8.
-        stored = stored.encode('utf-8', 'surrogateescape').decode('utf-8', 'replace')
+        raw = stored.encode('utf-8', 'surrogateescape')
+        if raw.decode('utf-8', 'replace').encode() != raw:
+            return found == {'$text': ('boolean', True), 'encoded': base64.b64encode(raw).decode()}
         if declared.upper() == 'JSON' and IsJson(stored):
             return found == Exact(stored)
+    if stored in (math.inf, -math.inf):
+        return found == {'$real': 'inf' if stored > 0 else '-inf'}
     if stored in (0, 1) and declared.upper() in ('BOOL', 'BOOLEAN'):
         return found == ('boolean', stored == 1)
     return found == stored and isinstance(found, float) == isinstance(stored, float)
