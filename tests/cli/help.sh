@@ -44,8 +44,8 @@ def until(mark):
     while not seen.endswith(mark):
         seen += os.read(terminal, 1)
     return seen
-send("""bind 'set enable-bracketed-paste off'; bind 'set bell-style none'; source script.bash; shown() { printf '\\n<%s>%s\\n' "$READLINE_LINE" done; READLINE_LINE=; READLINE_POINT=0; }; bind -x '"\\C-x": shown'; printf 'rea%s\\n' dy\n""")
-until(b'ready\r\n')
+send("""bind 'set enable-bracketed-paste off'; bind 'set bell-style none'; source script.bash; shown() { printf '\\n<%s>%s\\n' "$READLINE_LINE" done; READLINE_LINE=; READLINE_POINT=0; }; bind -x '"\\C-x": shown'; PS1=$(printf 'rea%s' dy)\n""")
+until(b'ready')  # the prompt: from now on keys are bash's own
 send(sys.argv[1] + '\t\x18')
 print(until(b'>done\r\n').decode().rsplit('\n<', 1)[1][:-7])
 END
