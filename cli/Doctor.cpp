@@ -47,10 +47,11 @@ std::string ProcessName(const std::string& strPid) {
 // A process may hold several locks, and stands in one row.
 void AddMeaning(const std::string& strProcess, const std::string& strMeaning, Json::Value& jRows) {
     for (Json::Value& jRow : jRows) {
-        const std::string strResult = jRow["result"].asString();
+        std::string strResult = jRow["result"].asString();
         if (strResult.compare(0, strProcess.size(), strProcess) == 0) {
-            const bool blSaid = strResult.find(strMeaning, strProcess.size()) != std::string::npos;
-            jRow["result"] = strResult + (blSaid ? "" : ", " + strMeaning);
+            if (strResult.find(strMeaning, strProcess.size()) == std::string::npos) {
+                jRow["result"] = strResult.append(", ").append(strMeaning);
+            }
             return;
         }
     }
