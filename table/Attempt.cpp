@@ -45,7 +45,10 @@ Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce) {
     while (IsLock(Outcome) && Left.Wait()) {
         Outcome = fnOnce();
     }
-    return IsLock(Outcome) ? Amended(Outcome, Retry::kCall, WaitedText(nWaitMs)) : Outcome;
+    if (IsLock(Outcome)) {
+        return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
+    }
+    return Outcome;
 }
 
 int RunOnce(sqlite3_stmt* pStatement) {
