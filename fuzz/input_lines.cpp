@@ -48,8 +48,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
             Require(IsRecord(Each, jRecord), "a record is what its line says");
         }
     }
-    // A byte order mark counts at the input's begin alone.
-    if (strText.find_first_of("\xEF\xFE\xFF") == std::string::npos) {
+    // A byte order mark, and zeros that tell an encoding, count at the input's begin alone.
+    constexpr std::string_view kEncodingBytes("\xEF\xFE\xFF\0", 4);
+    if (strText.find_first_of(kEncodingBytes) == std::string::npos) {
         Require(ReadAlone(strText, How, Found) == Found.vecRecords.size(), "no record is made up");
     }
     return 0;

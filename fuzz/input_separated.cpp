@@ -75,6 +75,10 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
     ReadOptions Plain = How;
     Plain.blHeader = false;
     Plain.blQuotes = true;
-    RequireSameCells(Found, Read(Written(Found, How.cDelimiter), 0, Plain));
+    const std::string strAgain = Written(Found, How.cDelimiter);
+    const bool blEncoding = strAgain.find('\0') < 4;  // zeros in the begin tell one
+    if (!blEncoding) {
+        RequireSameCells(Found, Read(strAgain, 0, Plain));
+    }
     return 0;
 }

@@ -22,16 +22,16 @@ FakeTime::~FakeTime() {
     g_pFake = nullptr;
 }
 
-void FakeTime::Sleep(long nNanoseconds) {
+void FakeTime::Sleep(long long nNanoseconds) {
     m_nPassed += nNanoseconds;
-    m_vecPauses.push_back(nNanoseconds / 1000000);
+    m_vecPauses.push_back(static_cast<long>(nNanoseconds / 1000000));
     m_fnAtPause(static_cast<int>(m_vecPauses.size()));
 }
 
 // Found before the C library's own. While there is no FakeTime nobody sleeps here.
 extern "C" int nanosleep(const timespec* pWanted, timespec*) {
     if (g_pFake != nullptr) {
-        g_pFake->Sleep(static_cast<long>(pWanted->tv_sec) * kSecond + pWanted->tv_nsec);
+        g_pFake->Sleep(static_cast<long long>(pWanted->tv_sec) * kSecond + pWanted->tv_nsec);
     }
     return 0;
 }

@@ -17,7 +17,7 @@ class FakeTime {
     // The pauses so far, in milliseconds.
     const std::vector<long>& Pauses() const { return m_vecPauses; }
 
-    void Sleep(long nNanoseconds);
+    void Sleep(long long nNanoseconds);
     long long Passed() const { return m_nPassed; }  // nanoseconds
 
   private:
