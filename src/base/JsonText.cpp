@@ -63,7 +63,7 @@ bool JsonCodec::Read(const char* szText, size_t nLength, Json::Value& jOut) {
         return true;
     }
     try {
-        // mutate(true, sunk): one that is made for each text reads the same.
+        // mutate(true, sunk, hoisted): one that is made for each text reads the same.
         if (!m_pReader) {
             m_pReader.reset(NewReader());
         }
