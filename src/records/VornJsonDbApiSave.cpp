@@ -20,12 +20,11 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
     const KnownTable& Table = Handle.LookUp();
     std::string strSql;
     const auto Save = [&]() -> int {
+        const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), &jRec);
         Json::Value jArrayTmp(Json::arrayValue);
         strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
-        // mutate(exchanged): the walk changes nothing.
         strSql.append(Handle.strName).append(" (");
-        const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), &jRec);
         AppendMemberNames(vecValues, strSql);
         strSql.append(") VALUES (");
         VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, vecValues, jRec, strSql),

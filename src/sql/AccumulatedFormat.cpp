@@ -36,7 +36,9 @@ void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue
     }
     const size_t nBefore = m_strText.length();
     Type.pfnAppend(jValue, m_strText);
-    m_blLiteral = m_strText.find('%', nBefore) == std::string::npos;
+    // Numbers, which hold no percent sign, stand without quotes.
+    // mutate(exchanged, || to &&): the longer way gives the same.
+    m_blLiteral = m_strText[nBefore] != '\'' || m_strText.find('%', nBefore) == std::string::npos;
 }
 
 // What the formatter makes of the text and the specifier behind it: the text ends at a NUL, "%%" is
