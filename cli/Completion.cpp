@@ -9,6 +9,7 @@
 #include "Commands.h"
 #include "Database.h"
 #include "Parse.h"
+#include "Tables.h"
 
 namespace VORN_JSON_DB::Cli {
 

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
-#include "Database.h"
 #include "JsonCells.h"
+#include "JsonFile.h"
 #include "input/Numbers.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -8,6 +8,7 @@
 #include "Commands.h"
 #include "Database.h"
 #include "Output.h"
+#include "Sql.h"
 
 namespace VORN_JSON_DB::Cli {
 

@@ -7,7 +7,11 @@
 
 #include "Commands.h"
 #include "Database.h"
+#include "Definitions.h"
 #include "JsonCells.h"
+#include "JsonFile.h"
+#include "Sql.h"
+#include "Tables.h"
 #include "input/ByteSource.h"
 #include "input/Interrupt.h"
 #include "input/LineBuffer.h"

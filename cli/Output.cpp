@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "Database.h"
 #include "JsonCells.h"
+#include "Sql.h"
 #include "Terminal.h"
 #include "input/JsonText.h"
 

@@ -6,8 +6,11 @@
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
+#include "Definitions.h"
 #include "JsonCells.h"
 #include "Output.h"
+#include "Sql.h"
+#include "Tables.h"
 #include "input/NewDefinition.h"
 
 namespace VORN_JSON_DB::Cli {

@@ -5,6 +5,9 @@
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
+#include "JsonFile.h"
+#include "Replacements.h"
+#include "Tables.h"
 #include "input/Numbers.h"
 
 namespace VORN_JSON_DB::Cli {

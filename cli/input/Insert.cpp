@@ -7,6 +7,10 @@
 #include <optional>
 
 #include "../Database.h"
+#include "../Definitions.h"
+#include "../Replacements.h"
+#include "../Sql.h"
+#include "../Tables.h"
 #include "InputFiles.h"
 #include "Interrupt.h"
 #include "LoaderSink.h"

@@ -4,8 +4,8 @@
 #include <utility>
 
 #include "../Command.h"
-#include "../Database.h"
 #include "../JsonCells.h"
+#include "../Tables.h"
 #include "InputFiles.h"
 #include "JsonText.h"
 #include "Numbers.h"

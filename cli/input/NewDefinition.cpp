@@ -3,7 +3,7 @@
 #include <utility>
 
 #include "../../src/schema/MemberType.h"
-#include "../Database.h"
+#include "../JsonFile.h"
 
 namespace VORN_JSON_DB::Cli {
 

@@ -24,23 +24,20 @@ same 'a dumb terminal' "$(on_terminal 80 "TERM=dumb '$VORNJSONDB' lst")" \
 # A bar for what takes longer than a second, erased before the summary. Records are fed until it is there.
 mkfifo feed
 "$VORNJSONDB" init bar.db t a:int --quiet
-script -qfec "stty cols 80; '$VORNJSONDB' insert bar.db t feed --format jsonl" log >/dev/null </dev/null &
-exec 3>feed
-until grep -q inserting log; do
-    printf '{"a": 1}\n' >&3
-done
-exec 3>&-
-wait
-bar=$(tr '\r' '\n' <log | grep -a inserting | head -n 1 | sed 's/[0-9][0-9,]*/N/g; s/\x1b\[K$/<erase>/')
-same 'a bar' "$bar" 'inserting N MB  N records  N/s<erase>'
-script -qfec "stty cols 12; '$VORNJSONDB' insert bar.db t feed --format jsonl" log >/dev/null </dev/null &
-exec 3>feed
-until grep -q inserting log; do
-    printf '{"a": 1}\n' >&3
-done
-exec 3>&-
-wait
-same 'a narrow bar' "$(tr '\r' '\n' <log | grep -a inserting | head -n 1 | sed 's/\x1b\[K$/<erase>/; s/[0-9]/N/g')" 'inserting N<erase>'
+
+# bar COLUMNS prints the first bar on a terminal of that width; log keeps all.
+bar() {
+    script -qfec "stty cols $1; '$VORNJSONDB' insert bar.db t feed --format jsonl" log >/dev/null </dev/null &
+    exec 3>feed
+    until grep -q inserting log; do
+        printf '{"a": 1}\n' >&3
+    done
+    exec 3>&-
+    wait
+    tr '\r' '\n' <log | grep -a inserting | head -n 1 | sed 's/[0-9][0-9,]*/N/g; s/\x1b\[K$/<erase>/'
+}
+same 'a bar' "$(bar 80)" 'inserting N MB  N records  N/s<erase>'
+same 'a narrow bar' "$(bar 12)" 'inserting N<erase>'
 same 'the summary' "$(tr -d '\r' <log | grep -a skipped | sed 's/^.*\x1b\[K/<erase>/; s/[0-9][0-9]*/N/')" \
     '<erase>N inserted, 0 replaced, 0 skipped, 0 failed (feed: JSON Lines)'
 finish

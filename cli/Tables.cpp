@@ -1,0 +1,77 @@
+#include "Tables.h"
+
+#include <algorithm>
+
+#include "../table/Affinity.h"
+#include "Sql.h"
+
+namespace VORN_JSON_DB::Cli {
+
+bool SameName(const std::string& strLeft, const std::string& strRight) {
+    return sqlite3_stricmp(strLeft.c_str(), strRight.c_str()) == 0;
+}
+
+bool HasName(const std::vector<std::string>& vecNames, const std::string& strName) {
+    return std::any_of(vecNames.begin(), vecNames.end(),
+                       [&](const std::string& strEach) { return SameName(strEach, strName); });
+}
+
+std::vector<std::string> TableNames(sqlite3* pDb) {
+    return Texts(pDb,
+                 "SELECT name FROM sqlite_master WHERE type = 'table' AND name NOT LIKE "
+                 "'sqlite\\_%' ESCAPE '\\' AND name <> 'vornjsondb_definition' ORDER BY name");
+}
+
+bool TableExists(sqlite3* pDb, const std::string& strTable) {
+    return HasName(Texts(pDb, kTablesAndViews), strTable);
+}
+
+void FailNoTable(const Context& Call, sqlite3* pDb) {
+    const std::string strHint = NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews));
+    Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
+                            (strHint.empty() ? "; see vornjsondb tables" : strHint));
+}
+
+void CheckNewName(const std::string& strTable) {
+    if (strTable.empty()) {
+        Fail(kExitUsage, "the name of the new table is empty; give it one");
+    }
+    if (sqlite3_strnicmp(strTable.c_str(), "sqlite_", 7) == 0) {
+        Fail(kExitUsage,
+             "\"" + strTable + "\": names that begin with sqlite_ are SQLite's own; take another");
+    }
+}
+
+std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
+    // A SQLite that knows no such pragma knows no STRICT table, either.
+    const Statement pList = Prepare(pDb, "PRAGMA main.table_list(" + Quoted(strTable) + ")");
+    const bool blStrict = Step(pList.get()) && sqlite3_column_int(pList.get(), 5) != 0;
+    if (!blStrict) {
+        return {};
+    }
+    return Texts(pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE",
+                 strTable);
+}
+
+std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable) {
+    using vornjsondb::Affinity;
+    const std::vector<std::string> vecAny = AnyColumns(pDb, strTable);
+    const Statement pLook = Prepare(pDb, "SELECT name, type FROM pragma_table_info(?1)", strTable);
+    std::vector<std::string> vecNames;
+    while (Step(pLook.get())) {
+        const std::string strName = ColumnText(pLook.get(), 0);
+        const Affinity eAffinity = vornjsondb::AffinityOf(ColumnText(pLook.get(), 1));
+        if (eAffinity != Affinity::kNone && eAffinity != Affinity::kText &&
+            !HasName(vecAny, strName)) {
+            vecNames.push_back(strName);
+        }
+    }
+    return vecNames;
+}
+
+std::string NumberColumnText(const std::string& strColumn, std::string_view strText) {
+    return "member \"" + strColumn + "\": its column would turn the text \"" +
+           std::string(strText) + "\" into a number: give a number, or make the column TEXT";
+}
+
+}  // namespace VORN_JSON_DB::Cli
