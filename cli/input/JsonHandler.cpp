@@ -95,6 +95,7 @@ bool JsonHandler::NoRecord(const Value& Given, const char* szKind) {
     } else if (strTaken.empty()) {
         strTaken = szKind;  // null, true, false
     }
+    m_eList = List::kNone;  // an object that follows is a record, too
     BeginRecord(strTaken);
     Blame(std::string("the record is ") + szKind + ", not an object");
     return EndRecord();

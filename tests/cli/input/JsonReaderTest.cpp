@@ -73,6 +73,9 @@ TEST(JsonReader, WhatIsWrongWithOneRecordHarmsNoOther) {
               "6@6: bad: the record is true, not an object\n"
               "7@7: bad: the member \"a\" is there twice\n"
               "8@8: a=4\n");
+    EXPECT_EQ(Json("1 {\"x\": [{\"a\": 2}]}"),
+              "1@1: bad: the record is a number, not an object\n"
+              "2@1: x=[{\"a\":2}]\n");
     EXPECT_EQ(
         Json("[{\"a\":\"\\udc00\"},{\"\\udfff\":1},{\"a\":[\"\\udc00\"]},{\"a\":\"\\ud7ff\"}]"),
         "1@1: bad: \\u gives half of a surrogate pair\n"
