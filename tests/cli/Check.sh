@@ -26,6 +26,15 @@ same() {
     fi
 }
 
+# until_handles_interrupt PID: until the command is the process, no longer a copy of this shell, and answers
+# Ctrl-C itself.
+until_handles_interrupt() {
+    until [[ $(</proc/"$1"/comm) == vornjsondb &&
+        $(sed -n 's/^SigCgt:.*\(.\)$/\1/p' /proc/"$1"/status) == [2367abef] ]]; do
+        sleep 0.01
+    done
+}
+
 finish() {
     exit $((failures > 0))
 }

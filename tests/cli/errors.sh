@@ -82,7 +82,7 @@ expect 6 '' 'error: shop.db: database is locked (waited 10 ms); try again, or wa
     -- list shop.db product --wait 10
 "$VORNJSONDB" insert shop.db product /dev/null --wait 600000 2>err &
 pid=$!
-until [[ $(sed -n 's/^SigCgt:.*\(.\)$/\1/p' /proc/$pid/status) == [2367abef] ]]; do sleep 0.01; done
+until_handles_interrupt "$pid"
 kill -INT "$pid"
 wait "$pid"
 same 'exit after Ctrl-C while nobody may read' $? 130

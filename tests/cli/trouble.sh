@@ -342,7 +342,8 @@ same 'who holds it' "$(grep writes out | sed 's/[0-9]\+/N/')" 'lock          pro
 # later is not the first to give up.
 "$VORNJSONDB" insert all.db t lines --wait 600000 2>err &
 pid=$!
-until [[ $(cut -d ' ' -f 3 /proc/$pid/stat) == S && $(sed -n 's/^SigCgt:.*\(.\)$/\1/p' /proc/$pid/status) == [2367abef] ]]; do sleep 0.01; done
+until_handles_interrupt "$pid"
+until [[ $(cut -d ' ' -f 3 /proc/$pid/stat) == S ]]; do sleep 0.01; done
 kill -INT "$pid"
 wait "$pid"
 same 'exit after Ctrl-C while it waits' $? 130
