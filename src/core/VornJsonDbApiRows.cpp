@@ -65,12 +65,15 @@ int FillColumns(Json::Value& jRec, const TableTypes& Types, int n_column, char**
     return 0;
 }
 
-// One row into a record behind those of jRecArray, which stays as it is when the row fails.
-int DbCallBackFillRec(Json::Value& jRecArray, int n_column, char** column_value,
+// What becomes of a row's record.
+using Keep = void (*)(Json::Value& jOut, Json::Value&& jRec);
+
+// One row into a record; jOut stays as it is when the row fails.
+int DbCallBackFillRec(Keep pfnKeep, Json::Value& jOut, int n_column, char** column_value,
                       char** column_name) {
     VORN_FAIL_IF(NULL == column_name || NULL == column_value);
     if (n_column < 1) {
-        jRecArray.append(Json::Value(Json::objectValue));
+        pfnKeep(jOut, Json::Value(Json::objectValue));
         return 0;
     }
     VORN_FAIL_IF_TEXT(NULL == column_name[0], "NULL == column_name[i]");
@@ -80,27 +83,48 @@ int DbCallBackFillRec(Json::Value& jRecArray, int n_column, char** column_value,
         vornjsondb::LookUpTable(Json::Value::nullSingleton(), g_strCurTable);
     const RowTemplate* pTemplate = Table.TemplateFor(n_column, column_name);
     if (pTemplate != nullptr) {
-        jRecArray.append(pTemplate->Record(column_value));
+        pfnKeep(jOut, pTemplate->Record(column_value));
         return 0;
     }
     Json::Value jRec(Json::objectValue);
     if (0 > FillColumns(jRec, Table.Types(), n_column, column_value, column_name)) {
         return -1;
     }
-    jRecArray.append(std::move(jRec));
+    pfnKeep(jOut, std::move(jRec));
     return 0;
 }
 
-}  // namespace
-
-int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** column_name) try {
-    Json::Value* pjRecArray = static_cast<Json::Value*>(pArg);
-    VORN_FAIL_IF(!pjRecArray);
-    VORN_FAIL_IF(pjRecArray->type() != Json::arrayValue && pjRecArray->type() != Json::nullValue);
-    VORN_FAIL_IF_TEXT(0 > DbCallBackFillRec(*pjRecArray, n_column, column_value, column_name),
+// The same for SQLite, through whose frames no exception must pass.
+int DbCallBackFill(Keep pfnKeep, Json::Value& jOut, int n_column, char** column_value,
+                   char** column_name) try {
+    VORN_FAIL_IF_TEXT(0 > DbCallBackFillRec(pfnKeep, jOut, n_column, column_value, column_name),
                       "0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)");
     return 0;
 } catch (const std::exception&) {
     VORN_LOG_CONDITION("0 > DbCallBackFillRec(&jTmp, n_column, column_value, column_name)");
     return -1;
+}
+
+void AppendToArray(Json::Value& jArray, Json::Value&& jRec) {
+    jArray.append(std::move(jRec));
+}
+
+void KeepFirst(Json::Value& jFirst, Json::Value&& jRec) {
+    if (jFirst.isNull()) {
+        jFirst.swapPayload(jRec);
+    }
+}
+
+}  // namespace
+
+int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** column_name) {
+    Json::Value* pjRecArray = static_cast<Json::Value*>(pArg);
+    VORN_FAIL_IF(!pjRecArray);
+    VORN_FAIL_IF(pjRecArray->type() != Json::arrayValue && pjRecArray->type() != Json::nullValue);
+    return DbCallBackFill(AppendToArray, *pjRecArray, n_column, column_value, column_name);
+}
+
+int DbCallBackFillFirst(void* pArg, int n_column, char** column_value, char** column_name) {
+    return DbCallBackFill(KeepFirst, *static_cast<Json::Value*>(pArg), n_column, column_value,
+                          column_name);
 }

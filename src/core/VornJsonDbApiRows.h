@@ -7,4 +7,9 @@
 // an exception must not pass through SQLite's frames.
 int DbCallBackFillList(void* pArg, int n_column, char** column_value, char** column_name);
 
+// The same for the first row alone, into a record (Json::Value*, null before; it stays null where
+// there is no row). The rows behind it are read, too, so that one that no record can be made of
+// fails here as in a list, but nothing of them is kept.
+int DbCallBackFillFirst(void* pArg, int n_column, char** column_value, char** column_name);
+
 #endif  // VORN_CORE_VORN_JSON_DB_API_ROWS_H

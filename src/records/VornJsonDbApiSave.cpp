@@ -20,8 +20,8 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
     const KnownTable& Table = Handle.LookUp();
     std::string strSql;
     const auto Save = [&]() -> int {
-        const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), &jRec);
-        Json::Value jArrayTmp(Json::arrayValue);
+        const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), jRec);
+        Json::Value jRow;
         strSql.reserve(kUsualStatement);
         strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
         strSql.append(Handle.strName).append(" (");
@@ -32,7 +32,7 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
         strSql.append(";select * from ").append(Handle.strName);
         strSql.append(" where rowid == last_insert_rowid();");
         VORN_FAIL_IF(strSql.empty());  // GCOVR_EXCL_BR_LINE: never is; kept as a guard
-        VORN_FAIL_IF_TEXT(0 > RunSql(Handle, strSql, DbCallBackFillList, &jArrayTmp),
+        VORN_FAIL_IF_TEXT(0 > RunSql(Handle, strSql, DbCallBackFillFirst, &jRow),
                           "0 > runSqlEx(strSql, DbCallBackFillList, &jArrayTmp)");
         // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!Handle.strSqlError.empty()) {
@@ -40,8 +40,8 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
             return -1;
         }
         // GCOVR_EXCL_STOP
-        VORN_FAIL_IF(0 == jArrayTmp.size());
-        jStored.swap(*jArrayTmp.begin());
+        VORN_FAIL_IF_TEXT(jRow.isNull(), "0 == jArrayTmp.size()");
+        jStored.swap(jRow);
         return 0;
     };
     if (0 <= Save()) {

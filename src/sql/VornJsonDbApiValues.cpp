@@ -15,16 +15,25 @@
 // Pinned by Names.MissingLastMemberLeavesATrailingComma.
 
 std::vector<vornjsondb::DeclaredValue> vornjsondb::DeclaredValues(const Json::Value& jMember,
-                                                                  const Json::Value* pjRec) {
-    MemberCursor Record(pjRec != nullptr ? *pjRec : Json::Value::nullSingleton());
+                                                                  const Json::Value& jRec) {
+    MemberCursor Record(jRec);
     std::vector<DeclaredValue> vecValues;
     vecValues.reserve(jMember.size());
     const Json::Value::const_iterator itEnd = jMember.end();
     for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
         const MemberName Name = NameOf(it);
-        vecValues.push_back({Name, pjRec != nullptr ? Record.Find(Name) : &*it});
+        vecValues.push_back({Name, Record.Find(Name)});
     }
     return vecValues;
+}
+
+void vornjsondb::AppendDeclaredNames(const Json::Value& jMember, std::string& strSql) {
+    const Json::Value::const_iterator itBegin = jMember.begin();
+    const Json::Value::const_iterator itEnd = jMember.end();
+    for (Json::Value::const_iterator it = itBegin; it != itEnd; ++it) {
+        const MemberName Name = NameOf(it);
+        strSql.append(",", it != itBegin ? 1 : 0).append(Name.pBegin, Name.Length());
+    }
 }
 
 void vornjsondb::AppendMemberNames(const std::vector<DeclaredValue>& vecValues,
@@ -71,12 +80,16 @@ int vornjsondb::AppendMemberValues(const HandleParts& Handle,
 
 int VornJsonDbApi::SqlExpandMemberName(std::string& strSql, Json::Value* pjRec) {
     const Json::Value& jMember = vornjsondb::DeclaredMembers(m_jTableDef, m_strName);
-    vornjsondb::AppendMemberNames(vornjsondb::DeclaredValues(jMember, pjRec), strSql);
+    if (pjRec == nullptr) {
+        vornjsondb::AppendDeclaredNames(jMember, strSql);
+    } else {
+        vornjsondb::AppendMemberNames(vornjsondb::DeclaredValues(jMember, *pjRec), strSql);
+    }
     return 0;
 }
 
 int VornJsonDbApi::SqlExpandMemberSymbol(std::string& strSql, Json::Value& jRec) {
     const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
     return vornjsondb::AppendMemberValues(
-        Handle, vornjsondb::DeclaredValues(Handle.Declared(), &jRec), jRec, strSql);
+        Handle, vornjsondb::DeclaredValues(Handle.Declared(), jRec), jRec, strSql);
 }

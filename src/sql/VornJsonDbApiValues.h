@@ -17,10 +17,13 @@ struct DeclaredValue {
     const Json::Value* pjValue;
 };
 
-// All declared members in key order, walked once for both lists. Without a record none is lacking.
-std::vector<DeclaredValue> DeclaredValues(const Json::Value& jMember, const Json::Value* pjRec);
+// All declared members in key order, walked once for both lists.
+std::vector<DeclaredValue> DeclaredValues(const Json::Value& jMember, const Json::Value& jRec);
 
-// SqlExpandMemberName of these.
+// SqlExpandMemberName of all that are declared, without a record.
+void AppendDeclaredNames(const Json::Value& jMember, std::string& strSql);
+
+// SqlExpandMemberName of a record's.
 void AppendMemberNames(const std::vector<DeclaredValue>& vecValues, std::string& strSql);
 
 // SqlExpandMemberSymbol of these, which are jRec's.
