@@ -172,9 +172,11 @@ ReadInput Read(const std::string& strText, size_t nBefore, const ReadOptions& Ho
 
 ReadInput ReadTwice(const std::string& strText, unsigned nShift, const ReadOptions& How) {
     ReadInput Found = Read(strText, 0, How);
-    // A mark in the input's begin is none behind line feeds, nor do zeros tell an encoding there.
-    const bool blMark = !strText.empty() &&
-                        (static_cast<unsigned char>(strText[0]) >= 0x80 || strText.find('\0') < 4);
+    // A mark in the input's begin is none behind line feeds, nor do zeros tell an encoding there,
+    // or a first line the delimiter.
+    const bool blMark =
+        !strText.empty() && (static_cast<unsigned char>(strText[0]) >= 0x80 ||
+                             strText.find('\0') < 4 || strText.compare(0, 4, "sep=") == 0);
     // One object is refused where it is large.
     const bool blOneObject = How.eFormat == Format::kJson && Found.vecRecords.size() == 1;
     if (nShift > 0 && nShift <= strText.size() && !blMark && !blOneObject) {

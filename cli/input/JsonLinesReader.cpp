@@ -65,7 +65,7 @@ class LinesReader {
             return m_Handler.Broken("there is a NUL byte");
         }
         m_Handler.MayHaveEscapes(strLine.find('\\') != std::string_view::npos);
-        rapidjson::InsituStringStream Stream(pBegin);
+        rapidjson::InsituStringStream Stream(blChecked ? pBegin : Copy(strLine));
         rapidjson::SkipWhitespace(Stream);
         while (Stream.Peek() != '\0') {
             const rapidjson::ParseResult Parsed =
@@ -82,6 +82,14 @@ class LinesReader {
         return true;
     }
 
+    // The line by itself. A sequence of UTF-8 that its end cuts short is read with the bytes behind
+    // it, and written where the text goes, which need not be the same place.
+    char* Copy(std::string_view strLine) {
+        constexpr size_t kLongestSequence = 4;
+        m_strCopy.assign(strLine).append(kLongestSequence, '\0');
+        return m_strCopy.data();
+    }
+
     std::string Problem(const rapidjson::ParseResult& Parsed) const {
         if (Parsed.Code() == rapidjson::kParseErrorTermination) {
             return m_Handler.Reason();
@@ -94,6 +102,7 @@ class LinesReader {
     LinePosition m_At;
     JsonHandler m_Handler;
     rapidjson::Reader m_Reader;
+    std::string m_strCopy;
 };
 
 }  // namespace

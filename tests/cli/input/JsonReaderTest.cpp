@@ -221,6 +221,14 @@ TEST(JsonLinesReader, BadLinesHarmNoOther) {
               "1@1: bad: lists and objects are nested more than 1000 levels deep\n2@2: a=3\n");
 }
 
+// The bytes that a sequence of UTF-8 lacks are not taken from the next line.
+TEST(JsonLinesReader, ASequenceCutByTheLinesEndHarmsNoOtherLine) {
+    for (const char* szCut : {"\xC3", "\xE6\xBC", "\xF2", "\xF2\x80", "\xF2\x80\x80"}) {
+        EXPECT_EQ(Lines("{\"a\":\"\\\\" + std::string(szCut) + "\n{\"b\":1}"),
+                  "1@1: bad: a text is no UTF-8; convert the input with iconv\n2@2: b=1\n");
+    }
+}
+
 // Texts are read in steps of several bytes: what is wrong is found at each place of a step.
 TEST(JsonLinesReader, ABadByteIsFoundAtEachPlaceOfAText) {
     const std::string strControl =
