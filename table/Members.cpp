@@ -57,7 +57,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
-        const std::string strName = TextOf(NameOf(it));
+        std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
             Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
@@ -79,7 +79,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
                        IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false});
             m_vecByColumn.insert(PlaceOfColumn(strName), m_vecNames.size());
-            m_vecNames.push_back(strName);
+            m_vecNames.push_back(std::move(strName));
         }
     }
 }
@@ -91,7 +91,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     const Json::ArrayIndex nNames = jKey.isArray() ? jKey.size() : 1;
     for (Json::ArrayIndex i = 0; i < nNames; ++i) {
         const Json::Value& jName = jKey.isArray() ? jKey[i] : jKey;
-        const std::string strName = jName.isString() ? jName.asString() : std::string();
+        std::string strName = jName.isString() ? jName.asString() : std::string();
         // mutate(exchanged): in any order.
         if (Find(strName) == kNone) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,
@@ -101,7 +101,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
             Report(vecFindings, FindingCode::kNamedTwice, strPath,
                    Concat({ShownText(strName), " is named twice"}));
         }
-        vecNames.push_back(strName);
+        vecNames.push_back(std::move(strName));
     }
     // mutate(doubled): the same key once more.
     SetKey(vecNames);

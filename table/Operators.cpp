@@ -84,7 +84,7 @@ std::string OperatorSuggestion(std::string_view strName) {
     }
     std::vector<std::string> vecNames;
     for (const char* szName : {"$and", "$or", "$not"}) {
-        vecNames.emplace_back(szName);
+        vecNames.push_back(szName);
     }
     for (const Operator& Row : kOperators) {
         std::string strOne = Row.szName;

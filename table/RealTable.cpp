@@ -81,6 +81,12 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
     return {};
 }
 
+// The database that holds the table; strDatabase stays as it is where none does.
+int FindDatabase(sqlite3* pDb, const std::string& strTable, std::string& strDatabase) {
+    return ForEachRow(pDb, kDatabaseSql, strTable,
+                      [&](const OwnStatement& pRow) { strDatabase = TextColumn(pRow, 0); });
+}
+
 }  // namespace
 
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
@@ -95,8 +101,10 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
                                             NumberColumn(pRow, 5) > kHidden});
         // From 1; 0: outside of the key.
         const auto nPlaceInKey = static_cast<size_t>(NumberColumn(pRow, 3));
+        while (Out.vecKey.size() < nPlaceInKey) {
+            Out.vecKey.push_back(std::string());
+        }
         if (nPlaceInKey > 0) {
-            Out.vecKey.resize(std::max(Out.vecKey.size(), nPlaceInKey));
             Out.vecKey[nPlaceInKey - 1] = Out.vecColumns.back().strName;
         }
     });
@@ -110,10 +118,21 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     return nResult;
 }
 
+int HasJsonIndex(sqlite3* pDb, const std::string& strTable, bool& blHas) {
+    std::string strDatabase = "main";
+    const int nResult = FindDatabase(pDb, strTable, strDatabase);
+    if (nResult != SQLITE_OK) {
+        return nResult;
+    }
+    const std::string strSql =
+        Concat({"SELECT 1 FROM ", Quoted(strDatabase),
+                ".sqlite_schema WHERE type = 'index' AND tbl_name = ?1 COLLATE NOCASE"
+                " AND instr(sql, 'json_') LIMIT 1"});
+    return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blHas = true; });
+}
+
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out) {
-    const int nResult = ForEachRow(pDb, kDatabaseSql, strTable, [&](const OwnStatement& pRow) {
-        Out.strDatabase = TextColumn(pRow, 0);
-    });
+    const int nResult = FindDatabase(pDb, strTable, Out.strDatabase);
     if (nResult != SQLITE_OK) {
         return nResult;
     }
@@ -124,14 +143,14 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
                 RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, {}});
         }
         RealIndex& Index = Out.vecAll.back();
-        const std::string strColumn = TextColumn(pRow, 2);
+        std::string strColumn = TextColumn(pRow, 2);
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
         const std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
         if (!IsBinary(strOfColumn) && !IsSameColumn(strOfColumn, strOfIndex)) {
             Index.blFiner = true;
         }
-        Index.vecColumns.push_back(strColumn);
+        Index.vecColumns.push_back(std::move(strColumn));
     });
 }
 

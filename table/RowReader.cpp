@@ -93,7 +93,8 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
         m_vecInKeyOrder.insert(
             itPlace, Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
-        m_vecNames.push_back(Shown.strName);
+        std::string strName = Shown.strName;
+        m_vecNames.push_back(std::move(strName));
     }
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC

@@ -68,16 +68,14 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
 
 // Whatever is written into an index on a place in JSON is wrong for every other program.
 Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
-    vornjsondb::RealIndexes There;
-    const int nResult = vornjsondb::ReadRealIndexes(Of.pDb, Of.Of.Table(), There);
+    bool blJson = false;
+    const int nResult = vornjsondb::HasJsonIndex(Of.pDb, Of.Of.Table(), blJson);
     if (nResult != SQLITE_OK) {
         return FailBySqlite(Of.pDb, nResult, What);
     }
     FindingList vecFindings;
-    for (const vornjsondb::RealIndex& Index : There.vecAll) {
-        if (Index.strSql.find("json_") != std::string::npos) {
-            vornjsondb::CheckFractions("", vecFindings);
-        }
+    if (blJson) {
+        vornjsondb::CheckFractions("", vecFindings);
     }
     return vornjsondb::FromFindings(std::move(vecFindings), What);
 }
@@ -143,7 +141,8 @@ void Table::Parts::Learn(const RealTable& Real) {
     }
     // mutate(exchanged): in any order.
     for (const size_t nMember : Of.Key()) {
-        vecKeyNames.push_back(Of.At(nMember).strName);
+        std::string strName = Of.At(nMember).strName;
+        vecKeyNames.push_back(std::move(strName));
     }
     for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
         const size_t nMember = Of.FindColumn(Column.strName);
