@@ -5,6 +5,7 @@
 #include <charconv>
 #include <cstdio>
 #include <cstring>
+#include <iterator>
 #include <system_error>
 
 #include "../table/Nearest.h"
@@ -61,6 +62,17 @@ constexpr RemedyRow kRemedies[] = {
     {"unknown-type", "see vornjsondb init --help"},
     {"wrong-operator", "$like and $prefix are for texts, $contains is for lists"},
 };
+
+// SQLite's words for a member that the table has no column for.
+constexpr const char* kMissingColumn[] = {"no such column: ", " has no column named "};
+
+bool IsMissingColumn(const Status& Outcome) {
+    return Outcome.Code() == StatusCode::kRefused &&
+           std::any_of(std::begin(kMissingColumn), std::end(kMissingColumn),
+                       [&](const char* szWords) {
+                           return Outcome.Message().find(szWords) != std::string::npos;
+                       });
+}
 
 void CheckOutput(bool blWritten) {
     if (!blWritten) {
@@ -151,6 +163,9 @@ std::string LineOf(const Status& Outcome) {
         if (Found.eSeverity == Severity::kError && !Found.strRemedy.empty()) {
             return Outcome.Message() + "; " + RemedyOf(Found);
         }
+    }
+    if (IsMissingColumn(Outcome)) {
+        return Outcome.Message() + "; vornjsondb sync adds the column";
     }
     const bool blLocked = Outcome.Code() == StatusCode::kLocked;
     return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) + HintFor(Outcome.Code());

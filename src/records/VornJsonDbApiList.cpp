@@ -62,6 +62,7 @@ int VornJsonDbApi::recGetOne(Json::Value& jRecParam, Json::Value& jRecOut) {
     VORN_FAIL_IF_TEXT(0 > ListRows(*this, {m_pDb, m_strName, m_jTableDef, m_strSqlError}, jRecParam,
                                    DbCallBackFillFirst, jFound),
                       "0 > recList(jRecParam, jRecArray)");
+    // mutate(exchanged): what is null is empty, too.
     if (jFound.isNull()) {
         return 0;
     }

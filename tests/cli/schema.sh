@@ -36,6 +36,12 @@ echo '{"product": {"key": "id", "member": {"id": {"cpptype": "int"}, "size": {"c
 same 'lint names subcommands' "$(cut -f 2,3,6 found | grep -v extra-column)" 'severity	code	remedy
 error	missing-column	vornjsondb sync adds it
 warning	missing-unique	vornjsondb sync adds a unique index'
+without='no column named size; vornjsondb sync adds the column (nothing is stored)'
+expect 2 '' 'error: shop.db: cannot read records of table "product": no such column: product.size; vornjsondb sync adds the column' \
+    -- list shop.db product --def grown.def
+echo '{"id": 9, "size": 1, "name": "x"}' >one.json
+expect 3 '' "error: one.json:1: cannot load record 1 into table \"product\": table product has $without" \
+    -- insert shop.db product one.json --def grown.def
 expect 0 '' 'nothing to do' -- sync shop.db product
 expect 0 'check         result
 ------------  ------
