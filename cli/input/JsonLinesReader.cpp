@@ -86,7 +86,7 @@ class LinesReader {
     // it, and written where the text goes, which need not be the same place.
     char* Copy(std::string_view strLine) {
         constexpr size_t kLongestSequence = 4;
-        m_strCopy.assign(strLine).append(kLongestSequence, '\0');
+        m_strCopy.assign(strLine).append(kLongestSequence + LineBuffer::kPad, '\0');
         return m_strCopy.data();
     }
 

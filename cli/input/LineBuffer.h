@@ -15,8 +15,10 @@ class LineBuffer {
     // Lines longer than nMost are skipped and reported as such.
     LineBuffer(ByteSource& From, size_t nMost) : m_From(From), m_nMost(nMost) {}
 
-    // False at the end. The line is without its line feed, and a NUL follows it. Who looks for that
-    // sixteen bytes at a time may read beyond it.
+    // Who looks for the NUL behind a line sixteen bytes at a time may read so far beyond it.
+    static constexpr size_t kPad = 16;
+
+    // False at the end. The line is without its line feed, and a NUL follows it.
     bool Next();
 
     char* Begin() { return m_vecBytes.data() + m_nBegin; }
@@ -25,7 +27,6 @@ class LineBuffer {
     std::int64_t Number() const { return m_nNumber; }
 
   private:
-    static constexpr size_t kPad = 16;
     bool Fill();
 
     ByteSource& m_From;
