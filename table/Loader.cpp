@@ -81,7 +81,9 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
         }
     }
     Written eWritten = Written::kInserted;
-    Status Outcome = Writer.Write(How.eOnDuplicate, What, eWritten);
+    const auto fnWrite = [&] { return Writer.Write(How.eOnDuplicate, What, eWritten); };
+    Status Outcome =
+        Into.blFails ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, 0, What, fnWrite) : fnWrite();
     if (Outcome.Ok()) {
         std::int64_t* const apnCounts[] = {&Now.nInserted, &Now.nSkipped, &Now.nReplaced,
                                            &Now.nReplaced};

@@ -118,17 +118,18 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     return nResult;
 }
 
-int HasJsonIndex(sqlite3* pDb, const std::string& strTable, bool& blHas) {
+int IsInSchema(sqlite3* pDb, const std::string& strTable, const char* szWhat, bool& blThere) {
     std::string strDatabase = "main";
     const int nResult = FindDatabase(pDb, strTable, strDatabase);
     if (nResult != SQLITE_OK) {
         return nResult;
     }
-    const std::string strSql =
-        Concat({"SELECT 1 FROM ", Quoted(strDatabase),
-                ".sqlite_schema WHERE type = 'index' AND tbl_name = ?1 COLLATE NOCASE"
-                " AND instr(sql, 'json_') LIMIT 1"});
-    return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blHas = true; });
+    // A temporary trigger may be one of any table.
+    const std::string strSql = Concat({"SELECT 1 FROM (SELECT * FROM ", Quoted(strDatabase),
+                                       ".sqlite_schema UNION ALL SELECT * FROM sqlite_temp_schema)"
+                                       " WHERE tbl_name = ?1 COLLATE NOCASE AND ",
+                                       szWhat, " LIMIT 1"});
+    return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blThere = true; });
 }
 
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out) {

@@ -41,9 +41,9 @@ struct RealIndexes {
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
 
-// Whether an index of the table calls a function for JSON. Much less code than reading them all,
-// for programs that do nothing else with indexes.
-int HasJsonIndex(sqlite3* pDb, const std::string& strTable, bool& blHas);
+// Whether the table's schema has a statement (type, sql) of which the SQL expression szWhat is
+// true.
+int IsInSchema(sqlite3* pDb, const std::string& strTable, const char* szWhat, bool& blThere);
 
 // Whether the column is the rowid itself, which never holds NULL: SQLite hands out values.
 bool IsRowid(const RealTable& Real, const RealColumn& Column);

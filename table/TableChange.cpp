@@ -18,11 +18,13 @@ using vornjsondb::QueryUse;
 using vornjsondb::Statement;
 using Parts = Table::Parts;
 
-// Runs one statement, which is whole by itself, and counts the rows that it changed.
+// Runs one statement, which is whole by itself but in a table that fails halfway, and counts the
+// rows that it changed.
 Status Run(Parts& Into, const Doing& What, const std::string& strShape,
            Callable<std::string()> fnSql, Callable<int(sqlite3_stmt*)> fnBind,
            std::int64_t* pnRows) {
-    return vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, [&]() -> Status {
+    int nRows = 0;
+    const auto fnRun = [&]() -> Status {
         Statement Lent;
         int nResult = Into.Kept.Take(strShape, fnSql, Lent);
         if (nResult == SQLITE_OK) {
@@ -31,11 +33,16 @@ Status Run(Parts& Into, const Doing& What, const std::string& strShape,
         if (nResult == SQLITE_OK) {
             nResult = Lent.Finish();
         }
-        if (nResult == SQLITE_OK && pnRows != nullptr) {
-            *pnRows = sqlite3_changes(Into.pDb);
-        }
+        nRows = sqlite3_changes(Into.pDb);
         return vornjsondb::FromSqlite(Into.pDb, nResult, What);
-    });
+    };
+    Status Outcome =
+        Into.blFails ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnRun)
+                     : vornjsondb::Attempt(Into.pDb, Into.How.nWaitMs, fnRun);
+    if (Outcome.Ok() && pnRows != nullptr) {
+        *pnRows = nRows;
+    }
+    return Outcome;
 }
 
 std::string SetSql(const vornjsondb::Members& Of, const vornjsondb::RecordValues& Values) {

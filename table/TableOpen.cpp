@@ -66,10 +66,14 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
     return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
+// ON CONFLICT FAIL and RAISE(FAIL); a name with these letters costs a savepoint and nothing else.
+constexpr char kFails[] = "type IN ('table', 'trigger') AND instr(lower(sql), 'fail')";
+
 // Whatever is written into an index on a place in JSON is wrong for every other program.
 Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
     bool blJson = false;
-    const int nResult = vornjsondb::HasJsonIndex(Of.pDb, Of.Of.Table(), blJson);
+    const int nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(),
+                                               "type = 'index' AND instr(sql, 'json_')", blJson);
     if (nResult != SQLITE_OK) {
         return FailBySqlite(Of.pDb, nResult, What);
     }
@@ -128,7 +132,10 @@ Status Table::Parts::Meet() {
     if (vornjsondb::MisreadsFractions()) {
         Outcome = CheckIndexes(*this, What);
     }
-    return Outcome;
+    if (!Outcome.Ok()) {
+        return Outcome;
+    }
+    return FromSqlite(pDb, vornjsondb::IsInSchema(pDb, Of.Table(), kFails, blFails), What);
 }
 
 void Table::Parts::Learn(const RealTable& Real) {

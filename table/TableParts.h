@@ -47,6 +47,7 @@ struct VORN_JSON_DB::Table::Parts {
     size_t nHandedOut =
         vornjsondb::Members::kNone;  // the member that is the rowid, if it is narrower
     std::string strRowid;  // a name of the rowid that no column has; empty: rows have none
+    bool blFails = false;  // a failed statement may leave a part of what it did
     bool blView = false;   // whose triggers do the work, of which SQLite counts nothing
     vornjsondb::Statements Kept;
     vornjsondb::JsonCodec Codec;

@@ -51,7 +51,7 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
 // A single statement is whole by itself, as long as nothing is looked at behind it.
 bool IsOneStatement(const Parts& Into, OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
     const bool blOne = eOnDuplicate == OnDuplicate::kStop || eOnDuplicate == OnDuplicate::kSkip;
-    return blOne && pjStored == nullptr && !Into.HandsOut(Into.Values);
+    return blOne && pjStored == nullptr && !Into.HandsOut(Into.Values) && !Into.blFails;
 }
 
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {

@@ -88,6 +88,47 @@ TEST_F(SchemaTest, LoaderCountsWhatTheTableIgnoresAsBad) {
     EXPECT_EQ(Rows("SELECT id FROM item"), "1");
 }
 
+constexpr char kFailing[] =
+    "CREATE TABLE item (id INTEGER PRIMARY KEY, name TEXT UNIQUE ON CONFLICT FAIL, size INT);"
+    "INSERT INTO item VALUES (1, 'a', 1), (2, 'b', 2), (3, 'c', 3);"
+    "CREATE TEMP TRIGGER i AFTER INSERT ON item WHEN new.size = 9"
+    " BEGIN SELECT RAISE(FAIL, 'nine'); END;"
+    "CREATE TRIGGER d AFTER DELETE ON item WHEN old.size = 3"
+    " BEGIN SELECT RAISE(FAIL, 'three'); END";
+
+TEST_F(SchemaTest, WhatFailsHalfwayChangesNothing) {
+    Meet(kFailing);
+    std::int64_t nRows = 7;
+    EXPECT_EQ(
+        Text(m_Table.Update(Query().Where("id", Op::kGreater, 0), Parse(R"({"name": "x"})"),
+                            &nRows)),
+        "duplicate: cannot update records of table \"item\": UNIQUE constraint failed: item.name");
+    EXPECT_EQ(Text(m_Table.Remove(Query().Where("id", Op::kGreater, 0), &nRows)),
+              "constraint: cannot remove records from table \"item\": three");
+    EXPECT_EQ(Text(m_Table.RemoveAll(&nRows)),
+              "constraint: cannot remove all records from table \"item\": three");
+    EXPECT_EQ(nRows, 7);
+    EXPECT_EQ(Text(m_Table.Save(Parse(R"({"id": 4, "size": 9})"), OnDuplicate::kStop)),
+              "constraint: cannot save a record in table \"item\": nine");
+    EXPECT_EQ(Rows("SELECT * FROM item"), "1|a|1;2|b|2;3|c|3");
+    EXPECT_EQ(Text(m_Table.Update(Query().Where("id", 1), Parse(R"({"name": "x"})"), &nRows)),
+              "ok");
+    EXPECT_EQ(nRows, 1);
+}
+
+TEST_F(SchemaTest, BadRecordThatFailsHalfwayIsNotLoaded) {
+    Meet(kFailing);
+    LoadOptions How;
+    How.blGoOnAfterBad = true;
+    Loader Into;
+    EXPECT_EQ(Text(Into.Start(m_Table, How)), "ok");
+    EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 4, "size": 9})"))),
+              "constraint: cannot load record 1 into table \"item\": nine");
+    EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 5, "size": 5})"))), "ok");
+    EXPECT_EQ(Text(Into.Commit()), "ok");
+    EXPECT_EQ(Rows("SELECT id FROM item ORDER BY id"), "1;2;3;5");
+}
+
 // The key as it is stands for members that are not there.
 TEST_F(SchemaTest, RecordOfNothingButItsKeyIsReplacedByItself) {
     Meet("CREATE TABLE item (id INT, name TEXT, PRIMARY KEY (id, name))",
