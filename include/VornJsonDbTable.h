@@ -410,9 +410,9 @@ class Table {
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
     // Sets members of all records that the query selects, or removes these records: all or none,
-    // where ON CONFLICT FAIL or a trigger's RAISE(FAIL) end it halfway, too, if they were there when
-    // the table was opened. A query without a condition, with sorting or with paging is refused. Of
-    // a view no rows are counted: SQLite does not know what its triggers do.
+    // where ON CONFLICT FAIL or a trigger's RAISE(FAIL) end it halfway, too, if they were there
+    // when the table was opened. A query without a condition, with sorting or with paging is
+    // refused. Of a view no rows are counted: SQLite does not know what its triggers do.
     Status Update(const Query& Which, const Json::Value& jMembers, std::int64_t* pnRows = nullptr);
     Status Remove(const Query& Which, std::int64_t* pnRows = nullptr);
     Status RemoveAll(std::int64_t* pnRows = nullptr);

@@ -84,7 +84,8 @@ std::string OperatorSuggestion(std::string_view strName) {
     }
     std::vector<std::string> vecNames;
     for (const char* szName : {"$and", "$or", "$not"}) {
-        vecNames.push_back(szName);
+        std::string strGroup = szName;
+        vecNames.push_back(std::move(strGroup));
     }
     for (const Operator& Row : kOperators) {
         std::string strOne = Row.szName;

@@ -102,7 +102,8 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         // From 1; 0: outside of the key.
         const auto nPlaceInKey = static_cast<size_t>(NumberColumn(pRow, 3));
         while (Out.vecKey.size() < nPlaceInKey) {
-            Out.vecKey.push_back(std::string());
+            std::string strLater;
+            Out.vecKey.push_back(std::move(strLater));
         }
         if (nPlaceInKey > 0) {
             Out.vecKey[nPlaceInKey - 1] = Out.vecColumns.back().strName;
@@ -125,10 +126,11 @@ int IsInSchema(sqlite3* pDb, const std::string& strTable, const char* szWhat, bo
         return nResult;
     }
     // A temporary trigger may be one of any table.
-    const std::string strSql = Concat({"SELECT 1 FROM (SELECT * FROM ", Quoted(strDatabase),
-                                       ".sqlite_schema UNION ALL SELECT * FROM sqlite_temp_schema)"
-                                       " WHERE tbl_name = ?1 COLLATE NOCASE AND ",
-                                       szWhat, " LIMIT 1"});
+    static constexpr char kOrTemporary[] =
+        ".sqlite_schema UNION ALL SELECT * FROM sqlite_temp_schema)"
+        " WHERE tbl_name = ?1 COLLATE NOCASE AND ";
+    const std::string strSql = Concat(
+        {"SELECT 1 FROM (SELECT * FROM ", Quoted(strDatabase), kOrTemporary, szWhat, " LIMIT 1"});
     return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blThere = true; });
 }
 
