@@ -38,6 +38,7 @@ class Library:
 
     # What the tests are linked with: the library with every name visible.
     NAME, HEADER = "libvornjsondb_testable.so", "VornJsonDbApi.h"
+    DEFINED = ()
     # In one process a test may hide behind what an earlier one left.
     ORDERS = ([], SHUFFLED)
 
@@ -45,7 +46,7 @@ class Library:
         self.folder = folder
         self.sources = self.find_sources()
         json = subprocess.run(["pkg-config", "--cflags", "jsoncpp"], capture_output=True, text=True, check=True)
-        self.flags = ["-std=c++17", "-fPIC", "-w"]
+        self.flags = ["-std=c++17", "-fPIC", "-w", *self.DEFINED]
         self.flags += [f"-I{folder}/header", "-Iinclude"] + json.stdout.split()
         # Compiled once, together with the headers that it includes.
         (folder / "header").mkdir(exist_ok=True)
@@ -107,12 +108,13 @@ class TableLibrary(Library):
     """The second handle, shared instead of static."""
 
     NAME, HEADER = "libvornjsondb_table_changed.so", "VornJsonDbTable.h"
+    DEFINED = ("-DVORN_TYPES_WITHOUT_TREATMENTS",)
     # It keeps nothing between calls that a test could hide behind.
     ORDERS = ([],)
 
     def find_sources(self):
         shared = re.findall(r"PROJECT_SOURCE_DIR}/(src/\S+\.cpp)", pathlib.Path("table/CMakeLists.txt").read_text())
-        return sorted([*pathlib.Path("table").glob("*.cpp"), *map(pathlib.Path, shared)])
+        return sorted({*pathlib.Path("table").glob("*.cpp"), *map(pathlib.Path, shared)})
 
     def make_tests(self):
         self.link(self.folder, {})
