@@ -1,5 +1,7 @@
 #include "Concat.h"
 
+#include <utility>
+
 #include "../src/base/Digits.h"
 
 namespace vornjsondb {
@@ -24,6 +26,12 @@ void Append(std::string& strTo, std::initializer_list<std::string_view> listPart
     for (const std::string_view strPart : listParts) {
         strTo.append(strPart);
     }
+}
+
+// Moved, as other lists take their texts: a list grows by one function for each kind of argument.
+void AddText(std::vector<std::string>& vecTexts, std::string_view strText) {
+    std::string strOwn(strText);
+    vecTexts.push_back(std::move(strOwn));
 }
 
 std::string DigitsOf(std::int64_t nValue) {

@@ -1,7 +1,6 @@
 #include "Operators.h"
 
 #include <iterator>
-#include <utility>
 #include <vector>
 
 #include "Concat.h"
@@ -84,12 +83,10 @@ std::string OperatorSuggestion(std::string_view strName) {
     }
     std::vector<std::string> vecNames;
     for (const char* szName : {"$and", "$or", "$not"}) {
-        std::string strGroup = szName;
-        vecNames.push_back(std::move(strGroup));
+        AddText(vecNames, szName);
     }
     for (const Operator& Row : kOperators) {
-        std::string strOne = Row.szName;
-        vecNames.push_back(std::move(strOne));
+        AddText(vecNames, Row.szName);
     }
     return Suggestion(strName, vecNames);
 }

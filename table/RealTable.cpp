@@ -102,8 +102,7 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         // From 1; 0: outside of the key.
         const auto nPlaceInKey = static_cast<size_t>(NumberColumn(pRow, 3));
         while (Out.vecKey.size() < nPlaceInKey) {
-            std::string strLater;
-            Out.vecKey.push_back(std::move(strLater));
+            AddText(Out.vecKey, "");
         }
         if (nPlaceInKey > 0) {
             Out.vecKey[nPlaceInKey - 1] = Out.vecColumns.back().strName;

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "../src/base/JsonMemory.h"
+#include "Concat.h"
 
 namespace vornjsondb {
 
@@ -93,8 +94,7 @@ RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
         m_vecInKeyOrder.insert(
             itPlace, Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
-        std::string strName = Shown.strName;
-        m_vecNames.push_back(std::move(strName));
+        AddText(m_vecNames, Shown.strName);
     }
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC

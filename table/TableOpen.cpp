@@ -148,8 +148,7 @@ void Table::Parts::Learn(const RealTable& Real) {
     }
     // mutate(exchanged): in any order.
     for (const size_t nMember : Of.Key()) {
-        std::string strName = Of.At(nMember).strName;
-        vecKeyNames.push_back(std::move(strName));
+        vornjsondb::AddText(vecKeyNames, Of.At(nMember).strName);
     }
     for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
         const size_t nMember = Of.FindColumn(Column.strName);
