@@ -82,3 +82,12 @@ if(NOT VORNJSONDB_SANITIZE)
             "$<${VORNJSONDB_OPTIMISED}:-fno-stack-clash-protection>")
     endif()
 endif()
+
+# Where size counts, gcc must not give functions of the standard library fewer arguments: it makes such
+# a function anew for each source, and the linker keeps one only of those that are all the same. Nor
+# need it keep what was computed once for another place: on 32-bit ARM, which has few registers, that
+# takes more code than computing it again.
+set(VORNJSONDB_LESS_CODE "$<$<CXX_COMPILER_ID:GNU>:-fno-ipa-sra;-fno-gcse>")
+add_library(vornjsondb_less_code INTERFACE)
+target_compile_options(vornjsondb_less_code INTERFACE
+    "$<$<CONFIG:MinSizeRel>:${VORNJSONDB_LESS_CODE}>")

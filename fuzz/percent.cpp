@@ -60,7 +60,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* pData, size_t nSize) {
         // The text alone takes no argument, not even the value's.
         Require(Formatted(strModel, "<0>") == Formatted(strModel, "<00>"), "the text is plain");
         strModel = Formatted(strModel + Type.szSpecifier, strValue.c_str());
-        Require(Text.Text() == strModel, "the text is what the formatter makes of it");
+        Require(Text.Text().View() == strModel, "the text is what the formatter makes of it");
         Text.Append(",");
         strModel += ",";
     }

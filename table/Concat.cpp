@@ -35,9 +35,7 @@ void AddText(std::vector<std::string>& vecTexts, std::string_view strText) {
 }
 
 std::string DigitsOf(std::int64_t nValue) {
-    std::string strDigits;
-    AppendDigits(Json::Int64{nValue}, strDigits);
-    return strDigits;
+    return std::string(Digits(Json::Int64{nValue}).View());
 }
 
 }  // namespace vornjsondb

@@ -6,9 +6,9 @@
 
 #include "../src/base/JsonMember.h"
 #include "../src/base/JsonMemory.h"
-#include "../src/base/PlainJson.h"
 #include "Concat.h"
 #include "FindingCodes.h"
+#include "WrittenJson.h"
 
 namespace vornjsondb {
 
@@ -93,9 +93,8 @@ Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompati
     if (!TakesJson(Type, jValue.isArray() ? '[' : cOther)) {
         return Misfit::kKind;
     }
-    strJson.clear();
     // mutate(sunk): both write the same.
-    if (!WritePlainJson(jValue, strJson)) {
+    if (!WritePlainText(jValue, strJson)) {
         const Misfit eMisfit = CheckTree(jValue);
         // mutate(exchanged): the text of what does not fit is not used.
         if (eMisfit != Misfit::kNone) {

@@ -56,13 +56,13 @@ bool AppendExact(const Operand& Each, std::string& strJson) {
     const BoundValue& Value = Each.Value;
     switch (Value.eKind) {
         case BoundValue::Kind::kInteger:
-            AppendDigits(Json::Int64{Value.nValue}, strJson);
+            strJson += Digits(Json::Int64{Value.nValue}).View();
             return true;
         case BoundValue::Kind::kReal: {
             const bool blWhole =
                 std::fabs(Value.dValue) <= kTwoTo53 && std::trunc(Value.dValue) == Value.dValue;
             if (blWhole) {
-                AppendDigits(static_cast<Json::Int64>(Value.dValue), strJson);
+                strJson += Digits(static_cast<Json::Int64>(Value.dValue)).View();
             }
             return blWhole;
         }

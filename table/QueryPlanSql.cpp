@@ -2,7 +2,6 @@
 
 #include <algorithm>
 
-#include "../src/base/SqlText.h"
 #include "Concat.h"
 #include "ConditionSql.h"
 #include "DecimalPoint.h"
@@ -14,6 +13,7 @@ using VORN_JSON_DB::Query;
 
 namespace {
 
+constexpr size_t kUsualText = 256;
 constexpr size_t kUsualValues = 4;  // an operand or two, and a page
 
 }  // namespace
@@ -44,7 +44,7 @@ void QueryPlan::WritePlain() {
 }
 
 void QueryPlan::Write(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
-    m_Sql.strSql.reserve(kUsualStatement);
+    m_Sql.strSql.reserve(kUsualText);
     m_Sql.vecValues.reserve(kUsualValues);
     AppendConditions(Which.vecWhere, m_Of, m_Codec, eUse == QueryUse::kChange, m_Sql, vecFindings);
     m_nConditionEnd = m_Sql.strSql.size();

@@ -4,10 +4,10 @@
 #include <utility>
 
 #include "../src/base/JsonMember.h"
-#include "../src/base/PlainJson.h"
 #include "Concat.h"
 #include "FindingCodes.h"
 #include "Nearest.h"
+#include "WrittenJson.h"
 
 namespace vornjsondb {
 
@@ -135,8 +135,7 @@ bool RecordValues::TakeTree(size_t nMember, const Json::Value& jValue, BoundKind
     if (Of.eKind != eKind) {
         return false;
     }
-    Of.strBytes.clear();
-    const bool blPlain = WritePlainJson(jValue, Of.strBytes);
+    const bool blPlain = WritePlainText(jValue, Of.strBytes);
     if (blPlain) {
         GiveText(nMember, Of.strBytes);
     }

@@ -3,6 +3,8 @@
 #include <cstring>
 #include <string_view>
 
+#include "../src/base/PlainJson.h"
+
 namespace vornjsondb {
 
 namespace {
@@ -107,6 +109,15 @@ const char* BehindValue(const char* p, int nLevel) {
 
 bool IsWrittenJson(const char* szText, size_t nLength) {
     return (*szText == '[' || *szText == '{') && BehindValue(szText, 0) == szText + nLength;
+}
+
+bool WritePlainText(const Json::Value& jValue, std::string& strOut) {
+    TextBuffer Text;
+    const bool blPlain = WritePlainJson(jValue, Text);
+    if (blPlain) {
+        strOut.assign(Text.View());
+    }
+    return blPlain;
 }
 
 }  // namespace vornjsondb

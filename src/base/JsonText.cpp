@@ -10,9 +10,6 @@ namespace vornjsondb {
 
 namespace {
 
-// Room for most texts: spares one that grows piece by piece its first allocations.
-constexpr size_t kUsualText = 64;
-
 Json::StreamWriter* NewWriter() {
     Json::StreamWriterBuilder Builder;
     Builder.settings_["indentation"] = "";
@@ -42,10 +39,9 @@ JsonCodec& ProcessCodec() {
 }  // namespace
 
 std::string JsonCodec::Write(const Json::Value& jValue) {
-    std::string strText;
-    strText.reserve(kUsualText);
-    if (WritePlainJson(jValue, strText)) {  // mutate(false): the longer way gives the same.
-        return strText;
+    TextBuffer Text;
+    if (WritePlainJson(jValue, Text)) {  // mutate(false): the longer way gives the same.
+        return std::string(Text.View());
     }
     std::ostringstream Stream;
     // Without this a stream swallows std::bad_alloc and the text is silently cut.

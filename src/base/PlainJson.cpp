@@ -152,8 +152,8 @@ class PlainReader {
     bool m_blPlain = true;
 };
 
-bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
-    // mutate(exchanged): behind a text that is not plain strOut is in any state.
+bool WriteText(const char* pBegin, const char* pEnd, TextBuffer& Out) {
+    // mutate(exchanged): behind a text that is not plain Out is in any state.
     for (const char* p = pBegin; p != pEnd; ++p) {
         const auto c = static_cast<unsigned char>(*p);
         // Small letters, and all that are none of ASCII's, are known by the first of these.
@@ -161,72 +161,71 @@ bool WriteText(const char* pBegin, const char* pEnd, std::string& strOut) {
             return false;
         }
     }
-    strOut += '"';
-    strOut.append(pBegin, static_cast<size_t>(pEnd - pBegin)) += '"';
+    Out.Append('"').Append({pBegin, static_cast<size_t>(pEnd - pBegin)}).Append('"');
     return true;
 }
 
-bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut);
+bool WriteValue(const Json::Value& jValue, int nLevel, TextBuffer& Out);
 
-bool WriteArray(const Json::Value& jArray, int nLevel, std::string& strOut) {
-    strOut += '[';
+bool WriteArray(const Json::Value& jArray, int nLevel, TextBuffer& Out) {
+    Out.Append('[');
     Json::ArrayIndex nStored = 0;
     const Json::Value::const_iterator itEnd = jArray.end();
     for (Json::Value::const_iterator it = jArray.begin(); it != itEnd; ++it) {
         if (nStored++ > 0) {
-            strOut += ',';
+            Out.Append(',');
         }
-        if (!WriteValue(*it, nLevel, strOut)) {
+        if (!WriteValue(*it, nLevel, Out)) {
             return false;
         }
     }
-    strOut += ']';
+    Out.Append(']');
     return nStored == jArray.size();
 }
 
-bool WriteObject(const Json::Value& jObject, int nLevel, std::string& strOut) {
+bool WriteObject(const Json::Value& jObject, int nLevel, TextBuffer& Out) {
     char cBefore = '{';
     const Json::Value::const_iterator itEnd = jObject.end();
     for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
-        strOut += cBefore;
+        Out.Append(cBefore);
         cBefore = ',';
         const MemberName Name = NameOf(it);
-        if (!WriteText(Name.pBegin, Name.pEnd, strOut)) {
+        if (!WriteText(Name.pBegin, Name.pEnd, Out)) {
             return false;
         }
-        strOut += ':';
-        if (!WriteValue(*it, nLevel, strOut)) {
+        Out.Append(':');
+        if (!WriteValue(*it, nLevel, Out)) {
             return false;
         }
     }
-    strOut += jObject.empty() ? "{}" : "}";
+    Out.Append(jObject.empty() ? "{}" : "}");
     return true;
 }
 
-bool WriteValue(const Json::Value& jValue, int nLevel, std::string& strOut) {
+bool WriteValue(const Json::Value& jValue, int nLevel, TextBuffer& Out) {
     if (nLevel > kMaxLevels) {
         return false;
     }
     switch (jValue.type()) {
         case Json::nullValue:
-            strOut += "null";
+            Out.Append("null");
             return true;
         case Json::booleanValue:
-            strOut += jValue.asBool() ? "true" : "false";
+            Out.Append(jValue.asBool() ? "true" : "false");
             return true;
         case Json::intValue:
-            AppendDigits(jValue.asInt64(), strOut);
+            AppendDigits(jValue.asInt64(), Out);
             return true;
         case Json::stringValue: {
             const char* pBegin = nullptr;
             const char* pEnd = nullptr;
             jValue.getString(&pBegin, &pEnd);
-            return WriteText(pBegin, pEnd, strOut);
+            return WriteText(pBegin, pEnd, Out);
         }
         case Json::arrayValue:
-            return WriteArray(jValue, nLevel + 1, strOut);
+            return WriteArray(jValue, nLevel + 1, Out);
         case Json::objectValue:
-            return WriteObject(jValue, nLevel + 1, strOut);
+            return WriteObject(jValue, nLevel + 1, Out);
         default:
             return false;
     }
@@ -244,8 +243,8 @@ bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut) {
     return true;
 }
 
-bool WritePlainJson(const Json::Value& jValue, std::string& strOut) {
-    return WriteValue(jValue, 0, strOut);
+bool WritePlainJson(const Json::Value& jValue, TextBuffer& Out) {
+    return WriteValue(jValue, 0, Out);
 }
 
 }  // namespace vornjsondb

@@ -6,9 +6,10 @@
 #define VORN_BASE_PLAIN_JSON_H
 
 #include <cstddef>
-#include <string>
 
 #include <json/json.h>
+
+#include "TextBuffer.h"
 
 namespace vornjsondb {
 
@@ -16,9 +17,9 @@ namespace vornjsondb {
 // that is not plain, well-formed or not.
 bool ReadPlainJson(const char* szText, size_t nLength, Json::Value& jOut);
 
-// Appends the value's text. Returns false, with strOut in any state, for a value that is not plain.
+// Appends the value's text. Returns false, with Out in any state, for a value that is not plain.
 // A list that does not store all of its elements is none: what is missing is a null.
-bool WritePlainJson(const Json::Value& jValue, std::string& strOut);
+bool WritePlainJson(const Json::Value& jValue, TextBuffer& Out);
 
 }  // namespace vornjsondb
 

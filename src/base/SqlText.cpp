@@ -4,13 +4,13 @@
 
 namespace vornjsondb {
 
-void AppendQuoted(const char* szText, std::string& strOut) {
-    strOut += '\'';
+void AppendQuoted(const char* szText, TextBuffer& Out) {
+    Out.Append('\'');
     while (const char* pQuote = std::strchr(szText, '\'')) {
-        strOut.append(szText, static_cast<size_t>(pQuote + 1 - szText)) += '\'';
+        Out.Append({szText, static_cast<size_t>(pQuote + 1 - szText)}).Append('\'');
         szText = pQuote + 1;
     }
-    strOut.append(szText) += '\'';
+    Out.Append(szText).Append('\'');
 }
 
 }  // namespace vornjsondb

@@ -1,11 +1,11 @@
 #ifndef VORN_BASE_SQL_TEXT_H
 #define VORN_BASE_SQL_TEXT_H
 
-#include <cstddef>
 #include <memory>
-#include <string>
 
 #include <sqlite3.h>
+
+#include "TextBuffer.h"
 
 namespace vornjsondb {
 
@@ -17,10 +17,7 @@ struct SqliteFree {
 using SqlText = std::unique_ptr<char, SqliteFree>;
 
 // Appends the text in single quotes, each quote in it doubled, as SQLite's formatter writes "%Q".
-void AppendQuoted(const char* szText, std::string& strOut);
-
-// Room for most statements: spares a text that grows piece by piece its first allocations.
-constexpr size_t kUsualStatement = 256;
+void AppendQuoted(const char* szText, TextBuffer& Out);
 
 }  // namespace vornjsondb
 

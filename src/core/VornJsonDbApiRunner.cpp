@@ -32,31 +32,38 @@ bool IsLocked(const char* szError, int nErrno) {
 
 }  // namespace
 
-int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
+int vornjsondb::RunSql(const HandleParts& Handle, std::string_view Sql,
                        int (*callback)(void*, int, char**, char**), void* pArg) {
     SqlText szError;
     int i = 0;
     const auto Failed = [&](int nResult) {
         Handle.strSqlError = szError ? szError.get() : kNoErrorText;
         VORN_LOG_PLAIN("i=%d,errno=%d, run sql failed, error=%s, sql=%s", i, errno,
-                       Handle.strSqlError.c_str(), strSql.c_str());
+                       Handle.strSqlError.c_str(), Sql.data());
         const char* szReason = szError.get();
         VORN_LOG_DEBUG("run sql fail, err=%s", szReason);
         return nResult;
     };
 
-    if (strSql.empty()) {
+    if (Sql.empty()) {
         VORN_LOG_CONDITION("0 >= strSql.length()");
         return Failed(-1);
     }
     while (i < kMaxAttempts) {
-        Handle.strSqlError = szError ? szError.get() : "";
-        szError.reset();
+        if (szError) {
+            Handle.strSqlError = szError.get();
+            szError.reset();
+        } else {
+            Handle.strSqlError.clear();
+        }
         // Only now, so that nothing but the statement can leave an errno that decides.
         errno = 0;
-        g_strCurTable = Handle.strName;
+        // mutate(true): the same name again changes nothing.
+        if (g_strCurTable != Handle.strName) {
+            g_strCurTable = Handle.strName;
+        }
         char* szText = nullptr;
-        const int nStatus = sqlite3_exec(Handle.pDb, strSql.c_str(), callback, pArg, &szText);
+        const int nStatus = sqlite3_exec(Handle.pDb, Sql.data(), callback, pArg, &szText);
         szError.reset(szText);
         if (nStatus == SQLITE_OK) {
             const int nChanged = callback == nullptr ? sqlite3_changes(Handle.pDb) : 0;
@@ -72,7 +79,7 @@ int vornjsondb::RunSql(const HandleParts& Handle, const std::string& strSql,
             return Failed(-1);
         }
         VORN_LOG_DEBUG("retry, i=%d, errno=%d, run sql failed, error=%s, sql=%s", i, errno,
-                       szReason, strSql.c_str());
+                       szReason, Sql.data());
         ++i;
         usleep(kRetryPauseUs);
     }

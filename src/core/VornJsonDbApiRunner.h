@@ -2,6 +2,7 @@
 #define VORN_CORE_VORN_JSON_DB_API_RUNNER_H
 
 #include <string>
+#include <string_view>
 
 #include "../schema/HandleParts.h"
 
@@ -11,8 +12,8 @@ extern std::string g_strCurTable;
 
 namespace vornjsondb {
 
-// runSqlEx, without a copy of the text: statements may hold long values.
-int RunSql(const HandleParts& Handle, const std::string& strSql,
+// runSqlEx of a text behind which a NUL stands, without a copy: statements may hold long values.
+int RunSql(const HandleParts& Handle, std::string_view Sql,
            int (*callback)(void*, int, char**, char**), void* pArg);
 
 }  // namespace vornjsondb

@@ -3,13 +3,15 @@
 #include <VornJsonDbApi.h>
 
 #include "../base/JsonMemory.h"
-#include "../base/SqlText.h"
+#include "../base/TextBuffer.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRunner.h"
+#include "../sql/VornJsonDbApiConditions.h"
 
 namespace {
 
 using vornjsondb::TableTypes;
+using vornjsondb::TextBuffer;
 
 // "a,b,c" for the failure line.
 std::string Joined(const std::vector<std::string>& strVector) {
@@ -27,25 +29,26 @@ std::string Joined(const std::vector<std::string>& strVector) {
 
 int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
     const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
-    std::string strSqlRun;
+    TextBuffer SqlRun;
     const auto Delete = [&]() -> int {
-        std::string strSql;
+        TextBuffer Where;
         int err = -1;
         VORN_FAIL_IF(jRecParam.type() != Json::objectValue);
-        VORN_FAIL_IF(0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND));
-        VORN_FAIL_IF_TEXT(strSql.empty() && !blAllowAll, "strSql.empty()");
-        strSqlRun.reserve(vornjsondb::kUsualStatement);
+        VORN_FAIL_IF_TEXT(0 > vornjsondb::AppendConditions(Handle, jRecParam, Where),
+                          "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)");
+        VORN_FAIL_IF_TEXT(Where.IsEmpty() && !blAllowAll, "strSql.empty()");
         // Two blanks before WHERE, as in a list.
-        strSqlRun.append("DELETE FROM ").append(m_strName).append(" ");
-        if (!strSql.empty()) {
-            strSqlRun.append(" WHERE ").append(strSql);
+        SqlRun.Append("DELETE FROM ").Append(m_strName).Append(' ');
+        if (!Where.IsEmpty()) {
+            SqlRun.Append(" WHERE ").Append(Where.View());
         }
-        strSqlRun.append(";");
-        VORN_FAIL_IF_TEXT(0 > (err = vornjsondb::RunSql(Handle, strSqlRun, nullptr, nullptr)),
-                          "0 > (err = runSqlEx(strSqlRun))");
+        SqlRun.Append(';');
+        VORN_FAIL_IF_TEXT(
+            0 > (err = vornjsondb::RunSql(Handle, SqlRun.Terminated(), nullptr, nullptr)),
+            "0 > (err = runSqlEx(strSqlRun))");
         // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!m_strSqlError.empty()) {
-            VORN_LOG_LOCATED("sql error, sql=%s", strSqlRun.c_str());
+            VORN_LOG_LOCATED("sql error, sql=%s", SqlRun.CStr());
             return -1;
         }
         // GCOVR_EXCL_STOP
@@ -55,7 +58,7 @@ int VornJsonDbApi::recDelete(Json::Value& jRecParam, bool blAllowAll) {
     const int nResult = Delete();
     // mutate(> to >=): where nothing failed, there is no error text.
     if (0 > nResult && !m_strSqlError.empty()) {
-        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", m_strSqlError.c_str(), strSqlRun.c_str());
+        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", m_strSqlError.c_str(), SqlRun.CStr());
     }
     return nResult;
 }

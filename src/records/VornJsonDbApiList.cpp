@@ -3,41 +3,44 @@
 #include <VornJsonDbApi.h>
 
 #include "../base/JsonText.h"
-#include "../base/SqlText.h"
+#include "../base/TextBuffer.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRows.h"
 #include "../core/VornJsonDbApiRunner.h"
+#include "../sql/VornJsonDbApiConditions.h"
 #include "../sql/VornJsonDbApiValues.h"
 
 namespace {
 
+using vornjsondb::TextBuffer;
+
 // recList with the row callback that fills jRecArrayOut.
 int ListRows(VornJsonDbApi& Api, const vornjsondb::HandleParts& Handle, Json::Value& jRecParam,
              int (*callback)(void*, int, char**, char**), Json::Value& jRecArrayOut) {
-    std::string strSqlRun;
+    TextBuffer SqlRun;
     const auto List = [&]() -> int {
-        std::string strSql;
+        TextBuffer Where;
         std::string strSqlLimit;
         VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
         VORN_FAIL_IF(jRecArrayOut.type() != Json::nullValue &&
                      jRecArrayOut.type() != Json::arrayValue);
-        VORN_FAIL_IF_TEXT(0 > Api.SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND),
+        VORN_FAIL_IF_TEXT(0 > vornjsondb::AppendConditions(Handle, jRecParam, Where),
                           "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)");
         VORN_FAIL_IF_TEXT(0 > Api.SqlFilterConditionFromJson(jRecParam, strSqlLimit),
                           "0 > SqlFilterConditionFromJson(jRecParam, strSqlLimit)");
         // From here on the statement is a part of what is logged of a failure.
-        strSqlRun.reserve(vornjsondb::kUsualStatement);
-        strSqlRun.append("SELECT ");
-        vornjsondb::AppendDeclaredNames(Handle.Declared(), strSqlRun);
+        SqlRun.Append("SELECT ");
+        vornjsondb::AppendDeclaredNames(Handle.Declared(), SqlRun);
         // The blank after the name makes two before WHERE: hosts compare statements as texts.
         // Pinned by List.ConditionStandsBehindTwoBlanks.
-        strSqlRun.append(" FROM ").append(Handle.strName).append(" ");
-        if (!strSql.empty()) {
-            strSqlRun.append(" WHERE ").append(strSql);
+        SqlRun.Append(" FROM ").Append(Handle.strName).Append(' ');
+        if (!Where.IsEmpty()) {
+            SqlRun.Append(" WHERE ").Append(Where.View());
         }
-        strSqlRun.append(strSqlLimit).append(";");
-        VORN_FAIL_IF_TEXT(0 > vornjsondb::RunSql(Handle, strSqlRun, callback, &jRecArrayOut),
-                          "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)");
+        SqlRun.Append(strSqlLimit).Append(';');
+        VORN_FAIL_IF_TEXT(
+            0 > vornjsondb::RunSql(Handle, SqlRun.Terminated(), callback, &jRecArrayOut),
+            "0 > runSqlEx(strSqlRun, DbCallBackFillList, &jRecArrayOut)");
         return 0;
     };
     if (0 <= List()) {
@@ -45,7 +48,7 @@ int ListRows(VornJsonDbApi& Api, const vornjsondb::HandleParts& Handle, Json::Va
     }
     VORN_LOG_PLAIN("jRecParam=%s", vornjsondb::ToString(jRecParam).c_str());
     if (!Handle.strSqlError.empty()) {
-        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", Handle.strSqlError.c_str(), strSqlRun.c_str());
+        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", Handle.strSqlError.c_str(), SqlRun.CStr());
     }
     return -1;
 }

@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "../base/JsonText.h"
-#include "../base/SqlText.h"
 #include "../core/LogLine.h"
 #include "../core/VornJsonDbApiRows.h"
 #include "../core/VornJsonDbApiRunner.h"
@@ -18,25 +17,25 @@
 int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, Json::Value& jStored,
                            bool blCreate) {
     const KnownTable& Table = Handle.LookUp();
-    std::string strSql;
+    TextBuffer Sql;
     const auto Save = [&]() -> int {
         const std::vector<DeclaredValue> vecValues = DeclaredValues(Handle.Declared(), jRec);
         Json::Value jRow;
-        strSql.reserve(kUsualStatement);
-        strSql.append(blCreate ? "INSERT INTO " : "REPLACE INTO ");
-        strSql.append(Handle.strName).append(" (");
-        AppendMemberNames(vecValues, strSql);
-        strSql.append(") VALUES (");
-        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, vecValues, jRec, strSql),
+        Sql.Append(blCreate ? "INSERT INTO " : "REPLACE INTO ").Append(Handle.strName).Append(" (");
+        AppendMemberNames(vecValues, Sql);
+        Sql.Append(") VALUES (");
+        VORN_FAIL_IF_TEXT(0 > AppendMemberValues(Handle, vecValues, jRec, Sql),
                           "0 > SqlExpandMemberSymbol(strSql, jRecInOut)");
-        strSql.append(";select * from ").append(Handle.strName);
-        strSql.append(" where rowid == last_insert_rowid();");
-        VORN_FAIL_IF(strSql.empty());  // GCOVR_EXCL_BR_LINE: never is; kept as a guard
-        VORN_FAIL_IF_TEXT(0 > RunSql(Handle, strSql, DbCallBackFillFirst, &jRow),
+        Sql.Append(";select * from ").Append(Handle.strName);
+        Sql.Append(" where rowid == last_insert_rowid();");
+        // GCOVR_EXCL_BR_START: never is empty; kept as a guard
+        VORN_FAIL_IF_TEXT(Sql.IsEmpty(), "strSql.empty()");
+        // GCOVR_EXCL_BR_STOP
+        VORN_FAIL_IF_TEXT(0 > RunSql(Handle, Sql.Terminated(), DbCallBackFillFirst, &jRow),
                           "0 > runSqlEx(strSql, DbCallBackFillList, &jArrayTmp)");
         // GCOVR_EXCL_START: a run that succeeds leaves no error text; the guard stays all the same.
         if (!Handle.strSqlError.empty()) {
-            VORN_LOG_LOCATED("sql error, sql=%s", strSql.c_str());
+            VORN_LOG_LOCATED("sql error, sql=%s", Sql.CStr());
             return -1;
         }
         // GCOVR_EXCL_STOP
@@ -50,7 +49,7 @@ int vornjsondb::SaveRecord(const HandleParts& Handle, const Json::Value& jRec, J
     VORN_LOG_PLAIN("blCreate=%d, jRecInOut=%s", static_cast<int>(blCreate), ToString(jRec).c_str());
     VORN_LOG_PLAIN("jType=%s", ToString(Table.jTypes).c_str());
     if (!Handle.strSqlError.empty()) {
-        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", Handle.strSqlError.c_str(), strSql.c_str());
+        VORN_LOG_PLAIN("sql error, err=%s, sql=%s", Handle.strSqlError.c_str(), Sql.CStr());
     }
     return -1;
 }

@@ -18,7 +18,7 @@ namespace {
 
 // A handle that binds values asks which treatments a type has, and calls none.
 void NoRead(const char*, Json::Value&) {}
-void NoAppend(const Json::Value&, std::string&) {}
+void NoAppend(const Json::Value&, TextBuffer&) {}
 
 constexpr auto ReadText = NoRead, ReadInt = NoRead, ReadInt64 = NoRead, ReadBool = NoRead,
                ReadJson = NoRead;
@@ -74,16 +74,16 @@ constexpr auto ReadJson = FromString;
 
 // ---- value into a value list ----
 
-void AppendText(const Json::Value& jValue, std::string& strOut) {
-    if (jValue.isString()) {  // mutate(false): a copy of it gives the same text.
-        AppendQuoted(jValue.asCString(), strOut);  // in place: it may be long
+void AppendText(const Json::Value& jValue, TextBuffer& Out) {
+    if (jValue.isString()) {                    // mutate(false): a copy of it gives the same text.
+        AppendQuoted(jValue.asCString(), Out);  // in place: it may be long
     } else {
-        AppendQuoted(jValue.asString().c_str(), strOut);
+        AppendQuoted(jValue.asString().c_str(), Out);
     }
 }
 
-void AppendJson(const Json::Value& jValue, std::string& strOut) {
-    AppendQuoted(ToString(jValue).c_str(), strOut);
+void AppendJson(const Json::Value& jValue, TextBuffer& Out) {
+    AppendQuoted(ToString(jValue).c_str(), Out);
 }
 
 // The value itself, which must lie below. JsonCpp takes the first number beyond a range for the
@@ -95,28 +95,28 @@ const Json::Value& Below(double dFirstBeyond, const Json::Value& jValue) {
     return jValue;
 }
 
-void AppendSigned(const Json::Value& jValue, std::string& strOut) {
-    AppendDigits(Below(9223372036854775808.0, jValue).asInt64(), strOut);
+void AppendSigned(const Json::Value& jValue, TextBuffer& Out) {
+    AppendDigits(Below(9223372036854775808.0, jValue).asInt64(), Out);
 }
 
-void AppendUnsigned(const Json::Value& jValue, std::string& strOut) {
-    AppendDigits(Below(18446744073709551616.0, jValue).asUInt64(), strOut);
+void AppendUnsigned(const Json::Value& jValue, TextBuffer& Out) {
+    AppendDigits(Below(18446744073709551616.0, jValue).asUInt64(), Out);
 }
 
-void AppendReal(double dValue, std::string& strOut) {
+void AppendReal(double dValue, TextBuffer& Out) {
     const SqlText szText(sqlite3_mprintf("%f", dValue));
     if (!szText) {
         throw std::logic_error("vornjsondb: the SQL formatter gave no text");
     }
-    strOut += szText.get();
+    Out.Append(szText.get());
 }
 
-void AppendFloat(const Json::Value& jValue, std::string& strOut) {
-    AppendReal(static_cast<double>(jValue.asFloat()), strOut);
+void AppendFloat(const Json::Value& jValue, TextBuffer& Out) {
+    AppendReal(static_cast<double>(jValue.asFloat()), Out);
 }
 
-void AppendDouble(const Json::Value& jValue, std::string& strOut) {
-    AppendReal(jValue.asDouble(), strOut);
+void AppendDouble(const Json::Value& jValue, TextBuffer& Out) {
+    AppendReal(jValue.asDouble(), Out);
 }
 
 #endif  // VORN_TYPES_WITHOUT_TREATMENTS

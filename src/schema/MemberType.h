@@ -3,9 +3,9 @@
 #ifndef VORN_SCHEMA_MEMBER_TYPE_H
 #define VORN_SCHEMA_MEMBER_TYPE_H
 
-#include <string>
-
 #include <json/json.h>
+
+#include "../base/TextBuffer.h"
 
 namespace vornjsondb {
 
@@ -51,7 +51,7 @@ struct MemberType {
     // Appends a value to a value list, as SQLite's formatter writes it for szSpecifier; nullptr:
     // cannot be stored. Throws Json::Exception for a value that cannot be converted, and
     // std::logic_error when the formatter itself, which writes fractions, gives no text.
-    void (*pfnAppend)(const Json::Value& jValue, std::string& strOut);
+    void (*pfnAppend)(const Json::Value& jValue, TextBuffer& Out);
     const char* szSpecifier;
 
     ConditionForm eCondition;

@@ -2,15 +2,12 @@
 
 #include <cstring>
 
-#include "../base/SqlText.h"
-
 namespace vornjsondb {
 
-AccumulatedFormat::AccumulatedFormat(const std::string& strText)
-    : m_blLiteral(strText.find('%') == std::string::npos &&
-                  strText.find('\0') == std::string::npos) {
-    m_strText.reserve(strText.length() + kUsualStatement);
-    m_strText.append(strText);
+AccumulatedFormat::AccumulatedFormat(std::string_view Text)
+    : m_blLiteral(Text.find('%') == std::string_view::npos &&
+                  Text.find('\0') == std::string_view::npos) {
+    m_Text.Append(Text);
 }
 
 // Each "%%" is passed over. A last "%" joins the one of the value's own specifier to another "%%",
@@ -19,7 +16,7 @@ bool AccumulatedFormat::HoldsConversion() const {
     if (m_blLiteral) {  // mutate(false): there is no percent sign to be found.
         return false;
     }
-    const char* p = m_strText.c_str();
+    const char* p = m_Text.CStr();
     while ((p = std::strchr(p, '%')) != nullptr && p[1] != '\0') {
         if (p[1] != '%') {
             return true;
@@ -34,33 +31,34 @@ void AccumulatedFormat::Format(const MemberType& Type, const Json::Value& jValue
         FormatAgain(Type, jValue);
         return;
     }
-    const size_t nBefore = m_strText.length();
-    Type.pfnAppend(jValue, m_strText);
+    const size_t nBefore = m_Text.Length();
+    Type.pfnAppend(jValue, m_Text);
+    const std::string_view Value(m_Text.View().data() + nBefore, m_Text.Length() - nBefore);
     // Numbers, which hold no percent sign, stand without quotes.
-    // mutate(exchanged, || to &&): the longer way gives the same.
-    m_blLiteral = m_strText[nBefore] != '\'' || m_strText.find('%', nBefore) == std::string::npos;
+    // mutate(|| to &&): the longer way gives the same.
+    m_blLiteral = Value[0] != '\'' || Value.find('%') == std::string_view::npos;
 }
 
 // What the formatter makes of the text and the specifier behind it: the text ends at a NUL, "%%" is
 // a percent sign, and the first other conversion is the value's own. There may be none left: the
 // value is then lost, as it is there.
 void AccumulatedFormat::FormatAgain(const MemberType& Type, const Json::Value& jValue) {
-    std::string strValue;
-    Type.pfnAppend(jValue, strValue);
-    const std::string strFormat = m_strText + Type.szSpecifier;
-    const char* pNext = strFormat.c_str();
-    m_strText.clear();
+    TextBuffer Value;
+    Type.pfnAppend(jValue, Value);
+    TextBuffer Format;
+    Format.Take(m_Text.Append(Type.szSpecifier));
+    const char* pNext = Format.CStr();
     while (const char* pSign = std::strchr(pNext, '%')) {
-        m_strText.append(pNext, static_cast<size_t>(pSign - pNext));
+        m_Text.Append({pNext, static_cast<size_t>(pSign - pNext)});
         if (pSign[1] != '%' && pSign[1] != '\0') {
-            m_strText += strValue;
+            m_Text.Append(Value.View());
             pNext = "";
             break;
         }
-        m_strText += '%';
+        m_Text.Append('%');
         pNext = pSign + (pSign[1] == '%' ? 2 : 1);
     }
-    m_strText += pNext;
+    m_Text.Append(pNext);
 }
 
 }  // namespace vornjsondb

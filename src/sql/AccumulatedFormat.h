@@ -11,10 +11,9 @@
 #ifndef VORN_SQL_ACCUMULATED_FORMAT_H
 #define VORN_SQL_ACCUMULATED_FORMAT_H
 
-#include <string>
-
 #include <json/json.h>
 
+#include "../base/TextBuffer.h"
 #include "../schema/MemberType.h"
 
 namespace vornjsondb {
@@ -22,7 +21,7 @@ namespace vornjsondb {
 class AccumulatedFormat {
   public:
     // Starts from a copy of the caller's text.
-    explicit AccumulatedFormat(const std::string& strText);
+    explicit AccumulatedFormat(std::string_view Text);
 
     // Whether the text so far holds a conversion, so that no further value can be formatted.
     bool HoldsConversion() const;
@@ -32,14 +31,14 @@ class AccumulatedFormat {
     void Format(const MemberType& Type, const Json::Value& jValue);
 
     // Appends text that later values format too; it holds no percent sign.
-    void Append(const char* szText) { m_strText += szText; }
+    void Append(const char* szText) { m_Text.Append(szText); }
 
-    std::string& Text() { return m_strText; }
+    TextBuffer& Text() { return m_Text; }
 
   private:
     void FormatAgain(const MemberType& Type, const Json::Value& jValue);
 
-    std::string m_strText;
+    TextBuffer m_Text;
     bool m_blLiteral;  // neither percent sign nor NUL: formatting the text leaves it as it is
 };
 

@@ -4,7 +4,6 @@
 
 #include <VornJsonDbApi.h>
 
-#include <cstring>
 #include <string_view>
 
 #include "../base/Digits.h"
@@ -19,6 +18,7 @@ using vornjsondb::ConditionForm;
 using vornjsondb::ListUse;
 using vornjsondb::SqlText;
 using vornjsondb::TableTypes;
+using vornjsondb::TextBuffer;
 using vornjsondb::TypedMember;
 
 constexpr char kFilterKey[] = "vornSqlWhereFilter";
@@ -50,8 +50,11 @@ SqlText EscapedValue(ConditionForm eForm, const Json::Value& jValue) try {
     return nullptr;
 }
 
-bool IsQuoted(ConditionForm eForm) {
-    return eForm == ConditionForm::kQuotedText || eForm == ConditionForm::kQuotedJson;
+// What stands on both sides of a value.
+std::string_view QuoteOf(ConditionForm eForm) {
+    const bool blQuoted =
+        eForm == ConditionForm::kQuotedText || eForm == ConditionForm::kQuotedJson;
+    return {"'", blQuoted ? size_t{1} : size_t{0}};
 }
 
 void LogNoText(ConditionForm eForm) {
@@ -70,22 +73,15 @@ void LogNoText(ConditionForm eForm) {
 }
 
 // "name=value" of a member.
-int AppendMatch(const TypedMember& Member, const Json::Value& jParam, std::string& strSqlOut) {
+int AppendMatch(const TypedMember& Member, const Json::Value& jParam, TextBuffer& Sql) {
     const ConditionForm eForm = Member.pType->eCondition;
     const SqlText szSql = EscapedValue(eForm, jParam);
     if (!szSql) {
         LogNoText(eForm);
         return -1;
     }
-    const size_t nValue = std::strlen(szSql.get());
-    const bool blQuoted = IsQuoted(eForm);
-    // Room for all of it first: memory that runs out in between must not leave half a condition.
-    strSqlOut.reserve(strSqlOut.length() + Member.Name.Length() + nValue + 3);
-    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()).append("='", blQuoted ? 2 : 1);
-    strSqlOut.append(szSql.get(), nValue);
-    if (blQuoted) {
-        strSqlOut += '\'';
-    }
+    const std::string_view Quote = QuoteOf(eForm);
+    Sql.Append(Member.Name.View()).Append('=').Append(Quote).Append(szSql.get()).Append(Quote);
     return 0;
 }
 
@@ -104,13 +100,12 @@ bool IsPlain(const TypedMember& Member, const Json::Value& jValue) {
 }
 
 // AppendMatch of a value that is plain.
-void AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue,
-                      std::string& strSqlOut) {
-    strSqlOut.append(Member.Name.pBegin, Member.Name.Length()) += '=';
+void AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue, TextBuffer& Sql) {
+    Sql.Append(Member.Name.View()).Append('=');
     if (jValue.isString()) {
-        vornjsondb::AppendQuoted(jValue.asCString(), strSqlOut);
+        vornjsondb::AppendQuoted(jValue.asCString(), Sql);
     } else {
-        vornjsondb::AppendDigits(jValue.asInt64(), strSqlOut);
+        vornjsondb::AppendDigits(jValue.asInt64(), Sql);
     }
 }
 
@@ -118,12 +113,13 @@ void AppendPlainMatch(const TypedMember& Member, const Json::Value& jValue,
 // The elements follow each other without a separator, so that several make one literal. Hosts
 // pass one element; a list that suddenly matched more rows would delete more. Pinned by
 // MemberCondition.ElementsFollowEachOtherWithoutSeparator.
-int AppendList(const TypedMember& Member, const Json::Value& jList, std::string& strSqlOut) {
+int AppendList(const TypedMember& Member, const Json::Value& jList, TextBuffer& Sql) {
     const ConditionForm eForm = Member.pType->eCondition;
     // In a list a boolean is written by its string form, unlike after "=".
     const ConditionForm eElement =
         eForm == ConditionForm::kBoolean ? ConditionForm::kBareText : eForm;
-    std::string strList;
+    const std::string_view Quote = QuoteOf(eElement);
+    TextBuffer List;
     // By index: an array need not store all of its elements, and a missing one is a null.
     for (Json::ArrayIndex i = 0; i < jList.size(); ++i) {
         const SqlText szSql = EscapedValue(eElement, jList[i]);
@@ -132,59 +128,65 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, std::string&
         VORN_FAIL_IF_TEXT(!szSql,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
         if (i == 0) {
-            strList.append(Member.Name.pBegin, Member.Name.Length()).append(" in (");
+            List.Append(Member.Name.View()).Append(" in (");
         }
-        const char* szQuote = IsQuoted(eElement) ? "'" : "";
-        strList.append(szQuote).append(szSql.get()).append(szQuote);
+        List.Append(Quote).Append(szSql.get()).Append(Quote);
     }
-    if (!strList.empty()) {
-        strSqlOut.append(strList.append(" )"));
+    if (!List.IsEmpty()) {
+        Sql.Append(List.View()).Append(" )");
     }
     return 0;
 }
 
 // The same of the member szField, for any value.
 int AppendListOf(const TableTypes& Types, const char* szField, const Json::Value& jList,
-                 std::string& strSqlOut) {
+                 TextBuffer& Sql) {
     VORN_FAIL_IF(!szField || !szField[0]);
     const TypedMember* pMember = Types.Find(vornjsondb::NameOf(szField));
     VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(szField)");
     VORN_FAIL_IF(jList.type() != Json::arrayValue);
-    return AppendList(*pMember, jList, strSqlOut);
+    return AppendList(*pMember, jList, Sql);
 }
 
 // A member's condition or assignment: by its value or by a list of values.
 int AppendMember(const TableTypes& Types, const TypedMember& Member, const Json::Value& jValue,
-                 ListUse eUse, std::string& strSqlOut) {
+                 ListUse eUse, TextBuffer& Sql) {
     // mutate(false, exchanged): the formatter gives the same; a list is not plain.
     if (eUse == ListUse::kAssignments && IsPlain(Member, jValue)) {
-        AppendPlainMatch(Member, jValue, strSqlOut);
+        AppendPlainMatch(Member, jValue, Sql);
         return 0;
     }
     if (jValue.isArray()) {
         // By name: for a list the name ends at its first NUL.
-        VORN_FAIL_IF_TEXT(0 > AppendListOf(Types, Member.Name.pBegin, jValue, strSqlOut),
+        VORN_FAIL_IF_TEXT(0 > AppendListOf(Types, Member.Name.pBegin, jValue, Sql),
                           "0 > SqlMakeByListField(jmFieldName[i].c_str(), jTmp, strSqlWhereOut)");
         return 0;
     }
-    VORN_FAIL_IF_TEXT(0 > AppendMatch(Member, jValue, strSqlOut),
+    VORN_FAIL_IF_TEXT(0 > AppendMatch(Member, jValue, Sql),
                       "0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)");
     return 0;
 }
 
 struct JoinMode {
+    std::string_view Opening;
     std::string_view Joiner;
-    bool blWrapped;
+    std::string_view Closing;
 };
 
 // By VORN_SQL_WHERE_TYPE_...
-constexpr JoinMode kJoinModes[] = {{" or ", true}, {" and ", true}, {" , ", false}};
+constexpr JoinMode kJoinModes[] = {{" (", " or ", " )"}, {" (", " and ", " )"}, {"", " , ", ""}};
 constexpr int kJoinModeCount = sizeof(kJoinModes) / sizeof(kJoinModes[0]);
+
+// Appends what was written, or written until it failed, and returns what that returned.
+int AppendTo(std::string& strOut, const TextBuffer& Sql, int nResult) {
+    strOut.append(Sql.View());
+    return nResult;
+}
 
 }  // namespace
 
 int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam,
-                                 std::string& strSqlOut, int andType, ListUse eUse) {
+                                 TextBuffer& Sql, int andType, ListUse eUse) {
     VORN_FAIL_IF(jRecParam.type() != Json::objectValue && jRecParam.type() != Json::nullValue);
     if (andType < 0 || andType >= kJoinModeCount) {
         VORN_LOG_LOCATED("error andType=%d", andType);
@@ -192,7 +194,6 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
     }
     bool blWritten = false;
     const JoinMode& Mode = kJoinModes[andType];
-    const std::string_view Opening = Mode.blWrapped ? " (" : "";
     TypeCursor NextType(Types);
     const Json::Value::const_iterator itEnd = jRecParam.end();
     for (Json::Value::const_iterator it = jRecParam.begin(); it != itEnd; ++it) {
@@ -205,11 +206,11 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         // Written before the member's own text: an empty list, which writes nothing, leaves its
         // joiner, and SQLite refuses the statement instead of running it without the condition.
         // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
-        strSqlOut += blWritten ? Mode.Joiner : Opening;
+        Sql.Append(blWritten ? Mode.Joiner : Mode.Opening);
         if (blFilter) {
             VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
-            strSqlOut.append(" ").append(it->asString()).append(" ");
-        } else if (0 > AppendMember(Types, *pMember, *it, eUse, strSqlOut)) {
+            Sql.Append(' ').Append(it->asString()).Append(' ');
+        } else if (0 > AppendMember(Types, *pMember, *it, eUse, Sql)) {
             return -1;
         }
         blWritten = true;
@@ -217,10 +218,14 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
     if (!blWritten) {
         return 1;
     }
-    if (Mode.blWrapped) {
-        strSqlOut += " )";
-    }
+    Sql.Append(Mode.Closing);
     return 0;
+}
+
+int vornjsondb::AppendConditions(const HandleParts& Handle, const Json::Value& jRecParam,
+                                 TextBuffer& Sql) {
+    return AppendMemberList(Handle.LookUp().Types(), jRecParam, Sql, VORN_SQL_WHERE_TYPE_AND,
+                            ListUse::kConditions);
 }
 
 int VornJsonDbApi::SqlMakeByMatchField(std::string& strField, Json::Value& jParam,
@@ -228,18 +233,22 @@ int VornJsonDbApi::SqlMakeByMatchField(std::string& strField, Json::Value& jPara
     const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
     const TypedMember* pMember = Types.Find(vornjsondb::NameOf(strField));
     VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strField)");
-    return AppendMatch(*pMember, jParam, strSqlOut);
+    TextBuffer Sql;
+    return AppendTo(strSqlOut, Sql, AppendMatch(*pMember, jParam, Sql));
 }
 
 int VornJsonDbApi::SqlMakeByListField(const char* szField, Json::Value& jList,
                                       std::string& strSqlOut) {
     const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
-    return AppendListOf(Types, szField, jList, strSqlOut);
+    TextBuffer Sql;
+    return AppendTo(strSqlOut, Sql, AppendListOf(Types, szField, jList, Sql));
 }
 
 int VornJsonDbApi::SqlExpandMemberList(Json::Value& jRecParam, std::string& strSqlWhereOut,
                                        int andType) {
     const TableTypes& Types = vornjsondb::LookUpTable(m_jTableDef, m_strName).Types();
-    return vornjsondb::AppendMemberList(Types, jRecParam, strSqlWhereOut, andType,
-                                        vornjsondb::ListUse::kConditions);
+    TextBuffer Sql;
+    const int nResult = vornjsondb::AppendMemberList(Types, jRecParam, Sql, andType,
+                                                     vornjsondb::ListUse::kConditions);
+    return AppendTo(strSqlWhereOut, Sql, nResult);
 }

@@ -1,10 +1,10 @@
 #ifndef VORN_SQL_VORN_JSON_DB_API_CONDITIONS_H
 #define VORN_SQL_VORN_JSON_DB_API_CONDITIONS_H
 
-#include <string>
-
 #include <json/json.h>
 
+#include "../base/TextBuffer.h"
+#include "../schema/HandleParts.h"
 #include "../schema/TableTypes.h"
 
 namespace vornjsondb {
@@ -13,8 +13,11 @@ namespace vornjsondb {
 // left out, and whole numbers, booleans and texts are written without SQLite's formatter.
 enum class ListUse { kConditions, kAssignments };
 
+// SqlExpandMemberList of conditions that all have to hold.
+int AppendConditions(const HandleParts& Handle, const Json::Value& jRecParam, TextBuffer& Sql);
+
 // SqlExpandMemberList with the table's types looked up.
-int AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam, std::string& strSqlOut,
+int AppendMemberList(const TableTypes& Types, const Json::Value& jRecParam, TextBuffer& Sql,
                      int andType, ListUse eUse);
 
 }  // namespace vornjsondb

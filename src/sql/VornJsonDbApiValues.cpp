@@ -27,33 +27,34 @@ std::vector<vornjsondb::DeclaredValue> vornjsondb::DeclaredValues(const Json::Va
     return vecValues;
 }
 
-void vornjsondb::AppendDeclaredNames(const Json::Value& jMember, std::string& strSql) {
+void vornjsondb::AppendDeclaredNames(const Json::Value& jMember, TextBuffer& Sql) {
     const Json::Value::const_iterator itBegin = jMember.begin();
     const Json::Value::const_iterator itEnd = jMember.end();
     for (Json::Value::const_iterator it = itBegin; it != itEnd; ++it) {
-        const MemberName Name = NameOf(it);
-        strSql.append(",", it != itBegin ? 1 : 0).append(Name.pBegin, Name.Length());
+        if (it != itBegin) {
+            Sql.Append(',');
+        }
+        Sql.Append(NameOf(it).View());
     }
 }
 
-void vornjsondb::AppendMemberNames(const std::vector<DeclaredValue>& vecValues,
-                                   std::string& strSql) {
+void vornjsondb::AppendMemberNames(const std::vector<DeclaredValue>& vecValues, TextBuffer& Sql) {
     for (const DeclaredValue& Each : vecValues) {
         if (Each.pjValue == nullptr) {
             continue;
         }
-        strSql.append(Each.Name.pBegin, Each.Name.Length());
+        Sql.Append(Each.Name.View());
         if (&Each != &vecValues.back()) {
-            strSql += ',';
+            Sql.Append(',');
         }
     }
 }
 
 int vornjsondb::AppendMemberValues(const HandleParts& Handle,
                                    const std::vector<DeclaredValue>& vecValues,
-                                   const Json::Value& jRec, std::string& strSql) {
+                                   const Json::Value& jRec, TextBuffer& Sql) {
     TypeCursor Types(Handle.LookUp().Types());
-    AccumulatedFormat Text(strSql);
+    AccumulatedFormat Text(Sql.View());
     for (const DeclaredValue& Each : vecValues) {
         const TypedMember* pMember = Types.Find(Each.Name);
         VORN_FAIL_IF_TEXT(pMember == nullptr, "!jType.isMember(strKey)");
@@ -74,22 +75,28 @@ int vornjsondb::AppendMemberValues(const HandleParts& Handle,
         }
         Text.Append(&Each != &vecValues.back() ? "," : ") ");
     }
-    strSql.swap(Text.Text());
+    Sql.Take(Text.Text());
     return 0;
 }
 
 int VornJsonDbApi::SqlExpandMemberName(std::string& strSql, Json::Value* pjRec) {
     const Json::Value& jMember = vornjsondb::DeclaredMembers(m_jTableDef, m_strName);
+    vornjsondb::TextBuffer Names;
     if (pjRec == nullptr) {
-        vornjsondb::AppendDeclaredNames(jMember, strSql);
+        vornjsondb::AppendDeclaredNames(jMember, Names);
     } else {
-        vornjsondb::AppendMemberNames(vornjsondb::DeclaredValues(jMember, *pjRec), strSql);
+        vornjsondb::AppendMemberNames(vornjsondb::DeclaredValues(jMember, *pjRec), Names);
     }
+    strSql.append(Names.View());
     return 0;
 }
 
 int VornJsonDbApi::SqlExpandMemberSymbol(std::string& strSql, Json::Value& jRec) {
     const vornjsondb::HandleParts Handle{m_pDb, m_strName, m_jTableDef, m_strSqlError};
-    return vornjsondb::AppendMemberValues(
-        Handle, vornjsondb::DeclaredValues(Handle.Declared(), jRec), jRec, strSql);
+    vornjsondb::TextBuffer Sql;
+    Sql.Append(strSql);
+    const int nResult = vornjsondb::AppendMemberValues(
+        Handle, vornjsondb::DeclaredValues(Handle.Declared(), jRec), jRec, Sql);
+    strSql.assign(Sql.View());
+    return nResult;
 }

@@ -57,9 +57,9 @@ TEST(PlainJson, PlainTextsReadAsJsonCppReadsThem) {
 TEST(PlainJson, ValuesAreWrittenAsJsonCppWritesThem) {
     for (const char* szText : kPlainTexts) {
         const Json::Value jValue = ReadLeniently(szText);
-        std::string strWritten;
-        ASSERT_TRUE(vornjsondb::WritePlainJson(jValue, strWritten)) << szText;
-        EXPECT_EQ(strWritten, Compact(jValue)) << szText;
+        vornjsondb::TextBuffer Written;
+        ASSERT_TRUE(vornjsondb::WritePlainJson(jValue, Written)) << szText;
+        EXPECT_EQ(Written.View(), Compact(jValue)) << szText;
     }
 }
 
@@ -120,18 +120,19 @@ TEST(PlainJson, ValuesThatNoParserMakesAreWrittenAsJsonCppWritesThem) {
         jList.append(WithComments(jOne));
         jList.append(jOne);
         for (const Json::Value& jValue : {jOne, WithComments(jOne), jList}) {
-            std::string strWritten;
-            if (vornjsondb::WritePlainJson(jValue, strWritten)) {
-                EXPECT_EQ(strWritten, Compact(jValue));
+            vornjsondb::TextBuffer Written;
+            if (vornjsondb::WritePlainJson(jValue, Written)) {
+                EXPECT_EQ(Written.View(), Compact(jValue));
             }
         }
     }
 }
 
 TEST(PlainJson, WritingAppendsToTheText) {
-    std::string strWritten = "limit ";
-    ASSERT_TRUE(vornjsondb::WritePlainJson(Json::Value(5), strWritten));
-    EXPECT_EQ(strWritten, "limit 5");
+    vornjsondb::TextBuffer Written;
+    Written.Append("limit ");
+    ASSERT_TRUE(vornjsondb::WritePlainJson(Json::Value(5), Written));
+    EXPECT_EQ(Written.View(), "limit 5");
 }
 
 TEST(PlainJson, TextsOutOfTheOrdinaryAreLeftToJsonCpp) {
@@ -212,8 +213,8 @@ TEST(PlainJson, ValuesOutOfTheOrdinaryAreLeftToJsonCpp) {
         ReadLeniently(R"({"a":{"a":{"a":{"a":{"a":{"a":{"a":{"a":{"a":1}}}}}}}}})"),
     };
     for (const Json::Value& jValue : jOthers) {
-        std::string strWritten;
-        EXPECT_FALSE(vornjsondb::WritePlainJson(jValue, strWritten)) << Compact(jValue);
+        vornjsondb::TextBuffer Written;
+        EXPECT_FALSE(vornjsondb::WritePlainJson(jValue, Written)) << Compact(jValue);
     }
 }
 

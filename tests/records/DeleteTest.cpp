@@ -5,7 +5,7 @@ using namespace testhost;
 
 namespace {
 
-const char kExpand[] = "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)";
+const char kNoConditions[] = "0 > SqlExpandMemberList(jRecParam, strSql, VORN_SQL_WHERE_TYPE_AND)";
 
 class Delete : public TableTest {
   protected:
@@ -143,11 +143,11 @@ TEST_F(Delete, EmptyListIsRejectedBySqliteAndDeletesNothing) {
 TEST_F(Delete, RefusedConditionRunsNothing) {
     Fill(3);
     Deletes(R"({"vornSqlWhereFilter":[]})", true, -1,
-            {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kExpand)});
-    Deletes(
-        R"({"name":{}})", true, -1,
-        {Check(R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))"),
-         Check("0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)"), Check(kExpand)});
+            {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kNoConditions)});
+    Deletes(R"({"name":{}})", true, -1,
+            {Check(R"(NULL == (szSql = sqlite3_mprintf("%q", jParam.asString().c_str())))"),
+             Check("0 > SqlMakeByMatchField(jmFieldName[i], jTmp, strSqlWhereOut)"),
+             Check(kNoConditions)});
     EXPECT_EQ(TakeSql(), Lines());
     EXPECT_EQ(Count(), "3");
 }
@@ -175,7 +175,7 @@ TEST_F(Delete, EarlierErrorTextShowsWithAnEmptyStatementAtTheExit) {
         "null", true, -1,
         {Check("jRecParam.type() != Json::objectValue"), SqlError("no such column: stale", "")});
     Deletes(R"({"vornSqlWhereFilter":1})", true, -1,
-            {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kExpand),
+            {Check("!jRecParam[jmFieldName[i]].isString()"), Check(kNoConditions),
              SqlError("no such column: stale", "")});
     Deletes(R"({"id":1})", false, 1);
     Deletes("{}", false, -1, {Check("strSql.empty()")});

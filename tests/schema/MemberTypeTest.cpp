@@ -11,31 +11,35 @@
 
 namespace {
 
+using vornjsondb::TextBuffer;
+
 const vornjsondb::MemberType& TypeNamed(const char* szName) {
     return vornjsondb::FindMemberType(szName, szName + std::string(szName).length());
 }
 
 TEST(MemberTypeTest, RefusedNumberLeavesTheTextAsItWas) {
     for (const char* szName : {"int", "unsigned int"}) {
-        std::string strText = "before";
-        EXPECT_THROW(TypeNamed(szName).pfnAppend(Json::Value(18446744073709551616.0), strText),
+        TextBuffer Text;
+        Text.Append("before");
+        EXPECT_THROW(TypeNamed(szName).pfnAppend(Json::Value(18446744073709551616.0), Text),
                      Json::LogicError);
-        EXPECT_EQ(strText, "before") << szName;
+        EXPECT_EQ(Text.View(), "before") << szName;
     }
 }
 
 // JsonCpp itself takes these two for the last number in range.
 TEST(MemberTypeTest, FirstNumberBeyondARangeLeavesTheTextAsItWas) {
-    std::string strText = "before";
-    EXPECT_THROW(TypeNamed("int").pfnAppend(Json::Value(9223372036854775808.0), strText),
+    TextBuffer Text;
+    Text.Append("before");
+    EXPECT_THROW(TypeNamed("int").pfnAppend(Json::Value(9223372036854775808.0), Text),
                  Json::LogicError);
-    EXPECT_EQ(strText, "before");
+    EXPECT_EQ(Text.View(), "before");
 }
 
 std::string ExceptionOf(const char* szType, const Json::Value& jValue) {
-    std::string strText;
+    TextBuffer Text;
     try {
-        TypeNamed(szType).pfnAppend(jValue, strText);
+        TypeNamed(szType).pfnAppend(jValue, Text);
     } catch (const std::exception& Error) {
         return Error.what();
     }
@@ -110,9 +114,9 @@ TEST(MemberTypeTest, TextsOfSqliteAreFreed) {
         EXPECT_GT(sqlite3_memory_used(), nBefore);
     }
     EXPECT_EQ(sqlite3_memory_used(), nBefore);
-    std::string strText;
-    TypeNamed("double").pfnAppend(Json::Value(1.5), strText);
-    EXPECT_EQ(strText, "1.500000");
+    TextBuffer Text;
+    TypeNamed("double").pfnAppend(Json::Value(1.5), Text);
+    EXPECT_EQ(Text.View(), "1.500000");
     EXPECT_EQ(sqlite3_memory_used(), nBefore);
 }
 
