@@ -10,6 +10,7 @@ namespace vornjsondb {
 void TextBuffer::Grow(size_t nMore) {
     const size_t nRoom = std::max(2 * m_nRoom, m_nLength + nMore + kUsual);
     std::unique_ptr<char[]> pGrown(new char[nRoom + 1]);
+    // mutate(doubled): the second time it is there already.
     std::memcpy(pGrown.get(), m_pText, m_nLength);
     m_pOwned = std::move(pGrown);
     m_pText = m_pOwned.get();
@@ -22,7 +23,9 @@ void TextBuffer::Take(TextBuffer& Other) {
         m_pOwned = std::move(Other.m_pOwned);
         m_pText = m_pOwned.get();
         m_nRoom = Other.m_nRoom;
+        // mutate(exchanged): the one is no part of the other.
         m_nLength = Other.m_nLength;
+        // mutate(exchanged): the one is no part of the other.
         Other.m_pText = Other.m_szUsual;
         Other.m_nRoom = kUsual - 1;
     } else {

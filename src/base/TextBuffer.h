@@ -24,8 +24,10 @@ class TextBuffer {
     // Throws std::bad_alloc, with the text as it was.
     TextBuffer& Append(std::string_view Piece) {
         if (Piece.size() > m_nRoom - m_nLength) {
+            // mutate(doubled): how much room there is shows nowhere.
             Grow(Piece.size());
         }
+        // mutate(doubled): the second time it is there already.
         std::memcpy(m_pText + m_nLength, Piece.data(), Piece.size());
         m_nLength += Piece.size();
         return *this;

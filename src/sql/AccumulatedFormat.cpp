@@ -13,7 +13,7 @@ AccumulatedFormat::AccumulatedFormat(std::string_view Text)
 // Each "%%" is passed over. A last "%" joins the one of the value's own specifier to another "%%",
 // or stands before a NUL, where the formatter writes it as it is.
 bool AccumulatedFormat::HoldsConversion() const {
-    if (m_blLiteral) {  // mutate(false): there is no percent sign to be found.
+    if (m_blLiteral) {  // mutate(false, exchanged): there is none to be found.
         return false;
     }
     const char* p = m_Text.CStr();

@@ -76,6 +76,7 @@ void LogNoText(ConditionForm eForm) {
 int AppendMatch(const TypedMember& Member, const Json::Value& jParam, TextBuffer& Sql) {
     const ConditionForm eForm = Member.pType->eCondition;
     const SqlText szSql = EscapedValue(eForm, jParam);
+    // mutate(exchanged): what a value is quoted by does not depend on it.
     if (!szSql) {
         LogNoText(eForm);
         return -1;

@@ -232,6 +232,10 @@ TEST_F(List, RefusedSortTermRunsNothing) {
 TEST_F(List, EarlierErrorTextShowsWithAnEmptyStatementInTheTail) {
     MakeStaleError();
     ExpectRefused("[]", {Check(kQueryKind)}, {SqlError("no such column: stale", "")});
+    ExpectRefused(
+        R"({"sort_by":7})",
+        {Check("!szSql"), Check("0 > SqlFilterConditionFromJson(jRecParam, strSqlLimit)")},
+        {SqlError("no such column: stale", "")});
     EXPECT_EQ(Listed("{}"), kAll);
     ExpectRefused("[]", {Check(kQueryKind)});
 }
