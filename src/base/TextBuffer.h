@@ -33,7 +33,14 @@ class TextBuffer {
         return *this;
     }
 
-    TextBuffer& Append(char c) { return Append(std::string_view(&c, 1)); }
+    TextBuffer& Append(char c) {
+        if (m_nLength == m_nRoom) {
+            // mutate(doubled): how much room there is shows nowhere.
+            Grow(1);
+        }
+        m_pText[m_nLength++] = c;
+        return *this;
+    }
 
     // Takes the other's text, which is empty then.
     void Take(TextBuffer& Other);

@@ -58,7 +58,7 @@ int vornjsondb::RunSql(const HandleParts& Handle, std::string_view Sql,
         }
         // Only now, so that nothing but the statement can leave an errno that decides.
         errno = 0;
-        // mutate(true, sunk): the same name again changes nothing.
+        // mutate(true, sunk, hoisted): the same name again changes nothing.
         if (g_strCurTable != Handle.strName) {
             g_strCurTable = Handle.strName;
         }

@@ -126,6 +126,7 @@ int AppendList(const TypedMember& Member, const Json::Value& jList, TextBuffer& 
         const SqlText szSql = EscapedValue(eElement, jList[i]);
         VORN_FAIL_IF_TEXT(!szSql && eElement == ConditionForm::kQuotedJson,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].toString().c_str()))");
+        // mutate(exchanged): of a list that is refused nothing is kept.
         VORN_FAIL_IF_TEXT(!szSql,
                           "NULL == (szSql = sqlite3_mprintf(\"%q\", jList[i].asString().c_str()))");
         if (i == 0) {

@@ -66,6 +66,18 @@ TEST_F(Save, ReplaceOverwritesTheRowWithTheSameKey) {
     EXPECT_EQ(All(), "1|new");
 }
 
+// Wherever the text has to be moved to a larger place.
+TEST_F(Save, StatementOfAnyLengthIsWhole) {
+    for (size_t nLength = 0; nLength < 1200; ++nLength) {
+        const std::string strLong(nLength, 'x');
+        Json::Value jRec = ParseJson(R"({"id":1})");
+        jRec["name"] = strLong + "'y";
+        ASSERT_EQ(Saved(jRec, false), jRec) << nLength;
+        ASSERT_EQ(TakeSql(), Lines{Statement("REPLACE", "id,name", "1,'" + strLong + "''y') ")})
+            << nLength;
+    }
+}
+
 TEST_F(Save, ReplaceWithoutAConflictInserts) {
     ExpectStored(R"({"id":4,"name":"x"})", R"({"id":4,"name":"x"})", false);
     EXPECT_EQ(All(), "4|x");
