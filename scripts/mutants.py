@@ -5,7 +5,8 @@ where they are applied. What is left is marked in the source, in front of a stat
 
     // mutate(false, 9 to 10): the longer way gives the same result.
 
-The brackets hold the names of the changes as the check reports them, or "any".
+The brackets hold the names of the changes as the check reports them, or "any". With "exchanged" the mark
+is about statements and about conditions and calls, with "exchanged statements" about these alone.
 """
 
 import pathlib
@@ -47,7 +48,7 @@ CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TE
 TWICE_IS_ONCE = re.compile(
     r"(?:clear|Clear|fill|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
     r"|Set|Fill|FillDefaults|pfnRead|Read|SetRight|SetUnknown|SetNull|SetText|GiveInteger|GiveText|WritePlain|Judge|strictMode"
-    r"|sqlite3_reset|sqlite3_clear_bindings)$"
+    r"|sqlite3_reset|sqlite3_clear_bindings|sqlite3_table_column_metadata)$"
 )
 # Log lines may come of these, and a name that nobody knew is known afterwards.
 LOOK_UP = re.compile(r"(?:\w+(?:\.|->|::))*(?:recType|LookUp|LookUpTable)\(")
@@ -85,7 +86,8 @@ class Mark:
         self.end = end_of_head(code, self.begin)
 
     def explains(self, change):
-        fitting = {change.name, "any"} & self.names if self.begin <= change.begin <= self.end else set()
+        names = {change.name, change.name.replace(" statements", ""), "any"}
+        fitting = names & self.names if self.begin <= change.begin <= self.end else set()
         self.unused -= fitting
         return bool(fitting)
 
@@ -183,9 +185,9 @@ class Source:
             if following or self.code[match.start() - 1] == ")":
                 yield match.start(), end, "", "dropped"
 
-    def exchange(self, left, right):
+    def exchange(self, left, right, name="exchanged"):
         between = self.text[left[1] : right[0]]
-        return left[0], right[1], self.text[slice(*right)] + between + self.text[slice(*left)], "exchanged"
+        return left[0], right[1], self.text[slice(*right)] + between + self.text[slice(*left)], name
 
     # ---- statements ----
 
@@ -200,7 +202,7 @@ class Source:
             if JUMP.match(second.text) or first.is_needed_by(second):
                 continue
             if first.order_matters(second, local):
-                yield self.exchange(run[index], run[index + 1])
+                yield self.exchange(run[index], run[index + 1], "exchanged statements")
 
     def local_names(self, at):
         """The names of the innermost function: nobody sees them after it has returned."""

@@ -284,7 +284,7 @@ def try_all(check, draw, jobs):
 
 
 def kind_of(change):
-    if change.name in ("dropped", "doubled", "exchanged", "hoisted", "sunk"):
+    if change.name.split()[0] in ("dropped", "doubled", "exchanged", "hoisted", "sunk"):
         return "structure"
     return "text" if change.name in ("text", "cut") else "other"
 

@@ -170,7 +170,7 @@ class OldQueryLint {
 
     void LintTail() {
         const Json::Value* pjSort = FindMember(m_jQuery, kOldSort);
-        // mutate(exchanged): what follows finds something only where nothing is sorted.
+        // mutate(exchanged statements): what follows finds something only where nothing is sorted.
         if (pjSort != nullptr && pjSort->isString()) {
             Report(
                 m_vecFindings, LintCode::kSortsNothing, Below("", kOldSort),
