@@ -19,13 +19,13 @@ namespace {
 enum class Percents { kExact, kHalved, kRefused };
 
 // It formats all text so far again with each later member: "%%" becomes "%" each time, and any
-// other use of the sign is refused. strText stands in quotes there.
+// other use of the sign is refused. At the end a quote follows it in the statement, and a NUL here.
 Percents FateOf(std::string strText, size_t nLater) {
-    strText += '\'';
     Percents eFate = Percents::kExact;
     for (; nLater > 0 && strText.find('%') != std::string::npos; --nLater) {
         std::string strHalved;
         for (size_t i = 0; i < strText.size(); ++i) {
+            // mutate(exchanged): of two percent signs either is kept.
             if (strText[i] == '%' && strText[++i] != '%') {
                 return Percents::kRefused;
             }
@@ -109,7 +109,7 @@ class OldRecordLint {
             Report(
                 m_vecFindings, FindingCode::kOutOfRange, strPath,
                 strMember + ": " + Shown(jValue) + " is beyond 63 bits, which recCreate refuses");
-        } else if (jValue.asInt64() < RangeOf(Type).nLeast ||
+        } else if (jValue.asInt64() < RangeOf(Type).nLeast ||  // mutate(exchanged): both only look.
                    jValue.asInt64() > RangeOf(Type).nMostRead) {
             Report(m_vecFindings, LintCode::kOldReadsOther, strPath,
                    strMember + ": " + Shown(jValue) +

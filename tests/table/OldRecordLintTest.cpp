@@ -73,6 +73,20 @@ TEST_F(OldRecordLintTest, LastMemberIsMissing) {
     Expect(R"({"a": "x"})", "", R"(0 {"a":"x","b":"d"})", "x|d");
 }
 
+// Member by member, as the definition has them; in a text what is cut off before what is left.
+TEST_F(OldRecordLintTest, FindingsAreInTheOrderOfTheDefinition) {
+    Describe(kThreeTexts);
+    Expect(R"({"a": 5, "b": "y"})",
+           "wrong-kind /a: member \"a\": 5 is another kind of value: expected is a text; "
+           "missing-last-member /c: member \"c\" is missing: recCreate refuses a record without "
+           "the last one",
+           "-1", "");
+    Expect(R"({"a": "%%\u0000x", "c": "z"})",
+           "nul-cut /a: member \"a\": \"%%\" is stored, and what follows the NUL byte is not; "
+           "percent-halved /a: member \"a\": each %% is stored as %, because other members follow",
+           R"(0 {"a":"%","c":"z"})", "%|NULL|z");
+}
+
 TEST_F(OldRecordLintTest, UnknownMembersAreDropped) {
     Describe(kThreeTexts);
     Expect(R"({"C": "x", "c": "z"})",
@@ -189,6 +203,14 @@ TEST_F(OldRecordLintTest, JsonThatIsNotReadBackAsItWas) {
     EXPECT_EQ(strResult.substr(0, 2), "0 ");
     EXPECT_NE(strResult, "0 " + Text(jRecord));
     EXPECT_EQ(AllRows(), std::string(1100, '[') + std::string(1100, ']'));
+}
+
+TEST_F(OldRecordLintTest, JsonThatIsNotReadBackAsItWasIsToldOnce) {
+    Describe(R"({"j": {"cpptype": "Json::arrayValue"}, "z": {"cpptype": "int"}})");
+    Json::Value jRecord = Parse(R"({"j": ["%%"], "z": 1})");
+    jRecord["j"].append(std::nan(""));
+    Expect(jRecord, "old-json-changed /j: member \"j\" holds NaN, which is stored as null",
+           R"(0 {"j":["%",null],"z":1})", R"(["%",null]|1)");
 }
 
 }  // namespace VORN_JSON_DB
