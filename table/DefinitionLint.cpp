@@ -105,6 +105,7 @@ class DefinitionLint {
         if (!m_Names.Has(strName)) {
             AddOldName(strPath, "member " + ShownText(strName));
         }
+        // mutate(exchanged statements): in any order.
         if (IsOldKey(strName)) {
             Report(m_vecFindings, LintCode::kHidesQueryKey, strPath,
                    "member " + Quoted(strName) + ": a VornJsonDbApi takes this key of a query " +

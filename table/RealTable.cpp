@@ -74,6 +74,7 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
             [szName](const RealColumn& Column) { return IsSameColumn(Column.strName, szName); });
         OwnStatement pStatement;
         const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
+        // mutate(exchanged): a statement that nobody runs leaves nothing.
         if (!blColumn && Prepare(pDb, strSql, pStatement) == SQLITE_OK) {
             return szName;
         }
@@ -96,6 +97,7 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         if (NumberColumn(pRow, 5) == kHidden) {
             return;
         }
+        // mutate(exchanged): in any order.
         Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
                                             TextColumn(pRow, 2), NumberColumn(pRow, 4) != 0,
                                             NumberColumn(pRow, 5) > kHidden});
@@ -141,6 +143,7 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
     int nLast = -1;
     return ForEachRow(pDb, IndexesSql(Out.strDatabase), strTable, [&](const OwnStatement& pRow) {
         if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
+            // mutate(doubled): both have one SQL text, and nobody looks for one without columns.
             Out.vecAll.push_back(
                 RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, {}});
         }
@@ -149,6 +152,7 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
         const std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
+        // mutate(exchanged): in any order.
         if (!IsBinary(strOfColumn) && !IsSameColumn(strOfColumn, strOfIndex)) {
             Index.blFiner = true;
         }
@@ -199,12 +203,14 @@ bool CallsNothing(const std::string& strSql) {
 
 int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& strRight, bool blJson,
                  bool& blSame) {
+    // mutate(hoisted): what follows gives its own.
     if (!CallsNothing(strRight)) {
         blSame = true;
         return SQLITE_OK;
     }
     std::string strSql = "SELECT CASE WHEN ";
     if (blJson) {
+        // mutate(doubled): the same condition once more.
         Append(strSql, {"json_valid(", strRight, ") THEN json(", strLeft, ") IS json(", strRight,
                         ") WHEN "});
     }
@@ -214,6 +220,7 @@ int HaveOneValue(sqlite3* pDb, const std::string& strLeft, const std::string& st
     if (nResult == SQLITE_OK) {
         nResult = sqlite3_step(pStatement.get());
     }
+    // mutate(exchanged): without a row its column is 0.
     blSame = nResult != SQLITE_ROW || NumberColumn(pStatement, 0) != 0;
     return nResult == SQLITE_ROW || nResult == SQLITE_ERROR ? SQLITE_OK : nResult;
 }

@@ -91,6 +91,7 @@ class TableCompare {
                     Quoted(pColumn->strType) + ", has " + NameOf(eAffinity) +
                     " affinity and changes what is stored");
         }
+        // mutate(exchanged): both only look.
         if (Of.blNotNull && !pColumn->blNotNull && !IsRowid(m_Real, *pColumn) && !m_Real.blView) {
             Add(LintCode::kNullableColumn, Of, " is \"notNull\", and its column takes NULL");
         }
