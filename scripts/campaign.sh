@@ -38,11 +38,11 @@ for option; do
 done
 
 # run FOLDER CMAKE-OPTION... builds the campaigns in one of the folders of scripts/test.sh, and runs them
-# side by side.
+# side by side. The command, which they do not need, stays part of the folder.
 run() {
     local folder=$1 program status=0
     local -a campaigns=()
-    configure "$@" -DBUILD_TESTING=ON -DVORNJSONDB_TABLE=ON "${together[@]}" -DVORNJSONDB_COMMAND=OFF
+    configure "$@" -DBUILD_TESTING=ON "${together[@]}" -DVORNJSONDB_COMMAND=ON
     build_quietly "$folder" "${programs[@]/#/vornjsondb_campaign_}"
     for program in "${programs[@]}"; do
         UBSAN_OPTIONS=print_stacktrace=1 "build/$folder/tests/campaigns/vornjsondb_campaign_$program" \
@@ -57,7 +57,7 @@ run() {
     return "$status"
 }
 
-need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_packages[@]}"
+need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${command_packages[@]}" "${test_packages[@]}"
 programs=("$name")
 if [[ $name != model ]]; then
     programs+=("table_$name")
