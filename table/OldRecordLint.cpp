@@ -134,6 +134,7 @@ class OldRecordLint {
         std::string strJson;
         BoundValue Value;
         const Misfit eMisfit = FitJson(Type, jValue, false, m_Codec, strJson, Value);
+        // mutate(hoisted): the text of what does not fit is empty.
         if (eMisfit == Misfit::kNone) {
             LintPercents(strMember, strJson, strPath, nLater);
             return;

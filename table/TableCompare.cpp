@@ -35,7 +35,7 @@ class TableCompare {
         if (nResult == SQLITE_OK && blFound) {
             nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_Indexes);
         }
-        // mutate(exchanged): what is not there is not compared.
+        // mutate(exchanged, false, || to &&): what was found is told only where all went well.
         if (nResult != SQLITE_OK || !blFound) {
             return nResult;
         }
@@ -106,7 +106,7 @@ class TableCompare {
             return SQLITE_OK;
         }
         const std::string strDefault = strClause.substr(kBefore.size());
-        bool blSame = false;
+        bool blSame = false;  // mutate(false to true): it is set in any case.
         const int nResult = HaveOneValue(m_pDb, strDefault, Column.strDefault, Of.IsJson(), blSame);
         if (nResult == SQLITE_OK && !blSame) {
             Add(LintCode::kOtherDefault, Of,
