@@ -40,6 +40,8 @@ TEST_F(DefinitionLintTest, WhatNoHandleTakes) {
               "no-definition /t: the definition names no members of table \"t\"");
     EXPECT_EQ(OfEntry(R"({"member": []})"),
               "no-definition /t: the definition names no members of table \"t\"");
+    EXPECT_EQ(OfEntry(R"({"membr": 1, "member": {}})"),
+              "no-definition /t: the definition names no members of table \"t\"");
     EXPECT_EQ(Text(LintDefinition("t", Json::Value(5))),
               "no-definition /t: the definition names no members of table \"t\"");
     EXPECT_EQ(OfMembers(R"({"a": {"cpptype": "text"}, "b": {}, "c": "int",
@@ -130,7 +132,8 @@ TEST_F(DefinitionLintTest, ColumnNamedRowidHidesTheRowNumber) {
               "rowid-name /t/member/rowid: member \"rowid\" hides the row number by which a "
               "VornJsonDbApi reads back what it has stored");
     EXPECT_EQ(OfEntry(R"({"key": "rowid",
-                          "member": {"rowid": {"cpptype": "int", "cppDefaultValue": 0}}})"),
+                          "member": {"a": {"cpptype": "int"},
+                                     "rowid": {"cpptype": "int", "cppDefaultValue": 0}}})"),
               "");
     Describe(R"({"rowid": {"cpptype": "int"}})");
     EXPECT_EQ(OldCreate(Parse(R"({"rowid": 7})")), "-1");
@@ -138,7 +141,8 @@ TEST_F(DefinitionLintTest, ColumnNamedRowidHidesTheRowNumber) {
 }
 
 TEST_F(DefinitionLintTest, TypesThatAnOldHandleKnowsInPart) {
-    EXPECT_EQ(OfMembers(R"({"a": {"cpptype": "double"}, "b": {"cpptype": "time_t"},
+    EXPECT_EQ(OfMembers(R"({"a": {"cpptype": "double", "cppDefaultValue": 0.5},
+                            "b": {"cpptype": "time_t"},
                             "c": {"cpptype": "Json::arrayValue"}, "d": {"cpptype": "any"},
                             "z": {"cpptype": "int", "cppDefaultValue": 0}})"),
               "old-type /t/member/a/cpptype: member \"a\" of type \"double\": a VornJsonDbApi "
