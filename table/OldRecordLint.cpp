@@ -24,6 +24,7 @@ Percents FateOf(std::string strText, size_t nLater) {
     Percents eFate = Percents::kExact;
     for (; nLater > 0 && strText.find('%') != std::string::npos; --nLater) {
         std::string strHalved;
+        // mutate(< to <=): the NUL behind the text is no percent sign.
         for (size_t i = 0; i < strText.size(); ++i) {
             // mutate(exchanged): of two percent signs either is kept.
             if (strText[i] == '%' && strText[++i] != '%') {
@@ -97,7 +98,7 @@ class OldRecordLint {
             LintInteger(strMember, Type, jValue, strPath);
         } else if (jValue.isString()) {
             LintText(strMember, std::string(BytesOf(jValue)), strPath, nLater);
-        } else if (Type.Bound.eKind != BoundKind::kBoolean) {
+        } else if (Type.Bound.eKind != BoundKind::kBoolean) {  // mutate(true): no flag has a text.
             LintJson(strMember, Type, jValue, strPath, nLater);
         }
     }
@@ -133,6 +134,7 @@ class OldRecordLint {
                   const std::string& strPath, size_t nLater) {
         std::string strJson;
         BoundValue Value;
+        // mutate(false to true): all that is written here is read, too.
         const Misfit eMisfit = FitJson(Type, jValue, false, m_Codec, strJson, Value);
         // mutate(hoisted): the text of what does not fit is empty.
         if (eMisfit == Misfit::kNone) {

@@ -48,6 +48,8 @@ TEST_F(OldQueryLintTest, QueriesThatMeanWhatTheySayHaveNoFindings) {
 TEST_F(OldQueryLintTest, WhatIsNoQuery) {
     Expect("[]", "not-a-query : a list of 0 is no query", "-1");
     Expect("5", "not-a-query : 5 is no query", "-1");
+    EXPECT_EQ(Text(LintOldQuery("t", Parse(R"({"t": {"member": {}}})"), Parse(R"({"a": 1})"))),
+              "no-definition /t: the definition names no members of table \"t\"");
     EXPECT_EQ(Text(LintOldQuery("nosuch", m_jDefinition, Parse("{}"))),
               "no-definition /nosuch: the definition names no members of table \"nosuch\"");
 }

@@ -58,6 +58,8 @@ TEST_F(OldRecordLintTest, WhatIsNoRecord) {
            "-1", "");
     Expect("[1]", "not-a-record : a list of 1 is no record: an object with members is expected",
            "-1", "");
+    EXPECT_EQ(Text(LintOldRecord("t", Parse(R"({"t": {"member": {}}})"), Parse(R"({"a": 1})"))),
+              "no-definition /t: the definition names no members of table \"t\"");
     EXPECT_EQ(Text(LintOldRecord("nosuch", m_jDefinition, Parse("{}"))),
               "no-definition /nosuch: the definition names no members of table \"nosuch\"");
 }
