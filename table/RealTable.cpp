@@ -97,7 +97,7 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         if (NumberColumn(pRow, 5) == kHidden) {
             return;
         }
-        // mutate(exchanged): in any order.
+        // mutate(exchanged, > to >=): in any order, and what is hidden does not come here.
         Out.vecColumns.push_back(RealColumn{TextColumn(pRow, 0), TextColumn(pRow, 1),
                                             TextColumn(pRow, 2), NumberColumn(pRow, 4) != 0,
                                             NumberColumn(pRow, 5) > kHidden});
