@@ -3,10 +3,6 @@
 #ifndef VORNJSONDB_CLI_INPUT_JSON_HANDLER_H
 #define VORNJSONDB_CLI_INPUT_JSON_HANDLER_H
 
-// For texts that are read in place without a check of their encoding.
-#if defined(__SSE2__) && !defined(RAPIDJSON_SSE2)
-#define RAPIDJSON_SSE2
-#endif
 #include <rapidjson/reader.h>
 
 #include <cstdint>

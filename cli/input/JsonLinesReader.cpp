@@ -1,5 +1,6 @@
 // JSON Lines: each line is read where it lies in memory, and a bad one harms no other.
 
+#include "CheckedText.h"
 #include "JsonHandler.h"
 #include "LineBuffer.h"
 #include "Utf8.h"
@@ -86,7 +87,7 @@ class LinesReader {
     // it, and written where the text goes, which need not be the same place.
     char* Copy(std::string_view strLine) {
         constexpr size_t kLongestSequence = 4;
-        m_strCopy.assign(strLine).append(kLongestSequence + LineBuffer::kPad, '\0');
+        m_strCopy.assign(strLine).append(kLongestSequence, '\0');
         return m_strCopy.data();
     }
 
@@ -101,7 +102,7 @@ class LinesReader {
     LineBuffer m_Lines;
     LinePosition m_At;
     JsonHandler m_Handler;
-    rapidjson::Reader m_Reader;
+    rapidjson::GenericReader<CheckedText, rapidjson::UTF8<>> m_Reader;
     std::string m_strCopy;
 };
 

@@ -15,8 +15,8 @@ class LineBuffer {
     // Lines longer than nMost are skipped and reported as such.
     LineBuffer(ByteSource& From, size_t nMost) : m_From(From), m_nMost(nMost) {}
 
-    // Who looks for the NUL behind a line sixteen bytes at a time may read so far beyond it.
-    static constexpr size_t kPad = 16;
+    // Who looks for the NUL behind a line eight bytes at a time may read so far beyond it.
+    static constexpr size_t kPad = 8;
 
     // False at the end. The line is without its line feed, and a NUL follows it.
     bool Next();

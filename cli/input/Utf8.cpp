@@ -2,45 +2,50 @@
 
 #include <utf8proc.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
-#include <cstring>
+
+#include "EightBytes.h"
 
 namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-// How many of eight bytes, from the first on, are ASCII and not below cLeast. It may say less.
-size_t PlainBytes(const char* pEight, unsigned char cLeast) {
-    constexpr std::uint64_t kOnes = 0x0101010101010101U;
-    std::uint64_t nEight = 0;
-    std::memcpy(&nEight, pEight, sizeof nEight);
-    // The top bit of each byte that is none of them, and maybe of bytes after the first such.
-    const std::uint64_t nOther = (nEight | (nEight - cLeast * kOnes)) & (0x80 * kOnes);
-    if (nOther == 0) {
-        return sizeof nEight;
+// How many bytes at the begin are whole characters of one or two bytes, none of them below cLeast.
+// It may say less.
+size_t ShortCharacters(std::string_view strBytes, unsigned char cLeast) {
+    EightBytes nOpen = 0;  // the mark of a first byte that ends a character begun before
+    size_t i = 0;
+    for (; i < strBytes.size(); i += sizeof(EightBytes)) {
+        const EightBytes nBytes = LoadUpToEight({strBytes.data() + i, strBytes.size() - i});
+        const EightBytes nBegin = nBytes & (nBytes << 1) & kAllMarks;  // 11......
+        const EightBytes nFollow = (nBytes & kAllMarks) ^ nBegin;      // 10......
+        // 111..... begins a longer one, and 1100000. stands for a character of one byte.
+        const EightBytes nTwo = nBegin & ~(nBytes << 2) & ((nBytes & Each(0x1E)) + Each(0x7E));
+        if (nBegin != nTwo || nFollow != (nTwo << 8 | nOpen) || MarkBelow(nBytes, cLeast) != 0) {
+            break;
+        }
+        nOpen = nTwo >> 56;
     }
-    constexpr bool kFirstIsLowest = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__;
-    return kFirstIsLowest ? static_cast<size_t>(__builtin_ctzll(nOther)) / 8 : 0;
+    return std::min(strBytes.size(), nOpen == 0 ? i : i - 1);
 }
 
 // The offset of the first byte that is no part of UTF-8, or ASCII below cLeast; npos: there is
 // none.
 size_t FindOther(std::string_view strBytes, unsigned char cLeast) {
-    size_t i = 0;
+    size_t i = ShortCharacters(strBytes, cLeast);
     while (i < strBytes.size()) {
-        const size_t nPlain =
-            i + 8 <= strBytes.size() ? PlainBytes(strBytes.data() + i, cLeast) : 0;
-        i += nPlain;
-        if (nPlain == 8) {
-            continue;
-        }
         std::int32_t nCode = 0;
         const size_t nLength = ReadCharacter(strBytes.substr(i), nCode);
         if (nCode < cLeast) {
             return i;
         }
         i += nLength;
+        // Longer ones mostly stand together.
+        if (i < strBytes.size() && static_cast<unsigned char>(strBytes[i]) < 0xE0) {
+            i += ShortCharacters(strBytes.substr(i), cLeast);
+        }
     }
     return std::string_view::npos;
 }

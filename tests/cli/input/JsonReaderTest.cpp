@@ -263,11 +263,22 @@ TEST(JsonLinesReader, EscapesAndCharactersOfSeveralBytesAtEachPlaceOfAText) {
             return Lines("{\"a\":\"" + strBefore + strInside + "y\"}\n{\"b\":1}");
         };
         const std::string strRead = "1@1: a='" + strBefore;
+        const std::string strAfter = "0123456789 caf\xC3\xA9 0123456789 ";
         EXPECT_EQ(fnRead("\\u0041\\n\\\""), strRead + "A\n\"y'\n2@2: b=1\n");
         EXPECT_EQ(fnRead("\xC3\xA9\xE2\x82\xAC"), strRead + "\xC3\xA9\xE2\x82\xACy'\n2@2: b=1\n");
+        EXPECT_EQ(fnRead("\\t" + strAfter + "\\/" + strAfter),
+                  strRead + "\t" + strAfter + "/" + strAfter + "y'\n2@2: b=1\n");
         EXPECT_EQ(fnRead("\\ud83d\\ude00"), strRead + "\xF0\x9F\x98\x80y'\n2@2: b=1\n");
         EXPECT_EQ(fnRead("\\udc00"), "1@1: bad: \\u gives half of a surrogate pair\n2@2: b=1\n");
     }
+}
+
+// With an escape in the line, and without.
+TEST(JsonLinesReader, TextsInListsAndObjects) {
+    EXPECT_EQ(Lines("{\"a\":[\"x\", \"it's / caf\xC3\xA9\x7F\", \"\"], \"b\":{\"c\": \"d\"}}\n"
+                    "{\"a\":[\"x\", \"\\\"\\\\\\u0001\\/\"], \"b\":{\"\\u0063\": \"d\"}}"),
+              "1@1: a=[\"x\",\"it's / caf\xC3\xA9\x7F\",\"\"] b={\"c\":\"d\"}\n"
+              "2@2: a=[\"x\",\"\\\"\\\\\\u0001/\"] b={\"c\":\"d\"}\n");
 }
 
 TEST(JsonLinesReader, CutLinesSayThatTheyEnd) {
