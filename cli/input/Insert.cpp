@@ -382,15 +382,14 @@ void Import::Load() {
     }
     Prepare();
     const bool blMode = m_eOnDuplicate != OnDuplicate::kStop;
-    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, m_pErrors.get(), blMode,
+    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, m_pErrors.get(),
+                                           m_blGuessed ? &m_AllSeen : nullptr, blMode,
                                            [this] { return AfterRecord(); });
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {
-        m_AllSeen.BeginInput(blCells);
         m_pSink->BeginInput(strName, blCells);
     };
-    BothSinks Both(m_AllSeen, *m_pSink);
-    if (!m_Files.Read(m_blGuessed ? static_cast<Sink&>(Both) : *m_pSink, fnBegin, false)) {
+    if (!m_Files.Read(*m_pSink, fnBegin, false)) {
         FailInterrupted();
     }
     if (m_blGuessed) {

@@ -109,32 +109,33 @@ bool JsonHandler::CheckEscapes(std::string_view strText) {
     return !blWrong;
 }
 
-void JsonHandler::AppendToJson(std::string_view strText) {
+void JsonHandler::SeparateInJson() {
     m_eList = List::kNone;
     const char cLast = m_strJson.back();
     if (cLast != '[' && cLast != '{' && cLast != ':') {
         m_strJson += ',';
     }
+}
+
+void JsonHandler::AppendToJson(std::string_view strText) {
+    SeparateInJson();
     m_strJson += strText;
 }
 
 void JsonHandler::AppendTextToJson(std::string_view strText) {
-    AppendToJson("");
-    AppendQuoted(strText, m_strJson);
-}
-
-bool JsonHandler::Scalar(const Value& Given, const char* szKind) {
-    if (m_nLevel == m_nRecordLevel) {
-        return NoRecord(Given, szKind);
+    SeparateInJson();
+    if (m_blEscapes) {
+        AppendQuoted(strText, m_strJson);
+    } else {
+        // What came without escapes needs none.
+        m_strJson += '"';
+        m_strJson += strText;
+        m_strJson += '"';
     }
-    if (m_strReason.empty()) {
-        m_To.Take(m_nMember, Given);
-    }
-    return true;
 }
 
 bool JsonHandler::Null() {
-    if (m_nLevel > m_nRecordLevel + 1) {
+    if (IsNested()) {
         AppendToJson("null");
         return true;
     }
@@ -142,7 +143,7 @@ bool JsonHandler::Null() {
 }
 
 bool JsonHandler::Bool(bool blValue) {
-    if (m_nLevel > m_nRecordLevel + 1) {
+    if (IsNested()) {
         AppendToJson(blValue ? "true" : "false");
         return true;
     }
@@ -154,7 +155,7 @@ bool JsonHandler::Bool(bool blValue) {
 
 bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strText(pText, nText);
-    if (m_nLevel > m_nRecordLevel + 1) {
+    if (IsNested()) {
         AppendToJson(strText);
         return true;
     }
@@ -164,7 +165,7 @@ bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) 
 bool JsonHandler::String(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strText(pText, nText);
     CheckText(strText);
-    if (m_nLevel > m_nRecordLevel + 1) {
+    if (IsNested()) {
         AppendTextToJson(strText);
         return true;
     }
@@ -184,10 +185,27 @@ void JsonHandler::NestedKey(std::string_view strName) {
     m_strJson += ':';
 }
 
+bool JsonHandler::KeyBesideList(std::string_view strName) {
+    Blame("the object has the member \"" + std::string(strName) + "\" beside the list \"" +
+          m_strListName + "\"; take the list out of it, or use --format jsonl");
+    return false;
+}
+
+bool JsonHandler::KeyTooMany() {
+    Blame("the records have more different members than the " + std::to_string(MemberNames::kMost) +
+          " that a table can have columns");
+    return false;
+}
+
+bool JsonHandler::KeyTwice(std::string_view strName) {
+    Blame("the member \"" + std::string(strName) + "\" is there twice");
+    return true;
+}
+
 bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strName(pText, nText);
     const bool blGood = CheckText(strName);
-    if (m_nLevel > m_nRecordLevel + 1) {
+    if (IsNested()) {
         NestedKey(strName);
         return true;
     }
@@ -196,9 +214,7 @@ bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
         return m_nLevel > m_nRecordLevel;  // nobody is told of a name that is no text
     }
     if (m_nLevel < m_nRecordLevel) {
-        Blame("the object has the member \"" + std::string(strName) + "\" beside the list \"" +
-              m_strListName + "\"; take the list out of it, or use --format jsonl");
-        return false;
+        return KeyBesideList(strName);
     }
     if (m_eList == List::kMayBe) {
         m_eList = List::kNamed;
@@ -209,14 +225,9 @@ bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
     bool blTwice = false;
     m_nMember = m_Names.Find(strName, blTwice);
     if (m_nMember == MemberNames::kTooMany) {
-        Blame("the records have more different members than the " +
-              std::to_string(MemberNames::kMost) + " that a table can have columns");
-        return false;
+        return KeyTooMany();
     }
-    if (blTwice) {
-        Blame("the member \"" + std::string(strName) + "\" is there twice");
-    }
-    return true;
+    return !blTwice || KeyTwice(strName);
 }
 
 // Whether the bracket makes records of what follows, instead of being a part of one.

@@ -62,7 +62,16 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     enum class List { kNone, kMayBe, kNamed, kBegun };  // how much of {"name": [{ was seen
 
     bool OfMember() const { return m_nLevel == m_nRecordLevel + 1; }
-    bool Scalar(const Value& Given, const char* szKind);
+    bool IsNested() const { return m_nLevel > m_nRecordLevel + 1; }
+    bool Scalar(const Value& Given, const char* szKind) {
+        if (m_nLevel == m_nRecordLevel) {
+            return NoRecord(Given, szKind);
+        }
+        if (m_strReason.empty()) {
+            m_To.Take(m_nMember, Given);
+        }
+        return true;
+    }
     bool Open(char cBracket);
     bool Close(char cBracket);
     bool IsWrappedList(char cBracket);
@@ -73,6 +82,10 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool CheckText(std::string_view strText) { return !m_blEscapes || CheckEscapes(strText); }
     bool CheckEscapes(std::string_view strText);
     void NestedKey(std::string_view strName);
+    bool KeyBesideList(std::string_view strName);
+    bool KeyTooMany();
+    bool KeyTwice(std::string_view strName);
+    void SeparateInJson();
     void AppendToJson(std::string_view strText);
     void AppendTextToJson(std::string_view strText);
 

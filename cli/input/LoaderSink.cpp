@@ -36,11 +36,12 @@ std::string At(const std::string& strInput, const Place& Where) {
 
 }  // namespace
 
-LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
-                       std::function<bool()> fnAfter)
+LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, Inference* pSeen,
+                       bool blMode, std::function<bool()> fnAfter)
     : m_Of(Of),
       m_Into(Into),
       m_pErrors(pErrors),
+      m_pSeen(pSeen),
       m_blMode(blMode),
       m_fnAfter(std::move(fnAfter)),
       m_vecNumberColumns(NumberColumns(Of.Connection(), Of.Name())),
@@ -50,6 +51,9 @@ void LoaderSink::BeginInput(const std::string& strName, bool blCells) {
     m_strInput = strName;
     m_blCells = blCells;
     m_vecColumns.clear();
+    if (m_pSeen != nullptr) {
+        m_pSeen->BeginInput(blCells);
+    }
 }
 
 void LoaderSink::NewMember(std::string_view strName) {
@@ -61,10 +65,16 @@ void LoaderSink::NewMember(std::string_view strName) {
                           HasName(m_vecNumberColumns, Added.strName);
     }
     m_vecColumns.push_back(std::move(Added));
+    if (m_pSeen != nullptr) {
+        m_pSeen->NewMember(strName);
+    }
 }
 
 void LoaderSink::Take(size_t nMember, const Value& Given) {
     const Column& Into = m_vecColumns[nMember];
+    if (m_pSeen != nullptr) {
+        m_pSeen->Take(nMember, Given);
+    }
     if (Into.nLoader < 0) {
         if (!m_blUnknown) {
             m_strUnknown = Into.strName;
@@ -99,9 +109,15 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
     }
 }
 
+// Out of the way of the texts that are taken.
+__attribute__((noinline)) void LoaderSink::RejectNumber(const Column& Into,
+                                                        std::string_view strText) {
+    m_Into.Reject(NumberColumnText(Into.strName, strText));
+}
+
 void LoaderSink::SetText(const Column& Into, std::string_view strText) {
     if (Into.blNumbers && IsNumberToSqlite(strText)) {
-        m_Into.Reject(NumberColumnText(Into.strName, strText));
+        RejectNumber(Into, strText);
     } else {
         m_Into.SetText(Into.nLoader, strText);
     }
@@ -194,6 +210,9 @@ void LoaderSink::NotStored(const Place& Where, const std::string& strReason) {
 }
 
 bool LoaderSink::EndRecord(const Place& Where) {
+    if (m_pSeen != nullptr) {
+        m_pSeen->EndRecord(Where);
+    }
     if (m_blUnknown) {
         m_blUnknown = false;
         const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members());
@@ -219,6 +238,9 @@ bool LoaderSink::EndRecord(const Place& Where) {
 }
 
 bool LoaderSink::BadRecord(const Place& Where, const std::string& strReason) {
+    if (m_pSeen != nullptr) {
+        m_pSeen->BadRecord(Where, strReason);
+    }
     m_blUnknown = false;
     m_Into.Reject(strReason);
     m_Into.EndRecord().Ignore();  // counts it

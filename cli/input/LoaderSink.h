@@ -11,16 +11,17 @@
 
 #include "../../src/schema/MemberType.h"
 #include "ErrorFile.h"
+#include "Inference.h"
 #include "Sink.h"
 
 namespace VORN_JSON_DB::Cli {
 
 class LoaderSink : public Sink {
   public:
-    // The first bad record is an Error, unless pErrors takes it. fnAfter is called after each
-    // record and says whether to go on.
+    // The first bad record is an Error, unless pErrors takes it. pSeen is told of all records.
+    // fnAfter is called after each record and says whether to go on.
     // blMode: the call says what to do with a key that is there.
-    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, bool blMode,
+    LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, Inference* pSeen, bool blMode,
                std::function<bool()> fnAfter);
 
     void BeginInput(const std::string& strName, bool blCells);
@@ -43,6 +44,7 @@ class LoaderSink : public Sink {
 
     void Set(const Column& Into, const Value& Given);
     void SetText(const Column& Into, std::string_view strText);
+    void RejectNumber(const Column& Into, std::string_view strText);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
     bool Decode(const Column& Into, std::string_view strBegin, std::string_view strJson);
@@ -53,6 +55,7 @@ class LoaderSink : public Sink {
     const Table& m_Of;
     Loader& m_Into;
     ErrorFile* const m_pErrors;
+    Inference* const m_pSeen;
     const bool m_blMode;
     const std::function<bool()> m_fnAfter;
     std::string m_strInput;

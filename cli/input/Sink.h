@@ -60,31 +60,6 @@ class Sink {
     virtual bool BadRecord(const Place& Where, const std::string& strReason) = 0;
 };
 
-// Tells two of the same records. The second one is not told what the first one wants no more of.
-class BothSinks : public Sink {
-  public:
-    BothSinks(Sink& First, Sink& Second) : m_First(First), m_Second(Second) {}
-
-    void NewMember(std::string_view strName) override {
-        m_First.NewMember(strName);
-        m_Second.NewMember(strName);
-    }
-    void Take(size_t nMember, const Value& Given) override {
-        m_First.Take(nMember, Given);
-        m_Second.Take(nMember, Given);
-    }
-    bool EndRecord(const Place& Where) override {
-        return m_First.EndRecord(Where) && m_Second.EndRecord(Where);
-    }
-    bool BadRecord(const Place& Where, const std::string& strReason) override {
-        return m_First.BadRecord(Where, strReason) && m_Second.BadRecord(Where, strReason);
-    }
-
-  private:
-    Sink& m_First;
-    Sink& m_Second;
-};
-
 }  // namespace VORN_JSON_DB::Cli
 
 #endif  // VORNJSONDB_CLI_INPUT_SINK_H
