@@ -8,6 +8,7 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
+// First those of Value::Kind, in its order.
 constexpr unsigned kNull = 1;
 constexpr unsigned kBoolean = 2;
 constexpr unsigned kInteger = 4;
@@ -37,22 +38,16 @@ unsigned KindOfJson(std::string_view strJson) {
 }
 
 unsigned KindsOf(const Value& Given) {
-    switch (Given.eKind) {
-        case Value::Kind::kNull:
-            return kNull;
-        case Value::Kind::kBoolean:
-            return kBoolean;
-        case Value::Kind::kInteger:
-            return OfInteger(Given.nInteger);
-        case Value::Kind::kReal:
-            return kReal;
-        case Value::Kind::kWide:
-            return kWide;
-        case Value::Kind::kText:
-            return kText;
-        default:
-            return KindOfJson(Given.strText);
+    if (Given.eKind == Value::Kind::kJson) {
+        return KindOfJson(Given.strText);
     }
+    const unsigned nKind = 1U << static_cast<unsigned>(Given.eKind);
+    return nKind == kInteger ? OfInteger(Given.nInteger) : nKind;
+}
+
+// Out of the way of all other values.
+__attribute__((noinline)) unsigned KindsOfCell(std::string_view strCell) {
+    return KindsOf(CellNumber(strCell));
 }
 
 struct TypeRow {
@@ -91,6 +86,7 @@ const char* TypeFor(unsigned nKinds, bool blCells) {
 void Inference::BeginInput(bool blCells) {
     m_vecInput.clear();
     m_vecNow.clear();
+    m_nNow = 0;
     m_blCells = blCells;
     m_blOnlyCells = m_blOnlyCells && blCells;
 }
@@ -103,25 +99,27 @@ void Inference::NewMember(std::string_view strName) {
         m_vecSeen.back().strName = strName;
     }
     m_vecInput.push_back(itFound->second);
+    m_vecNow.emplace_back();
 }
 
 void Inference::Take(size_t nMember, const Value& Given) {
     const bool blCell = m_blCells && Given.eKind == Value::Kind::kText;
-    m_vecNow.emplace_back(m_vecInput[nMember], KindsOf(blCell ? CellNumber(Given.strText) : Given));
+    m_vecNow[m_nNow++] = {m_vecInput[nMember],
+                          blCell ? KindsOfCell(Given.strText) : KindsOf(Given)};
 }
 
 bool Inference::EndRecord(const Place&) {
     ++m_nRecords;
-    for (const auto& Each : m_vecNow) {
-        m_vecSeen[Each.first].nKinds |= Each.second;
-        ++m_vecSeen[Each.first].nValues;
+    for (size_t i = 0; i < m_nNow; ++i) {
+        m_vecSeen[m_vecNow[i].nSeen].nKinds |= m_vecNow[i].nKinds;
+        ++m_vecSeen[m_vecNow[i].nSeen].nValues;
     }
-    m_vecNow.clear();
+    m_nNow = 0;
     return true;
 }
 
 bool Inference::BadRecord(const Place&, const std::string&) {
-    m_vecNow.clear();
+    m_nNow = 0;
     return true;
 }
 

@@ -6,7 +6,6 @@
 #include <cstdint>
 #include <map>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include <json/json.h>
@@ -45,11 +44,16 @@ class Inference : public Sink {
         unsigned nKinds = 0;       // bits
         std::int64_t nValues = 0;  // nulls, too
     };
+    struct Now {
+        size_t nSeen = 0;
+        unsigned nKinds = 0;
+    };
 
     std::vector<Seen> m_vecSeen;
     std::map<std::string, size_t, std::less<>> m_mapSeen;
-    std::vector<size_t> m_vecInput;                     // the input's members in m_vecSeen
-    std::vector<std::pair<size_t, unsigned>> m_vecNow;  // of the record: it may yet turn out bad
+    std::vector<size_t> m_vecInput;  // the input's members in m_vecSeen
+    std::vector<Now> m_vecNow;       // of the record, which may yet turn out bad; room for all
+    size_t m_nNow = 0;               // how many it has so far
     std::int64_t m_nRecords = 0;
     bool m_blCells = false;
     bool m_blOnlyCells = true;
