@@ -78,11 +78,10 @@ class SeparatedReader {
     bool m_blHeaderRead = false;
     size_t m_nCell = 0;  // of the row
     std::int64_t m_nRecord = 0;
-    std::int64_t m_nLine = 1;      // that is being fed
-    std::int64_t m_nRowLine = 1;   // where the row began
-    bool m_blAfterReturn = false;  // a line feed belongs to the carriage return before it
-    std::string m_strReason;       // what is wrong with the row
-    std::string m_strText;         // of the row
+    std::int64_t m_nLine = 1;     // that is being fed
+    std::int64_t m_nRowLine = 1;  // where the row began
+    std::string m_strReason;      // what is wrong with the row
+    std::string m_strText;        // of the row
 };
 
 template <typename Call>
@@ -235,9 +234,7 @@ bool SeparatedReader::Feed(const char* pBytes, size_t nBytes) {
 
 // A piece that ends in a line's end, if it is whole. Between rows the parser is where it began.
 bool SeparatedReader::FeedLine(const char* pLine, size_t nLine) {
-    const char cLast = pLine[nLine - 1];
-    const bool blSecondHalf = m_blAfterReturn && nLine == 1 && cLast == '\n';
-    if (m_Parser.pstate == 0 && !blSecondHalf) {
+    if (m_Parser.pstate == 0) {
         m_nRowLine = m_nLine;
         m_strText.clear();
     }
@@ -247,8 +244,8 @@ bool SeparatedReader::FeedLine(const char* pLine, size_t nLine) {
     if (!Feed(pLine, nLine)) {
         return false;
     }
-    m_nLine += (cLast == '\n' || cLast == '\r') && !blSecondHalf ? 1 : 0;
-    m_blAfterReturn = cLast == '\r';
+    const char cLast = pLine[nLine - 1];
+    m_nLine += cLast == '\n' || cLast == '\r' ? 1 : 0;
     return true;
 }
 
@@ -273,14 +270,18 @@ bool SeparatedReader::FeedBlock(const char* pBlock, size_t nBlock) {
 }
 
 ReadOutcome SeparatedReader::Run() {
-    const auto pBlock = std::make_unique<char[]>(ByteSource::kBlock);
+    // A carriage return waits for the line feed that may come with the next block.
+    size_t nWaiting = 0;
+    const auto pBlock = std::make_unique<char[]>(1 + ByteSource::kBlock);
+    bool blMore = true;
     bool blGoOn = true;
-    while (blGoOn) {
-        const size_t nRead = m_From.Read(pBlock.get(), ByteSource::kBlock);
-        if (nRead == 0) {
-            break;
-        }
-        blGoOn = FeedBlock(pBlock.get(), nRead);
+    while (blMore && blGoOn) {
+        const size_t nRead = m_From.Read(pBlock.get() + nWaiting, ByteSource::kBlock);
+        const size_t nBlock = nWaiting + nRead;
+        blMore = nRead > 0;
+        nWaiting = blMore && pBlock[nBlock - 1] == '\r' ? 1 : 0;
+        blGoOn = FeedBlock(pBlock.get(), nBlock - nWaiting);
+        pBlock[0] = '\r';
     }
     if (blGoOn && csv_fini(&m_Parser, OnCell, OnRow, this) != 0) {
         Fail(m_nRowLine, "the quotes that begin in this row never end");

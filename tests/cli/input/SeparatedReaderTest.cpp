@@ -136,6 +136,23 @@ TEST(SeparatedReader, RowsAcrossBlocksAreWhole) {
     EXPECT_EQ(Csv(strText), strRead);
 }
 
+// The carriage return is the last byte of a block; the line feed, if there is one, is the next
+// one's first.
+TEST(SeparatedReader, ALinesEndAcrossBlocksIsWhole) {
+    ReadOptions How = Separated();
+    How.blKeepText = true;
+    constexpr size_t kBlock = ByteSource::kBlock;
+    for (const std::string strEnd : {"\r\n", "\r"}) {
+        const std::string strHeader = "a\r\n";
+        const std::string strFirst(kBlock - 1 - strHeader.size(), 'x');
+        const std::string strSecond(kBlock - strEnd.size(), 'y');
+        EXPECT_EQ(ReadAll(strHeader + strFirst + strEnd + strSecond + strEnd + "1,2\r", How),
+                  "1@2: a='" + strFirst + "' <" + strFirst + strEnd + ">\n" +  //
+                      "2@3: a='" + strSecond + "' <" + strSecond + strEnd + ">\n" +
+                      "3@4: bad: the row has 2 cells, but there is 1 column <1,2\r>\n");
+    }
+}
+
 TEST(SeparatedReader, TheSinkEndsIt) {
     PrintedRecords To;
     To.nStopAfter = 1;
