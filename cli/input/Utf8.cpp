@@ -19,14 +19,16 @@ size_t ShortCharacters(std::string_view strBytes, unsigned char cLeast) {
     size_t i = 0;
     for (; i < strBytes.size(); i += sizeof(EightBytes)) {
         const EightBytes nBytes = LoadUpToEight({strBytes.data() + i, strBytes.size() - i});
-        const EightBytes nBegin = nBytes & (nBytes << 1) & kAllMarks;  // 11......
-        const EightBytes nFollow = (nBytes & kAllMarks) ^ nBegin;      // 10......
+        const EightBytes nHigh = nBytes & kAllMarks;
+        const EightBytes nBegin = nHigh & (nBytes << 1);  // 11......
+        const EightBytes nFollow = nHigh ^ nBegin;        // 10......
         // 111..... begins a longer one, and 1100000. stands for a character of one byte.
-        const EightBytes nTwo = nBegin & ~(nBytes << 2) & ((nBytes & Each(0x1E)) + Each(0x7E));
-        if (nBegin != nTwo || nFollow != (nTwo << 8 | nOpen) || MarkBelow(nBytes, cLeast) != 0) {
+        const EightBytes nOther = nBegin & (nBytes << 2 | ~((nBytes & Each(0x1E)) + Each(0x7E)));
+        const EightBytes nAlone = nFollow ^ (nBegin << 8 | nOpen);
+        if ((nOther | nAlone | MarkBelow(nBytes, cLeast)) != 0) {
             break;
         }
-        nOpen = nTwo >> 56;
+        nOpen = nBegin >> 56;
     }
     return std::min(strBytes.size(), nOpen == 0 ? i : i - 1);
 }
