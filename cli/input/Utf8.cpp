@@ -13,9 +13,9 @@ namespace VORN_JSON_DB::Cli {
 namespace {
 
 // How many bytes at the begin are whole characters of one or two bytes, none of them below cLeast.
-// It may say less.
 size_t ShortCharacters(std::string_view strBytes, unsigned char cLeast) {
     EightBytes nOpen = 0;  // the mark of a first byte that ends a character begun before
+    EightBytes nWrong = 0;
     size_t i = 0;
     for (; i < strBytes.size(); i += sizeof(EightBytes)) {
         const EightBytes nBytes = LoadUpToEight({strBytes.data() + i, strBytes.size() - i});
@@ -25,12 +25,16 @@ size_t ShortCharacters(std::string_view strBytes, unsigned char cLeast) {
         // 111..... begins a longer one, and 1100000. stands for a character of one byte.
         const EightBytes nOther = nBegin & (nBytes << 2 | ~((nBytes & Each(0x1E)) + Each(0x7E)));
         const EightBytes nAlone = nFollow ^ (nBegin << 8 | nOpen);
-        if ((nOther | nAlone | MarkBelow(nBytes, cLeast)) != 0) {
+        nWrong = nOther | nAlone | MarkBelow(nBytes, cLeast);
+        if (nWrong != 0) {
+            i += BeforeMark(nWrong);
             break;
         }
         nOpen = nBegin >> 56;
     }
-    return std::min(strBytes.size(), nOpen == 0 ? i : i - 1);
+    i = std::min(i, strBytes.size());
+    const bool blHalf = i > 0 && static_cast<unsigned char>(strBytes[i - 1]) >= 0xC0;
+    return blHalf ? i - 1 : i;
 }
 
 // The offset of the first byte that is no part of UTF-8, or ASCII below cLeast; npos: there is
