@@ -45,11 +45,6 @@ unsigned KindsOf(const Value& Given) {
     return nKind == kInteger ? OfInteger(Given.nInteger) : nKind;
 }
 
-// Out of the way of all other values.
-__attribute__((noinline)) unsigned KindsOfCell(std::string_view strCell) {
-    return KindsOf(CellNumber(strCell));
-}
-
 struct TypeRow {
     unsigned nMost;  // the kinds that the type has room for
     const char* szType;
@@ -86,7 +81,6 @@ const char* TypeFor(unsigned nKinds, bool blCells) {
 void Inference::BeginInput(bool blCells) {
     m_vecInput.clear();
     m_vecNow.clear();
-    m_nNow = 0;
     m_blCells = blCells;
     m_blOnlyCells = m_blOnlyCells && blCells;
 }
@@ -99,27 +93,25 @@ void Inference::NewMember(std::string_view strName) {
         m_vecSeen.back().strName = strName;
     }
     m_vecInput.push_back(itFound->second);
-    m_vecNow.emplace_back();
 }
 
 void Inference::Take(size_t nMember, const Value& Given) {
     const bool blCell = m_blCells && Given.eKind == Value::Kind::kText;
-    m_vecNow[m_nNow++] = {m_vecInput[nMember],
-                          blCell ? KindsOfCell(Given.strText) : KindsOf(Given)};
+    m_vecNow.push_back({m_vecInput[nMember], KindsOf(blCell ? CellNumber(Given.strText) : Given)});
 }
 
 bool Inference::EndRecord(const Place&) {
     ++m_nRecords;
-    for (size_t i = 0; i < m_nNow; ++i) {
-        m_vecSeen[m_vecNow[i].nSeen].nKinds |= m_vecNow[i].nKinds;
-        ++m_vecSeen[m_vecNow[i].nSeen].nValues;
+    for (const Now& Each : m_vecNow) {
+        m_vecSeen[Each.nSeen].nKinds |= Each.nKinds;
+        ++m_vecSeen[Each.nSeen].nValues;
     }
-    m_nNow = 0;
+    m_vecNow.clear();
     return true;
 }
 
 bool Inference::BadRecord(const Place&, const std::string&) {
-    m_nNow = 0;
+    m_vecNow.clear();
     return true;
 }
 

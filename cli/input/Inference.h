@@ -45,15 +45,14 @@ class Inference : public Sink {
         std::int64_t nValues = 0;  // nulls, too
     };
     struct Now {
-        size_t nSeen = 0;
-        unsigned nKinds = 0;
+        size_t nSeen;
+        unsigned nKinds;
     };
 
     std::vector<Seen> m_vecSeen;
     std::map<std::string, size_t, std::less<>> m_mapSeen;
     std::vector<size_t> m_vecInput;  // the input's members in m_vecSeen
-    std::vector<Now> m_vecNow;       // of the record, which may yet turn out bad; room for all
-    size_t m_nNow = 0;               // how many it has so far
+    std::vector<Now> m_vecNow;       // of the record, which may yet turn out bad
     std::int64_t m_nRecords = 0;
     bool m_blCells = false;
     bool m_blOnlyCells = true;

@@ -109,15 +109,9 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
     }
 }
 
-// Out of the way of the texts that are taken.
-__attribute__((noinline)) void LoaderSink::RejectNumber(const Column& Into,
-                                                        std::string_view strText) {
-    m_Into.Reject(NumberColumnText(Into.strName, strText));
-}
-
 void LoaderSink::SetText(const Column& Into, std::string_view strText) {
     if (Into.blNumbers && IsNumberToSqlite(strText)) {
-        RejectNumber(Into, strText);
+        m_Into.Reject(NumberColumnText(Into.strName, strText));
     } else {
         m_Into.SetText(Into.nLoader, strText);
     }

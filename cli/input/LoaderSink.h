@@ -44,7 +44,6 @@ class LoaderSink : public Sink {
 
     void Set(const Column& Into, const Value& Given);
     void SetText(const Column& Into, std::string_view strText);
-    void RejectNumber(const Column& Into, std::string_view strText);
     void SetCell(const Column& Into, std::string_view strCell);
     void SetAsJson(const Column& Into, const Value& Given);
     bool Decode(const Column& Into, std::string_view strBegin, std::string_view strJson);

@@ -53,7 +53,6 @@ class Sink {
     // before. A name may come without any value.
     virtual void NewMember(std::string_view strName) = 0;
 
-    // No more than once in a record for each member.
     virtual void Take(size_t nMember, const Value& Given) = 0;
 
     // Both return whether to go on reading.
