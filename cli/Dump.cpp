@@ -108,13 +108,11 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     if (!jDefinition.isNull()) {
         jHeader["definition"] = jDefinition;
     }
-    for (const std::string& strSql :
-         Texts(pDb,
-               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND sql IS NOT NULL ORDER BY "
-               "type <> 'table', type, name",
-               strTable)) {
-        jHeader["statements"].append(strSql);
-    }
+    jHeader["statements"] = Strings(
+        Texts(pDb,
+              "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND sql IS NOT NULL ORDER BY "
+              "type <> 'table', type, name",
+              strTable));
     std::vector<std::string> vecColumns = Texts(
         pDb, "SELECT name FROM pragma_table_xinfo(?1) WHERE hidden = 0 ORDER BY cid", strTable);
     const std::string strRowid = RowidName(pDb, strTable);

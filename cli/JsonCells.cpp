@@ -156,6 +156,14 @@ void AppendValue(std::string& strOut, const Json::Value& jValue) {
 
 }  // namespace
 
+Json::Value Strings(const std::vector<std::string>& vecTexts) {
+    Json::Value jTexts(Json::arrayValue);
+    for (const std::string& strText : vecTexts) {
+        jTexts.append(strText);
+    }
+    return jTexts;
+}
+
 std::string CompactJson(const Json::Value& jValue) {
     std::string strOut;
     AppendValue(strOut, jValue);

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include <json/json.h>
 
@@ -28,6 +29,8 @@ void AppendBlob(std::string& strOut, std::string_view strBytes);
 void AppendExactText(std::string& strOut, std::string_view strText);
 void AppendExactReal(std::string& strOut, double dValue);
 bool IsUtf8(std::string_view strText);
+
+Json::Value Strings(const std::vector<std::string>& vecTexts);  // as a list
 
 // On one line, in the order of JsonCpp, texts as UTF-8.
 std::string CompactJson(const Json::Value& jValue);

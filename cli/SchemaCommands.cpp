@@ -19,14 +19,6 @@ namespace {
 
 constexpr const char* kSeverities[] = {"note", "warning", "error"};
 
-Json::Value Strings(const std::vector<std::string>& vecTexts) {
-    Json::Value jTexts(Json::arrayValue);
-    for (const std::string& strText : vecTexts) {
-        jTexts.append(strText);
-    }
-    return jTexts;
-}
-
 void AppendFindings(const FindingList& vecFindings, const std::string& strTable,
                     Json::Value& jFindings) {
     for (const Finding& Found : vecFindings) {
@@ -109,17 +101,12 @@ FindingList FindingsOf(const Context& Call) {
 // Another program has dropped or renamed their tables.
 void AppendLeftOver(sqlite3* pDb, Json::Value& jFindings) {
     for (const std::string& strTable : LeftOverDefinitions(pDb)) {
-        Json::Value jFinding;
-        jFinding["table"] = strTable;
-        jFinding["severity"] = "warning";
-        jFinding["code"] = "left-over";
-        jFinding["path"] = vornjsondb::Below("", strTable);
-        jFinding["message"] =
-            "a definition of table \"" + strTable + "\" is kept, but the table is gone";
-        jFinding["remedy"] =
+        const Finding Found = {
+            Severity::kWarning, "left-over", vornjsondb::Below("", strTable),
+            "a definition of table \"" + strTable + "\" is kept, but the table is gone",
             "it is replaced when the table is made anew; a table that was renamed gets one by "
-            "vornjsondb sync --def";
-        jFindings.append(std::move(jFinding));
+            "vornjsondb sync --def"};
+        AppendFindings({Found}, strTable, jFindings);
     }
 }
 

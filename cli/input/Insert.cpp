@@ -8,6 +8,7 @@
 
 #include "../Database.h"
 #include "../Definitions.h"
+#include "../JsonCells.h"
 #include "../Replacements.h"
 #include "../Sql.h"
 #include "../Tables.h"
@@ -188,10 +189,7 @@ void Import::FindDefinition() {
     if (m_Call.Has("--key") && !m_jDefinition.isNull()) {
         Json::Value& jKey = m_jDefinition[m_strTable]["key"];
         m_jOwnKey = jKey;
-        jKey = Json::Value(Json::arrayValue);
-        for (const std::string& strName : m_Call.Names("--key")) {
-            jKey.append(strName);
-        }
+        jKey = Strings(m_Call.Names("--key"));
     }
     if (m_jDefinition.isNull() || m_Call.Has("--add-members")) {
         LearnTypes();
@@ -290,10 +288,7 @@ int Import::ShowDryRun() {
         Json::Value jShown;
         jShown["definition"] = m_jDefinition;
         if (m_blTableThere) {
-            jShown["alter"] = Json::Value(Json::arrayValue);
-            for (const std::string& strSql : vecStatements) {
-                jShown["alter"].append(strSql);
-            }
+            jShown["alter"] = Strings(vecStatements);
         } else {
             jShown["create"] = vecStatements[0];
         }
