@@ -17,7 +17,9 @@ using vornjsondb::BoundKind;
 using vornjsondb::BoundValue;
 using vornjsondb::FindingCode;
 using vornjsondb::Misfit;
+using vornjsondb::RecordValues;
 using Parts = Loader::Parts;
+using Slot = RecordValues::Slot;
 
 void SetWrong(Parts& Of, size_t nPlace, FindingCode eCode, std::string_view strMessage) {
     FindingList vecFindings;
@@ -68,7 +70,8 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
     const bool blCompatible = pOf->Into.How.blCompatible;
     Misfit eMisfit = Misfit::kNone;
     const char* szShown = nullptr;
-    BoundValue& Out = pOf->Values.Give(nPlace);
+    Slot& Into = pOf->Values.SlotOf(nPlace);
+    BoundValue& Out = pOf->Values.Give(Into);
     switch (eKind) {
         case Passed::kBoolean:
             eMisfit = FitBoolean(Type, nValue != 0, Out);
@@ -81,10 +84,10 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
             eMisfit = FitReal(Type, dValue, blCompatible, Out);
             break;
         case Passed::kText:
-            eMisfit = FitText(Type, pOf->Values.Copied(nPlace, strBytes), blCompatible, Out);
+            eMisfit = FitText(Type, RecordValues::Copied(Into, strBytes), blCompatible, Out);
             break;
         case Passed::kBlob:
-            eMisfit = FitBlob(Type, pOf->Values.Copied(nPlace, strBytes), blCompatible, Out);
+            eMisfit = FitBlob(Type, RecordValues::Copied(Into, strBytes), blCompatible, Out);
             break;
         default:
             Out.eKind = BoundValue::Kind::kNull;
@@ -92,12 +95,13 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
     Judge(*pOf, nPlace, eMisfit, szShown);
 }
 
-// The values of a started load that a member can simply be given: the member is there, and nothing
-// is wrong so far that a new value might put right.
-vornjsondb::RecordValues* Simply(Parts* pOf, int nMember) {
-    const bool blSimply = pOf != nullptr && pOf->nWrong == 0 && !pOf->IsRunning() &&
-                          static_cast<size_t>(nMember) < pOf->Values.Size();
-    return blSimply ? &pOf->Values : nullptr;
+// The place of a member of a started load that can simply be given a value: the member is there,
+// and nothing is wrong so far that a new value might put right.
+Slot* Simply(Parts* pOf, int nMember) {
+    const auto nPlace = static_cast<size_t>(nMember);
+    const bool blSimply =
+        pOf != nullptr && pOf->nWrong == 0 && !pOf->IsRunning() && nPlace < pOf->Values.Size();
+    return blSimply ? &pOf->Values.SlotOf(nPlace) : nullptr;
 }
 
 // JSON and nothing else: JsonCpp takes comments and what follows unless it is told otherwise. Of
@@ -135,7 +139,7 @@ void Loader::SetNull(int nMember) {
 void Loader::SetBoolean(int nMember, bool blValue) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
     // mutate(hoisted, sunk): the longer way gives the same.
-    if (pInto == nullptr || !pInto->TakeBoolean(static_cast<size_t>(nMember), blValue)) {
+    if (pInto == nullptr || !m_pParts->Values.TakeBoolean(*pInto, blValue)) {
         Set(m_pParts.get(), nMember, Passed::kBoolean, blValue ? 1 : 0);
     }
 }
@@ -143,7 +147,7 @@ void Loader::SetBoolean(int nMember, bool blValue) {
 void Loader::SetInteger(int nMember, std::int64_t nValue) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
     // mutate(hoisted, sunk): the longer way gives the same.
-    if (pInto == nullptr || !pInto->TakeInteger(static_cast<size_t>(nMember), nValue)) {
+    if (pInto == nullptr || !m_pParts->Values.TakeInteger(*pInto, nValue)) {
         Set(m_pParts.get(), nMember, Passed::kInteger, nValue);
     }
 }
@@ -154,10 +158,9 @@ void Loader::SetReal(int nMember, double dValue) {
 
 void Loader::SetText(int nMember, std::string_view strText) {
     auto* const pInto = Simply(m_pParts.get(), nMember);
-    const auto nPlace = static_cast<size_t>(nMember);
     // mutate(sunk): the longer way gives the same.
-    if (pInto != nullptr && pInto->FitsText(nPlace, strText)) {
-        pInto->GiveText(nPlace, pInto->Copied(nPlace, strText));
+    if (pInto != nullptr && m_pParts->Values.FitsText(*pInto, strText)) {
+        m_pParts->Values.GiveText(*pInto, RecordValues::Copied(*pInto, strText));
     } else {
         Set(m_pParts.get(), nMember, Passed::kText, 0, 0, strText);
     }
@@ -176,11 +179,12 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
     }
     // mutate(exchanged): the one knows nothing of the other.
     m_pParts->SetRight(nPlace);
-    strJson = m_pParts->Values.Copied(nPlace, strJson);
+    Slot& Of = m_pParts->Values.SlotOf(nPlace);
+    strJson = RecordValues::Copied(Of, strJson);
     // Most texts are just as they will be stored, and need no reading.
     // mutate(false, exchanged): the longer way gives the same.
     if (vornjsondb::IsWrittenJson(strJson.data(), strJson.size()) &&
-        m_pParts->Values.TakeWritten(nPlace, strJson)) {
+        m_pParts->Values.TakeWritten(Of, strJson)) {
         return;
     }
     FindingList vecFindings;
@@ -197,7 +201,7 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
             SetText(nMember, jValue.asString());
         } else {
             // mutate(doubled): only the first finding is taken.
-            m_pParts->Values.SetJson(nPlace, jValue, vecFindings);
+            m_pParts->Values.SetJson(Of, jValue, vecFindings);
         }
     } catch (const Json::RuntimeError& Error) {
         // The one exception of JsonCpp's for two things.

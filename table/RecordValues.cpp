@@ -15,6 +15,55 @@ namespace {
 
 constexpr size_t kShortText = 64;
 
+using Slot = RecordValues::Slot;
+
+// A short text goes where the last one of its length is bound, which is cheaper than to bind it.
+bool TakeText(RecordValues& Into, Slot& Of, const Json::Value& jText) {
+    const char* pBegin = nullptr;
+    const char* pEnd = nullptr;
+    if (!jText.getString(&pBegin, &pEnd)) {
+        return false;
+    }
+    const std::string_view strText(pBegin, static_cast<size_t>(pEnd - pBegin));
+    const bool blFits = Into.FitsText(Of, strText);
+    if (blFits) {
+        // mutate(any): a text is stored wherever it is kept.
+        const bool blCopy =
+            strText.size() == Of.Value.strBytes.size() && strText.size() <= kShortText;
+        Into.GiveText(Of, blCopy ? RecordValues::Copied(Of, strText) : strText);
+    }
+    return blFits;
+}
+
+// Plain JSON is written without a look before.
+bool TakeTree(RecordValues& Into, Slot& Of, const Json::Value& jTree) {
+    const bool blPlain = WritePlainText(jTree, Of.strBytes);
+    if (blPlain) {
+        Into.GiveText(Of, Of.strBytes);
+    }
+    return blPlain;
+}
+
+// Takes a value of the member's own kind that fits, as most do: in a few steps, for SetJson gives
+// the same for every value.
+bool TakeJson(RecordValues& Into, Slot& Of, const Json::Value& jValue) {
+    switch (Of.eKind) {
+        case BoundKind::kText:
+            return TakeText(Into, Of, jValue);
+        case BoundKind::kInteger:
+            return jValue.type() == Json::intValue && Into.TakeInteger(Of, jValue.asInt64());
+        case BoundKind::kBoolean:
+            return jValue.type() == Json::booleanValue && Into.TakeBoolean(Of, jValue.asBool());
+        case BoundKind::kList:
+        case BoundKind::kObject: {
+            const auto eTree = Of.eKind == BoundKind::kList ? Json::arrayValue : Json::objectValue;
+            return jValue.type() == eTree && TakeTree(Into, Of, jValue);
+        }
+        default:
+            return false;
+    }
+}
+
 }  // namespace
 
 RecordValues::RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatible,
@@ -35,6 +84,8 @@ void RecordValues::Prepare(size_t nMember) {
     const Member& Of = m_Of.At(nMember);
     const Range& Fits = RangeOf(*Of.pType);
     Slot& Into = m_vecSlots[nMember];
+    Into.pMember = &Of;
+    Into.pGiven = &m_strGiven[nMember];
     if (!m_blCompatible || Of.pType->pfnRead != nullptr) {
         // mutate(dropped): the longer way gives the same.
         Into.eKind = Of.Kind();
@@ -52,7 +103,7 @@ void RecordValues::Prepare(size_t nMember) {
     }
 }
 
-void RecordValues::Clear() {
+void RecordValues::ForgetAll() {
     std::fill(m_strGiven.begin(), m_strGiven.end(), '0');
     m_blEmpty = true;
 }
@@ -66,88 +117,41 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
         return false;
     }
     // Records and definition are sorted alike: one step a member.
-    const std::string* const pNames = m_Of.Names().data();
-    const size_t nNames = m_Of.Names().size();
-    size_t nNext = 0;
+    Slot* pNext = m_vecSlots.data();
+    const Slot* const pEnd = pNext + m_vecSlots.size();
     for (Json::Value::const_iterator it = jRecord.begin(); nLeft > 0; --nLeft, ++it) {
         const std::string_view strName = NameOf(it).View();
         bool blIsNext = false;
-        while (nNext < nNames && !(blIsNext = pNames[nNext] == strName) &&
-               pNames[nNext] < strName) {
-            ++nNext;
+        while (pNext != pEnd && !(blIsNext = pNext->pMember->strName == strName) &&
+               pNext->pMember->strName < strName) {
+            ++pNext;
         }
         if (blIsNext) {
-            SetJson(nNext++, *it, vecFindings);
+            Slot& Of = *pNext++;
+            // mutate(true): the longer way gives the same.
+            if (!TakeJson(*this, Of, *it)) {
+                SetJson(Of, *it, vecFindings);
+            }
         } else if (!m_blIgnoreUnknown) {
-            RefuseUnknown(std::string(strName), vecFindings);
+            RefuseUnknown(strName, vecFindings);
         }
     }
     return vecFindings.empty();
 }
 
-void RecordValues::SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
-    bool blTaken = false;
-    // mutate(exchanged): the longer way gives the same.
-    switch (jValue.type()) {
-        case Json::stringValue:
-            blTaken = TakeText(nMember, BytesOf(jValue));
-            break;
-        case Json::intValue:
-            // mutate(dropped): the longer way gives the same.
-            blTaken = TakeInteger(nMember, jValue.asInt64());
-            break;
-        case Json::booleanValue:
-            // mutate(dropped): the longer way gives the same.
-            blTaken = TakeBoolean(nMember, jValue.asBool());
-            break;
-        case Json::arrayValue:
-            // mutate(dropped): the longer way gives the same.
-            blTaken = TakeTree(nMember, jValue, BoundKind::kList);
-            break;
-        case Json::objectValue:
-            // mutate(dropped): the longer way gives the same.
-            blTaken = TakeTree(nMember, jValue, BoundKind::kObject);
-            break;
-        default:
-            break;
+void RecordValues::SetJson(Slot& Of, const Json::Value& jValue, FindingList& vecFindings) {
+    BoundValue Made;
+    const Misfit eMisfit =
+        FitJson(*Of.pMember->pType, jValue, m_blCompatible, m_Codec, Of.strBytes, Made);
+    if (Made.eKind == BoundValue::Kind::kInteger) {
+        GiveInteger(Of, Made.nValue);
+    } else if (Made.eKind == BoundValue::Kind::kText) {
+        GiveText(Of, Made.strBytes);
+    } else {
+        Give(Of) = Made;
     }
-    // mutate(hoisted, sunk): the longer way gives the same.
-    if (!blTaken) {
-        LookAtJson(nMember, jValue, vecFindings);
-    }
-}
-
-// A short text goes where the last one of its length is bound, which is cheaper than to bind it.
-bool RecordValues::TakeText(size_t nMember, std::string_view strText) {
-    const bool blFits = FitsText(nMember, strText);
-    if (blFits) {
-        // mutate(any): a text is stored wherever it is kept.
-        const bool blCopy =
-            strText.size() == At(nMember).strBytes.size() && strText.size() <= kShortText;
-        GiveText(nMember, blCopy ? Copied(nMember, strText) : strText);
-    }
-    return blFits;
-}
-
-// Plain JSON is written without a look before.
-bool RecordValues::TakeTree(size_t nMember, const Json::Value& jValue, BoundKind eKind) {
-    Slot& Of = m_vecSlots[nMember];
-    if (Of.eKind != eKind) {
-        return false;
-    }
-    const bool blPlain = WritePlainText(jValue, Of.strBytes);
-    if (blPlain) {
-        GiveText(nMember, Of.strBytes);
-    }
-    return blPlain;
-}
-
-void RecordValues::LookAtJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings) {
-    const Member& Into = m_Of.At(nMember);
-    const Misfit eMisfit = FitJson(*Into.pType, jValue, m_blCompatible, m_Codec,
-                                   m_vecSlots[nMember].strBytes, Give(nMember));
-    if (eMisfit != Misfit::kNone || m_vecSlots[nMember].blComputed) {
-        Refuse(Into, eMisfit, jValue, vecFindings);
+    if (eMisfit != Misfit::kNone || Of.blComputed) {
+        Refuse(*Of.pMember, eMisfit, jValue, vecFindings);
     }
 }
 
@@ -156,7 +160,8 @@ void RecordValues::Refuse(const Member& Into, Misfit eMisfit, const Json::Value&
     ReportMisfit(eMisfit, Into, Shown(jValue), Below("", Into.strName), vecFindings);
 }
 
-void RecordValues::RefuseUnknown(const std::string& strName, FindingList& vecFindings) const {
+void RecordValues::RefuseUnknown(std::string_view strUnknown, FindingList& vecFindings) const {
+    const std::string strName(strUnknown);
     Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
            Concat({"there is no member ", ShownText(strName), Suggestion(strName, m_Of.Names())}));
 }
@@ -170,7 +175,7 @@ bool RecordValues::FillDefaults(FindingList& vecFindings) {
         // The real table may compute what the definition has a default for.
         // mutate(exchanged): both only look.
         if (!Has(nMember) && !m_Of.At(nMember).blGenerated) {
-            SetJson(nMember, *m_Of.At(nMember).pjDefault, vecFindings);
+            SetJson(m_vecSlots[nMember], *m_Of.At(nMember).pjDefault, vecFindings);
         }
     }
     return vecFindings.empty();
@@ -197,11 +202,9 @@ bool RecordValues::HasKey(FindingList& vecFindings) const {
 }
 
 int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo, bool blAgain) {
-    const char* pGiven = m_strGiven.data();
-    const Member* pMember = m_Of.All().data();
     int nParameter = nNext;
     for (Slot& Each : m_vecSlots) {
-        if (*pGiven == '1' && (blKeyToo || !pMember->blKey)) {
+        if (*Each.pGiven == '1' && (blKeyToo || !Each.pMember->blKey)) {
             if (!blAgain || !Each.blBound) {
                 const int nResult = Each.Value.Bind(pStatement, nParameter);
                 if (nResult != SQLITE_OK) {
@@ -211,8 +214,6 @@ int RecordValues::BindGiven(sqlite3_stmt* pStatement, int& nNext, bool blKeyToo,
             }
             ++nParameter;
         }
-        ++pGiven;
-        ++pMember;
     }
     nNext = nParameter;
     return SQLITE_OK;

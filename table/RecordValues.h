@@ -23,76 +23,97 @@ class RecordValues {
   public:
     RecordValues(const Members& Of, JsonCodec& Codec, bool blCompatible, bool blIgnoreUnknown);
 
-    void Clear();
+    RecordValues(const RecordValues&) = delete;
+    RecordValues& operator=(const RecordValues&) = delete;
+    ~RecordValues() = default;
+
+    void Clear() {
+        // mutate(true): what is empty stays so.
+        if (!m_blEmpty) {
+            ForgetAll();
+        }
+    }
 
     // Takes a whole record, or new values for some members. Texts are not copied. Returns whether
     // all of it can be stored; if not, vecFindings tells why.
     bool Take(const Json::Value& jRecord, FindingList& vecFindings);
 
+    // What is kept of one member, from record to record.
+    struct Slot {
+        BoundValue Value;
+        std::string strBytes;  // of a text that is kept here
+        const Member* pMember = nullptr;
+        char* pGiven = nullptr;              // the member's place in Given
+        bool blBound = false;                // mutate(false to true): the first call binds all.
+        BoundKind eKind = BoundKind::kNone;  // of values that are taken without a look
+        bool blComputed = false;             // by the table, so that a value is refused
+        std::int64_t nLeast = 0;             // of whole numbers that are taken without a look
+        std::int64_t nMost = 0;
+    };
+    Slot& SlotOf(size_t nMember) { return m_vecSlots[nMember]; }
+
     // One member: for a Fit... function to fill, and from JSON.
-    BoundValue& Give(size_t nMember) {
-        Slot& Of = Mark(nMember);
+    BoundValue& Give(Slot& Of) {
+        Mark(Of);
         Of.blBound = false;
         return Of.Value;
     }
-    void SetJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
+    void SetJson(Slot& Of, const Json::Value& jValue, FindingList& vecFindings);
 
     // A copy for a text that would not live as long as the value, followed by a NUL. There is one
     // for each member, whose memory never becomes less.
-    std::string_view Copied(size_t nMember, std::string_view strBytes) {
-        std::string& strOwn = m_vecSlots[nMember].strBytes;
+    static std::string_view Copied(Slot& Of, std::string_view strBytes) {
         // mutate(hoisted, sunk): how much memory is kept shows nowhere.
-        if (strOwn.size() < strBytes.size()) {
-            Grow(strOwn, strBytes.size());
+        if (Of.strBytes.size() < strBytes.size()) {
+            Grow(Of.strBytes, strBytes.size());
         }
-        strBytes.copy(strOwn.data(), strBytes.size());
-        strOwn[strBytes.size()] = '\0';
-        return {strOwn.data(), strBytes.size()};
+        char* const pOwn = Of.strBytes.data();
+        strBytes.copy(pOwn, strBytes.size());
+        pOwn[strBytes.size()] = '\0';
+        return {pOwn, strBytes.size()};
     }
 
     // Most values are of their member's own kind and fit. These find that out in a few steps; what
     // they return false for is looked at by a Fit... function.
-    bool FitsText(size_t nMember, std::string_view strText) const {
-        return m_vecSlots[nMember].eKind == BoundKind::kText &&
+    bool FitsText(const Slot& Of, std::string_view strText) const {
+        return Of.eKind == BoundKind::kText &&
                (!m_blCompatible || strText.find('\0') == std::string_view::npos);
     }
-    bool TakeInteger(size_t nMember, std::int64_t nValue) {
-        const Slot& Of = m_vecSlots[nMember];
+    bool TakeInteger(Slot& Of, std::int64_t nValue) {
         const bool blFits =
             Of.eKind == BoundKind::kInteger && nValue >= Of.nLeast && nValue <= Of.nMost;
         if (blFits) {
-            GiveInteger(nMember, nValue);
+            GiveInteger(Of, nValue);
         }
         return blFits;
     }
-    bool TakeBoolean(size_t nMember, bool blValue) {
-        const bool blFits = m_vecSlots[nMember].eKind == BoundKind::kBoolean;
+    bool TakeBoolean(Slot& Of, bool blValue) {
+        const bool blFits = Of.eKind == BoundKind::kBoolean;
         if (blFits) {
-            GiveInteger(nMember, blValue ? 1 : 0);
+            GiveInteger(Of, blValue ? 1 : 0);
         }
         return blFits;
     }
     // JSON text as it will be stored.
-    bool TakeWritten(size_t nMember, std::string_view strJson) {
-        const bool blFits = m_vecSlots[nMember].eKind ==
-                            (strJson[0] == '[' ? BoundKind::kList : BoundKind::kObject);
+    bool TakeWritten(Slot& Of, std::string_view strJson) {
+        const bool blFits = Of.eKind == (strJson[0] == '[' ? BoundKind::kList : BoundKind::kObject);
         if (blFits) {
-            GiveText(nMember, strJson);
+            GiveText(Of, strJson);
         }
         return blFits;
     }
 
     // Gives a value that fits. What a statement has bound already is not bound again: it knows
     // where a text is and how long, and what stands there may be another one by now.
-    void GiveInteger(size_t nMember, std::int64_t nValue) {
-        Slot& Of = Mark(nMember);
+    void GiveInteger(Slot& Of, std::int64_t nValue) {
+        Mark(Of);
         // mutate(doubled): nothing is new in between.
         Of.blBound =
             Of.blBound && Of.Value.eKind == BoundValue::Kind::kInteger && Of.Value.nValue == nValue;
         Of.Value.SetInteger(nValue);
     }
-    void GiveText(size_t nMember, std::string_view strText) {
-        Slot& Of = Mark(nMember);
+    void GiveText(Slot& Of, std::string_view strText) {
+        Mark(Of);
         Of.blBound = Of.blBound && Of.Value.IsTextAt(strText);
         Of.Value.SetText(strText);
     }
@@ -128,30 +149,18 @@ class RecordValues {
     int BindKey(sqlite3_stmt* pStatement, int& nNext) const;
 
   private:
-    struct Slot {
-        BoundValue Value;
-        std::string strBytes;
-        bool blBound = false;                // mutate(false to true): the first call binds all.
-        BoundKind eKind = BoundKind::kNone;  // of values that are taken without a look
-        std::int64_t nLeast = 0;             // of whole numbers among them
-        std::int64_t nMost = 0;
-        bool blComputed = false;  // by the table, so that a value is refused
-    };
     void Prepare(size_t nMember);
-    Slot& Mark(size_t nMember) {
-        m_strGiven[nMember] = '1';
+    void Mark(Slot& Of) {
+        *Of.pGiven = '1';
         m_blEmpty = false;
-        return m_vecSlots[nMember];
     }
-    bool TakeText(size_t nMember, std::string_view strText);
-    bool TakeTree(size_t nMember, const Json::Value& jValue, BoundKind eKind);
+    void ForgetAll();
     static void Grow(std::string& strOwn, size_t nBytes);
 
     // Apart, so that records that fit pass by them.
     void Refuse(const Member& Into, Misfit eMisfit, const Json::Value& jValue,
                 FindingList& vecFindings) const;
-    void LookAtJson(size_t nMember, const Json::Value& jValue, FindingList& vecFindings);
-    void RefuseUnknown(const std::string& strName, FindingList& vecFindings) const;
+    void RefuseUnknown(std::string_view strUnknown, FindingList& vecFindings) const;
 
     const Members& m_Of;
     JsonCodec& m_Codec;

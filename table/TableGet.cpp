@@ -60,7 +60,7 @@ bool TakeKey(Parts& Of, const Json::Value& jKey, FindingList& vecFindings) {
     const std::vector<size_t>& vecKey = Of.Of.Key();
     if (vecKey.size() == 1 &&
         vornjsondb::FindMember(jKey, Of.Of.At(vecKey[0]).strName) == nullptr) {
-        Of.Wanted.SetJson(vecKey[0], jKey, vecFindings);
+        Of.Wanted.SetJson(Of.Wanted.SlotOf(vecKey[0]), jKey, vecFindings);
     } else {
         Of.Wanted.Take(jKey, vecFindings);
     }
