@@ -113,6 +113,19 @@ const Range& RangeOf(const MemberType& Type) {
     return kRanges[static_cast<size_t>(Type.Bound.eRange)];
 }
 
+bool BoundValue::IsBoundAs(const BoundValue& Other) const {
+    switch (eKind) {
+        case Kind::kNull:
+            return Other.eKind == Kind::kNull;
+        case Kind::kInteger:
+            return Other.IsInteger(nValue);
+        case Kind::kText:
+            return Other.IsTextAt(strBytes);
+        default:
+            return false;
+    }
+}
+
 int BoundValue::Bind(sqlite3_stmt* pStatement, int nParameter) const {
     switch (eKind) {
         case Kind::kInteger:

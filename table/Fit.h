@@ -32,11 +32,18 @@ struct BoundValue {
         strBytes = strText;
     }
 
+    bool IsInteger(std::int64_t nInteger) const {
+        return eKind == Kind::kInteger && nValue == nInteger;
+    }
+
     // Whether it is a text that stands there, with as many bytes.
     bool IsTextAt(std::string_view strText) const {
         return eKind == Kind::kText && strBytes.data() == strText.data() &&
                strBytes.size() == strText.size();
     }
+
+    // Whether a statement that has this one bound needs the other one no more. False says nothing.
+    bool IsBoundAs(const BoundValue& Other) const;
 
     int Bind(sqlite3_stmt* pStatement, int nParameter) const;  // SQLite's result
 };

@@ -85,9 +85,10 @@ Status Loader::Parts::Write(FindingList& vecFindings) {
     Status Outcome =
         Into.blFails ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, 0, What, fnWrite) : fnWrite();
     if (Outcome.Ok()) {
-        std::int64_t* const apnCounts[] = {&Now.nInserted, &Now.nSkipped, &Now.nReplaced,
-                                           &Now.nReplaced};
-        ++*apnCounts[static_cast<size_t>(eWritten)];
+        static constexpr std::int64_t LoadCounts::*kCounts[] = {
+            &LoadCounts::nInserted, &LoadCounts::nSkipped, &LoadCounts::nReplaced,
+            &LoadCounts::nReplaced};
+        ++(Now.*kCounts[static_cast<size_t>(eWritten)]);
         return Outcome;
     }
     return vornjsondb::InTransaction(Into.pDb, Outcome);

@@ -143,12 +143,10 @@ void RecordValues::SetJson(Slot& Of, const Json::Value& jValue, FindingList& vec
     BoundValue Made;
     const Misfit eMisfit =
         FitJson(*Of.pMember->pType, jValue, m_blCompatible, m_Codec, Of.strBytes, Made);
-    if (Made.eKind == BoundValue::Kind::kInteger) {
-        GiveInteger(Of, Made.nValue);
-    } else if (Made.eKind == BoundValue::Kind::kText) {
-        GiveText(Of, Made.strBytes);
-    } else {
-        Give(Of) = Made;
+    Mark(Of);
+    if (!Of.Value.IsBoundAs(Made)) {
+        Of.blBound = false;
+        Of.Value = Made;
     }
     if (eMisfit != Misfit::kNone || Of.blComputed) {
         Refuse(*Of.pMember, eMisfit, jValue, vecFindings);

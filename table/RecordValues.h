@@ -107,15 +107,17 @@ class RecordValues {
     // where a text is and how long, and what stands there may be another one by now.
     void GiveInteger(Slot& Of, std::int64_t nValue) {
         Mark(Of);
-        // mutate(doubled): nothing is new in between.
-        Of.blBound =
-            Of.blBound && Of.Value.eKind == BoundValue::Kind::kInteger && Of.Value.nValue == nValue;
-        Of.Value.SetInteger(nValue);
+        if (!Of.Value.IsInteger(nValue)) {
+            Of.blBound = false;
+            Of.Value.SetInteger(nValue);
+        }
     }
     void GiveText(Slot& Of, std::string_view strText) {
         Mark(Of);
-        Of.blBound = Of.blBound && Of.Value.IsTextAt(strText);
-        Of.Value.SetText(strText);
+        if (!Of.Value.IsTextAt(strText)) {
+            Of.blBound = false;
+            Of.Value.SetText(strText);
+        }
     }
 
     // From now on every value of the member is refused: the table computes it.

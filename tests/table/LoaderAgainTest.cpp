@@ -15,20 +15,23 @@ namespace {
 constexpr char kThings[] = R"({"thing": {"key": "id", "member": {
     "id": {"cpptype": "int"}, "list": {"cpptype": "Json::arrayValue"},
     "map": {"cpptype": "Json::objectValue"}, "on": {"cpptype": "bool"},
-    "size": {"cpptype": "long long"}, "text": {"cpptype": "string"}}}})";
+    "share": {"cpptype": "double"}, "size": {"cpptype": "long long"}, "text": {"cpptype": "string"}}}})";
 
-constexpr char kSelect[] = "SELECT id, list, map, \"on\", size, text FROM thing ORDER BY id";
+constexpr char kSelect[] = "SELECT id, list, map, \"on\", share, size, text FROM thing ORDER BY id";
 
 using Record = std::map<std::string, Json::Value>;  // without its key
 
 class LoaderAgainTest : public TableTest {
   protected:
     LoaderAgainTest() {
-        Open(kThings);
+        Options How;
+        How.blCompatible = false;  // which takes numbers with fractions, too
+        Open(kThings, How);
         // Few values, many of them alike, of one length or of none.
         m_Choices["list"] = Parse(R"([[1], [2], ["a"], ["b"], [0.5], [], null])");
         m_Choices["map"] = Parse(R"([{"a": 1}, {"b": 2}, {"b": 0.5}, {}, null])");
         m_Choices["on"] = Parse("[true, false, null]");
+        m_Choices["share"] = Parse("[0.5, 0.25, null]");
         m_Choices["size"] = Parse("[0, 1, -1, null]");
         m_Choices["text"] = Parse(R"(["ab", "cd", "e", "", null])");
         for (const char c : {'x', 'y'}) {
@@ -61,8 +64,10 @@ class LoaderAgainTest : public TableTest {
             Into.SetText(nMember, jValue.asString());
         } else if (jValue.isBool()) {
             Into.SetBoolean(nMember, jValue.asBool());
-        } else {
+        } else if (jValue.isInt64()) {
             Into.SetInteger(nMember, jValue.asInt64());
+        } else {
+            Into.SetReal(nMember, jValue.asDouble());
         }
     }
 
@@ -169,7 +174,7 @@ TEST_F(LoaderAgainTest, RecordAfterOneThatWasNotBoundIsStored) {
               "refused: cannot load record 2 into table \"thing\": string or blob too big");
     EXPECT_EQ(Text(Into.Add(Parse(R"({"id": 2, "list": ["y"], "on": true})"))), "ok");
     EXPECT_EQ(Text(Into.Commit()), "ok");
-    EXPECT_EQ(Rows(kSelect), "1|NULL|NULL|1|NULL|NULL;2|[\"y\"]|NULL|1|NULL|NULL");
+    EXPECT_EQ(Rows(kSelect), "1|NULL|NULL|1|NULL|NULL|NULL;2|[\"y\"]|NULL|1|NULL|NULL|NULL");
 }
 
 }  // namespace
