@@ -1,3 +1,5 @@
+#include <vector>
+
 #include "TableFixture.h"
 
 namespace VORN_JSON_DB {
@@ -78,6 +80,34 @@ TEST_F(SaveTest, UnknownMemberIsRefusedWithTheNearestName) {
         "refused: cannot save a record in table \"task\": there is no member \"nmae\" (did you "
         "mean \"name\"?) [unknown-member /nmae]",
         Create(R"({"nmae": "a"})"));
+}
+
+// A name that differs in one byte, wherever, is another one, and so is a longer and a shorter one.
+TEST_F(SaveTest, NamesAreToldApartByEachOfTheirBytes) {
+    for (size_t nBytes = 1; nBytes <= 12; ++nBytes) {
+        const std::string strName(nBytes, 'm');
+        const std::string strTable = "t" + std::to_string(nBytes);
+        Open(R"({")" + strTable + R"(": {"member": {")" + strName +
+             R"(": {"cpptype": "int"}, "other": {"cpptype": "int"}}}})");
+        std::vector<std::string> vecOthers{strName.substr(1), strName + "m"};
+        for (size_t i = 0; i < nBytes; ++i) {
+            for (const char c : {'l', 'n'}) {
+                vecOthers.push_back(strName);
+                vecOthers.back()[i] = c;
+            }
+        }
+        for (const std::string& strOther : vecOthers) {
+            Json::Value jRecord;
+            jRecord[strOther] = 1;
+            const Status Outcome = m_Table.Create(jRecord);
+            ASSERT_EQ(Outcome.Findings().size(), 1u) << strOther;
+            EXPECT_EQ(Outcome.Findings()[0].szCode, std::string("unknown-member"));
+            EXPECT_EQ(Outcome.Findings()[0].strPath, "/" + strOther);
+        }
+        const std::string strRecord = R"({")" + strName + R"(":7})";
+        EXPECT_EQ(Create(strRecord), strRecord);
+        m_Table = Table();
+    }
 }
 
 TEST_F(SaveTest, RecordThatIsNoneIsRefused) {
