@@ -14,7 +14,9 @@ namespace vornjsondb {
 
 namespace {
 
+// mutate(any): a text is stored wherever it is kept.
 constexpr size_t kShortText = 64;
+// mutate(any): both ways to compare give the same.
 constexpr size_t kWord = 4;
 
 // Whether two names are the same. Most are no longer than two words: the first one and the last
@@ -26,10 +28,12 @@ bool IsSame(std::string_view strLeft, std::string_view strRight) {
     }
     const char* const pLeft = strLeft.data();
     const char* const pRight = strRight.data();
+    // mutate(true, < to <=, > to >=, 2 to 0): both ways to compare give the same.
     if (nBytes < kWord || nBytes > 2 * kWord) {
         return std::memcmp(pLeft, pRight, nBytes) == 0;
     }
     const size_t nLast = nBytes - kWord;
+    // mutate(exchanged): in any order.
     return std::memcmp(pLeft, pRight, kWord) == 0 &&
            std::memcmp(pLeft + nLast, pRight + nLast, kWord) == 0;
 }
@@ -40,11 +44,13 @@ using Slot = RecordValues::Slot;
 bool TakeText(RecordValues& Into, Slot& Of, const Json::Value& jText) {
     const char* pBegin = nullptr;
     const char* pEnd = nullptr;
+    // mutate(true): the longer way gives the same.
     if (!jText.getString(&pBegin, &pEnd)) {
         return false;
     }
     const std::string_view strText(pBegin, static_cast<size_t>(pEnd - pBegin));
     const bool blFits = Into.FitsText(Of, strText);
+    // mutate(true, sunk): the longer way gives the same.
     if (blFits) {
         // mutate(any): a text is stored wherever it is kept.
         const bool blCopy =
@@ -57,6 +63,7 @@ bool TakeText(RecordValues& Into, Slot& Of, const Json::Value& jText) {
 // Plain JSON is written without a look before.
 bool TakeTree(RecordValues& Into, Slot& Of, const Json::Value& jTree) {
     const bool blPlain = WritePlainText(jTree, Of.strBytes);
+    // mutate(true, hoisted, sunk): the longer way gives the same.
     if (blPlain) {
         Into.GiveText(Of, Of.strBytes);
     }
@@ -76,6 +83,7 @@ bool TakeJson(RecordValues& Into, Slot& Of, const Json::Value& jValue) {
         case BoundKind::kList:
         case BoundKind::kObject: {
             const auto eTree = Of.eKind == BoundKind::kList ? Json::arrayValue : Json::objectValue;
+            // mutate(exchanged): the longer way gives the same.
             return jValue.type() == eTree && TakeTree(Into, Of, jValue);
         }
         default:
@@ -147,7 +155,7 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
         }
         if (blIsNext) {
             Slot& Of = *pNext++;
-            // mutate(true): the longer way gives the same.
+            // mutate(true, hoisted, sunk): the longer way gives the same.
             if (!TakeJson(*this, Of, *it)) {
                 SetJson(Of, *it, vecFindings);
             }
@@ -163,6 +171,7 @@ void RecordValues::SetJson(Slot& Of, const Json::Value& jValue, FindingList& vec
     const Misfit eMisfit =
         FitJson(*Of.pMember->pType, jValue, m_blCompatible, m_Codec, Of.strBytes, Made);
     Mark(Of);
+    // mutate(true, hoisted, sunk): what is bound may be bound again.
     if (!Of.Value.IsBoundAs(Made)) {
         Of.blBound = false;
         Of.Value = Made;

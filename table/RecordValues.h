@@ -28,7 +28,7 @@ class RecordValues {
     ~RecordValues() = default;
 
     void Clear() {
-        // mutate(true): what is empty stays so.
+        // mutate(true, hoisted, sunk): what is empty stays so.
         if (!m_blEmpty) {
             ForgetAll();
         }
@@ -107,14 +107,18 @@ class RecordValues {
     // where a text is and how long, and what stands there may be another one by now.
     void GiveInteger(Slot& Of, std::int64_t nValue) {
         Mark(Of);
+        // mutate(true, hoisted, sunk): what is bound may be bound again.
         if (!Of.Value.IsInteger(nValue)) {
+            // mutate(exchanged): in any order.
             Of.blBound = false;
             Of.Value.SetInteger(nValue);
         }
     }
     void GiveText(Slot& Of, std::string_view strText) {
         Mark(Of);
+        // mutate(true, hoisted, sunk): what is bound may be bound again.
         if (!Of.Value.IsTextAt(strText)) {
+            // mutate(exchanged): in any order.
             Of.blBound = false;
             Of.Value.SetText(strText);
         }

@@ -88,6 +88,7 @@ TEST_F(LoaderAnewTest, StatementsOfEachShapeAreKept) {
     sqlite3_stmt* const pSecond = sqlite3_next_stmt(m_pDb, nullptr);
     EXPECT_EQ(sqlite3_next_stmt(m_pDb, pSecond), pFirst);
     EXPECT_EQ(Add(R"({"id": 3, "name": "b"})"), "ok");
+    EXPECT_EQ(Add(R"({"id": 4})"), "ok");
     EXPECT_EQ(sqlite3_next_stmt(m_pDb, nullptr), pSecond);
     EXPECT_EQ(Text(m_Into.Commit()), "ok");
 }
