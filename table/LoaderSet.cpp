@@ -13,7 +13,6 @@ namespace VORN_JSON_DB {
 
 namespace {
 
-using vornjsondb::BoundKind;
 using vornjsondb::BoundValue;
 using vornjsondb::FindingCode;
 using vornjsondb::Misfit;

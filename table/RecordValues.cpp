@@ -78,8 +78,13 @@ bool TakeJson(RecordValues& Into, Slot& Of, const Json::Value& jValue) {
             return TakeText(Into, Of, jValue);
         case BoundKind::kInteger:
             return jValue.type() == Json::intValue && Into.TakeInteger(Of, jValue.asInt64());
-        case BoundKind::kBoolean:
-            return jValue.type() == Json::booleanValue && Into.TakeBoolean(Of, jValue.asBool());
+        case BoundKind::kBoolean: {
+            const bool blFits = jValue.type() == Json::booleanValue;
+            if (blFits) {
+                Into.GiveInteger(Of, jValue.asBool() ? 1 : 0);
+            }
+            return blFits;
+        }
         case BoundKind::kList:
         case BoundKind::kObject: {
             const auto eTree = Of.eKind == BoundKind::kList ? Json::arrayValue : Json::objectValue;
