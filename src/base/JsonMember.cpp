@@ -2,21 +2,15 @@
 
 namespace vornjsondb {
 
-MemberCursor::MemberCursor(const Json::Value& jValue) {
-    if (jValue.isObject()) {
-        m_it = jValue.begin();
-        m_itEnd = jValue.end();
-    }
-}
-
 const Json::Value* MemberCursor::Find(const MemberName& Name) {
-    while (m_it != m_itEnd) {
-        const int nOrder = Compare(NameOf(m_it), Name);
+    for (; !m_Walk.IsDone(); m_Walk.Next()) {
+        const int nOrder = Compare(m_Walk.Name(), Name);
         if (nOrder > 0) {
             return nullptr;
         }
-        const Json::Value& jMember = *m_it++;
         if (nOrder == 0) {
+            const Json::Value& jMember = m_Walk.Value();
+            m_Walk.Next();
             return &jMember;
         }
     }

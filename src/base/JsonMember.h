@@ -68,18 +68,45 @@ inline Json::Value& MakeMember(Json::Value& jObject, const MemberName& Name) {
     return *jObject.demand(Name.pBegin, Name.pEnd);
 }
 
+// How many members the value has: none when it is no object.
+inline size_t CountMembers(const Json::Value& jValue) {
+    return jValue.isObject() ? jValue.size() : 0;
+}
+
+// One member after the other, in key order; none when the value is no object. They are counted: to
+// compare JsonCpp's iterators is a call for each, and to ask for the last of them another one.
+class MemberWalk {
+  public:
+    explicit MemberWalk(const Json::Value& jValue)
+        : m_it(jValue.begin()), m_nLeft(CountMembers(jValue)) {}
+
+    bool IsDone() const { return m_nLeft == 0; }
+    bool IsLast() const { return m_nLeft == 1; }
+    void Next() {
+        if (--m_nLeft > 0) {  // mutate(true, > to >=): nobody looks behind the last one.
+            ++m_it;
+        }
+    }
+
+    MemberName Name() const { return NameOf(m_it); }
+    const Json::Value& Value() const { return *m_it; }
+
+  private:
+    Json::Value::const_iterator m_it;
+    size_t m_nLeft;
+};
+
 // Finds members of one value by names that are asked for in ascending order, each once, which is
 // how JSON objects keep theirs: one step a member instead of a search for each.
 class MemberCursor {
   public:
-    explicit MemberCursor(const Json::Value& jValue);
+    explicit MemberCursor(const Json::Value& jValue) : m_Walk(jValue) {}
 
     // As FindMember, for a name behind all that were asked for before.
     const Json::Value* Find(const MemberName& Name);
 
   private:
-    Json::Value::const_iterator m_it;
-    Json::Value::const_iterator m_itEnd;
+    MemberWalk m_Walk;
 };
 
 }  // namespace vornjsondb

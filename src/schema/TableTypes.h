@@ -18,11 +18,6 @@ struct TypedMember {
     const Json::Value* pjDefault;  // nullptr: none
 };
 
-// How many members the value has: none when it is no object.
-inline size_t CountMembers(const Json::Value& jValue) {
-    return jValue.isObject() ? jValue.size() : 0;
-}
-
 // A table's members in key order.
 class TableTypes {
   public:

@@ -9,10 +9,8 @@
 int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
     vornjsondb::TypeCursor Types(vornjsondb::LookUpTable(m_jTableDef, m_strName).Types());
     VORN_FAIL_IF_TEXT(!jParam.isObject(), "!jRecParam.isObject()");
-    const Json::Value& jRec = jParam;
-    const Json::Value::const_iterator itEnd = jRec.end();
-    for (Json::Value::const_iterator it = jRec.begin(); it != itEnd; ++it) {
-        const vornjsondb::MemberName Key = vornjsondb::NameOf(it);
+    for (vornjsondb::MemberWalk Walk(jParam); !Walk.IsDone(); Walk.Next()) {
+        const vornjsondb::MemberName Key = Walk.Name();
         const vornjsondb::TypedMember* pMember = Types.Find(Key);
         if (pMember == nullptr) {
             continue;
@@ -22,7 +20,7 @@ int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
             VORN_LOG_LOCATED("type not found!!, key=%s", Key.pBegin);
             return -1;
         }
-        if (!pfnFits(*it)) {
+        if (!pfnFits(Walk.Value())) {
             VORN_LOG_LOCATED("type failed, strKey=%s, jRecParam=%s", Key.pBegin,
                              vornjsondb::ToString(jParam).c_str());
             return -1;

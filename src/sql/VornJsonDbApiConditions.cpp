@@ -197,9 +197,8 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
     bool blWritten = false;
     const JoinMode& Mode = kJoinModes[andType];
     TypeCursor NextType(Types);
-    const Json::Value::const_iterator itEnd = jRecParam.end();
-    for (Json::Value::const_iterator it = jRecParam.begin(); it != itEnd; ++it) {
-        const MemberName Name = NameOf(it);
+    for (MemberWalk Walk(jRecParam); !Walk.IsDone(); Walk.Next()) {
+        const MemberName Name = Walk.Name();
         const bool blFilter = Name.Is(kFilterKey);
         const TypedMember* pMember = NextType.Find(Name);
         if (blFilter ? eUse == ListUse::kAssignments : pMember == nullptr) {
@@ -210,9 +209,9 @@ int vornjsondb::AppendMemberList(const TableTypes& Types, const Json::Value& jRe
         // Pinned by ConditionList.EmptyListLeavesItsJoinerBehind.
         Sql.Append(blWritten ? Mode.Joiner : Mode.Opening);
         if (blFilter) {
-            VORN_FAIL_IF_TEXT(!it->isString(), "!jRecParam[jmFieldName[i]].isString()");
-            Sql.Append(' ').Append(it->asString()).Append(' ');
-        } else if (0 > AppendMember(Types, *pMember, *it, eUse, Sql)) {
+            VORN_FAIL_IF_TEXT(!Walk.Value().isString(), "!jRecParam[jmFieldName[i]].isString()");
+            Sql.Append(' ').Append(Walk.Value().asString()).Append(' ');
+        } else if (0 > AppendMember(Types, *pMember, Walk.Value(), eUse, Sql)) {
             return -1;
         }
         blWritten = true;

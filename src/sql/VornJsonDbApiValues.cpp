@@ -19,22 +19,19 @@ std::vector<vornjsondb::DeclaredValue> vornjsondb::DeclaredValues(const Json::Va
     MemberCursor Record(jRec);
     std::vector<DeclaredValue> vecValues;
     vecValues.reserve(jMember.size());
-    const Json::Value::const_iterator itEnd = jMember.end();
-    for (Json::Value::const_iterator it = jMember.begin(); it != itEnd; ++it) {
-        const MemberName Name = NameOf(it);
+    for (MemberWalk Walk(jMember); !Walk.IsDone(); Walk.Next()) {
+        const MemberName Name = Walk.Name();
         vecValues.push_back({Name, Record.Find(Name)});
     }
     return vecValues;
 }
 
 void vornjsondb::AppendDeclaredNames(const Json::Value& jMember, TextBuffer& Sql) {
-    const Json::Value::const_iterator itBegin = jMember.begin();
-    const Json::Value::const_iterator itEnd = jMember.end();
-    for (Json::Value::const_iterator it = itBegin; it != itEnd; ++it) {
-        if (it != itBegin) {
+    for (MemberWalk Walk(jMember); !Walk.IsDone(); Walk.Next()) {
+        Sql.Append(Walk.Name().View());
+        if (!Walk.IsLast()) {
             Sql.Append(',');
         }
-        Sql.Append(NameOf(it).View());
     }
 }
 
