@@ -83,7 +83,8 @@ class MemberWalk {
     bool IsDone() const { return m_nLeft == 0; }
     bool IsLast() const { return m_nLeft == 1; }
     void Next() {
-        if (--m_nLeft > 0) {  // mutate(true, > to >=): nobody looks behind the last one.
+        // mutate(true, > to >=, sunk, hoisted): nobody looks behind the last one.
+        if (--m_nLeft > 0) {
             ++m_it;
         }
     }

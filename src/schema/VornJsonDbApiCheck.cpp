@@ -8,6 +8,7 @@
 
 int VornJsonDbApi::checkJsonType(Json::Value& jParam) {
     vornjsondb::TypeCursor Types(vornjsondb::LookUpTable(m_jTableDef, m_strName).Types());
+    // mutate(exchanged statements): what is no object has no members to go through.
     VORN_FAIL_IF_TEXT(!jParam.isObject(), "!jRecParam.isObject()");
     for (vornjsondb::MemberWalk Walk(jParam); !Walk.IsDone(); Walk.Next()) {
         const vornjsondb::MemberName Key = Walk.Name();
