@@ -37,11 +37,12 @@ run_clang() {
 
 run_cppcheck() {
     # The documented signature takes the statement by value; the second takes an argument of the log
-    # line for a statement.
+    # line for a statement; a buffer's bytes are written before they are read.
     cppcheck --quiet --std=c++17 --language=c++ --enable=warning,performance,portability \
         --inline-suppr --suppress=missingIncludeSystem \
         --suppress=passedByValue:src/core/VornJsonDbApiRunner.cpp \
-        --suppress=constStatement:src/core/VornJsonDbApiRows.cpp -D__GNUC__=12 --error-exitcode=1 \
+        --suppress=constStatement:src/core/VornJsonDbApiRows.cpp \
+        --suppress=uninitMemberVar:src/base/TextBuffer.h -D__GNUC__=12 --error-exitcode=1 \
         -Iinclude -j "$jobs" src include
 }
 
