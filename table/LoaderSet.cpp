@@ -186,6 +186,8 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
         m_pParts->Values.TakeWritten(Of, strJson)) {
         return;
     }
+    // The text of an earlier value may be gone; what ends this one early leaves null.
+    m_pParts->Values.Give(Of).eKind = BoundValue::Kind::kNull;
     FindingList vecFindings;
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);

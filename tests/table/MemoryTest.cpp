@@ -307,6 +307,34 @@ TEST_F(TableMemoryTest, WhatLoads) {
     });
 }
 
+// The text of the earlier list lies where the new one is copied to.
+TEST_F(TableMemoryTest, ValueThatEndsInBadAllocLeavesNullAndNoPartOfAnEarlierOne) {
+    int nThrown = 0;
+    std::string strStored;
+    for (int nAt = 1; strStored != "[\"b\",15]" && nAt < 1000; ++nAt) {
+        Loader Many;
+        ASSERT_TRUE(Many.Start(m_Table).Ok());
+        Many.SetInteger(Many.MemberIndex("id"), 3);
+        const int nTags = Many.MemberIndex("tags");
+        Many.SetJson(nTags, R"(["an earlier list"])");
+        bool blThrown = false;
+        g_nMallocsUntilFailure = nAt;
+        try {
+            Many.SetJson(nTags, R"([ "b", 15 ])");
+        } catch (const std::bad_alloc&) {
+            blThrown = true;
+        }
+        g_nMallocsUntilFailure = 0;
+        EXPECT_EQ("ok", Text(Many.EndRecord()));
+        strStored = Rows("SELECT tags FROM task WHERE id = 3");
+        if (blThrown) {
+            ++nThrown;
+            EXPECT_EQ("NULL", strStored) << "allocation " << nAt;
+        }
+    }
+    EXPECT_GT(nThrown, 0);
+}
+
 TEST_F(TableMemoryTest, WhatSpansCalls) {
     Try([&](Table& Into) {
         Transaction Outer;
