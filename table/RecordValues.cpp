@@ -1,7 +1,6 @@
 #include "RecordValues.h"
 
 #include <algorithm>
-#include <cstring>
 #include <utility>
 
 #include "../src/base/JsonMember.h"
@@ -16,27 +15,6 @@ namespace {
 
 // mutate(any): a text is stored wherever it is kept.
 constexpr size_t kShortText = 64;
-// mutate(any): both ways to compare give the same.
-constexpr size_t kWord = 4;
-
-// Whether two names are the same. Most are no longer than two words: the first one and the last
-// one, which may overlap, are then compared without a call.
-bool IsSame(std::string_view strLeft, std::string_view strRight) {
-    const size_t nBytes = strLeft.size();
-    if (nBytes != strRight.size()) {
-        return false;
-    }
-    const char* const pLeft = strLeft.data();
-    const char* const pRight = strRight.data();
-    // mutate(true, < to <=, > to >=, 2 to 0): both ways to compare give the same.
-    if (nBytes < kWord || nBytes > 2 * kWord) {
-        return std::memcmp(pLeft, pRight, nBytes) == 0;
-    }
-    const size_t nLast = nBytes - kWord;
-    // mutate(exchanged): in any order.
-    return std::memcmp(pLeft, pRight, kWord) == 0 &&
-           std::memcmp(pLeft + nLast, pRight + nLast, kWord) == 0;
-}
 
 using Slot = RecordValues::Slot;
 
@@ -154,7 +132,7 @@ bool RecordValues::Take(const Json::Value& jRecord, FindingList& vecFindings) {
     for (Json::Value::const_iterator it = jRecord.begin(); nLeft > 0; --nLeft, ++it) {
         const std::string_view strName = NameOf(it).View();
         bool blIsNext = false;
-        while (pNext != pEnd && !(blIsNext = IsSame(pNext->pMember->strName, strName)) &&
+        while (pNext != pEnd && !(blIsNext = pNext->pMember->strName == strName) &&
                pNext->pMember->strName < strName) {
             ++pNext;
         }
