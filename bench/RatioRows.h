@@ -41,6 +41,7 @@ Figure TableGetRatio(const Settings& Now);
 Figure TableListRatio(const Settings& Now);
 Figure LoadBySettersRatio(const Settings& Now);
 Figure LoadFromJsonRatio(const Settings& Now);
+Figure LoadSameJsonRatio(const Settings& Now);
 Figure QueryShare(const Settings& Now);
 Figure LongInRatio(const Settings& Now);
 

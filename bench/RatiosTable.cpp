@@ -157,6 +157,18 @@ Figure LoadFromJsonRatio(const Settings& Now) {
         [&](const Input& One, Json::Value&) { Hand.Load(One.Same); });
 }
 
+Figure LoadSameJsonRatio(const Settings& Now) {
+    TableStore Ours(0);
+    const TableStore Other(0);
+    ByHand Hand(Other.Db);
+    Loader Into;
+    RequireOk(Into.Start(Ours.Own));
+    return Writing(
+        Now, EightMemberRecord,
+        [&](const Json::Value& jRecord, Json::Value&) { RequireOk(Into.Add(jRecord)); },
+        [&](const Json::Value& jRecord, Json::Value&) { Hand.Load(jRecord); });
+}
+
 // A query is part of each fetch that it is compared with: the figure is a share.
 Figure QueryShare(const Settings& Now) {
     TableStore Source(kRows);

@@ -53,6 +53,7 @@ constexpr Row kRows[] = {
     {"table-list", "Table::List of 20,000 rows, per row", "hand-written typed reader", 0.60, TableListRatio},
     {"load-set", "Loader, by setters", "hand-written bind loop", 1.10, LoadBySettersRatio},
     {"load-json", "Loader, from Json::Value", "hand-written bind loop", 1.30, LoadFromJsonRatio},
+    {"load-same", "Loader, from Json::Value", "bind loop from the same Json::Value", 1.30, LoadSameJsonRatio},
     {"query", "making a query and finding its statement", "Table::First with it", 0.10, QueryShare},
     {"in", "$in with 10,000 values, per value", "per value of 1,000", 1.30, LongInRatio},
     {"size", "stripped library (figure: KiB)", "libsqlite3", 0, StrippedSize},

@@ -71,10 +71,7 @@ void ByHand::Create(const Json::Value& jRecord, Json::Value& jStored) {
     const auto& [pBegin, pInsert, pSelect, pEnd] = m_aCreate;
     StepTo(pBegin.get(), SQLITE_DONE);
     sqlite3_reset(pBegin.get());
-    const std::string strTags = m_Text.Write(jRecord["tags"]);
-    BindRecord(pInsert.get(), jRecord, strTags);
-    StepTo(pInsert.get(), SQLITE_DONE);
-    sqlite3_reset(pInsert.get());
+    Load(jRecord);
     sqlite3_bind_int64(pSelect.get(), 1,
                        sqlite3_last_insert_rowid(sqlite3_db_handle(pInsert.get())));
     StepTo(pSelect.get(), SQLITE_ROW);
@@ -109,6 +106,14 @@ void ByHand::Load(const Part& One) const {
     BindText(pInsert, 6, One.strName);
     BindText(pInsert, 7, One.strNote);
     BindText(pInsert, 8, One.strTags);
+    StepTo(pInsert, SQLITE_DONE);
+    sqlite3_reset(pInsert);
+}
+
+void ByHand::Load(const Json::Value& jRecord) {
+    sqlite3_stmt* const pInsert = m_aCreate[1].get();
+    const std::string strTags = m_Text.Write(jRecord["tags"]);
+    BindRecord(pInsert, jRecord, strTags);
     StepTo(pInsert, SQLITE_DONE);
     sqlite3_reset(pInsert);
 }

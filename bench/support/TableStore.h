@@ -56,6 +56,7 @@ class ByHand {
     void Get(int nId, Json::Value& jFound) const;
     void List(Json::Value& jAll) const;
     void Load(const Part& One) const;
+    void Load(const Json::Value& jRecord);
 
   private:
     std::array<KeptStatement, 4> m_aCreate;  // a savepoint, INSERT, SELECT of the row, its release
