@@ -114,8 +114,7 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
             // mutate(doubled): it reads the same again.
             ReadJson(TextOf(pStatement, pValue), Codec, jMember);
         } else if (eKind != RowKind::kNull) {
-            Json::Value jValue = ReadValue(pStatement, pValue, eKind);
-            jMember.swapPayload(jValue);
+            MakeInPlace(jMember, [&] { return ReadValue(pStatement, pValue, eKind); });
         } else {
             blLeaveOut = blLeaveOut || !Each.blKeepNull;
         }
