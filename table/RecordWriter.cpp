@@ -25,7 +25,8 @@ std::string InsertSql(const Members& Of, const RecordValues& Values) {
 std::string KeyList(const Members& Of) {
     std::string strList;
     for (const size_t nMember : Of.Key()) {
-        Append(strList, {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted});
+        Append(strList,
+               {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted, Of.At(nMember).strCollate});
     }
     return strList.append(")");
 }
@@ -77,8 +78,8 @@ Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What) {
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
-        Append(strWhere,
-               {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn, " = ?"});
+        Append(strWhere, {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn,
+                          Of.At(nMember).strCollate, " = ?"});
     }
     return strWhere;
 }
