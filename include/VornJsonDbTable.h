@@ -390,8 +390,8 @@ class Table {
     // defaults of the database and what triggers did. kDuplicate names the member whose value
     // another row has already. Save needs a key, and its members in the record; so does pjStored
     // in a view or a table WITHOUT ROWID. A view takes kStop and kUpsert. Save and Get find a key
-    // as the unique index on it compared texts when the table was opened (COLLATE NOCASE, say), and
-    // as its columns do if there are several or none; conditions compare bytes, whatever these say.
+    // as a unique index on it compared texts (COLLATE NOCASE, say) when the table was opened: as
+    // its columns do, where one does so or there is none. Conditions always compare bytes.
     Status Create(const Json::Value& jRecord, Json::Value* pjStored = nullptr);
     Status Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate,
                 Json::Value* pjStored = nullptr, Written* peWritten = nullptr);
