@@ -132,7 +132,7 @@ class OldRecordLint {
     }
 
     void LintJson(const std::string& strMember, const Json::Value& jValue,
-                  const std::string& strPath, size_t nLater) try {
+                  const std::string& strPath, size_t nLater) {
         static constexpr struct {
             Misfit eMisfit;
             const char* szFate;
@@ -149,7 +149,6 @@ class OldRecordLint {
         }
         LintPercents(strMember, m_Codec.Write(jValue), strPath, nLater);
     }
-    VORN_JSON_MEMORY_TO_BAD_ALLOC
 
     void LintPercents(const std::string& strMember, const std::string& strText,
                       const std::string& strPath, size_t nLater) {
@@ -177,7 +176,7 @@ class OldRecordLint {
 namespace VORN_JSON_DB {
 
 FindingList LintOldRecord(const std::string& strTable, const Json::Value& jDefinition,
-                          const Json::Value& jRecord) {
+                          const Json::Value& jRecord) try {
     FindingList vecFindings;
     const Json::Value& jMembers = vornjsondb::DeclaredMembers(jDefinition, strTable);
     if (jMembers.empty()) {
@@ -187,5 +186,6 @@ FindingList LintOldRecord(const std::string& strTable, const Json::Value& jDefin
     }
     return vecFindings;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace VORN_JSON_DB

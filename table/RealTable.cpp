@@ -152,10 +152,13 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
         std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
+        // mutate(exchanged): in any order.
         if (!IsSameColumn(strOfColumn, strOfIndex)) {
+            // mutate(exchanged): in any order.
             Index.blOwn = false;
-            Index.blFiner = Index.blFiner || !IsBinary(strOfColumn);
+            Index.blFiner |= !IsBinary(strOfColumn);
         }
+        // mutate(exchanged): in any order.
         Index.vecColumns.push_back(std::move(strColumn));
         Index.vecCollations.push_back(std::move(strOfIndex));
     });

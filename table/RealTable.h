@@ -22,7 +22,7 @@ struct RealTable {
     std::vector<RealColumn> vecColumns;  // none: there is no such table or view
     std::vector<std::string> vecKey;     // the primary key's columns, in its order
     std::string strRowid;                // a name of the rowid that no column hides; empty: none
-    bool blView = false;
+    bool blView = false;  // mutate(false to true): it is set where there are columns.
 };
 
 struct RealIndex {

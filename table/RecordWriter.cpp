@@ -112,9 +112,11 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
     const bool blHeld = Held.IsFor(m_Values.Given());
     int nResult = blHeld ? SQLITE_OK : Take(eVerb, Held);
     int nNext = 1;
+    // mutate(sunk): what is bound may be bound again.
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
         const bool blAgain = blHeld && m_pBound == &Held;
         nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate, blAgain);
+        // mutate(dropped): what is bound may be bound again.
         m_pBound = nResult == SQLITE_OK ? &Held : nullptr;
     }
     if (nResult == SQLITE_OK && (eVerb == Verb::kFind || eVerb == Verb::kUpdate)) {
@@ -158,6 +160,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         }
         nResult = Run(Now.eThen, nChanged);
         const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
+        // mutate(exchanged): of a record that failed it is not asked.
         eWritten = blSkipped ? Now.eFound : eWritten;
         if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
             return Fail(StatusCode::kConstraint, What,
@@ -176,6 +179,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
 
 // No key that SQLite hands out is one that the member could not be given.
 Status RecordWriter::CheckRowid(const Doing& What) {
+    // mutate(exchanged): both only look.
     const Member& Key = m_Into.Of.At(m_Into.nHandedOut);
     const std::int64_t nRowid = sqlite3_last_insert_rowid(m_Into.pDb);
     BoundValue Value;

@@ -134,6 +134,7 @@ Status Table::Parts::Meet() {
     if (vornjsondb::MisreadsFractions()) {
         Outcome = CheckIndexes(*this, What);
     }
+    // mutate(exchanged): nobody asks for what was learned of a table that is not opened.
     if (!Outcome.Ok()) {
         return Outcome;
     }
@@ -180,12 +181,14 @@ int Table::Parts::LearnCollations() {
     }
     const vornjsondb::RealIndex* pCounts = nullptr;
     for (const vornjsondb::RealIndex& Index : There.vecAll) {
+        // mutate(exchanged): all only look.
         if (Index.blUnique && (pCounts == nullptr || Index.blOwn) &&
             vornjsondb::AreSameColumns(Index.vecColumns, vecKeyNames)) {
             pCounts = &Index;
         }
     }
     for (size_t i = 0; pCounts != nullptr && i < pCounts->vecColumns.size(); ++i) {
+        // mutate(doubled): the same once more.
         Of.SetCollate(Of.FindColumn(pCounts->vecColumns[i]),
                       " COLLATE " + vornjsondb::Quoted(pCounts->vecCollations[i]));
     }

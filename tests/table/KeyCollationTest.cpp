@@ -178,20 +178,6 @@ TEST_F(KeyCollationTest, LoaderCountsByTheIndex) {
     }
 }
 
-TEST_F(KeyCollationTest, IndexesThatCannotBeReadAreAFailure) {
-    Run("CREATE TABLE item (name TEXT PRIMARY KEY, size INTEGER)");
-    sqlite3_set_authorizer(
-        m_pDb,
-        [](void*, int nAction, const char* szWhat, const char*, const char*, const char*) {
-            return nAction == SQLITE_PRAGMA && std::string(szWhat) == "index_list" ? SQLITE_DENY
-                                                                                   : SQLITE_OK;
-        },
-        nullptr);
-    EXPECT_EQ(Text(m_Table.Open(m_pDb, "item", Parse(kByName))),
-              "refused: cannot open table \"item\": not authorized");
-    sqlite3_set_authorizer(m_pDb, nullptr, nullptr);
-}
-
 }  // namespace
 
 }  // namespace VORN_JSON_DB

@@ -135,16 +135,16 @@ TEST_F(SyncTest, LintCallsNothingThatADefaultCalls) {
     Meet(
         "CREATE TABLE item (id INTEGER PRIMARY KEY, a INTEGER DEFAULT (spy(1)),"
         " b TEXT DEFAULT ('x' || spy(1)), c TEXT DEFAULT (/*'*/ spy(1) /*'*/),"
-        " d TEXT DEFAULT ('it''s' || -spy(1)), e TEXT DEFAULT ('(spy') )",
+        " d TEXT DEFAULT ('it''s' || -spy(1)), e TEXT DEFAULT ('s(py') )",
         R"({"key": "id", "member": {"id": {"cpptype": "int"},
              "a": {"cpptype": "int", "cppDefaultValue": 3},
              "b": {"cpptype": "string", "cppDefaultValue": "b"},
              "c": {"cpptype": "string", "cppDefaultValue": "c"},
              "d": {"cpptype": "string", "cppDefaultValue": "d"},
-             "e": {"cpptype": "string", "cppDefaultValue": "(shy"}}})");
+             "e": {"cpptype": "string", "cppDefaultValue": "s(hy"}}})");
     EXPECT_EQ(Lint(),
-              "other-default /item/member/e: member \"e\" has the default '(shy', and its column "
-              "'(spy'");
+              "other-default /item/member/e: member \"e\" has the default 's(hy', and its column "
+              "'s(py'");
     EXPECT_EQ(nCalls, 0);
 }
 
