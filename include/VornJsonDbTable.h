@@ -389,7 +389,9 @@ class Table {
     // Writes one record. pjStored, where given, receives the row as it is stored, with keys and
     // defaults of the database and what triggers did. kDuplicate names the member whose value
     // another row has already. Save needs a key, and its members in the record; so does pjStored
-    // in a view or a table WITHOUT ROWID. A view takes kStop and kUpsert.
+    // in a view or a table WITHOUT ROWID. A view takes kStop and kUpsert. Save and Get find a key
+    // as a unique index on it compared texts (COLLATE NOCASE, say) when the table was opened: as
+    // its columns do, where one does so or there is none. Conditions always compare bytes.
     Status Create(const Json::Value& jRecord, Json::Value* pjStored = nullptr);
     Status Save(const Json::Value& jRecord, OnDuplicate eOnDuplicate,
                 Json::Value* pjStored = nullptr, Written* peWritten = nullptr);
@@ -421,9 +423,8 @@ class Table {
     Status Lint(FindingList& vecFindings);
 
     // Adds columns and unique indexes that the definition has more than the table. A unique index
-    // compares texts as their column does (COLLATE NOCASE, say), by which Get and Save find a key;
-    // conditions compare bytes, whatever the column says. Nothing is ever dropped, renamed, rebuilt
-    // or retyped; what would need that is a finding.
+    // compares texts as their column does. Nothing is ever dropped, renamed, rebuilt or retyped;
+    // what would need that is a finding.
     Status Sync(SyncMode eMode, SyncReport& Report);
 
     // Members may be paths, none twice. pstrSql receives the statement. An index that is there is

@@ -35,35 +35,27 @@ size_t ReaderLevels() {
     return Builder["stackLimit"].asUInt();
 }
 
-Misfit CheckReal(double dValue) {
+unsigned CheckReal(double dValue) {
     if (std::isnan(dValue)) {
-        return Misfit::kNotANumber;
+        return BitOf(Misfit::kNotANumber);
     }
-    return std::isinf(dValue) ? Misfit::kInfinite : Misfit::kNone;
+    return std::isinf(dValue) ? BitOf(Misfit::kInfinite) : 0;
 }
 
-// What no JSON text can hold, or no reader gives back, anywhere in the value.
-Misfit CheckTree(const Json::Value& jValue, size_t nLevelsLeft) {
+unsigned CheckTree(const Json::Value& jValue, size_t nLevelsLeft) {
     if (nLevelsLeft == 0) {
-        return Misfit::kDepth;
+        return BitOf(Misfit::kDepth);
     }
     // mutate(exchanged): what has no members has an end, too.
     if (!jValue.isArray() && !jValue.isObject()) {
-        return jValue.type() == Json::realValue ? CheckReal(jValue.asDouble()) : Misfit::kNone;
+        return jValue.type() == Json::realValue ? CheckReal(jValue.asDouble()) : 0;
     }
     const Json::Value::const_iterator itEnd = jValue.end();
+    unsigned nFound = 0;
     for (Json::Value::const_iterator it = jValue.begin(); it != itEnd; ++it) {
-        const Misfit eMisfit = CheckTree(*it, nLevelsLeft - 1);
-        if (eMisfit != Misfit::kNone) {
-            return eMisfit;
-        }
+        nFound |= CheckTree(*it, nLevelsLeft - 1);
     }
-    return Misfit::kNone;
-}
-
-Misfit CheckTree(const Json::Value& jValue) {
-    const Misfit eMisfit = CheckTree(jValue, kSureLevels);
-    return eMisfit == Misfit::kDepth ? CheckTree(jValue, ReaderLevels()) : eMisfit;
+    return nFound;
 }
 
 // Whether a member of that type takes JSON that begins so.
@@ -95,10 +87,12 @@ Misfit FitTree(const MemberType& Type, const Json::Value& jValue, bool blCompati
     }
     // mutate(sunk): both write the same.
     if (!WritePlainText(jValue, strJson)) {
-        const Misfit eMisfit = CheckTree(jValue);
+        const unsigned nFound = MisfitsIn(jValue);
         // mutate(exchanged): the text of what does not fit is not used.
-        if (eMisfit != Misfit::kNone) {
-            return eMisfit;
+        for (const Misfit eEach : {Misfit::kNotANumber, Misfit::kInfinite, Misfit::kDepth}) {
+            if ((nFound & BitOf(eEach)) != 0) {
+                return eEach;
+            }
         }
         strJson = Codec.Write(jValue);
     }
@@ -244,6 +238,11 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
         default:
             return FitTree(Type, jValue, blCompatible, Codec, strJson, Out);
     }
+}
+
+unsigned MisfitsIn(const Json::Value& jTree) {
+    const unsigned nFound = CheckTree(jTree, kSureLevels);
+    return (nFound & BitOf(Misfit::kDepth)) == 0 ? nFound : CheckTree(jTree, ReaderLevels());
 }
 
 std::string Shown(const BoundValue& Value) {

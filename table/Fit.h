@@ -79,6 +79,12 @@ Misfit FitBlob(const MemberType& Type, std::string_view strBytes, bool blCompati
 Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompatible,
                JsonCodec& Codec, std::string& strJson, BoundValue& Out);
 
+// A bit for each: all that no JSON text can hold, or no reader gives back, anywhere in the value.
+constexpr unsigned BitOf(Misfit eMisfit) {
+    return 1U << static_cast<unsigned>(eMisfit);
+}
+unsigned MisfitsIn(const Json::Value& jTree);
+
 // The value as messages show it.
 std::string Shown(const BoundValue& Value);
 

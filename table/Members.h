@@ -5,6 +5,7 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include <json/json.h>
@@ -25,7 +26,8 @@ struct Member {
     bool blNotNull;
     bool blUnique;
     bool blNullSeen;
-    bool blGenerated;  // computed by the real table: can be read, not written
+    bool blGenerated;        // computed by the real table: can be read, not written
+    std::string strCollate;  // " COLLATE ...", as the key's index compares texts; empty: none does
 
     BoundKind Kind() const { return pType->Bound.eKind; }
     bool IsJson() const;
@@ -64,6 +66,9 @@ class Members {
     // What only the real table tells. A key of which not all columns are members is none.
     void SetKey(const std::vector<std::string>& vecColumns);
     void SetGenerated(size_t nMember) { m_vecAll[nMember].blGenerated = true; }
+    void SetCollate(size_t nMember, std::string strCollate) {
+        m_vecAll[nMember].strCollate = std::move(strCollate);
+    }
 
     const Json::Value& Definition() const { return m_jDefinition; }
     const std::string& Table() const { return m_strTable; }

@@ -5,6 +5,7 @@
 #include <algorithm>
 
 #include "../src/base/JsonMember.h"
+#include "../src/base/JsonMemory.h"
 #include "../src/base/JsonText.h"
 #include "../src/schema/MemberType.h"
 #include "../src/schema/TableDefinition.h"
@@ -99,7 +100,7 @@ class OldRecordLint {
         } else if (jValue.isString()) {
             LintText(strMember, std::string(BytesOf(jValue)), strPath, nLater);
         } else if (Type.Bound.eKind != BoundKind::kBoolean) {  // mutate(true): no flag has a text.
-            LintJson(strMember, Type, jValue, strPath, nLater);
+            LintJson(strMember, jValue, strPath, nLater);
         }
     }
 
@@ -130,24 +131,23 @@ class OldRecordLint {
         LintPercents(strMember, strStored, strPath, nLater);
     }
 
-    void LintJson(const std::string& strMember, const MemberType& Type, const Json::Value& jValue,
+    void LintJson(const std::string& strMember, const Json::Value& jValue,
                   const std::string& strPath, size_t nLater) {
-        std::string strJson;
-        BoundValue Value;
-        // mutate(false to true): all that is written here is read, too.
-        const Misfit eMisfit = FitJson(Type, jValue, false, m_Codec, strJson, Value);
-        // mutate(hoisted): the text of what does not fit is empty.
-        if (eMisfit == Misfit::kNone) {
-            LintPercents(strMember, strJson, strPath, nLater);
-            return;
+        static constexpr struct {
+            Misfit eMisfit;
+            const char* szFate;
+        } kFates[] = {
+            {Misfit::kNotANumber, " holds NaN, which is stored as null"},
+            {Misfit::kInfinite,
+             " holds an infinity: it is stored, and JsonCpp 1.9.5 does not read it back"},
+            {Misfit::kDepth, " is nested too deeply: it is stored, and only a part is read"}};
+        const unsigned nFound = MisfitsIn(jValue);
+        for (const auto& Each : kFates) {
+            if ((nFound & BitOf(Each.eMisfit)) != 0) {
+                Report(m_vecFindings, LintCode::kOldJsonChanged, strPath, strMember + Each.szFate);
+            }
         }
-        const char* szFate = " holds NaN, which is stored as null";
-        if (eMisfit == Misfit::kInfinite) {
-            szFate = " holds an infinity: it is stored, and JsonCpp 1.9.5 does not read it back";
-        } else if (eMisfit == Misfit::kDepth) {
-            szFate = " is nested too deeply: it is stored, and only a part is read";
-        }
-        Report(m_vecFindings, LintCode::kOldJsonChanged, strPath, strMember + szFate);
+        LintPercents(strMember, m_Codec.Write(jValue), strPath, nLater);
     }
 
     void LintPercents(const std::string& strMember, const std::string& strText,
@@ -176,7 +176,7 @@ class OldRecordLint {
 namespace VORN_JSON_DB {
 
 FindingList LintOldRecord(const std::string& strTable, const Json::Value& jDefinition,
-                          const Json::Value& jRecord) {
+                          const Json::Value& jRecord) try {
     FindingList vecFindings;
     const Json::Value& jMembers = vornjsondb::DeclaredMembers(jDefinition, strTable);
     if (jMembers.empty()) {
@@ -186,5 +186,6 @@ FindingList LintOldRecord(const std::string& strTable, const Json::Value& jDefin
     }
     return vecFindings;
 }
+VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 }  // namespace VORN_JSON_DB

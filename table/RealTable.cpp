@@ -145,18 +145,22 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
         if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
             // mutate(doubled): both have one SQL text, and nobody looks for one without columns.
             Out.vecAll.push_back(
-                RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, {}});
+                RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, true, {}, {}});
         }
         RealIndex& Index = Out.vecAll.back();
         std::string strColumn = TextColumn(pRow, 2);
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
-        const std::string strOfIndex = TextColumn(pRow, 3);
+        std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
         // mutate(exchanged): in any order.
-        if (!IsBinary(strOfColumn) && !IsSameColumn(strOfColumn, strOfIndex)) {
-            Index.blFiner = true;
+        if (!IsSameColumn(strOfColumn, strOfIndex)) {
+            // mutate(exchanged): in any order.
+            Index.blOwn = false;
+            Index.blFiner |= !IsBinary(strOfColumn);
         }
+        // mutate(exchanged): in any order.
         Index.vecColumns.push_back(std::move(strColumn));
+        Index.vecCollations.push_back(std::move(strOfIndex));
     });
 }
 
@@ -174,6 +178,12 @@ std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::st
 
 bool IsBinary(const std::string& strCollation) {
     return sqlite3_stricmp(strCollation.c_str(), "BINARY") == 0;
+}
+
+bool AreSameColumns(const std::vector<std::string>& vecLeft,
+                    const std::vector<std::string>& vecRight) {
+    return vecLeft.size() == vecRight.size() &&
+           std::is_permutation(vecLeft.begin(), vecLeft.end(), vecRight.begin(), IsSameColumn);
 }
 
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken) {

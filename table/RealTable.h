@@ -22,14 +22,16 @@ struct RealTable {
     std::vector<RealColumn> vecColumns;  // none: there is no such table or view
     std::vector<std::string> vecKey;     // the primary key's columns, in its order
     std::string strRowid;                // a name of the rowid that no column hides; empty: none
-    bool blView = false;
+    bool blView = false;  // mutate(false to true): it is set where there are columns.
 };
 
 struct RealIndex {
     std::string strSql;                   // its statement; empty: part of the table's own
     bool blUnique = false;                // among all rows
     bool blFiner = false;                 // tells values apart that its columns compare as equal
+    bool blOwn = true;                    // compares texts as its columns do
     std::vector<std::string> vecColumns;  // empty texts: expressions
+    std::vector<std::string> vecCollations;
 };
 
 struct RealIndexes {
@@ -51,6 +53,10 @@ bool IsRowid(const RealTable& Real, const RealColumn& Column);
 // How the column compares texts, where a statement does not say it.
 std::string CollationOf(sqlite3* pDb, const std::string& strTable, const std::string& strColumn);
 bool IsBinary(const std::string& strCollation);
+
+// Whether the columns are the same ones, in any order.
+bool AreSameColumns(const std::vector<std::string>& vecLeft,
+                    const std::vector<std::string>& vecRight);
 
 // Whether a table, a view or an index has that name, in any letter case.
 int IsNameTaken(sqlite3* pDb, const std::string& strName, bool& blTaken);

@@ -25,7 +25,8 @@ std::string InsertSql(const Members& Of, const RecordValues& Values) {
 std::string KeyList(const Members& Of) {
     std::string strList;
     for (const size_t nMember : Of.Key()) {
-        Append(strList, {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted});
+        Append(strList,
+               {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted, Of.At(nMember).strCollate});
     }
     return strList.append(")");
 }
@@ -77,8 +78,8 @@ Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What) {
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
-        Append(strWhere,
-               {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn, " = ?"});
+        Append(strWhere, {strWhere.empty() ? " WHERE " : " AND ", Of.At(nMember).strColumn,
+                          Of.At(nMember).strCollate, " = ?"});
     }
     return strWhere;
 }
@@ -111,9 +112,11 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
     const bool blHeld = Held.IsFor(m_Values.Given());
     int nResult = blHeld ? SQLITE_OK : Take(eVerb, Held);
     int nNext = 1;
+    // mutate(sunk): what is bound may be bound again.
     if (nResult == SQLITE_OK && eVerb != Verb::kFind) {
         const bool blAgain = blHeld && m_pBound == &Held;
         nResult = m_Values.BindGiven(Held.Get(), nNext, eVerb != Verb::kUpdate, blAgain);
+        // mutate(dropped): what is bound may be bound again.
         m_pBound = nResult == SQLITE_OK ? &Held : nullptr;
     }
     if (nResult == SQLITE_OK && (eVerb == Verb::kFind || eVerb == Verb::kUpdate)) {
@@ -157,6 +160,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         }
         nResult = Run(Now.eThen, nChanged);
         const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
+        // mutate(exchanged): of a record that failed it is not asked.
         eWritten = blSkipped ? Now.eFound : eWritten;
         if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
             return Fail(StatusCode::kConstraint, What,
@@ -175,6 +179,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
 
 // No key that SQLite hands out is one that the member could not be given.
 Status RecordWriter::CheckRowid(const Doing& What) {
+    // mutate(exchanged): both only look.
     const Member& Key = m_Into.Of.At(m_Into.nHandedOut);
     const std::int64_t nRowid = sqlite3_last_insert_rowid(m_Into.pDb);
     BoundValue Value;

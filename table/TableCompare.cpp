@@ -12,12 +12,6 @@ namespace vornjsondb {
 
 namespace {
 
-// In any order.
-bool SameNames(std::vector<std::string> vecLeft, const std::vector<std::string>& vecRight) {
-    return vecLeft.size() == vecRight.size() &&
-           std::is_permutation(vecLeft.begin(), vecLeft.end(), vecRight.begin(), IsSameColumn);
-}
-
 class TableCompare {
   public:
     TableCompare(sqlite3* pDb, const Members& Of, std::vector<std::string>* pvecStatements,
@@ -165,7 +159,7 @@ class TableCompare {
             vecNames.push_back(Of.strName);
             vecTerms.push_back(IndexTerm{Of.strName, Place{nMember, ""}});
         }
-        if (vecNames.empty() || IsUnique(vecNames)) {
+        if (vecNames.empty() || IsUnique(vecNames, blKey)) {
             return SQLITE_OK;
         }
         if (m_pvecStatements == nullptr) {
@@ -190,9 +184,9 @@ class TableCompare {
         }
     }
 
-    bool IsUnique(const std::vector<std::string>& vecNames) const {
+    bool IsUnique(const std::vector<std::string>& vecNames, bool blKey) const {
         const auto fnSame = [&vecNames](const std::vector<std::string>& vecOther) {
-            return SameNames(vecNames, vecOther);
+            return AreSameColumns(vecNames, vecOther);
         };
         const auto fnIndex = [&](bool blFiner) {
             return std::any_of(
@@ -200,8 +194,8 @@ class TableCompare {
                     return Index.blUnique && Index.blFiner == blFiner && fnSame(Index.vecColumns);
                 });
         };
-        // How a primary key compares texts only its index tells.
-        return fnIndex(false) || (fnSame(m_Real.vecKey) && !fnIndex(true)) ||
+        // A key is found as its index compares texts. How a primary key does only its index tells.
+        return fnIndex(false) || (fnIndex(true) ? blKey : fnSame(m_Real.vecKey)) ||
                std::any_of(m_vecUniqueByPlan.begin(), m_vecUniqueByPlan.end(), fnSame);
     }
 

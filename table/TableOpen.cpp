@@ -1,5 +1,6 @@
 // A Table's life: opening, and what is the same for all of its operations.
 
+#include <algorithm>
 #include <limits>
 #include <numeric>
 #include <utility>
@@ -9,6 +10,7 @@
 #include "CreateStatement.h"
 #include "DecimalPoint.h"
 #include "FindingCodes.h"
+#include "LeafSql.h"
 #include "RealTable.h"
 #include "TableParts.h"
 
@@ -132,10 +134,15 @@ Status Table::Parts::Meet() {
     if (vornjsondb::MisreadsFractions()) {
         Outcome = CheckIndexes(*this, What);
     }
+    // mutate(exchanged): nobody asks for what was learned of a table that is not opened.
     if (!Outcome.Ok()) {
         return Outcome;
     }
-    return FromSqlite(pDb, vornjsondb::IsInSchema(pDb, Of.Table(), kFails, blFails), What);
+    int nLearned = LearnCollations();
+    if (nLearned == SQLITE_OK) {
+        nLearned = vornjsondb::IsInSchema(pDb, Of.Table(), kFails, blFails);
+    }
+    return FromSqlite(pDb, nLearned, What);
 }
 
 void Table::Parts::Learn(const RealTable& Real) {
@@ -161,6 +168,31 @@ void Table::Parts::Learn(const RealTable& Real) {
             nHandedOut = nMember;
         }
     }
+}
+
+// A key tells records apart as the unique index on it does, which may compare texts in another way
+// than their columns. Of several the one counts that does as they do.
+int Table::Parts::LearnCollations() {
+    vornjsondb::RealIndexes There;
+    int nResult = SQLITE_OK;
+    if (std::any_of(Of.Key().begin(), Of.Key().end(),
+                    [this](size_t nMember) { return IsOrderedAsText(Of.At(nMember)); })) {
+        nResult = ReadRealIndexes(pDb, Of.Table(), There);
+    }
+    const vornjsondb::RealIndex* pCounts = nullptr;
+    for (const vornjsondb::RealIndex& Index : There.vecAll) {
+        // mutate(exchanged): all only look.
+        if (Index.blUnique && (pCounts == nullptr || Index.blOwn) &&
+            vornjsondb::AreSameColumns(Index.vecColumns, vecKeyNames)) {
+            pCounts = &Index;
+        }
+    }
+    for (size_t i = 0; pCounts != nullptr && i < pCounts->vecColumns.size(); ++i) {
+        // mutate(doubled): the same once more.
+        Of.SetCollate(Of.FindColumn(pCounts->vecColumns[i]),
+                      " COLLATE " + vornjsondb::Quoted(pCounts->vecCollations[i]));
+    }
+    return nResult;
 }
 
 Table::Table() = default;

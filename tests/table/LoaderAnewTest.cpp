@@ -93,6 +93,20 @@ TEST_F(LoaderAnewTest, StatementsOfEachShapeAreKept) {
     EXPECT_EQ(Text(m_Into.Commit()), "ok");
 }
 
+// A key that the table hands out ends a load only where its member cannot hold it.
+TEST_F(LoaderAnewTest, BadRecordBehindAKeyThatWasHandedOutIsLeftOut) {
+    LoadOptions How;
+    How.blGoOnAfterBad = true;
+    EXPECT_EQ(Text(m_Into.Start(m_Table, How)), "ok");
+    EXPECT_EQ(Add(R"({"name": "a"})"), "ok");
+    EXPECT_EQ(Add(R"({"id": 1})"),
+              "duplicate: cannot load record 2 into table \"task\": UNIQUE constraint failed: "
+              "task.id (id = 1)");
+    EXPECT_EQ(Add(R"({"name": "b"})"), "ok");
+    EXPECT_EQ(Text(m_Into.Commit()), "ok");
+    EXPECT_EQ(Ids(), "1;2");
+}
+
 TEST_F(LoaderAnewTest, FailureTakesBackWhatWasReplacedOrSkipped) {
     for (const auto eMode : {OnDuplicate::kReplace, OnDuplicate::kSkip}) {
         Run("DELETE FROM task");
