@@ -10,6 +10,7 @@
 #include <json/json.h>
 
 #include "../src/schema/MemberType.h"
+#include "Affinity.h"
 #include "Failure.h"
 
 namespace vornjsondb {
@@ -25,7 +26,8 @@ struct Member {
     bool blNotNull;
     bool blUnique;
     bool blNullSeen;
-    bool blGenerated;  // computed by the real table: can be read, not written
+    bool blGenerated;                      // computed by the real table: can be read, not written
+    Affinity eAffinity = Affinity::kNone;  // of the real column
 
     BoundKind Kind() const { return pType->Bound.eKind; }
     bool IsJson() const;
@@ -64,6 +66,7 @@ class Members {
     // What only the real table tells. A key of which not all columns are members is none.
     void SetKey(const std::vector<std::string>& vecColumns);
     void SetGenerated(size_t nMember) { m_vecAll[nMember].blGenerated = true; }
+    void SetAffinity(size_t nMember, Affinity eOf) { m_vecAll[nMember].eAffinity = eOf; }
 
     const Json::Value& Definition() const { return m_jDefinition; }
     const std::string& Table() const { return m_strTable; }

@@ -168,12 +168,16 @@ void Table::Parts::Learn(const RealTable& Real) {
     }
     for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
         const size_t nMember = Of.FindColumn(Column.strName);
-        if (Column.blGenerated && nMember != vornjsondb::Members::kNone) {
+        if (nMember == vornjsondb::Members::kNone) {
+            continue;
+        }
+        Of.SetAffinity(nMember, vornjsondb::AffinityOf(Column.strType));
+        if (Column.blGenerated) {
             // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);
             Values.RefuseAlways(nMember);
         }
-        if (nMember != vornjsondb::Members::kNone && IsNarrowRowid(Real, Column, Of.At(nMember))) {
+        if (IsNarrowRowid(Real, Column, Of.At(nMember))) {
             nHandedOut = nMember;
         }
     }
