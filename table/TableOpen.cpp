@@ -155,7 +155,9 @@ Status Table::Parts::Meet() {
 
 void Table::Parts::Learn(const RealTable& Real) {
     // A member of that name has no column yet, but Sync may add one.
-    strRowid = Real.strRowid;
+    // A member of that name has no column yet, but Sync may add one.
+    strRowid =
+        Of.FindColumn(Real.strRowid) == vornjsondb::Members::kNone ? Real.strRowid : std::string();
     // mutate(exchanged): in any order.
     blView = Real.blView;
     if (Of.Key().empty()) {
