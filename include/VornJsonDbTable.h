@@ -20,7 +20,8 @@
 //
 // The connection is the caller's and must outlive what works on it: a Table keeps prepared
 // statements, and sqlite3_close refuses while one lives. So Table, Loader and Transaction go before
-// the connection, in any order. A Loader keeps what it needs of its Table.
+// the connection, in any order. A Loader keeps what it needs of its Table. Transactions and loads
+// that are open at the same time are savepoints in each other: they end in the reverse order.
 // Threads: one at a time for a connection and all that works on it. Any number of threads may each
 // have their own; nothing is shared between them.
 // SQLite 3.35 or later. Databases are UTF-8; Table::Open refuses UTF-16.
@@ -32,7 +33,7 @@
 // A call that changes something is whole or nothing, inside a transaction of the caller's too. Some
 // failures may undo that transaction with it, as SQLite works: a full disk, an interrupt, and what
 // the table's own SQL answers with ROLLBACK. Then the message ends in "the transaction is undone".
-// Where that SQL says FAIL or IGNORE, what was done before stays, as it asks for. And a progress
+// Where that SQL says IGNORE, what was done before stays, as it asks for. And a progress
 // handler can interrupt a statement that has done its work: a call is then told as failed, and may
 // be done.
 // Functions and hooks of the program that SQLite calls in the middle of a call, an SQL function in
@@ -105,11 +106,12 @@ namespace VORN_JSON_DB {
 
 enum class StatusCode {
     kOk,
-    kNotFound,    // no such record or table
+    kNotFound,    // no such record; from Open, Lint and Sync, no such table
     kDuplicate,   // another record has this key, or this value of a unique member
     kConstraint,  // not null, check, foreign key, trigger; or the table has ignored the record
     kLocked,      // by another connection, or by a running statement of this one
-    kRefused,     // the findings say what is wrong with the arguments; nothing was run
+    kRefused,     // the findings say what is wrong with the arguments; where there are none, SQLite
+                  // does not take what the message says. Nothing was changed
     kReadOnly,
     kDiskFull,
     kIoError,
@@ -180,7 +182,8 @@ class [[nodiscard]] Status {
 //    "where"    conditions that must all hold: {member: value}, or {member: {operator: operand}}
 //               with one operator or several
 //    "sort"     members, with "-" before a descending one; the key is the last term, so that pages
-//               are stable. NULL comes first. Texts are ordered and compared by their bytes.
+//               are stable. NULL is less than all else. Texts are ordered and compared by their
+//               bytes.
 //    "limit", "offset"   whole numbers from 0; each may stand alone
 //    "members"  what a record holds; all, if absent
 //    "$not": {operator: operand} stands below a member as well; "$and" and "$or" with a list of
@@ -189,6 +192,7 @@ class [[nodiscard]] Status {
 // Each condition is true or false, never unknown: "$ne", "$nin" and "$not" are true for NULL.
 // An empty "$in" selects nothing and an empty "$or" is refused: no condition is ever dropped.
 // A path leads into a JSON member: "address.city", "tags[0]". What is absent there counts as null.
+// To a name with a point, a bracket, a quote or a backslash in it no path leads.
 // A blob of another program's whose bytes are JSON is looked into by paths and "$contains", too.
 // Within JSON some versions of SQLite, 3.40 among them, end a text at a NUL byte: paths and
 // "$contains" then see what stands before it, and operands of theirs with a NUL byte are refused.
@@ -207,7 +211,8 @@ enum class Op {       // true for a record whose member
     kIn,              // "$in": equals one of a list of up to 100,000 values
     kNotIn,           // "$nin": equals none of them
     kLike,            // "$like": matches; % is any text, _ any character, \ takes %, _ or \ as
-                      // it is; A equals a. No index helps.
+                      // it is; A equals a, as long as SQLite's own LIKE has not been told
+                      // otherwise (PRAGMA case_sensitive_like). No index helps.
     kPrefix,          // "$prefix": begins with the operand. An index helps.
     kNull,            // "$null": with true is NULL, with false is not
     kContains         // "$contains": is a list that holds the operand
@@ -360,7 +365,7 @@ enum class SyncMode { kLook, kChange };
 enum class OldCall { kRead, kChange };
 
 // A handle on one table. Outputs are as they were after a failure, unless a call says otherwise;
-// an input may be the output, too. Whatever kRefused returns was found before anything ran.
+// an input may be the output, too.
 class Table {
   public:
     Table();
@@ -375,7 +380,9 @@ class Table {
     // the connection. A null definition is made from the real table. kNotFound: there is no such
     // table and Options do not say how to make one, or their statement makes another, which is
     // undone. Columns that the table lacks, or has more, are
-    // no failure: see Lint and Sync.
+    // no failure: see Lint and Sync. What is learned of the real table here (its key, whether it is
+    // a view, columns that it computes) is not learned again: open it anew after its schema has
+    // been changed otherwise than by Sync and CreateIndex.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 
@@ -405,9 +412,9 @@ class Table {
     Status Exists(const Query& Which, bool& blExists);
 
     // One row at a time, in constant memory, until the callback, which must not be empty, returns
-    // false. In it the table can
-    // be read, and the Table moved and destroyed; but calls that change it, and Open, return
-    // kMisuse.
+    // false. In it the table can be read, and the Table moved and destroyed, and the query changed;
+    // but calls that change the table, and Open, return kMisuse. SQL of the caller's must not
+    // change its schema there: SQLite would go on with other columns.
     Status ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord);
     Status ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow);
 
@@ -432,7 +439,8 @@ class Table {
     Status CreateIndex(const std::vector<std::string>& vecMembers, bool blUnique,
                        std::string* pstrSql = nullptr);
 
-    // How a query, or any one statement that reads this table, would run.
+    // How a query, or any one statement that reads this table, would run. Pass no PRAGMA: SQLite
+    // runs some of them as it prepares them.
     Status Explain(const Query& Which, Plan& Found);
     Status ExplainSql(const std::string& strSql, Plan& Found);
 
@@ -555,7 +563,7 @@ class Transaction {
 Status CreateStatement(const std::string& strTable, const Json::Value& jDefinition,
                        std::string& strSql, const std::vector<std::string>& vecFirst = {});
 
-// A definition that fits the columns of a real table or view.
+// A definition that fits the columns of a real table or view. A lock is reported at once.
 Status DefinitionOf(sqlite3* pDb, const std::string& strTable, Json::Value& jDefinition);
 
 // What is wrong with a definition, for either handle; what an old handle would make of a query

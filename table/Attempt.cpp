@@ -36,16 +36,26 @@ Status InTransaction(sqlite3* pDb, const Status& Outcome) {
     return blGone ? Amended(Outcome, Retry::kTransaction, "; the transaction is undone") : Outcome;
 }
 
+namespace {
+
+// Whether a pause may help. It does not where a statement of this connection is reading from a
+// state before another one's change: a ForEach around the call, whose state stays.
+bool MayPass(const Status& Outcome) {
+    return IsLock(Outcome) && Outcome.SqliteCode() != SQLITE_BUSY_SNAPSHOT;
+}
+
+}  // namespace
+
 Status Attempt(sqlite3* pDb, int nWaitMs, Callable<Status()> fnOnce) {
     if (sqlite3_get_autocommit(pDb) == 0) {
         return InTransaction(pDb, fnOnce());
     }
     Patience Left(nWaitMs);
     Status Outcome = fnOnce();
-    while (IsLock(Outcome) && Left.Wait()) {
+    while (MayPass(Outcome) && Left.Wait()) {
         Outcome = fnOnce();
     }
-    if (IsLock(Outcome)) {
+    if (MayPass(Outcome)) {
         return Amended(Outcome, Retry::kCall, WaitedText(nWaitMs));
     }
     return Outcome;

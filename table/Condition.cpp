@@ -54,7 +54,9 @@ Condition Group(Node::Kind eKind, std::vector<Condition> vecParts) {
     pNode->nLeaves = 0;
     for (Condition& Part : vecParts) {
         const Node& Each = Part.Root();
-        const bool blSame = Each.eKind == eKind && eKind != Node::Kind::kNot;
+        // An empty one stays, to be refused: in a list of others it would be dropped.
+        const bool blSame =
+            Each.eKind == eKind && eKind != Node::Kind::kNot && !Each.vecParts.empty();
         pNode->nLeaves += Each.nLeaves;
         // mutate(exchanged): the part is the same wherever it has been moved.
         pNode->nLevels = std::max(pNode->nLevels, Each.nLevels + (blSame ? 0 : 1));

@@ -4,6 +4,7 @@
 
 #include <VornJsonDbTable.h>
 
+#include <cmath>
 #include <string_view>
 #include <vector>
 
@@ -71,6 +72,9 @@ std::string DefaultClause(const Member& Declared) {
         case BoundValue::Kind::kInteger:
             return Concat({" DEFAULT ", DigitsOf(Value.nValue)});
         case BoundValue::Kind::kReal:
+            if (std::isinf(Value.dValue)) {
+                return Value.dValue < 0 ? " DEFAULT -9e999" : " DEFAULT 9e999";
+            }
             sqlite3_snprintf(sizeof szReal, szReal, "%!.17g", Value.dValue);
             return Concat({" DEFAULT ", szReal});
         case BoundValue::Kind::kText:

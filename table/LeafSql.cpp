@@ -30,6 +30,14 @@ bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
     }
 }
 
+// Whether SQLite may read a number in the text. A date, with its signs behind digits, is none.
+bool MayBeNumber(std::string_view strText) {
+    const size_t nSign = strText.find_last_of("+-");
+    return strText.find_first_not_of("0123456789.+-eE \t\n\v\f\r") == std::string_view::npos &&
+           (nSign == std::string_view::npos || nSign == 0 || strText[nSign - 1] > '9' ||
+            strText[nSign - 1] < '0');
+}
+
 bool RefuseOperand(const Operator& Row, const Json::Value& jOperand, Problem& Why) {
     return Why.Tell(
         FindingCode::kWrongOperand,
@@ -114,6 +122,18 @@ void LeafSql::AddLeft(ValueKind eKind) {
         m_strSql += m_pMember->strColumn;
         m_strSql += eKind == ValueKind::kText ? " COLLATE BINARY" : "";
     }
+}
+
+// The same where an order is asked for. Of two values SQLite makes one kind first, by the column's
+// affinity, and all texts would be greater than the number that is made of the operand. The plus
+// takes the affinity away, and with it the index.
+void LeafSql::AddOrdered(const Operand& What) {
+    const bool blText = What.eKind == ValueKind::kText;
+    const bool blConverts =
+        blText ? m_pMember->eAffinity > Affinity::kText && MayBeNumber(What.Value.strBytes)
+               : m_pMember->eAffinity == Affinity::kText;
+    m_strSql += blConverts && !m_blPath ? "+" : "";
+    AddLeft(What.eKind);
 }
 
 void LeafSql::AddKindTest(ValueKind eKind) {
@@ -201,7 +221,7 @@ bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Pro
     const bool blEnd = !m_blPath && szEnd != nullptr;
     OpenJson();
     m_strSql += blEnd ? "(" : "";
-    AddLeft(What.eKind);
+    AddOrdered(What);
     m_strSql += Row.szSql;
     AddValue(What.eKind, What.Value);
     // mutate(exchanged): only one of the two writes anything.
@@ -228,7 +248,7 @@ bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Proble
                                                            " and ", Shown(jPair[1])}));
     }
     OpenJson();
-    AddLeft(Least.eKind);
+    AddOrdered(MayBeNumber(Least.Value.strBytes) ? Least : Most);
     m_strSql += " BETWEEN ";
     AddValue(Least.eKind, Least.Value);
     m_strSql += " AND ";

@@ -46,6 +46,7 @@ class LeafSql {
     void WritePrefix(const Json::Value& jPrefix);
 
     void AddLeft(ValueKind eKind);
+    void AddOrdered(const Operand& What);
     void AddKindTest(ValueKind eKind);
     void AddValue(ValueKind eKind, const BoundValue& Value);
     void AddJsonEqual(const Operand& What);

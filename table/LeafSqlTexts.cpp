@@ -73,14 +73,16 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
 }
 
 void LeafSql::WritePrefix(const Json::Value& jPrefix) {
+    const Operand From{ValueKind::kText, BoundText(BytesOf(jPrefix))};
+    const Operand To{ValueKind::kText, Beyond(BytesOf(jPrefix), m_Reader)};
     m_strSql += '(';
-    AddLeft(ValueKind::kText);
+    AddOrdered(From);
     m_strSql += " >= ";
-    m_Out.Add(BoundText(BytesOf(jPrefix)));
+    m_Out.Add(From.Value);
     m_strSql += " AND ";
-    AddLeft(ValueKind::kText);
+    AddOrdered(To);
     m_strSql += " < ";
-    m_Out.Add(Beyond(BytesOf(jPrefix), m_Reader));
+    m_Out.Add(To.Value);
     m_strSql += m_blPath ? "" : ")";
     CloseJson(ValueKind::kText);
 }

@@ -64,9 +64,7 @@ Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
 
 Status Loader::Parts::Write(FindingList& vecFindings) {
     const vornjsondb::Doing What{"load record # into", &Into.Of.Table(), Now.nRecords};
-    if (vecFindings.empty() && Values.IsEmpty()) {
-        Report(vecFindings, vornjsondb::FindingCode::kNotARecord, "", "the record has no members");
-    }
+    vornjsondb::CheckEmpty(Values, vecFindings);
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);
     }
@@ -126,7 +124,13 @@ Status Loader::Parts::End(const Status& Outcome) {
 Status Loader::Parts::EndRecord(FindingList& vecFindings) {
     const vornjsondb::Running Busy(Into, this);
     ++Now.nRecords;
-    Status Outcome = Write(vecFindings);
+    Status Outcome;
+    try {
+        Outcome = Write(vecFindings);
+    } catch (...) {
+        Values.Clear();  // the next record has none of this one's
+        throw;
+    }
     Values.Clear();
     if (!Outcome.Ok()) {
         return Fail(Outcome);

@@ -11,6 +11,7 @@
 #include <json/json.h>
 
 #include "../src/schema/MemberType.h"
+#include "Affinity.h"
 #include "Failure.h"
 
 namespace vornjsondb {
@@ -28,6 +29,7 @@ struct Member {
     bool blNullSeen;
     bool blGenerated;        // computed by the real table: can be read, not written
     std::string strCollate;  // " COLLATE ...", as the key's index compares texts; empty: none does
+    Affinity eAffinity = Affinity::kNone;  // of the real column
 
     BoundKind Kind() const { return pType->Bound.eKind; }
     bool IsJson() const;
@@ -69,6 +71,7 @@ class Members {
     void SetCollate(size_t nMember, std::string strCollate) {
         m_vecAll[nMember].strCollate = std::move(strCollate);
     }
+    void SetAffinity(size_t nMember, Affinity eOf) { m_vecAll[nMember].eAffinity = eOf; }
 
     const Json::Value& Definition() const { return m_jDefinition; }
     const std::string& Table() const { return m_strTable; }

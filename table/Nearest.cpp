@@ -1,6 +1,7 @@
 #include "Nearest.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "Concat.h"
 #include "FindingCodes.h"
@@ -16,11 +17,14 @@ char Lower(char c) {
 }
 
 // How many single slips lie between the two: a letter that is wrong, missing, too many, or has
-// changed places with its neighbour. Letter case is none. Of long texts more than are ever near.
-size_t Slips(std::string_view strLeft, std::string_view strRight) {
-    if (std::max(strLeft.size(), strRight.size()) > kLongestCompared) {
-        return kLongestCompared;
+// changed places with its neighbour. Letter case is none. nTooMany, or more, where it is not less:
+// looked for no further, as a record from the network may have any number of unknown names.
+size_t Slips(std::string_view strLeft, std::string_view strRight, size_t nTooMany) {
+    const auto [nShorter, nLonger] = std::minmax({strLeft.size(), strRight.size()});
+    if (nLonger > kLongestCompared || nLonger - nShorter >= nTooMany) {
+        return nTooMany;
     }
+    size_t nLeastUp = 0;
     size_t nRows[3][kLongestCompared + 1] = {};
     size_t* pTwoUp = nRows[0];
     size_t* pUp = nRows[1];
@@ -30,6 +34,7 @@ size_t Slips(std::string_view strLeft, std::string_view strRight) {
     }
     for (size_t i = 1; i <= strLeft.size(); ++i) {
         pRow[0] = i;
+        size_t nLeast = i;
         for (size_t j = 1; j <= strRight.size(); ++j) {
             const bool blSame = Lower(strLeft[i - 1]) == Lower(strRight[j - 1]);
             pRow[j] = std::min({pUp[j] + 1, pRow[j - 1] + 1, pUp[j - 1] + (blSame ? 0 : 1)});
@@ -39,6 +44,10 @@ size_t Slips(std::string_view strLeft, std::string_view strRight) {
             if (blSwapped) {
                 pRow[j] = std::min(pRow[j], pTwoUp[j - 2] + 1);
             }
+            nLeast = std::min(nLeast, pRow[j]);
+        }
+        if (std::min(nLeast, std::exchange(nLeastUp, nLeast)) >= nTooMany) {
+            return nTooMany;
         }
         std::swap(pTwoUp, pUp);
         std::swap(pUp, pRow);
@@ -52,7 +61,7 @@ std::string Nearest(std::string_view strTyped, const std::vector<std::string>& v
     const std::string* pNearest = nullptr;
     size_t nFewest = 1 + std::min<size_t>(3, 1 + strTyped.size() / 4);
     for (const std::string& strCandidate : vecCandidates) {
-        const size_t nSlips = Slips(strTyped, strCandidate);
+        const size_t nSlips = Slips(strTyped, strCandidate, nFewest);
         if (nSlips < nFewest && nSlips < strCandidate.size()) {
             nFewest = nSlips;
             pNearest = &strCandidate;

@@ -67,6 +67,12 @@ std::string UpdateSql(const Members& Of, const RecordValues& Values) {
 
 }  // namespace
 
+void CheckEmpty(const RecordValues& Values, FindingList& vecFindings) {
+    if (vecFindings.empty() && Values.IsEmpty()) {
+        Report(vecFindings, FindingCode::kNotARecord, "", "the record has no members");
+    }
+}
+
 Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What) {
     const bool blMode =
         static_cast<size_t>(eOnDuplicate) <= static_cast<size_t>(OnDuplicate::kUpsert);

@@ -44,6 +44,9 @@ class RecordWriter {
     const Statement* m_pBound = nullptr;  // the one of them that has the values before bound
 };
 
+// Reports a record of which nothing is left once its unknown members are left out.
+void CheckEmpty(const RecordValues& Values, FindingList& vecFindings);
+
 // A failure for a number that is none of its values.
 Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What);
 

@@ -46,6 +46,13 @@ void ReadJson(std::string_view strText, JsonCodec& Codec, Json::Value& jOut) {
     }
 }
 
+// Whether a double holds the number exactly.
+bool IsExact(sqlite3_int64 nValue) {
+    constexpr double kTwoTo63 = 9223372036854775808.0;
+    const auto dValue = static_cast<double>(nValue);
+    return dValue < kTwoTo63 && static_cast<sqlite3_int64>(dValue) == nValue;
+}
+
 // What a value is: of its member's kind where it fits it, else of the stored one.
 RowKind KindOf(sqlite3_value* pValue, BoundKind eKind) {
     constexpr RowKind kInt = RowKind::kInteger, kReal = RowKind::kReal, kText = RowKind::kText,
@@ -58,9 +65,11 @@ RowKind KindOf(sqlite3_value* pValue, BoundKind eKind) {
         {kText, kText, kText, kText, kText, kJson, kJson, kJson, kText},
         {kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob, kBlob},
         {kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull, kNull}};
-    const RowKind eFound = kKinds[sqlite3_value_type(pValue) - 1][static_cast<size_t>(eKind)];
+    const int nType = sqlite3_value_type(pValue);
+    const RowKind eFound = kKinds[nType - 1][static_cast<size_t>(eKind)];
     const bool blNumber =
-        eFound == RowKind::kBoolean && (sqlite3_value_int64(pValue) & ~sqlite3_int64{1}) != 0;
+        (eFound == RowKind::kBoolean && (sqlite3_value_int64(pValue) & ~sqlite3_int64{1}) != 0) ||
+        (eFound == kReal && nType == SQLITE_INTEGER && !IsExact(sqlite3_value_int64(pValue)));
     return blNumber ? kInt : eFound;
 }
 
@@ -163,9 +172,14 @@ double Row::Real(int nColumn) const {
     return sqlite3_column_double(m_From.pStatement, nColumn);
 }
 
+// A blob that is asked for as a text would be one from then on.
 std::string_view Row::Text(int nColumn) const {
-    return vornjsondb::TextOf(m_From.pStatement,
-                              vornjsondb::ColumnValue(m_From.pStatement, nColumn));
+    sqlite3_value* const pValue = vornjsondb::ColumnValue(m_From.pStatement, nColumn);
+    if (sqlite3_value_type(pValue) == SQLITE_BLOB) {
+        const auto* const pBytes = static_cast<const char*>(sqlite3_value_blob(pValue));
+        return {pBytes, static_cast<size_t>(sqlite3_value_bytes(pValue))};
+    }
+    return vornjsondb::TextOf(m_From.pStatement, pValue);
 }
 
 }  // namespace VORN_JSON_DB

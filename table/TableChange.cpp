@@ -5,6 +5,7 @@
 #include "Attempt.h"
 #include "FindingCodes.h"
 #include "QueryPlan.h"
+#include "RecordWriter.h"
 #include "TableParts.h"
 
 namespace VORN_JSON_DB {
@@ -75,6 +76,7 @@ Status Table::Update(const Query& Which, const Json::Value& jMembers, std::int64
         Plan.Resolve(Which, QueryUse::kChange, vecFindings);
         FindingList vecMembers;
         Into.Values.Take(jMembers, vecMembers);
+        vornjsondb::CheckEmpty(Into.Values, vecMembers);
         vecFindings.insert(vecFindings.end(), vecMembers.begin(), vecMembers.end());
         const auto fnSql = [&] {
             std::string strSql = "UPDATE " + Into.Of.QuotedTable() + SetSql(Into.Of, Into.Values);

@@ -8,6 +8,7 @@
 #include "DecimalPoint.h"
 #include "FindingCodes.h"
 #include "IndexSql.h"
+#include "SelectSql.h"
 #include "TableParts.h"
 
 namespace VORN_JSON_DB {
@@ -54,7 +55,18 @@ std::vector<IndexTerm> TermsOf(const vornjsondb::Members& Of,
 int RunPlan(Parts& Into, const std::vector<IndexTerm>& vecTerms, bool blUnique, IndexPlan& Plan) {
     vornjsondb::RealIndexes There;
     std::vector<std::string> vecPlanned;
-    int nResult = vornjsondb::ReadRealIndexes(Into.pDb, Into.Of.Table(), There);
+    std::vector<size_t> vecColumns;
+    vecColumns.reserve(vecTerms.size());
+    for (const IndexTerm& Term : vecTerms) {
+        vecColumns.push_back(Term.Where.nMember);
+    }
+    // In CREATE INDEX the name of a column that is not there would be a text, the same in all rows.
+    vornjsondb::OwnStatement pColumns;
+    int nResult =
+        vornjsondb::Prepare(Into.pDb, vornjsondb::SelectSql(Into.Of, vecColumns), pColumns);
+    if (nResult == SQLITE_OK) {
+        nResult = vornjsondb::ReadRealIndexes(Into.pDb, Into.Of.Table(), There);
+    }
     if (nResult == SQLITE_OK) {
         nResult =
             vornjsondb::PlanIndex(Into.pDb, Into.Of, There, vecTerms, blUnique, vecPlanned, Plan);

@@ -68,8 +68,23 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
     return vornjsondb::FromSqlite(Into.pDb, nResult, What);
 }
 
-// ON CONFLICT FAIL and RAISE(FAIL); a name with these letters costs a savepoint and nothing else.
-constexpr char kFails[] = "type IN ('table', 'trigger') AND instr(lower(sql), 'fail')";
+// Whether a statement on the table may end halfway: by ON CONFLICT FAIL and RAISE(FAIL), its own or
+// those of a table that its triggers and foreign keys change. A name with these letters costs a
+// savepoint and nothing else. What follows OR is asked of all tables.
+int FindFails(const Table::Parts& Of, bool& blFails) {
+    static constexpr char kFails[] = "type IN ('table', 'trigger') AND instr(lower(sql), 'fail')";
+    static constexpr char kReaches[] = "type = 'trigger' OR instr(lower(sql), 'references')";
+    bool blReaches = false;
+    int nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), kFails, blFails);
+    if (nResult == SQLITE_OK) {
+        nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), kReaches, blReaches);
+    }
+    if (nResult == SQLITE_OK && blReaches) {
+        const std::string strAny = std::string("0 OR ") + kFails;
+        nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), strAny.c_str(), blFails);
+    }
+    return nResult;
+}
 
 // Whatever is written into an index on a place in JSON is wrong for every other program.
 Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
@@ -140,13 +155,15 @@ Status Table::Parts::Meet() {
     }
     int nLearned = LearnCollations();
     if (nLearned == SQLITE_OK) {
-        nLearned = vornjsondb::IsInSchema(pDb, Of.Table(), kFails, blFails);
+        nLearned = FindFails(*this, blFails);
     }
     return FromSqlite(pDb, nLearned, What);
 }
 
 void Table::Parts::Learn(const RealTable& Real) {
-    strRowid = Real.strRowid;
+    // A member of that name has no column yet, but Sync may add one.
+    strRowid =
+        Of.FindColumn(Real.strRowid) == vornjsondb::Members::kNone ? Real.strRowid : std::string();
     // mutate(exchanged): in any order.
     blView = Real.blView;
     if (Of.Key().empty()) {
@@ -159,12 +176,16 @@ void Table::Parts::Learn(const RealTable& Real) {
     }
     for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
         const size_t nMember = Of.FindColumn(Column.strName);
-        if (Column.blGenerated && nMember != vornjsondb::Members::kNone) {
+        if (nMember == vornjsondb::Members::kNone) {
+            continue;
+        }
+        Of.SetAffinity(nMember, vornjsondb::AffinityOf(Column.strType));
+        if (Column.blGenerated) {
             // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);
             Values.RefuseAlways(nMember);
         }
-        if (nMember != vornjsondb::Members::kNone && IsNarrowRowid(Real, Column, Of.At(nMember))) {
+        if (IsNarrowRowid(Real, Column, Of.At(nMember))) {
             nHandedOut = nMember;
         }
     }

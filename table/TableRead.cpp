@@ -179,7 +179,9 @@ Status Table::Exists(const Query& Which, bool& blExists) {
 }
 
 Status Table::ForEach(const Query& Which, const std::function<bool(const Json::Value&)>& fnRecord) {
-    const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
+    const std::shared_ptr<Parts> pOwn = m_pParts;          // the callback may destroy the Table
+    const std::vector<Condition> vecOwn = Which.vecWhere;  // and change the query, of whose values
+                                                           // SQLite has no copies
     const auto fnRead = [&](Parts& From, const Doing& What) {
         const auto fnEach = [&](const Json::Value& jRecord) {
             const Callback Now(From);
@@ -191,7 +193,9 @@ Status Table::ForEach(const Query& Which, const std::function<bool(const Json::V
 }
 
 Status Table::ForEachRow(const Query& Which, const std::function<bool(const Row&)>& fnRow) {
-    const std::shared_ptr<Parts> pOwn = m_pParts;  // the callback may destroy the Table
+    const std::shared_ptr<Parts> pOwn = m_pParts;          // the callback may destroy the Table
+    const std::vector<Condition> vecOwn = Which.vecWhere;  // and change the query, of whose values
+                                                           // SQLite has no copies
     const auto fnRead = [&](Parts& From, const Doing& What) {
         const auto fnEach = [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
             const Row::Source Source{pStatement, From.Of, vecColumns};

@@ -56,7 +56,9 @@ bool IsOneStatement(const Parts& Into, OnDuplicate eOnDuplicate, const Json::Val
 
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
     FindingList vecFindings;
-    if (Into.Values.Take(jRecord, vecFindings) && eOnDuplicate != OnDuplicate::kStop) {
+    Into.Values.Take(jRecord, vecFindings);
+    vornjsondb::CheckEmpty(Into.Values, vecFindings);
+    if (vecFindings.empty() && eOnDuplicate != OnDuplicate::kStop) {
         Into.Values.HasKey(vecFindings);
     }
     return vornjsondb::FromFindings(std::move(vecFindings), What);

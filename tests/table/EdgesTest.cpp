@@ -88,6 +88,73 @@ TEST_F(EdgesTest, NumericColumnsKeepWholeNumbers) {
               "as \"TEXT\", has text affinity and changes what is stored");
 }
 
+// By its type the column makes a number of what looks like one: of 2024, and of the end of the
+// prefix 2024-, which is 2024. with a point.
+TEST_F(EdgesTest, TextsInAColumnOfNumbersAreOrderedAsTexts) {
+    for (const char* szType : {"string", "any"}) {
+        Meet("DROP TABLE IF EXISTS item; CREATE TABLE item (id INTEGER PRIMARY KEY, day DATETIME)",
+             std::string(R"({"member": {"id": {"cpptype": "int"}, "day": {"cpptype": ")") + szType +
+                 "\"}}}");
+        Run("INSERT INTO item (day) VALUES ('2023-05-05'), ('2024-01-01'), ('2024-12-31 23:59'),"
+            " ('2025-02-02'), (' +'), (NULL), (2024)");
+        const auto fnIds = [this](Op eOp, const char* szOperand) {
+            return Ids(Query().Where("day", eOp, Parse(szOperand)).Sort("id"));
+        };
+        EXPECT_EQ(fnIds(Op::kPrefix, "\"2024\""), "2,3");
+        EXPECT_EQ(fnIds(Op::kPrefix, "\"2024-\""), "2,3");
+        EXPECT_EQ(fnIds(Op::kGreaterOrEqual, "\"2024\""), "2,3,4");
+        EXPECT_EQ(fnIds(Op::kGreater, "\"2024\""), "2,3,4");
+        EXPECT_EQ(fnIds(Op::kLess, "\" 2024\""), "5");
+        EXPECT_EQ(fnIds(Op::kLess, "\" -1\""), "5");
+        EXPECT_EQ(fnIds(Op::kLess, "\"-1\""), "5");
+        EXPECT_EQ(fnIds(Op::kLessOrEqual, "\"2024e+0\""), "1,2,3,5");
+        EXPECT_EQ(fnIds(Op::kLess, "\"2024-01-02\""), "1,2,5");
+        EXPECT_EQ(fnIds(Op::kBetween, R"(["2024", "2025"])"), "2,3");
+        EXPECT_EQ(fnIds(Op::kBetween, R"(["2024-01-02", "2025"])"), "3");
+        EXPECT_EQ(fnIds(Op::kBetween, R"(["2023-06", "2024-06"])"), "2");
+        EXPECT_EQ(fnIds(Op::kEqual, "\"2024\""), "7");
+    }
+    EXPECT_EQ(Ids(Query().Where("day", Op::kLess, 2025)), "7");
+}
+
+// The other way round: a number that is compared with a column of texts would become one.
+TEST_F(EdgesTest, NumbersInAColumnOfTextsAreNone) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, a TEXT)",
+         R"({"member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");
+    Run("INSERT INTO item (a) VALUES (7), (12), ('x')");
+    for (const Op eOp : {Op::kLess, Op::kGreater}) {
+        EXPECT_EQ(Ids(Query().Where("a", eOp, 8)), "");
+    }
+    EXPECT_EQ(Ids(Query().Where("a", Op::kBetween, Parse("[1, 8]"))), "");
+    EXPECT_EQ(Ids(Query().Where("a", 12)), "2");
+}
+
+TEST_F(EdgesTest, OrderOfDatesKeepsItsIndex) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, day DATE)",
+         R"({"member": {"id": {"cpptype": "int"}, "day": {"cpptype": "string"}}})");
+    EXPECT_EQ(Text(m_Table.CreateIndex({"day"}, false)), "ok");
+    Plan Found;
+    EXPECT_EQ(Text(m_Table.Explain(Query().Where("day", Op::kGreater, "2024-01-01"), Found)), "ok");
+    EXPECT_EQ(
+        Found.strSql,
+        R"(SELECT "item"."day", "item"."id" FROM "item" WHERE ("item"."day" COLLATE BINARY > ?)"
+        R"( AND "item"."day" COLLATE BINARY < x''))");
+    EXPECT_EQ(Found.vecSteps, std::vector<std::string>{
+                                  "SEARCH item USING COVERING INDEX item_day (day>? AND day<?)"});
+}
+
+// Below a place in JSON there is no column to convert.
+TEST_F(EdgesTest, PlacesInsideOfAJsonColumnAreOrderedAsTheyAre) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, j JSON)",
+         R"({"member": {"id": {"cpptype": "int"}, "j": {"cpptype": "Json::Value"}}})");
+    Run("INSERT INTO item (j) VALUES ('{\"a\":\"2024-01\"}'), ('{\"a\":2024}')");
+    Plan Found;
+    const Query Which = Query().Where("j.a", Op::kPrefix, "2024");
+    EXPECT_EQ(Text(m_Table.Explain(Which, Found)), "ok");
+    EXPECT_EQ(Found.strSql.find('+'), std::string::npos);
+    EXPECT_EQ(Ids(Which), "1");
+}
+
 TEST_F(EdgesTest, KeyThatIsNotTheRowidTakesNull) {
     Meet("CREATE TABLE item (id INT PRIMARY KEY)",
          R"({"key": "id", "member": {"id": {"cpptype": "int", "notNull": true}}})");

@@ -125,6 +125,18 @@ TEST_F(IndexTest, TableOfAnAttachedDatabaseGetsItsIndexThere) {
     EXPECT_EQ(Index({"name"}), strSql);
 }
 
+// In CREATE INDEX SQLite takes the name of no column for a text: one row would be all that such a
+// unique index lets in.
+TEST_F(IndexTest, ColumnThatIsNotThereIsNotIndexed) {
+    Run("ALTER TABLE doc DROP COLUMN name; ALTER TABLE doc DROP COLUMN map");
+    const std::string strRefused = "refused: cannot create an index on table \"doc\": ";
+    EXPECT_EQ(Index({"name"}, true), strRefused + "no such column: doc.name");
+    EXPECT_EQ(Index({"id", "map.a"}), strRefused + "no such column: doc.map");
+    EXPECT_EQ(Rows("SELECT name FROM sqlite_schema WHERE type = 'index'"), "");
+    Run("DROP TABLE doc");
+    EXPECT_EQ(Index({"id"}), strRefused + "no such table: doc");
+}
+
 TEST_F(IndexTest, NameOfAnIndexIsNoneOfSqlitesOwn) {
     Open(R"({"SQLite": {"key": "id", "member": {"id": {"cpptype": "int"},
                                                 "a": {"cpptype": "int"}}}})");
@@ -154,7 +166,7 @@ TEST_F(IndexTest, WhatCannotBeIndexed) {
               "ok");
     Run("DROP TABLE doc");
     EXPECT_EQ(Index({"size"}),
-              "refused: cannot create an index on table \"doc\": no such table: main.doc");
+              "refused: cannot create an index on table \"doc\": no such table: doc");
 }
 
 TEST_F(IndexTest, NoTermStandsTwice) {

@@ -103,6 +103,28 @@ TEST_F(LocksTest, FurtherTryWritesOnlyWhatWasGiven) {
     EXPECT_EQ(Written::kUpdated, eWritten);
 }
 
+// The statement that reads around the call sees a state that stays as it is, so a pause is in vain.
+TEST_F(LocksTest, ChangeBehindTheStateThatAForEachReadsDoesNotWait) {
+    Other("PRAGMA journal_mode = WAL; INSERT INTO task (id) VALUES (1), (2)");
+    Options How;
+    How.blCompatible = false;
+    Table Unrelated;
+    EXPECT_EQ("ok", Text(Unrelated.Open(m_pDb, "unrelated", Json::Value(), How)));
+    const FakeTime Time;
+    EXPECT_EQ("ok", Text(m_Table.ForEach(Query(), [&](const Json::Value&) {
+                  Other("INSERT INTO task (id) VALUES (3)");
+                  const Status Outcome = Unrelated.Create(Parse(R"({"a": 1})"));
+                  EXPECT_EQ(
+                      "locked: cannot save a record in table \"unrelated\": database is locked",
+                      Text(Outcome));
+                  EXPECT_EQ(Retry::kCall, Outcome.Advice());
+                  EXPECT_EQ(SQLITE_BUSY_SNAPSHOT, Outcome.SqliteCode());
+                  return false;
+              })));
+    EXPECT_EQ(std::vector<long>{}, Time.Pauses());
+    EXPECT_EQ("ok", Text(Unrelated.Create(Parse(R"({"a": 1})"))));
+}
+
 TEST_F(LocksTest, InsideOfATransactionThereIsNoWaiting) {
     EXPECT_EQ("ok", Create(1));
     Transaction All;

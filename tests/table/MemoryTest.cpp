@@ -335,6 +335,32 @@ TEST_F(TableMemoryTest, ValueThatEndsInBadAllocLeavesNullAndNoPartOfAnEarlierOne
     EXPECT_GT(nThrown, 0);
 }
 
+TEST_F(TableMemoryTest, RecordThatRanOutOfMemoryLeavesNothingToTheNext) {
+    int nThrown = 0;
+    bool blUntouched = false;
+    for (int nAt = 1; !blUntouched && nAt < 20000; ++nAt) {
+        Restore();
+        Loader Into;
+        EXPECT_EQ("ok", Text(Into.Start(m_Table)));
+        Into.SetInteger(Into.MemberIndex("id"), 3);
+        Into.SetText(Into.MemberIndex("name"), kLongName);
+        g_blMallocFailed = false;
+        g_nMallocsUntilFailure = nAt;
+        try {
+            End(Into.EndRecord());
+        } catch (const std::bad_alloc&) {
+            g_nMallocsUntilFailure = 0;
+            ++nThrown;
+            Into.SetInteger(Into.MemberIndex("id"), 4);
+            EXPECT_EQ("ok", Text(Into.EndRecord()));
+            EXPECT_EQ("4|NULL", Rows("SELECT id, name FROM task WHERE id > 2")) << nAt;
+        }
+        blUntouched = !g_blMallocFailed;
+    }
+    EXPECT_TRUE(blUntouched);
+    EXPECT_GT(nThrown, 0);
+}
+
 TEST_F(TableMemoryTest, WhatSpansCalls) {
     Try([&](Table& Into) {
         Transaction Outer;

@@ -403,6 +403,14 @@ TEST_F(QueryFindings, HundredThousandNestedGroupsAreAFinding) {
     }
 }
 
+TEST_F(QueryFindings, EmptyGroupInOneOfItsKindIsNotDropped) {
+    const char* szEmpty = "empty-group /where: a group holds no condition";
+    const Condition One("id", 1);
+    EXPECT_EQ(Sql(Query().Where(Condition::All({Condition::All({}), One}))), szEmpty);
+    EXPECT_EQ(Sql(Query().Where(Condition::Any({One, Condition::Any({})}))), szEmpty);
+    EXPECT_EQ(Sql(Query().Where(Condition::All({})).Where(One)), szEmpty);
+}
+
 TEST_F(QueryFindings, AThousandConditionsAndNoMore) {
     Json::Value jQuery;
     for (int i = 0; i < 1001; ++i) {

@@ -248,6 +248,52 @@ TEST_F(ReadTest, ValuesThatDoNotFitTheirTypesAreReadAsWhatTheyAre) {
         strAll);
 }
 
+// No double holds the first and the last one.
+TEST_F(ReadTest, WholeNumberThatIsNoDoubleIsReadExactly) {
+    Options How;
+    How.blCompatible = false;
+    How.strSqlCreate = "CREATE TABLE w (id INTEGER PRIMARY KEY, real)";
+    Open(R"({"w": {"key": "id", "member": {"id": {"cpptype": "int"},
+                                           "real": {"cpptype": "double"}}}})",
+         How);
+    Run("INSERT INTO w (real) VALUES (9007199254740993), (9007199254740994), (5),"
+        " (-9223372036854775807 - 1), (9223372036854775807)");
+    std::string strAll;
+    EXPECT_EQ("ok", Text(m_Table.ForEachRow(Query().Members({"real"}), [&](const Row& Now) {
+                  const bool blWhole = Now.KindOf(0) == Row::Kind::kInteger;
+                  strAll += blWhole ? std::to_string(Now.Integer(0)) + "; " : "real; ";
+                  return true;
+              })));
+    EXPECT_EQ("9007199254740993; real; real; real; 9223372036854775807; ", strAll);
+}
+
+TEST_F(ReadTest, KindOfABlobStaysWhenItIsRead) {
+    Run("UPDATE task SET name = x'6100ff' WHERE id = 1");
+    const auto fnRow = [](const Row& Now) {
+        EXPECT_EQ(Now.Text(0), std::string_view("a\0\xff", 3));
+        EXPECT_EQ(Now.KindOf(0), Row::Kind::kBlob);
+        return true;
+    };
+    EXPECT_EQ(Text(m_Table.ForEachRow(Query().Where("id", 1).Members({"name"}), fnRow)), "ok");
+}
+
+// SQLite has the texts of its conditions where the query has them.
+TEST_F(ReadTest, CallbackMayChangeTheQuery) {
+    const std::string strName(1000, 'x');
+    Run("UPDATE task SET name = '" + strName + "'");
+    Query Which = Query().Where("name", strName);
+    int nRows = 0;
+    const auto fnChange = [&](const auto&) {
+        Which = Query().Where("name", std::string(1000, 'y'));
+        return ++nRows < 10;
+    };
+    EXPECT_EQ(Text(m_Table.ForEach(Which, fnChange)), "ok");
+    EXPECT_EQ(nRows, 3);
+    Which = Query().Where("name", strName);
+    EXPECT_EQ(Text(m_Table.ForEachRow(Which, fnChange)), "ok");
+    EXPECT_EQ(nRows, 6);
+}
+
 TEST_F(ReadTest, ClosedTableIsMisuse) {
     Table Closed;
     Json::Value jOut;

@@ -136,6 +136,15 @@ TEST_F(SaveTest, UnknownMembersCanBeLeftOut) {
     How.blIgnoreUnknown = true;
     Open(kTasks, How);
     EXPECT_EQ(R"({"done":false,"id":1,"name":"a"})", Create(R"({"a": 1, "name": "a", "zzz": []})"));
+    EXPECT_EQ(Create(R"({"a": 1})"),
+              "refused: cannot save a record in table \"task\": the record has no members "
+              "[not-a-record ]");
+    EXPECT_EQ(Text(m_Table.Update(Query().Where("id", 1), Parse(R"({"a": 1})"))),
+              "refused: cannot update records of table \"task\": the record has no members "
+              "[not-a-record ]");
+    EXPECT_EQ(Save(R"({"a": 1})", OnDuplicate::kUpsert),
+              "refused: cannot save a record in table \"task\": the record has no members "
+              "[not-a-record ]");
 }
 
 TEST_F(SaveTest, DefaultThatDoesNotFitIsRefusedWhenItIsNeeded) {

@@ -116,6 +116,27 @@ TEST_F(SchemaTest, WhatFailsHalfwayChangesNothing) {
     EXPECT_EQ(nRows, 1);
 }
 
+TEST_F(SchemaTest, WhatFailsHalfwayInAnotherTableChangesNothing) {
+    Meet(
+        "CREATE TABLE log (half INT UNIQUE ON CONFLICT FAIL);"
+        "CREATE TABLE item (id INTEGER PRIMARY KEY, name TEXT, size INT);"
+        "INSERT INTO item VALUES (1, 'a', 1), (2, 'b', 2), (3, 'c', 3);"
+        "CREATE TRIGGER u AFTER UPDATE ON item BEGIN INSERT INTO log VALUES (new.id / 2); END");
+    EXPECT_EQ(
+        Text(m_Table.Update(Query().Where("id", Op::kGreater, 0), Parse(R"({"name": "x"})"))),
+        "duplicate: cannot update records of table \"item\": UNIQUE constraint failed: log.half");
+    EXPECT_EQ(Rows("SELECT * FROM item"), "1|a|1;2|b|2;3|c|3");
+    Meet(
+        "DROP TRIGGER u; DROP TABLE log; PRAGMA foreign_keys = ON;"
+        "CREATE TABLE part (id INT REFERENCES item(id) ON DELETE CASCADE);"
+        "INSERT INTO part VALUES (1), (2); CREATE TRIGGER d AFTER DELETE ON part WHEN old.id = 2"
+        " BEGIN SELECT RAISE(FAIL, 'two'); END");
+    EXPECT_EQ(Text(m_Table.RemoveAll()),
+              "constraint: cannot remove all records from table \"item\": two");
+    EXPECT_EQ(Rows("SELECT id FROM item"), "1;2;3");
+    EXPECT_EQ(Rows("SELECT id FROM part"), "1;2");
+}
+
 TEST_F(SchemaTest, BadRecordThatFailsHalfwayIsNotLoaded) {
     Meet(kFailing);
     LoadOptions How;

@@ -251,6 +251,17 @@ TEST_F(SyncTest, RowsThatClashChangeNothing) {
     EXPECT_EQ(sqlite3_get_autocommit(m_pDb), 1);
 }
 
+// A new row is not found by what was the rowid before and is another column now.
+TEST_F(SyncTest, MemberMayGetTheNameOfTheRowid) {
+    Run("CREATE TABLE item (id INTEGER PRIMARY KEY)");
+    EXPECT_EQ("ok", Text(m_Table.Open(m_pDb, "item", Parse(R"({"item": {"key": "id", "member": {
+        "id": {"cpptype": "int"}, "rowid": {"cpptype": "int"}}}})"))));
+    SyncReport Report;
+    EXPECT_EQ("ok", Text(m_Table.Sync(SyncMode::kChange, Report)));
+    EXPECT_EQ(R"({"id":1,"rowid":2})", Create(R"({"id": 1, "rowid": 2})"));
+    EXPECT_EQ(R"({"id":2,"rowid":1})", Create(R"({"id": 2, "rowid": 1})"));
+}
+
 TEST_F(SyncTest, KeyIsNotAdded) {
     Meet("CREATE TABLE item (a INTEGER); INSERT INTO item VALUES (1)",
          R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "int"}}})");

@@ -199,6 +199,21 @@ TEST_F(TypesTest, InfinityIsStoredAsAColumnAndRefusedInsideOfJson) {
         Text(m_Table.List(Which, jRecord)));
 }
 
+TEST_F(TypesTest, InfinityMayBeADefault) {
+    for (const double dDefault : {HUGE_VAL, -HUGE_VAL}) {
+        Json::Value jDefinition = Parse(R"({"t": {"key": "i", "member": {
+            "d": {"cpptype": "double"}, "i": {"cpptype": "int"}}}})");
+        jDefinition["t"]["member"]["d"]["cppDefaultValue"] = dDefault;
+        Options How;
+        How.blCreateTable = true;
+        Run("DROP TABLE IF EXISTS t");
+        EXPECT_EQ("ok", Text(m_Table.Open(m_pDb, "t", jDefinition, How)));
+        Run("INSERT INTO t (i) VALUES (1)");
+        EXPECT_EQ(dDefault < 0 ? "real|-Inf" : "real|Inf", Rows("SELECT typeof(d), d FROM t"));
+        m_Table = Table();
+    }
+}
+
 TEST_F(TypesTest, CompatibleRefusesWhatAnOldHandleCannotReadBack) {
     const Case kCases[] = {
         {"string", R"("a")", "text|a|\"a\""},
