@@ -156,13 +156,12 @@ bool JsonHandler::Bool(bool blValue) {
 
 bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strText(pText, nText);
-    const Value Given = JsonNumber(strText);
     if (!IsNested()) {
-        return Scalar(Given, "a number");
+        return Scalar(JsonNumber(strText), "a number");
     }
-    // What keeps the list or the object would round it.
+    // What keeps the list or the object would round it. Most numbers are shorter.
     std::uint64_t nWide = 0;
-    if (Given.eKind == Value::Kind::kWide && m_strReason.empty() &&
+    if (nText > 18 && m_strReason.empty() && JsonNumber(strText).eKind == Value::Kind::kWide &&
         std::from_chars(pText, pText + nText, nWide).ec != std::errc()) {
         Blame("in the member \"" + m_Names.Name(m_nMember) + "\" the number " +
               std::string(strText) + " has more than 64 bits; write it as a text");
