@@ -182,7 +182,7 @@ void Import::FindDefinition() {
         m_blKept ? m_jDefinition[m_strTable] : Json::Value(Json::objectValue);
     if (!jTable.isObject() || !jTable.get("member", Json::objectValue).isObject()) {
         Fail(kExitBadData, m_Call.Db() + ": the definition of table \"" + m_strTable +
-                               "\" is no object with an object \"member\"; give one by --def FILE");
+                               R"(" is no object with an object "member"; give one by --def FILE)");
     }
     if (m_blTableThere && !m_blKept) {
         Check(DefinitionOf(m_pDb.get(), m_strTable, m_jDefinition), m_Call.Db());
