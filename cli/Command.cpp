@@ -89,15 +89,6 @@ void AppendEscaped(std::string& strLine, std::string_view strBytes) {
     }
 }
 
-// What steers a terminal: the controls, and the marks that turn the direction of what follows.
-bool Steers(std::int32_t nCode) {
-    const bool blControl = nCode < ' ' || (nCode >= 0x7F && nCode < 0xA0);
-    const bool blMark = nCode == 0x61C || (nCode >= 0x200E && nCode <= 0x200F) ||
-                        (nCode >= 0x2028 && nCode <= 0x202E) ||
-                        (nCode >= 0x2066 && nCode <= 0x2069);
-    return blControl || blMark;
-}
-
 // Names and values in a message may come from anywhere, and must not steer the terminal.
 std::string OneLine(const std::string& strText) {
     std::string strLine;

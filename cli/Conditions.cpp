@@ -151,7 +151,9 @@ Json::Value ParseAssignments(const Table& Of, const std::vector<std::string>& ve
 Json::Value ParseKey(const Table& Of, const std::string& strWord) {
     const std::vector<std::string>& vecKey = Of.KeyMembers();
     if (vecKey.empty()) {
-        Fail(kExitUsage, "table \"" + Of.Name() + "\" has no key; select by --where");
+        Fail(kExitUsage,
+             "table \"" + Of.Name() +
+                 "\" has no key; select by --where, which list, update and delete have");
     }
     if (vecKey.size() == 1) {
         return TypedValue(Of, vecKey[0], strWord);
@@ -182,6 +184,18 @@ Query KeyQuery(const Table& Of, const Json::Value& jKey) {
     return Which;
 }
 
+void TakeMembers(const Context& Call, Query& Which) {
+    std::vector<std::string> vecNames = Call.Names("--members");
+    for (auto itName = vecNames.begin(); itName != vecNames.end(); ++itName) {
+        if (std::find(vecNames.begin(), itName, *itName) != itName) {
+            Fail(kExitUsage, "--members: \"" + *itName + "\" is there twice; name it once");
+        }
+    }
+    if (!vecNames.empty()) {
+        Which.Members(std::move(vecNames));
+    }
+}
+
 Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::string>& vecWords) {
     Json::Value jQuery(Json::objectValue);
     if (Call.Has("--where")) {
@@ -198,9 +212,7 @@ Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::st
     }
     Which.Limit(Call.Whole("--limit", -1));
     Which.Offset(Call.Whole("--offset", 0));
-    if (Call.Has("--members")) {
-        Which.Members(Call.Names("--members"));
-    }
+    TakeMembers(Call, Which);
     return Which;
 }
 

@@ -24,6 +24,8 @@ Json::Value ParseAssignments(const Table& Of, const std::vector<std::string>& ve
 Json::Value ParseKey(const Table& Of, const std::string& strWord);
 Query KeyQuery(const Table& Of, const Json::Value& jKey);
 
+void TakeMembers(const Context& Call, Query& Which);  // of --members, if it is given
+
 // member=value words and --where; with --sort, --limit, --offset and --members as far as the
 // subcommand has them.
 Query ParseQuery(const Context& Call, const Table& Of, const std::vector<std::string>& vecWords);

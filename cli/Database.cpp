@@ -32,8 +32,8 @@ bool HasWal(const std::string& strFile) {
 }
 
 // Reading it as it stands would miss what others write meanwhile, so that a copy is the way.
-void CheckFolderOfWal(const std::string& strFile) {
-    const std::string strFolder = FolderOf(strFile);
+void CheckFolderOfWal(const std::string& strFile, sqlite3* pDb) {
+    const std::string strFolder = FolderOf(sqlite3_db_filename(pDb, nullptr));
     if (access(strFolder.c_str(), W_OK) != 0 && HasWal(strFile)) {
         Fail(kExitIo, strFile +
                           ": it is in WAL mode, in which SQLite writes beside the file even "
@@ -49,7 +49,9 @@ bool IsEmpty(const std::string& strFile) {
 }
 
 // Under a lock that nobody has beside it: another program may be about to store something.
-void RemoveEmpty(sqlite3* pDb, const std::string& strFile) {
+void RemoveEmpty(sqlite3* pDb) {
+    // What a symbolic link leads to, which itself stays.
+    const std::string strFile = sqlite3_db_filename(pDb, nullptr);
     if (!IsEmpty(strFile)) {
         return;
     }
@@ -68,7 +70,8 @@ void CheckFile(const std::string& strFile, Access eAccess) {
     if (strFile.empty() || strFile == ":memory:" || strFile.compare(0, 5, "file:") == 0) {
         Fail(kExitUsage, "\"" + strFile + "\" names no file; name the file of a database");
     }
-    if (eAccess == Access::kCreate && access(strFile.c_str(), F_OK) != 0 && errno == ENOENT) {
+    struct stat Found {};
+    if (stat(strFile.c_str(), &Found) != 0 && errno == ENOENT && eAccess == Access::kCreate) {
         if (access(FolderOf(strFile).c_str(), W_OK | X_OK) != 0) {
             Fail(kExitIo, strFile + ": " + std::strerror(errno) + "; check the folder");
         }
@@ -80,6 +83,11 @@ void CheckFile(const std::string& strFile, Access eAccess) {
                           (nError == ENOENT ? "; check the name, or make it with init or insert"
                                             : "; check its permissions"));
     }
+    // What is written to a device is gone, and a pipe that nobody writes to is waited for.
+    if (!S_ISREG(Found.st_mode)) {
+        Fail(kExitIo,
+             strFile + ": it is a folder, a pipe or a device; name the file of a database");
+    }
 }
 
 int Look(sqlite3* pDb) {
@@ -89,8 +97,8 @@ int Look(sqlite3* pDb) {
 }  // namespace
 
 void CloseDatabase::operator()(sqlite3* pDb) const {
-    if (!strMade.empty()) {
-        RemoveEmpty(pDb, strMade);
+    if (blMade) {
+        RemoveEmpty(pDb);
     }
     sqlite3_close_v2(pDb);
 }
@@ -103,9 +111,9 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
     sqlite3* pDb = nullptr;
     const int nResult =
         sqlite3_open_v2(strFile.c_str(), &pDb, kFlags[static_cast<int>(eAccess)], nullptr);
-    Database pOwner(pDb, CloseDatabase{blNew ? strFile : ""});
+    Database pOwner(pDb, CloseDatabase{blNew && nResult == SQLITE_OK});
     if (nResult != SQLITE_OK) {
-        Fail(kExitIo, strFile + ": " + sqlite3_errstr(nResult) + "; is it a file?");
+        Fail(kExitIo, strFile + ": " + sqlite3_errstr(nResult) + "; check the folder");
     }
     sqlite3_extended_result_codes(pDb, 1);
     WaitForLocks(pDb, Call.WaitMs());
@@ -120,7 +128,7 @@ Database OpenDatabase(const Context& Call, Access eAccess) {
     if (nLooked != SQLITE_OK) {
         const int nPrimary = nLooked & 0xFF;
         if (nPrimary == SQLITE_CANTOPEN || nPrimary == SQLITE_READONLY) {
-            CheckFolderOfWal(strFile);
+            CheckFolderOfWal(strFile, pDb);
         }
         FailBySqlite(pDb, strFile);
     }

@@ -14,7 +14,7 @@ namespace VORN_JSON_DB::Cli {
 enum class Access { kRead, kChange, kCreate };  // kCreate makes the file, if there is none
 
 struct CloseDatabase {
-    std::string strMade;  // the file, if this call has made it: left empty, it goes again
+    bool blMade = false;  // the file is this call's: left empty, it goes again
 
     void operator()(sqlite3* pDb) const;
 };

@@ -2,6 +2,7 @@
 
 #include <sys/stat.h>
 
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 
@@ -13,6 +14,19 @@
 namespace VORN_JSON_DB::Cli {
 
 namespace {
+
+// A key of a form that SQLite cannot check is an error of it.
+std::string BrokenKeys(sqlite3* pDb) {
+    try {
+        const std::vector<std::string> vecFound = Texts(pDb, "PRAGMA foreign_key_check");
+        return vecFound.empty() ? "ok" : "broken in table \"" + vecFound[0] + "\"";
+    } catch (const Error& Failed) {
+        if (Failed.nExit != kExitUnexpected) {
+            throw;
+        }
+        return sqlite3_errmsg(pDb);
+    }
+}
 
 std::string Pragma(sqlite3* pDb, const std::string& strPragma) {
     const std::vector<std::string> vecFound = Texts(pDb, "PRAGMA " + strPragma);
@@ -106,10 +120,10 @@ int RunDoctor(Context& Call) {
     try {
         const Database pDb = OpenDatabase(Call, Access::kRead);
         const std::string strIntegrity = Pragma(pDb.get(), "integrity_check(1)");
-        const std::string strForeign = Pragma(pDb.get(), "foreign_key_check");
-        blSound = strIntegrity == "ok" && strForeign.empty();
+        const std::string strForeign = BrokenKeys(pDb.get());
+        blSound = strIntegrity == "ok" && strForeign == "ok";
         Add("integrity", strIntegrity);
-        Add("foreign keys", strForeign.empty() ? "ok" : "broken in table \"" + strForeign + "\"");
+        Add("foreign keys", strForeign);
         Add("journal mode", Pragma(pDb.get(), "journal_mode"));
         Add("encoding", Pragma(pDb.get(), "encoding"));
         Add("pages", Pragma(pDb.get(), "page_count"));
@@ -120,8 +134,11 @@ int RunDoctor(Context& Call) {
         }
         Locked = Failed;  // by whom is what is asked for
     }
-    AppendLocks(Call.Db(), "", jRows);
-    AppendLocks(Call.Db(), "-shm", jRows);
+    // SQLite has it beside the file that a symbolic link leads to.
+    std::error_code Failed;
+    const std::string strFile = std::filesystem::canonical(Call.Db(), Failed);
+    AppendLocks(strFile, "", jRows);
+    AppendLocks(strFile, "-shm", jRows);
     WriteObjects(Call, jRows, {"check", "result"});
     if (Locked.nExit != kExitFine) {
         throw Error(Locked);

@@ -92,7 +92,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     const std::vector<std::string> vecFound = Texts(
         pDb,
         "SELECT name FROM sqlite_master WHERE type = 'table' AND name = ?1 COLLATE NOCASE AND "
-        "sql NOT LIKE 'CREATE VIRTUAL %'",
+        "sql NOT LIKE 'CREATE VIRTUAL %' AND name NOT LIKE 'sqlite\\_%' ESCAPE '\\'",
         Call.TableName());
     if (vecFound.empty()) {
         Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() +
@@ -142,7 +142,7 @@ class LineReader {
     explicit LineReader(const std::string& strFile)
         : m_Lines(m_File, std::numeric_limits<std::size_t>::max()) {
         if (!m_File.Open(strFile)) {
-            FailToRead("check name and permissions");
+            FailToRead();
         }
     }
 
@@ -152,7 +152,7 @@ class LineReader {
             FailInterrupted();
         }
         if (m_File.Error() != 0) {
-            FailToRead("check the disk");
+            FailToRead();
         }
         m_strLine.assign(blThere ? m_Lines.Begin() : "", blThere ? m_Lines.Size() : 0);
         m_nLine += 1;
@@ -168,8 +168,9 @@ class LineReader {
     }
 
   private:
-    [[noreturn]] void FailToRead(const char* szHint) const {
-        Fail(kExitIo, m_File.Name() + ": " + std::strerror(m_File.Error()) + "; " + szHint);
+    [[noreturn]] void FailToRead() const {
+        Fail(kExitIo,
+             m_File.Name() + ": " + std::strerror(m_File.Error()) + "; check name and permissions");
     }
 
     ByteSource m_File;

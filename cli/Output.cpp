@@ -98,6 +98,23 @@ Cell CellOf(const Json::Value& jValue, bool blJson, std::string& strText) {
     return Value;
 }
 
+std::unique_ptr<RecordOutput> ChooseOutput(const Context& Call, bool blOne = false) {
+    const std::string strFormat = Call.Text("--format", Call.Json()          ? "json"
+                                                        : IsTerminal(stdout) ? "table"
+                                                                             : "json");
+    const bool blHeader = !Call.Has("--no-headers");
+    if (strFormat == "csv" || strFormat == "tsv") {
+        return SeparatedOutput(strFormat == "csv" ? ',' : '\t', blHeader);
+    }
+    if (strFormat == "table") {
+        return TableOutput(blHeader);
+    }
+    if (blOne) {
+        return JsonOutput(JsonShape::kOne);
+    }
+    return JsonOutput(strFormat == "jsonl" ? JsonShape::kLines : JsonShape::kList);
+}
+
 }  // namespace
 
 void AppendPlain(std::string& strOut, const Cell& Value) {
@@ -118,24 +135,8 @@ void AppendPlain(std::string& strOut, const Cell& Value) {
     }
 }
 
-std::unique_ptr<RecordOutput> ChooseOutput(const Context& Call, bool blOne) {
-    const std::string strFormat = Call.Text("--format", Call.Json()          ? "json"
-                                                        : IsTerminal(stdout) ? "table"
-                                                                             : "json");
-    const bool blHeader = !Call.Has("--no-headers");
-    if (strFormat == "csv" || strFormat == "tsv") {
-        return SeparatedOutput(strFormat == "csv" ? ',' : '\t', blHeader);
-    }
-    if (strFormat == "table") {
-        return TableOutput(blHeader);
-    }
-    if (blOne) {
-        return JsonOutput(JsonShape::kOne);
-    }
-    return JsonOutput(strFormat == "jsonl" ? JsonShape::kLines : JsonShape::kList);
-}
-
-std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, RecordOutput& To) {
+std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, bool blOne) {
+    const std::unique_ptr<RecordOutput> pTo = ChooseOutput(Call, blOne);
     if (Which.vecMembers.empty()) {
         Which.Members(MembersInColumnOrder(From));
     }
@@ -147,19 +148,19 @@ std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, RecordO
     const Status Read = From.ForEachRow(Which, [&](const Row& Found) {
         if (nRecords++ == 0) {
             vecPlaces = PlacesIn(Found, Which.vecMembers);
-            To.Begin(vecColumns);
+            pTo->Begin(vecColumns);
         }
         for (std::size_t nColumn = 0; nColumn < vecCells.size(); ++nColumn) {
             vecCells[nColumn] = CellOf(Found, vecPlaces[nColumn]);
         }
-        To.Record(vecCells);
+        pTo->Record(vecCells);
         return true;
     });
     Check(Read, Call.Db());
-    if (nRecords == 0) {
-        To.Begin(vecColumns);
+    if (nRecords == 0 && !blOne) {
+        pTo->Begin(vecColumns);
     }
-    To.End();
+    pTo->End();
     return nRecords;
 }
 

@@ -39,11 +39,9 @@ std::unique_ptr<RecordOutput> JsonOutput(JsonShape eShape);
 std::unique_ptr<RecordOutput> SeparatedOutput(char cBetween, bool blHeader);
 std::unique_ptr<RecordOutput> TableOutput(bool blHeader);  // cut to the width of a terminal
 
-// What --format or --json asks for; else a table on a terminal, and JSON.
-std::unique_ptr<RecordOutput> ChooseOutput(const Context& Call, bool blOne = false);
-
-// Writes what a query selects. Returns the number of records.
-std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, RecordOutput& To);
+// Writes what a query selects, as --format or --json asks for; else as a table to a terminal, and
+// as JSON. Returns the number of records. blOne: there is one, or nothing is written.
+std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, bool blOne);
 
 // Writes a list of flat objects, such as findings, with these members as columns.
 void WriteObjects(const Context& Call, const Json::Value& jObjects,

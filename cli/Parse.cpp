@@ -17,7 +17,8 @@ constexpr char kMark = '\x01';
 std::string Marked(const std::string& strWord) {
     const bool blNumber = strWord.size() > 1 && strWord[0] == '-' &&
                           std::strchr("0123456789.", strWord[1]) != nullptr;
-    return blNumber || strWord.compare(0, 1, "[") == 0 ? kMark + strWord : strWord;
+    const bool blOther = !strWord.empty() && (strWord[0] == '[' || strWord[0] == kMark);
+    return blNumber || blOther ? kMark + strWord : strWord;
 }
 
 std::vector<std::string> Unmarked(std::vector<std::string> vecWords) {
@@ -119,11 +120,13 @@ void CheckOptionName(const std::string& strWord, const Command& Of) {
     }
     const std::string strName = strWord.substr(0, strWord.find('='));
     // The rest of a name is forgotten more often than it is mistyped.
+    const bool blLong = strName.compare(0, 2, "--") == 0;
     const auto itBegun = std::find_if(vecNames.begin(), vecNames.end(), [&](const auto& strEach) {
         return strName.size() > 3 && strEach.compare(0, strName.size(), strName) == 0;
     });
     const std::string strHint = itBegun != vecNames.end() ? "; did you mean \"" + *itBegun + "\"?"
-                                                          : NearestHint(strName, vecNames);
+                                : blLong                  ? NearestHint(strName, vecNames)
+                                                          : "";
     FailUsage("unknown option \"" + strName + "\" of " + Of.szName,
               strHint.empty() ? std::string("; see vornjsondb ") + Of.szName +
                                     " --help, and put -- before words that begin with a dash"
@@ -245,7 +248,9 @@ bool Parse(int nArguments, char** pszArguments, Context& Call) {
     }
     Call.pCommand = TakeCommand(vecWords);
     const auto Asked = [&vecWords](const char* szLong, const char* szShort) {
-        return !vecWords.empty() && (vecWords[0] == szLong || vecWords[0] == szShort);
+        return std::any_of(vecWords.begin(), vecWords.end(), [&](const std::string& strWord) {
+            return strWord == szLong || strWord == szShort;
+        });
     };
     if (Call.pCommand == nullptr && Asked("--version", "-V")) {
         Put("vornjsondb " VORNJSONDB_VERSION " (SQLite " + std::string(sqlite3_libversion()) +
@@ -257,7 +262,7 @@ bool Parse(int nArguments, char** pszArguments, Context& Call) {
         return false;
     }
     if (Call.pCommand == nullptr) {
-        FailUsage(vecWords.empty()
+        FailUsage(vecWords.empty() || FindOption(SharedOptions(), vecWords[0]) != nullptr
                       ? "there is no subcommand"
                       : "there is no subcommand, and no option \"" + vecWords[0] + "\"",
                   "");

@@ -10,23 +10,18 @@ namespace VORN_JSON_DB::Cli {
 int RunList(Context& Call) {
     OpenTable Open(Call, Access::kRead);
     const Query Which = ParseQuery(Call, Open.Records, Call.WordsFrom(2));
-    WriteRecords(Call, Open.Records, Which, *ChooseOutput(Call));
+    WriteRecords(Call, Open.Records, Which, false);
     return kExitFine;
 }
 
 int RunGet(Context& Call) {
     OpenTable Open(Call, Access::kRead);
     Query Which = KeyQuery(Open.Records, ParseKey(Open.Records, Call.vecWords[2]));
-    if (Call.Has("--members")) {
-        Which.Members(Call.Names("--members"));
-    }
-    bool blThere = false;
-    Check(Open.Records.Exists(Which, blThere), Call.Db());
-    if (!blThere) {
+    TakeMembers(Call, Which);
+    if (WriteRecords(Call, Open.Records, Which, true) == 0) {
         Fail(kExitNotFound, Call.Db() + ": table \"" + Call.TableName() +
                                 "\" has no record with the key \"" + Call.vecWords[2] + "\"");
     }
-    WriteRecords(Call, Open.Records, Which, *ChooseOutput(Call, true));
     return kExitFine;
 }
 

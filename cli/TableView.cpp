@@ -8,6 +8,7 @@
 
 #include "Output.h"
 #include "Terminal.h"
+#include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -24,13 +25,6 @@ struct Shown {
     int nWidth = 0;
     bool blRight = false;
 };
-
-// What would move the cursor or turn the direction of writing.
-bool IsHarmful(utf8proc_int32_t nCode) {
-    return utf8proc_category(nCode) == UTF8PROC_CATEGORY_CC ||
-           (nCode >= 0x202A && nCode <= 0x202E) || (nCode >= 0x2066 && nCode <= 0x2069) ||
-           nCode == 0x2028 || nCode == 0x2029;
-}
 
 std::string Escaped(utf8proc_int32_t nCode) {
     if (nCode == '\n' || nCode == '\t' || nCode == '\r') {
@@ -90,7 +84,7 @@ class Cutter {
     }
 
     void AddCharacter(utf8proc_int32_t nCode) {
-        if (IsHarmful(nCode)) {
+        if (Steers(nCode)) {
             const std::string strEscape = Escaped(nCode);
             m_All.strText += strEscape;
             m_All.nWidth += static_cast<int>(strEscape.size());

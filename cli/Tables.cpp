@@ -40,6 +40,9 @@ void CheckNewName(const std::string& strTable) {
         Fail(kExitUsage,
              "\"" + strTable + "\": names that begin with sqlite_ are SQLite's own; take another");
     }
+    if (SameName(strTable, "vornjsondb_definition")) {
+        Fail(kExitUsage, "\"" + strTable + "\": definitions are kept there; take another name");
+    }
 }
 
 std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {

@@ -72,9 +72,8 @@ size_t Columns(std::string_view strText, char cDelimiter) {
 }
 
 char GuessDelimiter(std::string_view strText) {
-    // Spreadsheets may say it in a line of its own.
-    if (strText.substr(0, 4) == "sep=" && strText.find_first_of("\r\n") == 5) {
-        return strText[4];
+    if (HasDelimiterLine(strText)) {
+        return strText[kDelimiterLine - 1];
     }
     size_t nMost = 1;
     char cBest = ',';
@@ -100,6 +99,11 @@ char GuessDelimiter(std::string_view strText) {
 }
 
 }  // namespace
+
+bool HasDelimiterLine(std::string_view strFirst) {
+    const std::string_view strText = WithoutMark(strFirst);
+    return strText.substr(0, 4) == "sep=" && strText.find_first_of("\r\n") == kDelimiterLine;
+}
 
 ReadOptions GuessFormat(std::string_view strFirst) {
     const std::string_view strText = WithoutMark(strFirst);

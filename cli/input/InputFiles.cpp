@@ -71,7 +71,7 @@ void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& 
 InputFiles::InputFiles(const Context& Call) {
     const std::vector<std::string> vecFiles = Call.WordsFrom(2);
     // Each would get some of its bytes.
-    if (std::count(vecFiles.begin(), vecFiles.end(), "-") > 1) {
+    if (std::count(vecFiles.begin(), vecFiles.end(), "-") + (Call.Text("--def") == "-") > 1) {
         Fail(kExitUsage, "standard input is named more than once; give - once");
     }
     for (const std::string& strPath : vecFiles) {

@@ -88,6 +88,7 @@ class Import {
     void Prepare();
     void CheckKey();
     void Load();
+    void BeginBatch();
     bool AfterRecord();
     void CommitBatch();
     void NoteNulls();
@@ -177,6 +178,12 @@ void Import::FindDefinition() {
     m_jDefinition = CurrentDefinition(m_Call, m_pDb.get(), m_strTable);
     m_blKept = !m_jDefinition.isNull();
     m_blToKeep = m_Call.Has("--def");
+    const Json::Value jTable =
+        m_blKept ? m_jDefinition[m_strTable] : Json::Value(Json::objectValue);
+    if (!jTable.isObject() || !jTable.get("member", Json::objectValue).isObject()) {
+        Fail(kExitBadData, m_Call.Db() + ": the definition of table \"" + m_strTable +
+                               R"(" is no object with an object "member"; give one by --def FILE)");
+    }
     if (m_blTableThere && !m_blKept) {
         Check(DefinitionOf(m_pDb.get(), m_strTable, m_jDefinition), m_Call.Db());
     }
@@ -340,10 +347,10 @@ void Import::Prepare() {
     m_Others.emplace(m_pDb.get(), m_strTable);
 }
 
-// SQLite finds a record by its key only where no two can have the same.
+// SQLite finds a record by its key only where no two can have the same, and else looks at all.
 void Import::CheckKey() {
     FindingList vecFindings;
-    if (m_eOnDuplicate == OnDuplicate::kSkip || m_eOnDuplicate == OnDuplicate::kReplace) {
+    if (m_eOnDuplicate != OnDuplicate::kStop) {
         Check(m_Table.Lint(vecFindings), m_Call.Db());
     }
     std::string strWords;
@@ -352,9 +359,13 @@ void Import::CheckKey() {
     }
     for (const Finding& Found : vecFindings) {
         if (std::string_view("key-not-unique") == Found.szCode) {
-            Fail(kExitBadData, m_Call.Db() + ": " + Found.strMessage +
-                                   "; make it so by vornjsondb index " + m_Call.Db() + " " +
-                                   m_strTable + strWords + " --unique");
+            const std::string strLine = m_Call.Db() + ": " + Found.strMessage +
+                                        "; make it so by vornjsondb index " + m_Call.Db() + " " +
+                                        m_strTable + strWords + " --unique";
+            if (m_eOnDuplicate != OnDuplicate::kUpsert) {
+                Fail(kExitBadData, strLine);
+            }
+            m_Call.Say(strLine + ", which spares looking at all records for each");
         }
     }
 }
@@ -377,9 +388,13 @@ void Import::Load() {
     }
     Prepare();
     const bool blMode = m_eOnDuplicate != OnDuplicate::kStop;
-    m_pSink = std::make_unique<LoaderSink>(m_Table, m_Into, m_pErrors.get(),
-                                           m_blGuessed ? &m_AllSeen : nullptr, blMode,
-                                           [this] { return AfterRecord(); });
+    m_pSink = std::make_unique<LoaderSink>(
+        m_Table, m_Into, m_pErrors.get(), m_blGuessed ? &m_AllSeen : nullptr, blMode,
+        [this] { BeginBatch(); }, [this] { return AfterRecord(); });
+    // Nobody is kept from writing while the first record is waited for.
+    if (m_nBatch > 0 && m_blTableThere && !m_blToKeep) {
+        CommitBatch();
+    }
     m_pProgress = std::make_unique<Progress>("inserting", nBytes, m_Call.Quiet());
     const auto fnBegin = [this](const std::string& strName, bool blCells) {
         m_pSink->BeginInput(strName, blCells);
@@ -394,13 +409,19 @@ void Import::Load() {
     m_pProgress.reset();
 }
 
+// No sooner than there is something to store: a pipe may be silent for long.
+void Import::BeginBatch() {
+    if (!m_All.IsOpen()) {
+        BeginChange(m_Call, m_pDb.get(), m_All);
+        m_Others.emplace(m_pDb.get(), m_strTable);
+    }
+}
+
 bool Import::AfterRecord() {
     const std::int64_t nRecords = m_Into.Counts().nRecords;
     m_pProgress->Tick(nRecords, m_Files.BytesRead());
     if (m_nBatch > 0 && nRecords - m_nStored >= m_nBatch) {
         CommitBatch();
-        BeginChange(m_Call, m_pDb.get(), m_All);
-        m_Others.emplace(m_pDb.get(), m_strTable);
     }
     return !Interrupt::Came();
 }
@@ -409,14 +430,17 @@ void Import::CommitBatch() {
     if (m_pErrors) {
         m_pErrors->Write();
     }
-    NoteNulls();
-    CheckInPlace(m_Call, m_pDb.get());
-    const std::int64_t nInserted = m_Into.Counts().nInserted;
-    m_nGone += m_Others->Gone(nInserted - m_nInserted);
-    m_nInserted = nInserted;
-    m_Others.reset();
-    Check(m_Into.Commit(), m_Call.Db());
-    Check(m_All.Commit(), m_Call.Db());
+    // It is not where all were bad.
+    if (m_All.IsOpen()) {
+        NoteNulls();
+        CheckInPlace(m_Call, m_pDb.get());
+        const std::int64_t nInserted = m_Into.Counts().nInserted;
+        m_nGone += m_Others->Gone(nInserted - m_nInserted);
+        m_nInserted = nInserted;
+        m_Others.reset();
+        Check(m_Into.Commit(), m_Call.Db());
+        Check(m_All.Commit(), m_Call.Db());
+    }
     m_nStored = m_Into.Counts().nRecords;
 }
 

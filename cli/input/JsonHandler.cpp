@@ -1,5 +1,6 @@
 #include "JsonHandler.h"
 
+#include <charconv>
 #include <utility>
 
 #include "JsonText.h"
@@ -155,11 +156,18 @@ bool JsonHandler::Bool(bool blValue) {
 
 bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) {
     const std::string_view strText(pText, nText);
-    if (IsNested()) {
-        AppendToJson(strText);
-        return true;
+    if (!IsNested()) {
+        return Scalar(JsonNumber(strText), "a number");
     }
-    return Scalar(JsonNumber(strText), "a number");
+    // What keeps the list or the object would round it. Most numbers are shorter.
+    std::uint64_t nWide = 0;
+    if (nText > 18 && m_strReason.empty() && JsonNumber(strText).eKind == Value::Kind::kWide &&
+        std::from_chars(pText, pText + nText, nWide).ec != std::errc()) {
+        Blame("in the member \"" + m_Names.Name(m_nMember) + "\" the number " +
+              std::string(strText) + " has more than 64 bits; write it as a text");
+    }
+    AppendToJson(strText);
+    return true;
 }
 
 bool JsonHandler::String(const char* pText, rapidjson::SizeType nText, bool) {
@@ -191,12 +199,6 @@ bool JsonHandler::KeyBesideList(std::string_view strName) {
     return false;
 }
 
-bool JsonHandler::KeyTooMany() {
-    Blame("the records have more different members than the " + std::to_string(MemberNames::kMost) +
-          " that a table can have columns");
-    return false;
-}
-
 bool JsonHandler::KeyTwice(std::string_view strName) {
     Blame("the member \"" + std::string(strName) + "\" is there twice");
     return true;
@@ -225,7 +227,8 @@ bool JsonHandler::Key(const char* pText, rapidjson::SizeType nText, bool) {
     bool blTwice = false;
     m_nMember = m_Names.Find(strName, blTwice);
     if (m_nMember == MemberNames::kTooMany) {
-        return KeyTooMany();
+        Blame(MemberNames::TooMany());
+        return false;
     }
     return !blTwice || KeyTwice(strName);
 }

@@ -83,7 +83,6 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool CheckEscapes(std::string_view strText);
     void NestedKey(std::string_view strName);
     bool KeyBesideList(std::string_view strName);
-    bool KeyTooMany();
     bool KeyTwice(std::string_view strName);
     void SeparateInJson();
     void AppendToJson(std::string_view strText);

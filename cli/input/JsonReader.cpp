@@ -107,9 +107,13 @@ void BlockStream::Refill() {
     m_acBlock[nRead] = '\0';
 }
 
+// They may be more than a record may have.
 void SkipBlanks(BlockStream& Stream) {
-    rapidjson::SkipWhitespace(Stream);
     Stream.BetweenRecords();
+    while (std::string_view(" \t\r\n").find(Stream.Peek()) != std::string_view::npos) {
+        Stream.Take();
+        Stream.BetweenRecords();
+    }
 }
 
 std::string Problem(const rapidjson::ParseResult& Parsed, const BlockStream& Stream,

@@ -37,12 +37,13 @@ std::string At(const std::string& strInput, const Place& Where) {
 }  // namespace
 
 LoaderSink::LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, Inference* pSeen,
-                       bool blMode, std::function<bool()> fnAfter)
+                       bool blMode, std::function<void()> fnBefore, std::function<bool()> fnAfter)
     : m_Of(Of),
       m_Into(Into),
       m_pErrors(pErrors),
       m_pSeen(pSeen),
       m_blMode(blMode),
+      m_fnBefore(std::move(fnBefore)),
       m_fnAfter(std::move(fnAfter)),
       m_vecNumberColumns(NumberColumns(Of.Connection(), Of.Name())),
       m_vecNulls(Of.Members().size()) {}
@@ -215,6 +216,7 @@ bool LoaderSink::EndRecord(const Place& Where) {
                              (strNearest.empty() ? "; --add-members adds it"
                                                  : strNearest + " or add it by --add-members"));
     }
+    m_fnBefore();
     const Status Outcome = m_Into.EndRecord();
     if (!Outcome.Ok() && (m_pErrors == nullptr || !IsOfRecord(Outcome, m_Of.Connection()))) {
         const bool blDuplicate = Outcome.Code() == StatusCode::kDuplicate;

@@ -19,10 +19,10 @@ namespace VORN_JSON_DB::Cli {
 class LoaderSink : public Sink {
   public:
     // The first bad record is an Error, unless pErrors takes it. pSeen is told of all records.
-    // fnAfter is called after each record and says whether to go on.
+    // fnBefore is called before a record is stored, fnAfter after each, and says whether to go on.
     // blMode: the call says what to do with a key that is there.
     LoaderSink(const Table& Of, Loader& Into, ErrorFile* pErrors, Inference* pSeen, bool blMode,
-               std::function<bool()> fnAfter);
+               std::function<void()> fnBefore, std::function<bool()> fnAfter);
 
     void BeginInput(const std::string& strName, bool blCells);
 
@@ -56,6 +56,7 @@ class LoaderSink : public Sink {
     ErrorFile* const m_pErrors;
     Inference* const m_pSeen;
     const bool m_blMode;
+    const std::function<void()> m_fnBefore;
     const std::function<bool()> m_fnAfter;
     std::string m_strInput;
     std::string m_strBytes;  // of a value that came encoded

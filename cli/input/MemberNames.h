@@ -21,6 +21,10 @@ class MemberNames {
     // More names than any table has columns are no records, and would fill the memory.
     static constexpr size_t kMost = 32767;
     static constexpr size_t kTooMany = static_cast<size_t>(-1);
+    static std::string TooMany() {
+        return "the records have more different members than the " + std::to_string(kMost) +
+               " that a table can have columns";
+    }
 
     void BeginRecord() {
         ++m_nRecord;

@@ -55,6 +55,10 @@ ReadOutcome ReadSeparated(ByteSource& From, const ReadOptions& How, Sink& To);
 // What the first bytes look like.
 ReadOptions GuessFormat(std::string_view strFirst);
 
+// Whether they are a line "sep=;", with which a spreadsheet is told the delimiter.
+bool HasDelimiterLine(std::string_view strFirst);
+constexpr std::size_t kDelimiterLine = 5;  // its length
+
 // "JSON Lines", "CSV with ;"
 std::string FormatText(const ReadOptions& How);
 

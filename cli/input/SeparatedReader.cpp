@@ -2,9 +2,9 @@
 
 #include <csv.h>
 
-#include <algorithm>
 #include <cstring>
 #include <exception>
+#include <map>
 #include <memory>
 #include <utility>
 #include <vector>
@@ -63,7 +63,6 @@ class SeparatedReader {
     void Fail(std::int64_t nLine, std::string strReason);
     void Cell(const char* pCell, size_t nCell);
     void Row();
-    bool IsDelimiterLine() const;
     void Header();
     void Name(const std::string& strName);
     void Blame(std::string strReason);
@@ -128,6 +127,9 @@ void SeparatedReader::Cell(const char* pCell, size_t nCell) {
     const std::string_view strCell(pCell == nullptr ? "" : pCell, nCell);
     const size_t nColumn = m_nCell++;
     const size_t nWrong = FindNoUtf8(strCell);
+    if (!m_blHeaderRead && nColumn == MemberNames::kMost) {
+        return Fail(m_nRowLine, MemberNames::TooMany());
+    }
     if (!m_blHeaderRead && m_How.blHeader) {
         if (nWrong != std::string_view::npos) {
             Fail(m_nRowLine, "the name of column " + std::to_string(m_nCell) + ": " +
@@ -153,20 +155,12 @@ void SeparatedReader::Cell(const char* pCell, size_t nCell) {
     m_To.Take(nColumn, Given);
 }
 
-// "sep=;", with which a spreadsheet is told the delimiter.
-bool SeparatedReader::IsDelimiterLine() const {
-    return m_nRowLine == 1 && m_vecNames.size() == 2 && m_vecNames[0] == "sep=" &&
-           m_vecNames[1].empty();
-}
-
 void SeparatedReader::Header() {
     std::vector<std::string> vecNames;
     vecNames.swap(m_vecNames);
-    std::vector<std::string> vecLower;
+    std::map<std::string, size_t> mapLower;
     for (size_t i = 0; i < vecNames.size(); ++i) {
-        vecLower.push_back(LowerCase(vecNames[i]));
-        const auto itFirst = std::find(vecLower.begin(), vecLower.end(), vecLower.back());
-        const auto nFirst = static_cast<size_t>(itFirst - vecLower.begin());
+        const size_t nFirst = mapLower.emplace(LowerCase(vecNames[i]), i).first->second;
         if (vecNames[i].empty()) {
             Fail(m_nRowLine, "column " + std::to_string(i + 1) +
                                  " has no name; --no-header is for input without names");
@@ -187,10 +181,6 @@ void SeparatedReader::Header() {
 void SeparatedReader::Row() {
     const size_t nCells = std::exchange(m_nCell, 0);
     const bool blHeader = !m_blHeaderRead && m_How.blHeader;
-    if (blHeader && IsDelimiterLine()) {
-        m_vecNames.clear();
-        return;
-    }
     m_blHeaderRead = true;
     if (blHeader) {
         Header();
@@ -270,6 +260,10 @@ bool SeparatedReader::FeedBlock(const char* pBlock, size_t nBlock) {
 }
 
 ReadOutcome SeparatedReader::Run() {
+    char szDelimiterLine[kDelimiterLine];
+    if (HasDelimiterLine(m_From.Look())) {
+        m_From.Read(szDelimiterLine, kDelimiterLine);  // and an empty line is left, which is none
+    }
     // A carriage return waits for the line feed that may come with the next block.
     size_t nWaiting = 0;
     const auto pBlock = std::make_unique<char[]>(1 + ByteSource::kBlock);

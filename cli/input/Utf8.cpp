@@ -74,6 +74,14 @@ size_t FindNoUtf8(std::string_view strBytes) {
     return FindOther(strBytes, 0);
 }
 
+bool Steers(std::int32_t nCode) {
+    const bool blControl = nCode < ' ' || (nCode >= 0x7F && nCode < 0xA0);
+    const bool blMark = nCode == 0x61C || (nCode >= 0x200E && nCode <= 0x200F) ||
+                        (nCode >= 0x2028 && nCode <= 0x202E) ||
+                        (nCode >= 0x2066 && nCode <= 0x2069);
+    return blControl || blMark;
+}
+
 std::string WithoutBadBytes(std::string_view strBytes) {
     std::string strText;
     for (size_t i = FindNoUtf8(strBytes); i != std::string_view::npos; i = FindNoUtf8(strBytes)) {

@@ -19,6 +19,9 @@ bool IsUtf8WithoutControls(std::string_view strBytes);
 // The length of the character that the bytes begin with; 1, and a negative code, where it is none.
 size_t ReadCharacter(std::string_view strBytes, std::int32_t& nCode);
 
+// What steers a terminal: the controls, and the marks that turn the direction of what follows.
+bool Steers(std::int32_t nCode);
+
 // With U+FFFD for each byte that is no part of UTF-8.
 std::string WithoutBadBytes(std::string_view strBytes);
 

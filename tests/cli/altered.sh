@@ -142,6 +142,16 @@ prod,warning,left-over,/prod,\"${left//\"/\"\"}\",$remedy" '' -- lint gone.db --
 # One that is no JSON is named, with the way out.
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (old.json: JSON)' -- insert bad.db t old.json --key id
 "$VORNJSONDB" schema bad.db t --json >t.def
+for definition in 5 null '{"member": 5}'; do
+    echo "{\"t\": $definition}" >odd.def
+    for options in '' --dry-run '--add-members --dry-run' '--key id --upsert'; do
+        # shellcheck disable=SC2086  # several words
+        found=$("$VORNJSONDB" insert bad.db t old.json --def odd.def $options 2>&1)
+        same "exit with the definition $definition and $options" $? 3
+        same "said with the definition $definition and $options" "${found% (nothing is stored)}" \
+            'error: bad.db: the definition of table "t" is no object with an object "member"; give one by --def FILE'
+    done
+done
 sqlite3 bad.db "UPDATE vornjsondb_definition SET definition = '{'"
 expect 3 '' 'error: bad.db: the kept definition of "t": Line 1, Column 2: Missing '"'}'"' or object member name; it must be JSON; give one by --def FILE, which vornjsondb sync keeps in its place' \
     -- list bad.db t

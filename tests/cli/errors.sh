@@ -53,6 +53,16 @@ expect 7 '' 'error: text: file is not a database; name an SQLite database first'
 
 expect 2 '' 'error: unknown option "--form" of list; did you mean "--format"?' -- list shop.db product --form csv
 expect 2 '' 'error: there is no subcommand, and no option "--list"; see vornjsondb --help' -- --list
+expect 2 '' 'error: there is no subcommand; see vornjsondb --help' -- --json
+same 'other options beside --version' "$("$VORNJSONDB" --json --version)" "$("$VORNJSONDB" --version)"
+same 'other options beside --help' "$("$VORNJSONDB" --quiet -h)" "$("$VORNJSONDB" --help)"
+expect 2 '' 'error: unknown option "-x.jsonl" of insert; see vornjsondb insert --help, and put -- before words that begin with a dash' \
+    -- insert shop.db product -x.jsonl
+expect 5 '' 'error: shop.db: table "heap" has no record with the key "\x01[a]"' -- get shop.db heap $'\001[a]'
+expect 2 '' 'error: --members: "id" is there twice; name it once' -- list shop.db product --members id,name,id
+expect 2 '' 'error: --members: "id" is there twice; name it once' -- get shop.db product 1 --members id --members id
+expect 2 '' 'error: "Vornjsondb_definition": definitions are kept there; take another name' -- \
+    init new.db Vornjsondb_definition a:int
 expect 2 '' 'error: --sql lacks its value; see vornjsondb explain --help' -- explain shop.db product --sql
 expect 0 '[{"id":1,"price":5.0}]' '' -- list shop.db product id=1 --members 'id, price' --sort 'id, -price'
 expect 2 '' 'error: --sort: no member "price desc"; write -price' -- list shop.db product --sort 'price desc'
@@ -131,6 +141,7 @@ expect 2 '' 'error: key "{"product": 1}": it must be an object with just these m
 expect 2 '' 'error: key "x": it must be an object with just these members: product, country' -- \
     get shop.db price x
 sqlite3 shop.db 'DROP TABLE heap; CREATE TABLE heap (a)'
+expect 2 '' 'error: table "heap" has no key; select by --where, which list, update and delete have' -- get shop.db heap 1
 expect 3 '' 'error: shop.db: cannot save a record in table "heap": the table has no key that tells records apart; name the key in a definition, given by --def; or insert --key MEMBER' \
     -- upsert shop.db heap a=1
 echo '[{"ID": 9, "size": 3}]' >near.json

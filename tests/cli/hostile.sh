@@ -81,6 +81,11 @@ good '{"a":5e-324}
 {"a":1.7976931348623157e+308}
 {"a":0.0}
 {"a":0.1}' '{"a": 5e-324}\n{"a": 1.7976931348623157e308}\n{"a": -0}\n{"a": 1.0e-1}\n'
+good '{"a":[18446744073709551615,-9223372036854775808]}' '[{"a": [18446744073709551615, -9223372036854775808]}]'
+for number in 18446744073709551616 -9223372036854775809; do
+    bad 1 "in the member \"a\" the number $number has more than 64 bits; write it as a text" "[{\"a\": {\"x\": $number}}]"
+done
+bad 1 'the record is a list, not an object' '[[[18446744073709551616]]]'
 printf '{"a": 18446744073709551616}\n{"a": 5}\n' >in
 expect 0 '' 'member "a": numbers beyond 64 bits are kept as texts
 member "a": values of several kinds
@@ -112,6 +117,20 @@ good "{\"a\":$(repeat '[' 999)$(repeat ']' 999)}" "{\"a\": $(repeat '[' 999)$(re
     head -c 17000000 /dev/zero | tr '\0' x
 ) >in
 expect 3 '' 'error: in:1: record 1 is longer than 16777216 bytes; correct the input (nothing is stored)' -- insert bad.db t in
+# Blanks between records are none of them.
+(
+    printf '{"a": 1}\n{'
+    head -c 17000000 /dev/zero | tr '\0' ' '
+    echo '"a": 2}'
+) >in
+expect 3 '' 'error: in:2: record 2 is longer than 16777216 bytes; correct the input (nothing is stored)' -- insert bad.db t in --format json
+(
+    printf '{"a": 1} {"a": 3}'
+    head -c 17000000 /dev/zero | tr '\0' ' '
+    echo '{"a": 2}'
+    head -c 17000000 /dev/zero | tr '\0' '\n'
+) >in
+expect 0 '' '3 inserted, 0 replaced, 0 skipped, 0 failed (in: JSON)' -- insert good.db blanks in --format json
 for text in '' '  \n ' '[]'; do
     printf '%b' "$text" >in
     "$VORNJSONDB" insert bad.db t in 2>err
@@ -155,6 +174,14 @@ expect 3 '' 'error: the records have 2001 different members, and a table has at 
 seq -s , -f 'm%g' 2000 >in && seq -s , 2000 >>in
 expect 0 '' '' -- insert good.db wide in --quiet
 expect 0 1 '' -- count good.db wide m2000=2000
+(
+    seq -s , -f 'm%.0f' 200000
+    seq -s , 200000
+) >in
+for option in --format=csv --no-header; do
+    expect 3 '' 'error: in:1: the records have more different members than the 32767 that a table can have columns; correct the input (nothing is stored)' \
+        -- insert bad.db t in $option
+done
 broken 1 'the records have more different members than the 32767 that a table can have columns' \
     "[{\"a\": 1$(seq -s '' -f ', "m%g": 1' 40000)}]"
 

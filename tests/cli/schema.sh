@@ -52,6 +52,17 @@ encoding      UTF-8
 pages         5
 free pages    0' '' -- doctor shop.db
 
+# A key of a form that cannot be checked is what doctor finds.
+sqlite3 keys.db 'CREATE TABLE p (a); CREATE TABLE c (x REFERENCES p (a)); INSERT INTO c VALUES (1)'
+expect 3 'check         result
+------------  ------------------------------------------
+integrity     ok
+foreign keys  foreign key mismatch - "c" referencing "p"
+journal mode  delete
+encoding      UTF-8
+pages         3
+free pages    0' '' -- doctor keys.db
+
 # Every value comes back with its type and bits.
 sqlite3 shop.db "CREATE TABLE odd (a, b);
     INSERT INTO odd VALUES (1, 1.0), (-0.0, 5e-324), (9e999, -9e999), (x'00ff', ''), (NULL, 0.1),
@@ -94,6 +105,9 @@ expect 3 '' "$other" -- insert wide.db odd wide.json --dry-run
 "$VORNJSONDB" init shop.db single a:int --quiet && "$VORNJSONDB" insert shop.db single - --quiet <<<'{"a": 1}'
 "$VORNJSONDB" dump shop.db single >single.dump
 expect 0 '' 'loaded 1 row into table "single"' -- load other.db single.dump
+sqlite3 shop.db ANALYZE
+expect 5 '' 'error: shop.db: there is no table "sqlite_stat1" that can be dumped; see vornjsondb tables' -- \
+    dump shop.db sqlite_stat1
 head -n 2 dump >cut
 expect 3 '' 'error: cut:3: the end is missing; dump the table again' -- load third.db cut
 same 'no file is left' "$(ls third.db 2>/dev/null)" ''
@@ -132,8 +146,9 @@ import sqlite3, subprocess, sys
 database = sqlite3.connect('warned.db', isolation_level=None)
 database.executescript("PRAGMA journal_mode = wal; BEGIN IMMEDIATE; INSERT INTO t VALUES (1, 'x');")
 database.execute('SELECT * FROM t').fetchone()
-print(subprocess.run([sys.argv[1], 'doctor', 'warned.db'], capture_output=True, text=True).stdout)
+print(subprocess.run([sys.argv[1], 'doctor', 'link.db'], capture_output=True, text=True).stdout)
 END
+ln -s warned.db link.db
 python3 wal.py "$VORNJSONDB" | grep process | sed 's/[0-9][0-9]*/N/' >out
 same 'processes' "$(wc -l <out)" 1
 same 'what it does' "$(sed 's/.*) //' out | tr -d , | tr ' ' '\n' | sort | xargs)" 'reads writes'

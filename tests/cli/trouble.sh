@@ -6,8 +6,13 @@ expect 0 '' '' -- insert all.db t lines --key id --quiet
 
 # Not a database, or no longer one.
 mkdir folder
-expect 7 '' 'error: folder: disk I/O error; is it a file?' -- list folder t
-expect 7 '' 'error: folder: unable to open database file; is it a file?' -- insert folder t lines
+mkfifo pipe
+for file in folder pipe /dev/null; do
+    for words in "list $file t" "insert $file t lines" "doctor $file"; do
+        # shellcheck disable=SC2086  # several words
+        expect 7 '' "error: $file: it is a folder, a pipe or a device; name the file of a database" -- $words
+    done
+done
 expect 7 '' 'error: no/such.db: No such file or directory; check the folder' -- insert no/such.db t lines
 expect 7 '' 'error: lines: file is not a database; name an SQLite database first' -- insert lines t lines
 cp all.db cut.db && truncate -s 8192 cut.db
@@ -61,6 +66,7 @@ same 'no temporary folder' "$(cat err)" \
 expect 0 '1999' '' -- count rest.db t
 expect 0 0 '' -- count rest.db t id=1
 expect 2 '' 'error: standard input is named more than once; give - once' -- insert new.db t - -
+expect 2 '' 'error: standard input is named more than once; give - once' -- insert new.db t - --def -
 "$VORNJSONDB" insert new.db t - <&- 2>err
 same 'exit with a closed input' $? 7
 same 'a closed input' "$(cat err)" 'error: standard input: Bad file descriptor; check name and permissions (nothing is stored)'
@@ -108,6 +114,9 @@ for words in 'list %s t' 'tables %s' 'doctor %s' 'dump %s t'; do
     expect 7 '' 'error: medium/wal.db: it is in WAL mode, in which SQLite writes beside the file even to read it, and its folder cannot be written to: Permission denied; copy it, with medium/wal.db-wal if there is one, to a folder that can be' \
         -- $(printf "$words" medium/wal.db)
 done
+ln -s medium/wal.db linked.db
+expect 7 '' 'error: linked.db: it is in WAL mode, in which SQLite writes beside the file even to read it, and its folder cannot be written to: Permission denied; copy it, with linked.db-wal if there is one, to a folder that can be' \
+    -- count linked.db t
 chmod 000 readonly.db
 expect 7 '' 'error: readonly.db: Permission denied; check its permissions' -- count readonly.db t
 expect 7 '' 'error: readonly.db: Permission denied; check name and permissions' -- insert new.db t readonly.db
@@ -224,6 +233,23 @@ END
 same 'ended by the signal' \
     "$(python3 interrupt.py "$VORNJSONDB" insert all.db t feed --format jsonl)" -2
 
+# Between two batches others may write, however long the input is silent.
+sqlite3 all.db 'DELETE FROM t'
+"$VORNJSONDB" insert all.db t feed --format jsonl --batch 1 --quiet &
+pid=$!
+exec 3>feed
+until_handles_interrupt "$pid"
+for count in 1 2; do
+    expect 0 '' 'deleted 0 records' -- delete all.db t --where '{"id": 7000}' --wait 0
+    sed -n ${count}p lines >&3
+    until [[ $(sqlite3 -cmd '.timeout 5000' all.db 'SELECT count(*) FROM t') == "$count" ]]; do :; done
+done
+expect 0 '' 'updated 2 records' -- update all.db t --where '{"id": {"$gt": 0}}' text=x
+exec 3>&-
+wait "$pid"
+same 'exit of what was fed' $? 0
+expect 0 '' 'deleted 2 records' -- delete all.db t --where '{"text": "x"}'
+
 # So it does where load waits for more, and what load has made goes again.
 "$VORNJSONDB" dump all.db t >t.dump
 "$VORNJSONDB" load loaded.db feed 2>err &
@@ -257,6 +283,12 @@ echo '[{"id": 1}, {"id": null}' >broken.json
 expect 3 '' 'error: broken.json:2: the input ends inside of the list, after record 2; correct the input (nothing is stored)' \
     -- insert fresh.db t broken.json
 same 'no file is left' "$(ls fresh.db 2>/dev/null)" ''
+# Nor is the link to a database that is not there yet.
+ln -s real.db link.db
+"$VORNJSONDB" insert link.db t broken.json 2>err
+same 'a link stays, and leads to nothing' "$(readlink link.db; ls real.db 2>/dev/null)" real.db
+expect 0 '' '2000 inserted, 0 replaced, 0 skipped, 0 failed (lines: JSON Lines)' -- insert link.db t lines
+expect 0 2000 '' -- count real.db t
 
 # What a failed call made is not removed while another program is about to store something there, and
 # nothing is stored in a file that is gone.

@@ -23,6 +23,9 @@ for mode in --skip --replace; do
     expect 3 '' 'error: shop.db: the table can hold several rows with one key; make it so by vornjsondb index shop.db heap id --unique (nothing is stored)' \
         -- insert shop.db heap heap.json --key id $mode
 done
+expect 4 '' 'shop.db: the table can hold several rows with one key; make it so by vornjsondb index shop.db heap id --unique, which spares looking at all records for each
+error: heap.json:1: cannot load record 1 into table "heap": UNIQUE constraint failed: heap.code (code = "5"); correct it, or leave it out by --errors FILE (nothing is stored)' \
+    -- insert shop.db heap heap.json --key id --upsert
 "$VORNJSONDB" index shop.db heap id --unique --quiet
 for mode in --skip --upsert; do
     expect 4 '' 'error: heap.json:1: cannot load record 1 into table "heap": UNIQUE constraint failed: heap.code (code = "5"); correct it, or leave it out by --errors FILE (nothing is stored)' \

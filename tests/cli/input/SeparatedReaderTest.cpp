@@ -47,6 +47,9 @@ TEST(SeparatedReader, ALineThatTellsTheDelimiterIsNoHeader) {
     EXPECT_EQ(Csv("seq=,\na,b\n"), "failed in line 1" + strNoName);
     EXPECT_EQ(Csv("sep=,b\n1,2\n"), "1@2: sep=='1' b='2'\n");
     EXPECT_EQ(Csv("sep=\n1\n"), "1@2: sep=='1'\n");
+    ReadOptions How = Separated(';');
+    How.blHeader = false;
+    EXPECT_EQ(ReadAll("sep=;\n1;2\n", How), "1@2: c1='1' c2='2'\n");
 }
 
 TEST(SeparatedReader, TheMarkIsTakenOff) {
