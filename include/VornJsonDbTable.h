@@ -522,7 +522,8 @@ class Loader {
 // 8  Several calls as one
 
 // Everything on the connection between Begin and Commit happens whole or not at all. Inside of an
-// open transaction it is a savepoint.
+// open transaction it is a savepoint. One that cannot be rolled back alone, for want of memory, is
+// undone with all around it: Rollback and the outer Commit say so, the destructor cannot.
 class Transaction {
   public:
     enum class Mode {

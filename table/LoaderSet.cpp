@@ -89,7 +89,7 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
             eMisfit = FitBlob(Type, RecordValues::Copied(Into, strBytes), blCompatible, Out);
             break;
         default:
-            Out.eKind = BoundValue::Kind::kNull;
+            break;
     }
     Judge(*pOf, nPlace, eMisfit, szShown);
 }
@@ -187,7 +187,7 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
         return;
     }
     // The text of an earlier value may be gone; what ends this one early leaves null.
-    m_pParts->Values.Give(Of).eKind = BoundValue::Kind::kNull;
+    m_pParts->Values.Give(Of);
     FindingList vecFindings;
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);
     const std::string strPath = vornjsondb::Below("", Into.strName);

@@ -52,10 +52,12 @@ class RecordValues {
     };
     Slot& SlotOf(size_t nMember) { return m_vecSlots[nMember]; }
 
-    // One member: for a Fit... function to fill, and from JSON.
+    // One member: null, for a Fit... function to fill, and from JSON.
     BoundValue& Give(Slot& Of) {
         Mark(Of);
+        // mutate(exchanged): in any order.
         Of.blBound = false;
+        Of.Value.eKind = BoundValue::Kind::kNull;
         return Of.Value;
     }
     void SetJson(Slot& Of, const Json::Value& jValue, FindingList& vecFindings);

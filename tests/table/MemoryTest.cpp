@@ -335,6 +335,26 @@ TEST_F(TableMemoryTest, ValueThatEndsInBadAllocLeavesNullAndNoPartOfAnEarlierOne
     EXPECT_GT(nThrown, 0);
 }
 
+// The text is too long for the memory that is kept of the record before.
+TEST_F(TableMemoryTest, TextOfAnyThatEndsInBadAllocLeavesNull) {
+    Table Any;
+    Options How;
+    How.blCompatible = false;
+    Run("CREATE TABLE one (y)");
+    ASSERT_EQ("ok",
+              Text(Any.Open(m_pDb, "one",
+                            Parse(R"({"one": {"member": {"y": {"cpptype": "any"}}}})"), How)));
+    Loader Many;
+    ASSERT_EQ("ok", Text(Many.Start(Any)));
+    Many.SetText(0, "a first text");
+    ASSERT_EQ("ok", Text(Many.EndRecord()));
+    g_nMallocsUntilFailure = 1;
+    EXPECT_THROW(Many.SetText(0, std::string_view(kLongName)), std::bad_alloc);
+    g_nMallocsUntilFailure = 0;
+    EXPECT_EQ("ok", Text(Many.EndRecord()));
+    EXPECT_EQ("a first text;NULL", Rows("SELECT y FROM one"));
+}
+
 TEST_F(TableMemoryTest, RecordThatRanOutOfMemoryLeavesNothingToTheNext) {
     int nThrown = 0;
     bool blUntouched = false;

@@ -219,6 +219,9 @@ int Several(Sub& s, Args& a) {
         if (status.Ok()) {
             status = s.pHandle->table.RemoveAll();
         }
+        if (status.Ok()) {
+            status = part.Rollback();
+        }
     }
     if (status.Ok()) {
         Json::Value jFive;
