@@ -39,7 +39,7 @@ table=(build/coverage/table/CMakeFiles/vornjsondb_table.dir
 # Left out as well are branches on lines that decide nothing: the compiler's own around the making of
 # a function-local static and around a catch clause that does not apply, and the ways of an exception
 # out of a call that gcov does not mark as such.
-own_branches=('^ *static ' '^VORN_JSON_MEMORY' '^ *} catch' '^ *(\*|.*\()new ' '^ *}\)?;?$' '.*= default;$'
+own_branches=('^ *static ' '^VORN_JSON_MEMORY' '^ *} catch' '^ *(\*|.*\()?new ' '^ *}\)?;?$' '.*= default;$'
     '^ *const LineFormat Format\(' '^ *std::printf\(' '^ *syslog\(' '^ *Name\.pBegin = It'
     '^ *return FindMember\(' '^ *return SqlText\(')
 report=(gcovr --root . --exclude-throw-branches

@@ -13,11 +13,13 @@ namespace vornjsondb {
 // it elsewhere and to swap takes twice as long, and a row is made of such values. When fnMake
 // throws, null is left.
 template <typename Function>
-void MakeInPlace(Json::Value& jNull, Function&& fnMake) try {
-    new (&jNull) Json::Value(fnMake());
-} catch (...) {
-    new (&jNull) Json::Value();
-    throw;
+void MakeInPlace(Json::Value& jNull, Function&& fnMake) {
+    try {
+        new (&jNull) Json::Value(fnMake());
+    } catch (...) {
+        new (&jNull) Json::Value();
+        throw;
+    }
 }
 
 }  // namespace vornjsondb
