@@ -32,6 +32,7 @@ constexpr auto AppendText = NoAppend, AppendJson = NoAppend, AppendSigned = NoAp
 
 // Null, also for a column that comes twice.
 Json::Value& Emptied(Json::Value& jOut) {
+    // mutate(true, false, sunk, hoisted, != to ==): what is not released is only lost.
     if (jOut.type() != Json::nullValue) {
         // mutate(dropped): what is not released is only lost.
         jOut = Json::Value::nullSingleton();
@@ -40,6 +41,7 @@ Json::Value& Emptied(Json::Value& jOut) {
 }
 
 void ReadText(const char* szText, Json::Value& jOut) {
+    // mutate(doubled): it reads the same again.
     MakeInPlace(Emptied(jOut), [&] { return Json::Value(szText); });
 }
 
@@ -63,18 +65,21 @@ Number ReadNumber(const char* szText, Number (*pfnGeneral)(const char*, char**, 
 // and cut where it has 64. Stored data is read so everywhere.
 // Pinned by RowValues.UnsignedIntAboveTheSignedMaximumGoesThroughTheSignedConversion.
 void ReadInt(const char* szText, Json::Value& jOut) {
+    // mutate(doubled): it reads the same again.
     MakeInPlace(Emptied(jOut), [&] {
         return Json::Value(static_cast<Json::Int>(ReadNumber(szText, std::strtol)));
     });
 }
 
 void ReadInt64(const char* szText, Json::Value& jOut) {
+    // mutate(doubled): it reads the same again.
     MakeInPlace(Emptied(jOut), [&] {
         return Json::Value(static_cast<Json::Int64>(ReadNumber(szText, std::strtoll)));
     });
 }
 
 void ReadBool(const char* szText, Json::Value& jOut) {
+    // mutate(doubled): it reads the same again.
     MakeInPlace(Emptied(jOut), [&] { return Json::Value(ReadNumber(szText, std::strtol) == 1); });
 }
 
