@@ -24,7 +24,7 @@ bool IsSet(const Json::Value& jEntry, const char* szFlag) {
 }
 
 bool IsUsableName(const std::string& strName) {
-    return strName.find('\0') == std::string::npos && strName[0] != '$';
+    return std::string_view(strName).find('\0') == std::string_view::npos && strName[0] != '$';
 }
 
 }  // namespace
@@ -57,7 +57,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
-        std::string strName = TextOf(NameOf(it));
+        const std::string strName = TextOf(NameOf(it));
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
             Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
@@ -79,7 +79,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
                        IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false, ""});
             m_vecByColumn.insert(PlaceOfColumn(strName), m_vecNames.size());
-            m_vecNames.push_back(std::move(strName));
+            AddText(m_vecNames, strName);
         }
     }
 }
@@ -91,7 +91,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     const Json::ArrayIndex nNames = jKey.isArray() ? jKey.size() : 1;
     for (Json::ArrayIndex i = 0; i < nNames; ++i) {
         const Json::Value& jName = jKey.isArray() ? jKey[i] : jKey;
-        std::string strName = jName.isString() ? jName.asString() : std::string();
+        const std::string strName = jName.isString() ? jName.asString() : std::string();
         // mutate(exchanged): in any order.
         if (Find(strName) == kNone) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,
@@ -101,7 +101,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
             Report(vecFindings, FindingCode::kNamedTwice, strPath,
                    Concat({ShownText(strName), " is named twice"}));
         }
-        vecNames.push_back(std::move(strName));
+        AddText(vecNames, strName);
     }
     // mutate(doubled): the same key once more.
     SetKey(vecNames);
@@ -153,6 +153,21 @@ size_t Members::FindColumn(const std::string& strColumn) const {
 
 bool Members::HasRowidKey() const {
     return m_vecKey.size() == 1 && At(m_vecKey[0]).Kind() == BoundKind::kInteger;
+}
+
+bool Members::HasCollates() const {
+    for (const size_t nMember : m_vecKey) {
+        if (At(nMember).strCollate.empty()) {
+            return false;
+        }
+    }
+    return true;
+}
+
+void Members::ForgetCollates() {
+    for (Member& Each : m_vecAll) {
+        Each.strCollate.clear();
+    }
 }
 
 void Members::SetKey(const std::vector<std::string>& vecColumns) {
