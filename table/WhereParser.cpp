@@ -34,7 +34,7 @@ struct GroupKey {
 constexpr GroupKey kGroupKeys[] = {
     {"$and", Condition::All, true}, {"$or", Condition::Any, true}, {"$not", NotAll, false}};
 
-const GroupKey* FindGroupKey(const std::string& strKey) {
+const GroupKey* FindGroupKey(std::string_view strKey) {
     for (const GroupKey& Each : kGroupKeys) {
         if (strKey == Each.szKey) {
             return &Each;
@@ -130,7 +130,7 @@ class WhereParser {
             const std::string strBelow = Below(strPath, strKey);
             if (const Operator* pRow = FindOperator(strKey)) {
                 AddLeaf(strMember, pRow->eOp, *it, strBelow, vecOut);
-            } else if (strKey == "$not") {
+            } else if (Name.Is("$not")) {
                 Conditions vecParts;
                 ReadOperators(strMember, *it, strBelow, nLevel + 1, vecParts);
                 vecOut.push_back(NotAll(std::move(vecParts)));
