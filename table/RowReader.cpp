@@ -1,7 +1,5 @@
 #include "RowReader.h"
 
-#include <utility>
-
 #include "../src/base/JsonMemory.h"
 
 namespace vornjsondb {
@@ -85,9 +83,9 @@ Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, RowKind e
 
 }  // namespace
 
-RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
+RowReader::RowReader(const Members& Of, const std::vector<size_t>& vecColumns,
                      VORN_JSON_DB::Nulls eNulls) try
-    : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
+    : m_vecColumns(vecColumns), m_jEmpty(Json::objectValue) {
     for (const size_t nMember : m_vecColumns) {
         const Member& Shown = Of.At(nMember);
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||

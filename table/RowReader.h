@@ -16,7 +16,7 @@ namespace vornjsondb {
 class RowReader {
   public:
     // For rows whose columns are these members, in the members' order. Of must outlive it.
-    RowReader(const Members& Of, std::vector<size_t> vecColumns, VORN_JSON_DB::Nulls eNulls);
+    RowReader(const Members& Of, const std::vector<size_t>& vecColumns, VORN_JSON_DB::Nulls eNulls);
 
     // The statement's row as a record.
     Json::Value Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const;
