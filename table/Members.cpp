@@ -14,10 +14,6 @@ namespace vornjsondb {
 
 namespace {
 
-std::string TextOf(const MemberName& Name) {
-    return {Name.pBegin, Name.pEnd};
-}
-
 bool IsSet(const Json::Value& jEntry, const char* szFlag) {
     const Json::Value* pjFlag = FindMember(jEntry, szFlag);
     return pjFlag != nullptr && pjFlag->isBool() && pjFlag->asBool();
@@ -57,7 +53,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
-        const std::string strName = TextOf(NameOf(it));
+        const std::string strName(NameOf(it).View());
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
             Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),

@@ -89,7 +89,7 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
         // mutate(doubled): the same name once more.
         AddText(vecKeys, Key.szKey);
     }
-    const std::string strKey(Name.pBegin, Name.pEnd);
+    const std::string strKey(Name.View());
     Report(Out.vecFindings, FindingCode::kUnknownQueryKey, Below("", strKey),
            Concat({"a query has no key ", ShownText(strKey), Suggestion(strKey, vecKeys)}));
 }

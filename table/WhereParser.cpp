@@ -80,7 +80,7 @@ class WhereParser {
         const Json::Value::const_iterator itEnd = jObject.end();
         for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
-            const std::string strKey(Name.pBegin, Name.pEnd);
+            const std::string strKey(Name.View());
             const std::string strBelow = Below(strPath, strKey);
             const GroupKey* pGroup = FindGroupKey(strKey);
             if (!IsOperator(Name)) {
@@ -126,7 +126,7 @@ class WhereParser {
         const Json::Value::const_iterator itEnd = jOperators.end();
         for (Json::Value::const_iterator it = jOperators.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
-            const std::string strKey(Name.pBegin, Name.pEnd);
+            const std::string strKey(Name.View());
             const std::string strBelow = Below(strPath, strKey);
             if (const Operator* pRow = FindOperator(strKey)) {
                 AddLeaf(strMember, pRow->eOp, *it, strBelow, vecOut);
