@@ -126,12 +126,11 @@ Status FromFindings(FindingList&& vecFindings, const Doing& What) {
 }
 
 bool HasError(const FindingList& vecFindings) {
+    bool blError = false;
     for (const Finding& Found : vecFindings) {
-        if (Found.eSeverity == Severity::kError) {
-            return true;
-        }
+        blError = blError || Found.eSeverity == Severity::kError;
     }
-    return false;
+    return blError;
 }
 
 namespace {

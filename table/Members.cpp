@@ -152,12 +152,11 @@ bool Members::HasRowidKey() const {
 }
 
 bool Members::HasCollates() const {
+    bool blAll = true;
     for (const size_t nMember : m_vecKey) {
-        if (At(nMember).strCollate.empty()) {
-            return false;
-        }
+        blAll = blAll && !At(nMember).strCollate.empty();
     }
-    return true;
+    return blAll;
 }
 
 void Members::ForgetCollates() {

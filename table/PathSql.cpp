@@ -18,12 +18,11 @@ bool IsNumber(std::string_view strText) {
 
 // SQLite has no escape for what would end the name or begin one.
 bool IsReachable(std::string_view strName) {
+    bool blAll = true;
     for (const char c : strName) {
-        if (c == '"' || c == '\\' || static_cast<unsigned char>(c) < ' ') {
-            return false;
-        }
+        blAll = blAll && c != '"' && c != '\\' && static_cast<unsigned char>(c) >= ' ';
     }
-    return true;
+    return blAll;
 }
 
 // Takes ".name" from the front of strSteps.

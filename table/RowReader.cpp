@@ -85,7 +85,7 @@ Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, RowKind e
 
 RowReader::RowReader(const Members& Of, const std::vector<size_t>& vecColumns,
                      VORN_JSON_DB::Nulls eNulls) try
-    : m_vecColumns(vecColumns), m_jEmpty(Json::objectValue) {
+    : m_vecColumns(vecColumns.begin(), vecColumns.end()), m_jEmpty(Json::objectValue) {
     for (const size_t nMember : m_vecColumns) {
         const Member& Shown = Of.At(nMember);
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
