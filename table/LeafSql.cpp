@@ -237,19 +237,19 @@ bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Pro
 }
 
 bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Problem& Why) {
-    const Json::Value& jLeast = jPair[0U];
-    const Json::Value& jMost = jPair[1U];
+    const Json::Value& jFrom = jPair[0U];
+    const Json::Value& jTo = jPair[1U];
     Operand Least, Most;
-    if (!ReadOrdered(Row, jLeast, Least, Why) || !ReadOrdered(Row, jMost, Most, Why)) {
+    if (!ReadOrdered(Row, jFrom, Least, Why) || !ReadOrdered(Row, jTo, Most, Why)) {
         return false;
     }
     if (Least.eKind != Most.eKind) {
         return RefuseOperand(Row, jPair, Why);
     }
     // mutate(exchanged): the SQL of what is refused is not run.
-    if (IsLess(jMost, jLeast)) {
+    if (IsLess(jTo, jFrom)) {
         return Why.Tell(FindingCode::kSwappedEnds,
-                        Concat({"nothing lies between ", Shown(jLeast), " and ", Shown(jMost)}));
+                        Concat({"nothing lies between ", Shown(jFrom), " and ", Shown(jTo)}));
     }
     OpenJson();
     AddOrdered(MayBeNumber(Least.Value.strBytes) ? Least : Most);
