@@ -137,7 +137,7 @@ Whole::~Whole() {
 
 int Whole::Take(const char* szSql, Statement& Lent) {
     return m_Kept.Take(
-        szSql, [szSql] { return std::string(szSql); }, Lent);
+        szSql, [szSql] { return Concat({szSql}); }, Lent);
 }
 
 Status AttemptWhole(sqlite3* pDb, Statements& Kept, int nWaitMs, const Doing& What,

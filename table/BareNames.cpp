@@ -2,8 +2,8 @@
 
 #include <algorithm>
 #include <cctype>
-#include <new>
 
+#include "../src/base/JsonMemory.h"
 #include "Statements.h"
 
 namespace vornjsondb {
@@ -29,7 +29,7 @@ BareNames::BareNames() {
     // mutate(exchanged): what is not freed then only AddressSanitizer sees.
     m_pDb.reset(pDb);
     if (nResult != SQLITE_OK) {
-        throw std::bad_alloc();
+        ThrowBadAlloc();
     }
 }
 
@@ -45,7 +45,7 @@ bool BareNames::Has(const std::string& strName) const {
         nResult = sqlite3_step(pStatement.get());
     }
     if (nResult == SQLITE_NOMEM) {
-        throw std::bad_alloc();
+        ThrowBadAlloc();
     }
     return nResult == SQLITE_ROW && sqlite3_column_int(pStatement.get(), 0) == 7;
 }

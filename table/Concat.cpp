@@ -28,10 +28,10 @@ void Append(std::string& strTo, std::initializer_list<std::string_view> listPart
     }
 }
 
-// Moved, as other lists take their texts: a list grows by one function for each kind of argument.
+// Not moved, which would be a function that JsonCpp has as well, and takes from the program.
 void AddText(std::vector<std::string>& vecTexts, std::string_view strText) {
-    std::string strOwn(strText);
-    vecTexts.push_back(std::move(strOwn));
+    vecTexts.emplace_back();
+    vecTexts.back() = strText;
 }
 
 std::string DigitsOf(std::int64_t nValue) {

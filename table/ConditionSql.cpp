@@ -100,7 +100,8 @@ class ConditionWriter {
     void WriteRest(const Chain& Of, size_t nFrom, size_t nTo, const char* szClose) {
         if (nFrom < nTo) {
             const bool blOne = nTo - nFrom == 1;
-            m_strSql.append(Of.szJoiner).append(blOne ? "" : "(");
+            m_strSql += Of.szJoiner;
+            m_strSql += blOne ? "" : "(";
             WriteChain(Of, nFrom, nTo);
             m_strSql += blOne ? "" : szClose;
         }

@@ -40,7 +40,7 @@ Json::Value Describe(const RealTable& Real) {
         }
     }
     for (const std::string& strColumn : Real.vecKey) {
-        jTable["key"].append(strColumn);
+        jTable["key"].append(strColumn.c_str());
     }
     return jTable;
 }

@@ -1,6 +1,5 @@
 #include "Failure.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <utility>
 
@@ -81,7 +80,7 @@ Retry RetryOf(int nSqlite, bool blInTransaction) {
 std::string Doing::Text() const {
     std::string strText = Concat({"cannot ", szDo});
     if (nRecord != 0) {
-        strText.replace(strText.find('#'), 1, DigitsOf(nRecord));
+        Append(strText, {" ", DigitsOf(nRecord), " into"});
     }
     if (pstrTable != nullptr) {
         Append(strText, {" table ", Quoted(*pstrTable)});
@@ -110,7 +109,7 @@ Status FailBySqlite(sqlite3* pDb, int nResult, const Doing& What) {
     return Status(std::move(pDetails));
 }
 
-Status FromFindings(FindingList vecFindings, const Doing& What) {
+Status FromFindings(FindingList&& vecFindings, const Doing& What) {
     if (vecFindings.empty()) {
         return {};
     }
@@ -127,8 +126,11 @@ Status FromFindings(FindingList vecFindings, const Doing& What) {
 }
 
 bool HasError(const FindingList& vecFindings) {
-    return std::any_of(vecFindings.begin(), vecFindings.end(),
-                       [](const Finding& Found) { return Found.eSeverity == Severity::kError; });
+    bool blError = false;
+    for (const Finding& Found : vecFindings) {
+        blError = blError || Found.eSeverity == Severity::kError;
+    }
+    return blError;
 }
 
 namespace {
@@ -140,7 +142,7 @@ Status Retold(const Status& Outcome, Retry eRetry, std::string strMessage) {
     pDetails->nSqliteCode = Outcome.SqliteCode();
     pDetails->nSystemError = Outcome.SystemError();
     pDetails->strMessage = std::move(strMessage);
-    pDetails->vecFindings = Outcome.Findings();
+    ReportAll(Outcome.Findings(), pDetails->vecFindings);
     return Status(std::move(pDetails));
 }
 

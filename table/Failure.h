@@ -34,7 +34,7 @@ using VORN_JSON_DB::StatusCode;
 struct Doing {
     const char* szDo;              // "list records of"
     const std::string* pstrTable;  // nullptr: the words are enough
-    std::int64_t nRecord = 0;      // stands for # in szDo, if not 0: "load record # into"
+    std::int64_t nRecord = 0;      // if not 0: "load record" becomes "load record 7 into"
 
     std::string Text() const;
 };
@@ -51,7 +51,7 @@ inline Status FromSqlite(sqlite3* pDb, int nResult, const Doing& What) {
 
 // Success, with the findings, when none of them is an error; else kRefused with the first one's
 // message.
-Status FromFindings(FindingList vecFindings, const Doing& What);
+Status FromFindings(FindingList&& vecFindings, const Doing& What);
 
 // What a call returns a reference to where it has nothing.
 template <typename Kind>

@@ -66,6 +66,12 @@ void Report(FindingList& vecFindings, Finding Row, std::string_view strPath,
     }
 }
 
+void ReportAll(const FindingList& vecOthers, FindingList& vecFindings) {
+    for (const Finding& Other : vecOthers) {
+        Report(vecFindings, Other, Other.strPath, Other.strMessage);
+    }
+}
+
 void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings) {
     Report(vecFindings, FindingCode::kNoDefinition, Below("", strTable),
            Concat({"the definition names no members of table ", Quoted(strTable)}));
@@ -115,7 +121,9 @@ std::string Shown(const Json::Value& jValue) {
 
 std::string ShownText(std::string_view strText) {
     const bool blLong = strText.size() > kShownBytes;
-    return Quoted(blLong ? Cut(strText) : strText).append(blLong ? "..." : "");
+    std::string strShown = Quoted(blLong ? Cut(strText) : strText);
+    strShown += blLong ? "..." : "";
+    return strShown;
 }
 
 std::string_view BytesOf(const Json::Value& jText) {
@@ -134,7 +142,8 @@ std::string Enclosed(std::string_view strText, char cQuote) {
     for (const char c : strText) {
         strEnclosed.append(c == cQuote ? 2 : 1, c);
     }
-    return strEnclosed += cQuote;
+    strEnclosed += cQuote;
+    return strEnclosed;
 }
 
 }  // namespace vornjsondb

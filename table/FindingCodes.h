@@ -98,6 +98,9 @@ void Report(FindingList& vecFindings, FindingCode eCode, std::string_view strPat
 void Report(FindingList& vecFindings, Finding Row, std::string_view strPath,
             std::string_view strMessage);
 
+// Adds those that another list has.
+void ReportAll(const FindingList& vecOthers, FindingList& vecFindings);
+
 // Reports a definition that has no members for the table.
 void ReportNoDefinition(const std::string& strTable, FindingList& vecFindings);
 

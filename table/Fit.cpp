@@ -32,7 +32,7 @@ constexpr size_t kSureLevels = 128;
 
 size_t ReaderLevels() {
     Json::CharReaderBuilder Builder;
-    return Builder["stackLimit"].asUInt();
+    return static_cast<size_t>(Builder["stackLimit"].asInt64());
 }
 
 unsigned CheckReal(double dValue) {

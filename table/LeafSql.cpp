@@ -137,7 +137,8 @@ void LeafSql::AddOrdered(const Operand& What) {
 }
 
 void LeafSql::AddKindTest(ValueKind eKind) {
-    m_strSql.append(KindAt(m_pMember->strColumn, m_Where.strPath)).append(JsonTypeTest(eKind));
+    m_strSql += KindAt(m_pMember->strColumn, m_Where.strPath);
+    m_strSql += JsonTypeTest(eKind);
 }
 
 // What is said of a value inside of JSON comes with its kind: true is 1 there, and a list a text.
@@ -228,24 +229,27 @@ bool LeafSql::WriteOrdered(const Operator& Row, const Json::Value& jOperand, Pro
     if (blEnd) {
         m_strSql += " AND ";
         AddLeft(What.eKind);
-        m_strSql.append(szEnd).append(")");
+        m_strSql += szEnd;
+        m_strSql += ')';
     }
     CloseJson(What.eKind);
     return true;
 }
 
 bool LeafSql::WriteBetween(const Operator& Row, const Json::Value& jPair, Problem& Why) {
+    const Json::Value& jFrom = jPair[0U];
+    const Json::Value& jTo = jPair[1U];
     Operand Least, Most;
-    if (!ReadOrdered(Row, jPair[0], Least, Why) || !ReadOrdered(Row, jPair[1], Most, Why)) {
+    if (!ReadOrdered(Row, jFrom, Least, Why) || !ReadOrdered(Row, jTo, Most, Why)) {
         return false;
     }
     if (Least.eKind != Most.eKind) {
         return RefuseOperand(Row, jPair, Why);
     }
     // mutate(exchanged): the SQL of what is refused is not run.
-    if (IsLess(jPair[1], jPair[0])) {
-        return Why.Tell(FindingCode::kSwappedEnds, Concat({"nothing lies between ", Shown(jPair[0]),
-                                                           " and ", Shown(jPair[1])}));
+    if (IsLess(jTo, jFrom)) {
+        return Why.Tell(FindingCode::kSwappedEnds,
+                        Concat({"nothing lies between ", Shown(jFrom), " and ", Shown(jTo)}));
     }
     OpenJson();
     AddOrdered(MayBeNumber(Least.Value.strBytes) ? Least : Most);

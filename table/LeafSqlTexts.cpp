@@ -67,7 +67,7 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
     if (m_blPath) {
         CloseJson(ValueKind::kText);
     } else {
-        m_strSql.append(" AND typeof(").append(m_pMember->strColumn).append(") = 'text')");
+        Append(m_strSql, {" AND typeof(", m_pMember->strColumn, ") = 'text')"});
     }
     return true;
 }

@@ -43,9 +43,12 @@ void AppendJsonText(std::string_view strText, std::string& strJson) {
     for (const char c : strText) {
         const auto nByte = static_cast<unsigned char>(c);
         if (nByte < 0x20) {
-            strJson.append("\\u00").append(1, kHex[nByte >> 4U]).append(1, kHex[nByte & 15U]);
+            strJson += "\\u00";
+            strJson += kHex[nByte >> 4U];
+            strJson += kHex[nByte & 15U];
         } else {
-            strJson.append(c == '"' || c == '\\' ? "\\" : "").append(1, c);
+            strJson += c == '"' || c == '\\' ? "\\" : "";
+            strJson += c;
         }
     }
     strJson += '"';

@@ -63,7 +63,7 @@ Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
 }
 
 Status Loader::Parts::Write(FindingList& vecFindings) {
-    const vornjsondb::Doing What{"load record # into", &Into.Of.Table(), Now.nRecords};
+    const vornjsondb::Doing What{"load record", &Into.Of.Table(), Now.nRecords};
     vornjsondb::CheckEmpty(Values, vecFindings);
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);

@@ -14,17 +14,13 @@ namespace vornjsondb {
 
 namespace {
 
-std::string TextOf(const MemberName& Name) {
-    return {Name.pBegin, Name.pEnd};
-}
-
 bool IsSet(const Json::Value& jEntry, const char* szFlag) {
     const Json::Value* pjFlag = FindMember(jEntry, szFlag);
     return pjFlag != nullptr && pjFlag->isBool() && pjFlag->asBool();
 }
 
 bool IsUsableName(const std::string& strName) {
-    return strName.find('\0') == std::string::npos && strName[0] != '$';
+    return std::string_view(strName).find('\0') == std::string_view::npos && strName[0] != '$';
 }
 
 }  // namespace
@@ -57,7 +53,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
     const std::string strPath = Below(Below("", m_strTable), "member");
     const Json::Value::const_iterator itEnd = jMembers.end();
     for (Json::Value::const_iterator it = jMembers.begin(); it != itEnd; ++it) {
-        std::string strName = TextOf(NameOf(it));
+        const std::string strName(NameOf(it).View());
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
             Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
@@ -79,7 +75,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
                        IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false, ""});
             m_vecByColumn.insert(PlaceOfColumn(strName), m_vecNames.size());
-            m_vecNames.push_back(std::move(strName));
+            AddText(m_vecNames, strName);
         }
     }
 }
@@ -91,7 +87,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
     const Json::ArrayIndex nNames = jKey.isArray() ? jKey.size() : 1;
     for (Json::ArrayIndex i = 0; i < nNames; ++i) {
         const Json::Value& jName = jKey.isArray() ? jKey[i] : jKey;
-        std::string strName = jName.isString() ? jName.asString() : std::string();
+        const std::string strName = jName.isString() ? jName.asString() : std::string();
         // mutate(exchanged): in any order.
         if (Find(strName) == kNone) {
             Report(vecFindings, FindingCode::kUnknownKey, strPath,
@@ -101,7 +97,7 @@ void Members::TakeKey(const Json::Value& jKey, FindingList& vecFindings) {
             Report(vecFindings, FindingCode::kNamedTwice, strPath,
                    Concat({ShownText(strName), " is named twice"}));
         }
-        vecNames.push_back(std::move(strName));
+        AddText(vecNames, strName);
     }
     // mutate(doubled): the same key once more.
     SetKey(vecNames);
@@ -153,6 +149,20 @@ size_t Members::FindColumn(const std::string& strColumn) const {
 
 bool Members::HasRowidKey() const {
     return m_vecKey.size() == 1 && At(m_vecKey[0]).Kind() == BoundKind::kInteger;
+}
+
+bool Members::HasCollates() const {
+    bool blAll = true;
+    for (const size_t nMember : m_vecKey) {
+        blAll = blAll && !At(nMember).strCollate.empty();
+    }
+    return blAll;
+}
+
+void Members::ForgetCollates() {
+    for (Member& Each : m_vecAll) {
+        Each.strCollate.clear();
+    }
 }
 
 void Members::SetKey(const std::vector<std::string>& vecColumns) {

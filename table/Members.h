@@ -71,6 +71,8 @@ class Members {
     void SetCollate(size_t nMember, std::string strCollate) {
         m_vecAll[nMember].strCollate = std::move(strCollate);
     }
+    bool HasCollates() const;  // all members of the key
+    void ForgetCollates();
     void SetAffinity(size_t nMember, Affinity eOf) { m_vecAll[nMember].eAffinity = eOf; }
 
     const Json::Value& Definition() const { return m_jDefinition; }

@@ -18,9 +18,11 @@ bool IsNumber(std::string_view strText) {
 
 // SQLite has no escape for what would end the name or begin one.
 bool IsReachable(std::string_view strName) {
-    return std::none_of(strName.begin(), strName.end(), [](char c) {
-        return c == '"' || c == '\\' || static_cast<unsigned char>(c) < ' ';
-    });
+    bool blAll = true;
+    for (const char c : strName) {
+        blAll = blAll && c != '"' && c != '\\' && static_cast<unsigned char>(c) >= ' ';
+    }
+    return blAll;
 }
 
 // Takes ".name" from the front of strSteps.
@@ -39,7 +41,7 @@ bool TakeName(std::string_view& strSteps, std::string& strOut, Problem& Why) {
         return Why.Tell(FindingCode::kNumberInPath,
                         Concat({ShownText(strName), " would be a name, not an index"}));
     }
-    strOut.append(".\"");
+    strOut += ".\"";
     for (const char c : strName) {
         strOut.append(c == '\'' ? 2 : 1, c);
     }
@@ -61,8 +63,9 @@ bool TakeIndex(std::string_view& strSteps, std::string& strOut, Problem& Why) {
     return true;
 }
 
+// Into strOut, empty before.
 bool TakeSteps(std::string_view strSteps, std::string& strOut, Problem& Why) {
-    strOut = "'$";
+    strOut += "'$";
     while (!strSteps.empty()) {
         if (strSteps[0] != '.' && strSteps[0] != '[') {
             return Why.Tell(FindingCode::kBadPath, "a point or a bracket is missing in it");

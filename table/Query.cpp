@@ -63,7 +63,9 @@ Query& Query::Take(std::string& strMember, Op eOp, Json::Value& jOperand) {
 }
 
 Query& Query::Sort(std::string strTerm) & {
-    vecSort.push_back(std::move(strTerm));
+    // As AddText makes a list longer.
+    vecSort.emplace_back();
+    vecSort.back() = std::move(strTerm);
     return *this;
 }
 

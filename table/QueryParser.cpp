@@ -24,7 +24,7 @@ void ReadNames(const Json::Value& jNames, const char* szPath, FindingCode eCode,
     }
     for (Json::ArrayIndex i = 0; i < jNames.size(); ++i) {
         if (jNames[i].isString()) {
-            vecNames.push_back(jNames[i].asString());
+            AddText(vecNames, BytesOf(jNames[i]));
         } else {
             Report(vecFindings, eCode, Below(szPath, DigitsOf(i)),
                    Concat({"a name belongs here, not ", Shown(jNames[i])}));
@@ -86,11 +86,10 @@ void ReadKey(const MemberName& Name, const Json::Value& jValue, bool blValuesOnl
     }
     std::vector<std::string> vecKeys;
     for (const QueryKey& Key : kKeys) {
-        std::string strOne = Key.szKey;
-        // mutate(doubled): an empty name is near to none.
-        vecKeys.push_back(std::move(strOne));
+        // mutate(doubled): the same name once more.
+        AddText(vecKeys, Key.szKey);
     }
-    const std::string strKey(Name.pBegin, Name.pEnd);
+    const std::string strKey(Name.View());
     Report(Out.vecFindings, FindingCode::kUnknownQueryKey, Below("", strKey),
            Concat({"a query has no key ", ShownText(strKey), Suggestion(strKey, vecKeys)}));
 }

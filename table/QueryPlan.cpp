@@ -8,7 +8,7 @@ namespace vornjsondb {
 using VORN_JSON_DB::Query;
 
 void QueryPlan::Resolve(const Query& Which, QueryUse eUse, FindingList& vecFindings) {
-    vecFindings = Which.vecFindings;
+    ReportAll(Which.vecFindings, vecFindings);
     if (HasError(vecFindings)) {
         return;
     }
@@ -44,7 +44,8 @@ bool QueryPlan::ResolvePlain(const Query& Which) {
     if (blPlain) {
         const bool blPaged = IsPaged(Which);
         // No SQL begins so.
-        m_strShape = blPaged ? '\2' : '\1';
+        // mutate(doubled): told twice, it tells the same.
+        m_strShape += blPaged ? '\2' : '\1';
         // mutate(doubled, exchanged): in any order, once or twice.
         m_strShape += static_cast<char>(Leaf.eOp);
         // mutate(doubled): told twice, it tells the same members apart.

@@ -155,13 +155,13 @@ std::string_view QueryPlan::Condition() {
 void QueryPlan::AppendWhere(std::string& strSql) {
     const std::string_view strCondition = Condition();
     if (!strCondition.empty()) {
-        strSql.append(" WHERE ").append(strCondition);
+        Append(strSql, {" WHERE ", strCondition});
     }
 }
 
 void QueryPlan::AppendTail(std::string& strSql) {
     WritePlain();
-    strSql.append(m_Sql.strSql, m_nConditionEnd, m_nTailEnd - m_nConditionEnd);
+    strSql += std::string_view(m_Sql.strSql).substr(m_nConditionEnd, m_nTailEnd - m_nConditionEnd);
 }
 
 }  // namespace vornjsondb

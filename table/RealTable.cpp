@@ -27,22 +27,17 @@ constexpr char kNameSql[] =
     "SELECT 1 FROM pragma_table_xinfo(?1) UNION ALL SELECT 1 FROM pragma_index_xinfo(?1)";
 
 // A row for each column of each index.
-std::string IndexesSql(const std::string& strDatabase) {
-    static constexpr char kHead[] =
-        "SELECT Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name, Part.coll,"
-        " (SELECT sql FROM ";
-    static constexpr char kOfDatabase[] =
-        ".sqlite_schema WHERE type = 'index' AND name = Listed.name) FROM pragma_index_list(?1, ";
+std::string IndexesSql(std::string_view strWhat, const std::string& strDatabase,
+                       std::string_view strWhere) {
     static constexpr char kParts[] = ") AS Listed, pragma_index_xinfo(Listed.name, ";
-    static constexpr char kInOrder[] = ") AS Part WHERE Part.key ORDER BY Listed.seq, Part.seqno";
     const std::string strText = Enclosed(strDatabase, '\'');
-    return Concat({kHead, Quoted(strDatabase), kOfDatabase, strText, kParts, strText, kInOrder});
+    return Concat({"SELECT ", strWhat, " FROM pragma_index_list(?1, ", strText, kParts, strText,
+                   ") AS Part WHERE Part.key AND ", strWhere});
 }
 
 // Calls fnRow for each row of a statement about the name.
-template <typename PerRow>
 int ForEachRow(sqlite3* pDb, const std::string& strSql, const std::string& strName,
-               PerRow&& fnRow) {
+               Callable<void(const OwnStatement&)> fnRow) {
     OwnStatement pStatement;
     int nResult = PrepareFor(pDb, strSql, strName, pStatement);
     if (nResult == SQLITE_OK) {
@@ -69,9 +64,10 @@ int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
-        const bool blColumn = std::any_of(
-            Real.vecColumns.begin(), Real.vecColumns.end(),
-            [szName](const RealColumn& Column) { return IsSameColumn(Column.strName, szName); });
+        bool blColumn = false;
+        for (const RealColumn& Column : Real.vecColumns) {
+            blColumn = blColumn || IsSameColumn(Column.strName, szName);
+        }
         OwnStatement pStatement;
         const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
         // mutate(exchanged): a statement that nobody runs leaves nothing.
@@ -128,10 +124,9 @@ int IsInSchema(sqlite3* pDb, const std::string& strTable, const char* szWhat, bo
     }
     // A temporary trigger may be one of any table.
     static constexpr char kOrTemporary[] =
-        ".sqlite_schema UNION ALL SELECT * FROM sqlite_temp_schema)"
-        " WHERE tbl_name = ?1 COLLATE NOCASE AND ";
+        ".sqlite_schema UNION ALL SELECT * FROM sqlite_temp_schema) SELECT 1 FROM Here WHERE ";
     const std::string strSql = Concat(
-        {"SELECT 1 FROM (SELECT * FROM ", Quoted(strDatabase), kOrTemporary, szWhat, " LIMIT 1"});
+        {"WITH Here AS (SELECT * FROM ", Quoted(strDatabase), kOrTemporary, szWhat, " LIMIT 1"});
     return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blThere = true; });
 }
 
@@ -140,28 +135,62 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
     if (nResult != SQLITE_OK) {
         return nResult;
     }
+    const std::string strWhat = Concat(
+        {"Listed.seq, Listed.\"unique\" AND NOT Listed.partial, Part.name, Part.coll,"
+         " (SELECT sql FROM ",
+         Quoted(Out.strDatabase), ".sqlite_schema WHERE type = 'index' AND name = Listed.name)"});
+    const std::string strSql =
+        IndexesSql(strWhat, Out.strDatabase, "1 ORDER BY Listed.seq, Part.seqno");
     int nLast = -1;
-    return ForEachRow(pDb, IndexesSql(Out.strDatabase), strTable, [&](const OwnStatement& pRow) {
+    return ForEachRow(pDb, strSql, strTable, [&](const OwnStatement& pRow) {
         if (std::exchange(nLast, NumberColumn(pRow, 0)) != NumberColumn(pRow, 0)) {
             // mutate(doubled): both have one SQL text, and nobody looks for one without columns.
             Out.vecAll.push_back(
-                RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, true, {}, {}});
+                RealIndex{TextColumn(pRow, 4), NumberColumn(pRow, 1) != 0, false, {}});
         }
         RealIndex& Index = Out.vecAll.back();
-        std::string strColumn = TextColumn(pRow, 2);
+        const std::string strColumn = TextColumn(pRow, 2);
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
-        std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
-        // mutate(exchanged): in any order.
-        if (!IsSameColumn(strOfColumn, strOfIndex)) {
-            // mutate(exchanged): in any order.
-            Index.blOwn = false;
-            Index.blFiner |= !IsBinary(strOfColumn);
-        }
-        // mutate(exchanged): in any order.
-        Index.vecColumns.push_back(std::move(strColumn));
-        Index.vecCollations.push_back(std::move(strOfIndex));
+        Index.blFiner |= !IsSameColumn(strOfColumn, TextColumn(pRow, 3)) && !IsBinary(strOfColumn);
+        AddText(Index.vecColumns, strColumn);
     });
+}
+
+int LearnCollations(sqlite3* pDb, Members& Of) {
+    static constexpr char kUnique[] =
+        "Listed.\"unique\" AND NOT Listed.partial ORDER BY Listed.seq, Part.seqno DESC";
+    std::string strDatabase = "main";
+    int nResult = FindDatabase(pDb, Of.Table(), strDatabase);
+    const std::string strSql = IndexesSql("Part.seqno, Part.name, Part.coll", strDatabase, kUnique);
+    bool blFound = false;
+    // First among those alone that compare as the columns do.
+    for (int nTry = 0; nResult == SQLITE_OK && !blFound && nTry < 2; ++nTry) {
+        size_t nColumns = 0;
+        nResult = ForEachRow(pDb, strSql, Of.Table(), [&](const OwnStatement& pRow) {
+            if (blFound) {
+                return;
+            }
+            const std::string strColumn = TextColumn(pRow, 1);
+            const std::string strCollation = TextColumn(pRow, 2);
+            const size_t nMember = Of.FindColumn(strColumn);
+            // Collations have names like columns.
+            if (nMember != Members::kNone &&
+                (nTry > 0 || IsSameColumn(CollationOf(pDb, Of.Table(), strColumn), strCollation))) {
+                // mutate(doubled): the same once more.
+                Of.SetCollate(nMember, Concat({" COLLATE ", Quoted(strCollation)}));
+            }
+            ++nColumns;
+            if (NumberColumn(pRow, 0) == 0) {
+                blFound = Of.HasCollates() && nColumns == Of.Key().size();
+                nColumns = 0;
+                if (!blFound) {
+                    Of.ForgetCollates();
+                }
+            }
+        });
+    }
+    return nResult;
 }
 
 bool IsRowid(const RealTable& Real, const RealColumn& Column) {

@@ -8,6 +8,8 @@
 
 #include <sqlite3.h>
 
+#include "Members.h"
+
 namespace vornjsondb {
 
 struct RealColumn {
@@ -29,9 +31,7 @@ struct RealIndex {
     std::string strSql;                   // its statement; empty: part of the table's own
     bool blUnique = false;                // among all rows
     bool blFiner = false;                 // tells values apart that its columns compare as equal
-    bool blOwn = true;                    // compares texts as its columns do
     std::vector<std::string> vecColumns;  // empty texts: expressions
-    std::vector<std::string> vecCollations;
 };
 
 struct RealIndexes {
@@ -43,8 +43,12 @@ struct RealIndexes {
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
 
-// Whether the table's schema has a statement (type, sql) of which the SQL expression szWhat is
-// true.
+// Tells the members of the key how the unique index on it compares texts, which may be in another
+// way than their columns do. Of several the one counts that does as they do.
+int LearnCollations(sqlite3* pDb, Members& Of);
+
+// Whether of a row of "Here", the schema of the table's database and that of temporary things, the
+// SQL expression szWhat is true, in which ?1 is the table's name.
 int IsInSchema(sqlite3* pDb, const std::string& strTable, const char* szWhat, bool& blThere);
 
 // Whether the column is the rowid itself, which never holds NULL: SQLite hands out values.

@@ -28,7 +28,8 @@ std::string KeyList(const Members& Of) {
         Append(strList,
                {strList.empty() ? "(" : ", ", Of.At(nMember).strQuoted, Of.At(nMember).strCollate});
     }
-    return strList.append(")");
+    strList += ')';
+    return strList;
 }
 
 // Or the key as it is, so that SQLite tells whether there is such a record.
@@ -41,7 +42,7 @@ std::string SetOrKey(const Members& Of, const std::string& strSet) {
 std::string OnConflict(const Members& Of, bool blReplace) {
     const std::string strHead = Concat({" ON CONFLICT ", KeyList(Of), " DO "});
     if (!blReplace) {
-        return strHead + "NOTHING";
+        return Concat({strHead, "NOTHING"});
     }
     std::string strSet;
     for (const Member& Other : Of.All()) {
@@ -108,8 +109,10 @@ std::string RecordWriter::Sql(Verb eVerb) const {
 // The statement for the members of this record, in the place of the last one.
 int RecordWriter::Take(Verb eVerb, Statement& Held) {
     Held = Statement();
+    std::string strShape(1, LetterOf(eVerb));
+    strShape += m_Values.Given();
     return m_Into.Kept.Take(
-        LetterOf(eVerb) + m_Values.Given(), [&] { return Sql(eVerb); }, Held);
+        strShape, [&] { return Sql(eVerb); }, Held);
 }
 
 // Runs one statement to its end. nRows, 0 before: how many it found or changed.
@@ -206,14 +209,14 @@ Status RecordWriter::WithValues(const Status& Failed) const {
     std::string strMore;
     for (size_t i = 0; i < Of.Size(); ++i) {
         const std::string strName = Concat({Of.Table(), ".", Of.At(i).strName});
-        const size_t nFound = strMessage.rfind(strName);
+        const size_t nFound = std::string_view(strMessage).rfind(strName);
         const char cAfter = nFound == std::string::npos ? 'x' : strMessage[nFound + strName.size()];
         if ((cAfter == '\0' || cAfter == ',') && m_Values.Has(i)) {
             Append(strMore,
                    {strMore.empty() ? " (" : ", ", Of.At(i).strName, " = ", Shown(m_Values.At(i))});
         }
     }
-    strMore.append(strMore.empty() ? "" : ")");
+    strMore += strMore.empty() ? "" : ")";
     return Amended(Failed, Failed.Advice(), strMore);
 }
 

@@ -1,11 +1,6 @@
 #include "RowReader.h"
 
-#include <algorithm>
-#include <new>
-#include <utility>
-
 #include "../src/base/JsonMemory.h"
-#include "Concat.h"
 
 namespace vornjsondb {
 
@@ -29,7 +24,7 @@ std::string_view TextOf(sqlite3_stmt* pStatement, sqlite3_value* pValue) {
     // mutate(hoisted): where there is a text, no memory was lacking.
     if (pText == nullptr) {
         if (sqlite3_errcode(sqlite3_db_handle(pStatement)) == SQLITE_NOMEM) {
-            throw std::bad_alloc();
+            ThrowBadAlloc();
         }
         return "";
     }
@@ -76,7 +71,7 @@ RowKind KindOf(sqlite3_value* pValue, BoundKind eKind) {
 Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, RowKind eKind) {
     switch (eKind) {
         case RowKind::kBoolean:
-            return sqlite3_value_int(pValue) == 1;
+            return sqlite3_value_int64(pValue) == 1;
         case RowKind::kInteger:
             return static_cast<Json::Int64>(sqlite3_value_int64(pValue));
         case RowKind::kReal:
@@ -88,22 +83,17 @@ Json::Value ReadValue(sqlite3_stmt* pStatement, sqlite3_value* pValue, RowKind e
 
 }  // namespace
 
-RowReader::RowReader(const Members& Of, std::vector<size_t> vecColumns,
+RowReader::RowReader(const Members& Of, const std::vector<size_t>& vecColumns,
                      VORN_JSON_DB::Nulls eNulls) try
-    : m_vecColumns(std::move(vecColumns)), m_jEmpty(Json::objectValue) {
-    for (size_t i = 0; i < m_vecColumns.size(); ++i) {
-        const Member& Shown = Of.At(m_vecColumns[i]);
+    : m_vecColumns(vecColumns.begin(), vecColumns.end()), m_jEmpty(Json::objectValue) {
+    for (const size_t nMember : m_vecColumns) {
+        const Member& Shown = Of.At(nMember);
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
                                 (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
-        // Members are numbered in the order of their names.
-        const auto itPlace =
-            std::upper_bound(m_vecInKeyOrder.begin(), m_vecInKeyOrder.end(), m_vecColumns[i],
-                             [](size_t nNew, const Column& Each) { return nNew < Each.nMember; });
+        // Members are numbered in the order of their names, as those of a record are.
         // mutate(exchanged): in any order.
-        m_vecInKeyOrder.insert(
-            itPlace, Column{static_cast<int>(i), m_vecColumns[i], Shown.Kind(), blKeepNull});
+        m_vecRead.push_back(Column{&Shown, Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
-        AddText(m_vecNames, Shown.strName);
     }
 }
 VORN_JSON_MEMORY_TO_BAD_ALLOC
@@ -113,10 +103,11 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
     Json::Value jRecord = m_jEmpty;
     Json::Value::iterator itMember = jRecord.begin();
     bool blLeaveOut = false;
-    for (const Column& Each : m_vecInKeyOrder) {
+    int nColumn = 0;
+    for (const Column& Each : m_vecRead) {
         Json::Value& jMember = *itMember;
         ++itMember;
-        sqlite3_value* const pValue = ColumnValue(pStatement, Each.nColumn);
+        sqlite3_value* const pValue = ColumnValue(pStatement, nColumn++);
         const RowKind eKind = KindOf(pValue, Each.eKind);
         // mutate(sunk): with nothing to leave out nothing is.
         if (eKind == RowKind::kJson) {
@@ -138,10 +129,11 @@ Json::Value RowReader::Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const tr
 VORN_JSON_MEMORY_TO_BAD_ALLOC
 
 void RowReader::LeaveOutNulls(sqlite3_stmt* pStatement, Json::Value& jRecord) const {
-    for (const Column& Each : m_vecInKeyOrder) {
-        const bool blNull = sqlite3_column_type(pStatement, Each.nColumn) == SQLITE_NULL;
-        if (blNull && !Each.blKeepNull) {
-            jRecord.removeMember(m_vecNames[static_cast<size_t>(Each.nColumn)]);
+    int nColumn = 0;
+    for (const Column& Each : m_vecRead) {
+        const int nType = sqlite3_value_type(ColumnValue(pStatement, nColumn++));
+        if (nType == SQLITE_NULL && !Each.blKeepNull) {
+            jRecord.removeMember(Each.pMember->strName);
         }
     }
 }

@@ -15,8 +15,8 @@ namespace vornjsondb {
 
 class RowReader {
   public:
-    // For rows whose columns are these members. Of must outlive it.
-    RowReader(const Members& Of, std::vector<size_t> vecColumns, VORN_JSON_DB::Nulls eNulls);
+    // For rows whose columns are these members, in the members' order. Of must outlive it.
+    RowReader(const Members& Of, const std::vector<size_t>& vecColumns, VORN_JSON_DB::Nulls eNulls);
 
     // The statement's row as a record.
     Json::Value Read(sqlite3_stmt* pStatement, JsonCodec& Codec) const;
@@ -25,8 +25,7 @@ class RowReader {
 
   private:
     struct Column {
-        int nColumn;
-        size_t nMember;
+        const Member* pMember;
         BoundKind eKind;
         bool blKeepNull;
     };
@@ -34,8 +33,7 @@ class RowReader {
     void LeaveOutNulls(sqlite3_stmt* pStatement, Json::Value& jRecord) const;
 
     std::vector<size_t> m_vecColumns;
-    std::vector<std::string> m_vecNames;
-    std::vector<Column> m_vecInKeyOrder;
+    std::vector<Column> m_vecRead;
     Json::Value m_jEmpty;  // every member, with null
 };
 

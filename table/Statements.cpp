@@ -12,10 +12,10 @@ constexpr size_t kMostStatements = 1000;
 
 }  // namespace
 
-int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out) {
+int Prepare(sqlite3* pDb, const char* szSql, OwnStatement& Out) {
     sqlite3_stmt* pStatement = nullptr;
-    const int nResult = sqlite3_prepare_v3(pDb, strSql.c_str(), static_cast<int>(strSql.size()) + 1,
-                                           SQLITE_PREPARE_PERSISTENT, &pStatement, nullptr);
+    const int nResult =
+        sqlite3_prepare_v3(pDb, szSql, -1, SQLITE_PREPARE_PERSISTENT, &pStatement, nullptr);
     Out.reset(pStatement);
     return nResult;
 }
@@ -31,7 +31,7 @@ int PrepareFor(sqlite3* pDb, const std::string& strSql, const std::string& strTe
 std::string TextColumn(const OwnStatement& pStatement, int nColumn) {
     std::string strText;
     if (const auto* pText = sqlite3_column_text(pStatement.get(), nColumn)) {
-        strText = reinterpret_cast<const char*>(pText);
+        strText += reinterpret_cast<const char*>(pText);
     }
     return strText;
 }
@@ -69,18 +69,17 @@ Statements::Statements(sqlite3* pDb, size_t nMost)
 }
 
 bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
-    const auto itFound = std::find_if(m_vecKept.rbegin(), m_vecKept.rend(),
-                                      [strShape](const std::unique_ptr<Statement::Kept>& pEach) {
-                                          return pEach->strShape == strShape;
-                                      });
-    // mutate(exchanged): without a statement nobody asks for its home.
-    if (itFound == m_vecKept.rend()) {
-        return false;
+    for (auto itKept = m_vecKept.end(); itKept != m_vecKept.begin();) {
+        --itKept;
+        if ((*itKept)->strShape == strShape) {
+            // mutate(exchanged): in any order.
+            Lent.m_pHome = this;
+            Lent.m_pLent = std::move(*itKept);
+            m_vecKept.erase(itKept);
+            return true;
+        }
     }
-    Lent.m_pHome = this;
-    Lent.m_pLent = std::move(*itFound);
-    m_vecKept.erase(std::next(itFound).base());
-    return true;
+    return false;
 }
 
 int Statements::Take(std::string_view strShape, Callable<std::string()> fnSql, Statement& Lent) {

@@ -21,7 +21,10 @@ struct FinalizeStatement {
 using OwnStatement = std::unique_ptr<sqlite3_stmt, FinalizeStatement>;
 
 // Prepares a statement that is used once. Returns SQLite's result.
-int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out);
+int Prepare(sqlite3* pDb, const char* szSql, OwnStatement& Out);
+inline int Prepare(sqlite3* pDb, const std::string& strSql, OwnStatement& Out) {
+    return Prepare(pDb, strSql.c_str(), Out);
+}
 
 // The same with the first parameter bound to the text, which the caller keeps.
 int PrepareFor(sqlite3* pDb, const std::string& strSql, const std::string& strText,

@@ -77,7 +77,7 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         Plan Made;
         vornjsondb::QueryPlan Resolved(From.Of, From.Codec);
         Resolved.Resolve(Which, vornjsondb::QueryUse::kRead, Made.vecFindings);
-        Status Checked = vornjsondb::FromFindings(Made.vecFindings, What);
+        Status Checked = vornjsondb::FromFindings(FindingList(Made.vecFindings), What);
         // mutate(exchanged): a statement for nobody only takes time.
         if (!Checked.Ok()) {
             return Checked;

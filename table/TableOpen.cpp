@@ -1,6 +1,5 @@
 // A Table's life: opening, and what is the same for all of its operations.
 
-#include <algorithm>
 #include <limits>
 #include <numeric>
 #include <utility>
@@ -43,7 +42,7 @@ Status CheckEncoding(sqlite3* pDb, const Doing& What) {
         return FailBySqlite(pDb, nResult, What);
     }
     const std::string strEncoding = vornjsondb::TextColumn(pStatement, 0);
-    if (strEncoding.compare(0, 6, "UTF-16") == 0) {
+    if (std::string_view(strEncoding) != "UTF-8") {
         return vornjsondb::Fail(
             StatusCode::kRefused, What,
             vornjsondb::Concat({"the database is ", strEncoding, ", not UTF-8"}));
@@ -70,27 +69,18 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
 
 // Whether a statement on the table may end halfway: by ON CONFLICT FAIL and RAISE(FAIL), its own or
 // those of a table that its triggers and foreign keys change. A name with these letters costs a
-// savepoint and nothing else. What follows OR is asked of all tables.
-int FindFails(const Table::Parts& Of, bool& blFails) {
-    static constexpr char kFails[] = "type IN ('table', 'trigger') AND instr(lower(sql), 'fail')";
-    static constexpr char kReaches[] = "type = 'trigger' OR instr(lower(sql), 'references')";
-    bool blReaches = false;
-    int nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), kFails, blFails);
-    if (nResult == SQLITE_OK) {
-        nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), kReaches, blReaches);
-    }
-    if (nResult == SQLITE_OK && blReaches) {
-        const std::string strAny = std::string("0 OR ") + kFails;
-        nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(), strAny.c_str(), blFails);
-    }
-    return nResult;
-}
+// savepoint and nothing else.
+constexpr char kFails[] =
+    "type IN ('table', 'trigger') AND instr(lower(sql), 'fail') AND (tbl_name = ?1 COLLATE NOCASE"
+    " OR EXISTS (SELECT 1 FROM Here WHERE tbl_name = ?1 COLLATE NOCASE AND type = 'trigger'"
+    " OR instr(lower(sql), 'references')))";
 
 // Whatever is written into an index on a place in JSON is wrong for every other program.
 Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
     bool blJson = false;
-    const int nResult = vornjsondb::IsInSchema(Of.pDb, Of.Of.Table(),
-                                               "type = 'index' AND instr(sql, 'json_')", blJson);
+    const int nResult = vornjsondb::IsInSchema(
+        Of.pDb, Of.Of.Table(),
+        "tbl_name = ?1 COLLATE NOCASE AND type = 'index' AND instr(sql, 'json_')", blJson);
     if (nResult != SQLITE_OK) {
         return FailBySqlite(Of.pDb, nResult, What);
     }
@@ -99,6 +89,14 @@ Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
         vornjsondb::CheckFractions("", vecFindings);
     }
     return vornjsondb::FromFindings(std::move(vecFindings), What);
+}
+
+bool HasTextKey(const vornjsondb::Members& Of) {
+    bool blText = false;
+    for (const size_t nMember : Of.Key()) {
+        blText = blText || IsOrderedAsText(Of.At(nMember));
+    }
+    return blText;
 }
 
 bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
@@ -153,9 +151,9 @@ Status Table::Parts::Meet() {
     if (!Outcome.Ok()) {
         return Outcome;
     }
-    int nLearned = LearnCollations();
+    int nLearned = HasTextKey(Of) ? vornjsondb::LearnCollations(pDb, Of) : SQLITE_OK;
     if (nLearned == SQLITE_OK) {
-        nLearned = FindFails(*this, blFails);
+        nLearned = vornjsondb::IsInSchema(pDb, Of.Table(), kFails, blFails);
     }
     return FromSqlite(pDb, nLearned, What);
 }
@@ -189,31 +187,6 @@ void Table::Parts::Learn(const RealTable& Real) {
             nHandedOut = nMember;
         }
     }
-}
-
-// A key tells records apart as the unique index on it does, which may compare texts in another way
-// than their columns. Of several the one counts that does as they do.
-int Table::Parts::LearnCollations() {
-    vornjsondb::RealIndexes There;
-    int nResult = SQLITE_OK;
-    if (std::any_of(Of.Key().begin(), Of.Key().end(),
-                    [this](size_t nMember) { return IsOrderedAsText(Of.At(nMember)); })) {
-        nResult = ReadRealIndexes(pDb, Of.Table(), There);
-    }
-    const vornjsondb::RealIndex* pCounts = nullptr;
-    for (const vornjsondb::RealIndex& Index : There.vecAll) {
-        // mutate(exchanged): all only look.
-        if (Index.blUnique && (pCounts == nullptr || Index.blOwn) &&
-            vornjsondb::AreSameColumns(Index.vecColumns, vecKeyNames)) {
-            pCounts = &Index;
-        }
-    }
-    for (size_t i = 0; pCounts != nullptr && i < pCounts->vecColumns.size(); ++i) {
-        // mutate(doubled): the same once more.
-        Of.SetCollate(Of.FindColumn(pCounts->vecColumns[i]),
-                      " COLLATE " + vornjsondb::Quoted(pCounts->vecCollations[i]));
-    }
-    return nResult;
 }
 
 Table::Table() = default;

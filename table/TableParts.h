@@ -31,7 +31,6 @@ struct VORN_JSON_DB::Table::Parts {
     vornjsondb::Doing Do(const char* szDo) const { return {szDo, &Of.Table()}; }
 
     void Learn(const vornjsondb::RealTable& Real);
-    int LearnCollations();  // SQLite's result
 
     // Whether the record leaves it to SQLite to hand out its rowid, of which the member does not
     // hold every value.

@@ -1,5 +1,6 @@
 // Reading what a query selects.
 
+#include <optional>
 #include <utility>
 
 #include "Concat.h"
@@ -58,14 +59,14 @@ Status Select(Parts& From, const Query& Which, const Doing& What,
 // The same with records. fnRecord may take the record.
 Status SelectRecords(Parts& From, const Query& Which, const Doing& What,
                      Callable<bool(Json::Value&)> fnRecord) {
-    std::unique_ptr<vornjsondb::RowReader> pSome;
+    std::optional<vornjsondb::RowReader> Some;
     const auto fnRow = [&](sqlite3_stmt* pStatement, const std::vector<size_t>& vecColumns) {
         const bool blAll = &vecColumns == &From.WholeRow.Columns();
         // mutate(hoisted, sunk): each new one reads alike.
-        if (!blAll && !pSome) {
-            pSome = std::make_unique<vornjsondb::RowReader>(From.Of, vecColumns, From.How.eNulls);
+        if (!blAll && !Some) {
+            Some.emplace(From.Of, vecColumns, From.How.eNulls);
         }
-        Json::Value jRecord = (blAll ? From.WholeRow : *pSome).Read(pStatement, From.Codec);
+        Json::Value jRecord = (blAll ? From.WholeRow : *Some).Read(pStatement, From.Codec);
         return fnRecord(jRecord);
     };
     return Select(From, Which, What, fnRow);

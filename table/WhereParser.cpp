@@ -34,7 +34,7 @@ struct GroupKey {
 constexpr GroupKey kGroupKeys[] = {
     {"$and", Condition::All, true}, {"$or", Condition::Any, true}, {"$not", NotAll, false}};
 
-const GroupKey* FindGroupKey(const std::string& strKey) {
+const GroupKey* FindGroupKey(std::string_view strKey) {
     for (const GroupKey& Each : kGroupKeys) {
         if (strKey == Each.szKey) {
             return &Each;
@@ -80,7 +80,7 @@ class WhereParser {
         const Json::Value::const_iterator itEnd = jObject.end();
         for (Json::Value::const_iterator it = jObject.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
-            const std::string strKey(Name.pBegin, Name.pEnd);
+            const std::string strKey(Name.View());
             const std::string strBelow = Below(strPath, strKey);
             const GroupKey* pGroup = FindGroupKey(strKey);
             if (!IsOperator(Name)) {
@@ -126,11 +126,11 @@ class WhereParser {
         const Json::Value::const_iterator itEnd = jOperators.end();
         for (Json::Value::const_iterator it = jOperators.begin(); it != itEnd; ++it) {
             const MemberName Name = NameOf(it);
-            const std::string strKey(Name.pBegin, Name.pEnd);
+            const std::string strKey(Name.View());
             const std::string strBelow = Below(strPath, strKey);
             if (const Operator* pRow = FindOperator(strKey)) {
                 AddLeaf(strMember, pRow->eOp, *it, strBelow, vecOut);
-            } else if (strKey == "$not") {
+            } else if (Name.Is("$not")) {
                 Conditions vecParts;
                 ReadOperators(strMember, *it, strBelow, nLevel + 1, vecParts);
                 vecOut.push_back(NotAll(std::move(vecParts)));

@@ -150,6 +150,27 @@ TEST_F(KeyCollationTest, WithoutAUniqueIndexOnItAKeyComparesAsItsColumn) {
               "(\"name\" COLLATE BINARY)");
 }
 
+// Two columns, as the key has, but one of them is not of the key's.
+TEST_F(KeyCollationTest, AnIndexThatNamesOneColumnTwiceIsNotOnAKeyOfTwo) {
+    Meet("(a TEXT, b TEXT); CREATE UNIQUE INDEX item_u ON item (a COLLATE NOCASE, a COLLATE RTRIM)",
+         R"({"item": {"key": ["a", "b"], "member": {"a": {"cpptype": "string"},
+             "b": {"cpptype": "string"}}}})");
+    EXPECT_EQ(Create(R"({"a": "X", "b": "y"})"), R"({"a":"X","b":"y"})");
+    EXPECT_EQ(Get(R"({"a": "X", "b": "y"})"), R"({"a":"X","b":"y"})");
+    EXPECT_EQ(Get(R"({"a": "x", "b": "y"})").substr(0, 9), "not-found");
+}
+
+TEST_F(KeyCollationTest, OfIndexesThatAllCompareInOtherWaysTheNewestCounts) {
+    for (const char* szOther : {"NOCASE", "BINARY"}) {
+        Meet(std::string("(name TEXT COLLATE ") + (*szOther == 'N' ? "BINARY" : "NOCASE") +
+             ", size INTEGER); CREATE UNIQUE INDEX item_o ON item (name COLLATE " + szOther +
+             "); CREATE UNIQUE INDEX item_n ON item (name COLLATE RTRIM)");
+        EXPECT_EQ(Create(R"({"name": "ABC", "size": 1})"), R"({"name":"ABC","size":1})");
+        EXPECT_EQ(Get(R"("ABC ")"), R"({"name":"ABC","size":1})") << szOther;
+        EXPECT_EQ(Get(R"("abc")"), kNoSuch) << szOther;
+    }
+}
+
 TEST_F(KeyCollationTest, LoaderCountsByTheIndex) {
     const struct {
         OnDuplicate eMode;
