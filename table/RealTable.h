@@ -12,7 +12,7 @@ namespace vornjsondb {
 
 struct RealColumn {
     std::string strName;
-    std::string strType;     // as declared
+    std::string strType;     // as declared; empty, too, where a STRICT table says ANY
     std::string strDefault;  // as SQL; empty: none
     bool blNotNull;
     bool blGenerated;
@@ -42,6 +42,12 @@ struct RealIndexes {
 // All return SQLite's result. A table that is not there is no failure.
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
+
+// Whether the table is a STRICT one, where each column has a type and ANY is one.
+int IsStrict(sqlite3* pDb, const std::string& strTable, bool& blStrict);
+
+// Whether the name is a view's.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
 
 // Whether the table's schema has a statement (type, sql) of which the SQL expression szWhat is
 // true.
