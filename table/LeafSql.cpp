@@ -132,6 +132,7 @@ void LeafSql::AddOrdered(const Operand& What) {
     const bool blConverts =
         blText ? m_pMember->eAffinity > Affinity::kText && MayBeNumber(What.Value.strBytes)
                : m_pMember->eAffinity == Affinity::kText;
+    m_Out.blNoIndex = m_Out.blNoIndex || (blConverts && !m_blPath);
     m_strSql += blConverts && !m_blPath ? "+" : "";
     AddLeft(What.eKind);
 }
