@@ -70,7 +70,8 @@ Status CreateReal(Table::Parts& Into, const Doing& What, RealTable& Real) {
 
 // Whether a statement on the table may end halfway: by ON CONFLICT FAIL and RAISE(FAIL), its own or
 // those of a table that its triggers and foreign keys change. A name with these letters costs a
-// savepoint and nothing else. What follows OR is asked of all tables.
+// savepoint and nothing else. "This table AND" is written before each, so that what follows an OR
+// is asked of all tables.
 int FindFails(const Table::Parts& Of, bool& blFails) {
     static constexpr char kFails[] = "type IN ('table', 'trigger') AND instr(lower(sql), 'fail')";
     static constexpr char kReaches[] = "type = 'trigger' OR instr(lower(sql), 'references')";
@@ -103,7 +104,7 @@ Status CheckIndexes(const Table::Parts& Of, const Doing& What) {
 
 bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
                    const vornjsondb::Member& Of) {
-    return IsRowid(Real, Column) && Of.Kind() == vornjsondb::BoundKind::kInteger &&
+    return IsRowid(Real, Column) &&
            vornjsondb::RangeOf(*Of.pType).nMostRead < std::numeric_limits<std::int64_t>::max();
 }
 
