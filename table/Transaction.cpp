@@ -112,7 +112,7 @@ Status Transaction::Commit() {
     }
     Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
     if (nResult != SQLITE_BUSY) {
-        return Failed;
+        return vornjsondb::InTransaction(m_pDb, Failed);
     }
     return vornjsondb::Amended(Failed, Retry::kCall, vornjsondb::WaitedText(m_nWaitMs));
 }
