@@ -114,13 +114,15 @@ bool LeafSql::WriteOperator(const Operator& Row, const Json::Value& jOperand, Pr
     }
 }
 
-// Texts are compared by their bytes, whatever the table says of the column.
+// Texts are compared by their bytes, whatever the table says of the column. So are numbers where
+// texts may be, too: the index has one order for both.
 void LeafSql::AddLeft(ValueKind eKind) {
     if (m_blPath) {
         m_strSql += ValueAt(m_pMember->strColumn, m_Where.strPath);
     } else {
+        const bool blBoth = eKind == ValueKind::kNumber && m_pMember->Kind() == BoundKind::kAny;
         m_strSql += m_pMember->strColumn;
-        m_strSql += eKind == ValueKind::kText ? " COLLATE BINARY" : "";
+        m_strSql += eKind == ValueKind::kText || blBoth ? " COLLATE BINARY" : "";
     }
 }
 
@@ -177,9 +179,7 @@ bool LeafSql::WriteEqual(const Operator& Row, const Json::Value& jOperand, Probl
         m_strSql += blNot ? ") IS NOT TRUE" : "";
         return true;
     }
-    const bool blText = m_pMember->Kind() == BoundKind::kAny ? What.eKind == ValueKind::kText
-                                                             : IsOrderedAsText(*m_pMember);
-    AddLeft(blText ? ValueKind::kText : ValueKind::kNumber);
+    AddLeft(IsOrderedAsText(*m_pMember) ? ValueKind::kText : ValueKind::kNumber);
     m_strSql += Row.szSql;
     m_Out.Add(What.Value);
     return true;

@@ -294,7 +294,8 @@ TEST_F(IndexTest, NoAdviceWhereNoIndexHelps) {
 // A column that makes texts of numbers, or numbers of texts, has no index for their order.
 TEST_F(IndexTest, AdviceKnowsWhatItsColumnConverts) {
     Run("DROP TABLE doc; CREATE TABLE doc (id INTEGER PRIMARY KEY, name NUMERIC, size TEXT,"
-        " rate TEXT, done TEXT, small VARCHAR, tags INT, map INT, json INT, any TEXT)");
+        " rate TEXT, done TEXT, small VARCHAR, tags INT, map INT, json INT, any TEXT COLLATE "
+        "NOCASE)");
     m_Table = Table();
     EXPECT_EQ(Text(m_Table.Open(m_pDb, "doc", Parse(kDocs))), "ok");
     for (const char* szWhere :
@@ -309,6 +310,8 @@ TEST_F(IndexTest, AdviceKnowsWhatItsColumnConverts) {
     };
     const Case kCases[] = {{R"({"size": 5})", "size"},
                            {R"({"any": {"$gt": "5"}})", "any"},
+                           {R"({"any": 5})", "any"},
+                           {R"({"any": {"$in": [5]}})", "any"},
                            {R"({"name": {"$gt": "x"}})", "name"},
                            {R"({"name": {"$prefix": "x"}})", "name"},
                            {R"({"map.a": {"$gt": 5}})", "map.a"},
