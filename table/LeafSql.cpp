@@ -33,6 +33,7 @@ bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
 // Whether SQLite may read a number in the text. A date, with its signs behind digits, is none.
 bool MayBeNumber(std::string_view strText) {
     const size_t nSign = strText.find_last_of("+-");
+    // mutate(exchanged): both only look.
     return strText.find_first_not_of("0123456789.+-eE \t\n\v\f\r") == std::string_view::npos &&
            (nSign == std::string_view::npos || nSign == 0 || strText[nSign - 1] > '9' ||
             strText[nSign - 1] < '0');

@@ -294,6 +294,7 @@ TEST_F(SaveTest, NumberOfNoModeIsRefused) {
         EXPECT_EQ(Text(Load.Start(m_Table, {eMode})),
                   "misuse: cannot load records into table \"task\": there is no OnDuplicate of "
                   "this number");
+        EXPECT_EQ(Text(Load.Commit()), "misuse: cannot load records: the loader is not started");
     }
     EXPECT_EQ(Rows("SELECT * FROM task"), "");
 }
