@@ -67,28 +67,12 @@ Json::Value MembersFromWords(const Context& Call, std::vector<std::string>& vecN
     return jMembers;
 }
 
-// The table knows a column's type by name alone, and ANY is a number's in all tables but STRICT
-// ones.
-void DropForAny(const OpenTable& Open, FindingList& vecFindings) {
-    for (const std::string& strColumn : AnyColumns(Open.pDb.get(), Open.Records.Name())) {
-        using vornjsondb::Below;
-        const std::string strPath =
-            Below(Below(Below("", Open.Records.Name()), "member"), strColumn);
-        const auto fnAbout = [&strPath](const Finding& Found) {
-            return Found.szCode == std::string_view("other-affinity") && Found.strPath == strPath;
-        };
-        vecFindings.erase(std::remove_if(vecFindings.begin(), vecFindings.end(), fnAbout),
-                          vecFindings.end());
-    }
-}
-
 // What keeps a table from being opened is a finding like others, and not the end.
 FindingList FindingsOf(const Context& Call) {
     FindingList vecFindings;
     try {
         OpenTable Open(Call, Access::kRead, KnownDefinition);
         Check(Open.Records.Lint(vecFindings), Call.Db());
-        DropForAny(Open, vecFindings);
     } catch (const Error& Failed) {
         if (Failed.vecFindings.empty()) {
             throw;

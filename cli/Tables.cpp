@@ -45,6 +45,9 @@ void CheckNewName(const std::string& strTable) {
     }
 }
 
+namespace {
+
+// Columns that keep each value as it is although their type has a name: ANY in a STRICT table.
 std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
     // A SQLite that knows no such pragma knows no STRICT table, either.
     const Statement pList = Prepare(pDb, "PRAGMA main.table_list(" + Quoted(strTable) + ")");
@@ -55,6 +58,8 @@ std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
     return Texts(pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE",
                  strTable);
 }
+
+}  // namespace
 
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable) {
     using vornjsondb::Affinity;

@@ -24,8 +24,6 @@ bool TableExists(sqlite3* pDb, const std::string& strTable);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
 
-// Columns that keep each value as it is although their type has a name: ANY in a STRICT table.
-std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable);
 // Columns that turn a text into a number if it looks like one. Such a text is refused.
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable);
 std::string NumberColumnText(const std::string& strColumn, std::string_view strText);

@@ -78,8 +78,8 @@
 // (1) A whole number that no double holds exactly, such as 2^53 + 1, is out of range.
 //
 // A null is SQL's NULL for every type. A value of another kind or range is refused, never
-// converted; so is a record without its key where the next one that the table hands out is beyond
-// the member's range. A stored value that does not fit its member's type, put there by another
+// converted; so is a record without its key where the next one that the table hands out is none of
+// the member's values. A stored value that does not fit its member's type, put there by another
 // program, is read as what it is.
 //
 // Record: a JSON object whose members are the definition's. A member that is absent is not
@@ -382,7 +382,8 @@ class Table {
     // undone. Columns that the table lacks, or has more, are
     // no failure: see Lint and Sync. What is learned of the real table here (its key, whether it is
     // a view, columns that it computes) is not learned again: open it anew after its schema has
-    // been changed otherwise than by Sync and CreateIndex.
+    // been changed otherwise than by Sync and CreateIndex. A table that has become a view refuses
+    // changes.
     Status Open(sqlite3* pDb, const std::string& strName, const Json::Value& jDefinition,
                 const Options& How = Options());
 
@@ -538,7 +539,8 @@ class Transaction {
 
     Status Begin(sqlite3* pDb, Mode eMode = Mode::kImmediate, int nWaitMs = 5000);
 
-    // After kLocked the transaction is still there, and Commit can be called again.
+    // After kLocked the transaction is still there, and Commit can be called again. What a commit
+    // hook forbids is rolled back, as SQLite works, and the message says so.
     Status Commit();
     Status Rollback();
 

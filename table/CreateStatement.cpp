@@ -18,7 +18,7 @@ namespace vornjsondb {
 namespace {
 
 // By which SQLite keeps values as they are bound.
-const char* DeclaredType(BoundKind eKind) {
+const char* DeclaredType(BoundKind eKind, bool blStrict) {
     switch (eKind) {
         case BoundKind::kBoolean:
         case BoundKind::kInteger:
@@ -26,7 +26,7 @@ const char* DeclaredType(BoundKind eKind) {
         case BoundKind::kReal:
             return " REAL";
         case BoundKind::kAny:
-            return "";
+            return blStrict ? " ANY" : "";
         default:
             return " TEXT";
     }
@@ -84,9 +84,9 @@ std::string DefaultClause(const Member& Declared) {
     }
 }
 
-std::string ColumnClause(const Member& Declared, bool blNotNull) {
-    return Concat({Declared.strQuoted, DeclaredType(Declared.Kind()), blNotNull ? " NOT NULL" : "",
-                   DefaultClause(Declared)});
+std::string ColumnClause(const Member& Declared, bool blNotNull, bool blStrict) {
+    return Concat({Declared.strQuoted, DeclaredType(Declared.Kind(), blStrict),
+                   blNotNull ? " NOT NULL" : "", DefaultClause(Declared)});
 }
 
 std::string CreateTableSql(const Members& Of, const std::vector<std::string>& vecFirst) {
@@ -96,10 +96,11 @@ std::string CreateTableSql(const Members& Of, const std::vector<std::string>& ve
         const Member& Declared = Of.At(nMember);
         const bool blRowid = Declared.blKey && Of.HasRowidKey();
         // SQLite lets other keys be NULL, any number of times.
-        Append(strSql, {szBefore,
-                        blRowid ? Concat({Declared.strQuoted, " INTEGER PRIMARY KEY"})
-                                : ColumnClause(Declared, Declared.blNotNull || Declared.blKey),
-                        Declared.blUnique && !blRowid ? " UNIQUE" : ""});
+        Append(strSql,
+               {szBefore,
+                blRowid ? Concat({Declared.strQuoted, " INTEGER PRIMARY KEY"})
+                        : ColumnClause(Declared, Declared.blNotNull || Declared.blKey, false),
+                Declared.blUnique && !blRowid ? " UNIQUE" : ""});
         szBefore = ", ";
     }
     if (!Of.Key().empty() && !Of.HasRowidKey()) {

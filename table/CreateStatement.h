@@ -11,8 +11,9 @@ namespace vornjsondb {
 // The members of vecFirst, each once, are the first columns.
 std::string CreateTableSql(const Members& Of, const std::vector<std::string>& vecFirst);
 
-// One column as CREATE TABLE and ALTER TABLE declare it: name, type, NOT NULL, default.
-std::string ColumnClause(const Member& Declared, bool blNotNull);
+// One column as CREATE TABLE and ALTER TABLE declare it: name, type, NOT NULL, default. blStrict:
+// for a STRICT table, where no type may be left out.
+std::string ColumnClause(const Member& Declared, bool blNotNull, bool blStrict);
 
 // " DEFAULT 'x'", or nothing where the definition has none, or one that is no literal.
 std::string DefaultClause(const Member& Declared);

@@ -57,7 +57,8 @@ Status DefinitionOf(sqlite3* pDb, const std::string& strTable, Json::Value& jDef
     if (nResult != SQLITE_OK) {
         return vornjsondb::FailBySqlite(pDb, nResult, What);
     }
-    if (Real.vecColumns.empty()) {
+    // SQLite takes what stands before a NUL byte for the name.
+    if (Real.vecColumns.empty() || strTable.find('\0') != std::string::npos) {
         return vornjsondb::Fail(StatusCode::kNotFound, What, "there is no such table");
     }
     Json::Value jMade;

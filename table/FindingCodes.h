@@ -17,7 +17,7 @@
     X(kNoDefinition, "no-definition", kError,                                                     \
       "give {\"<table>\": {\"member\": {\"<name>\": {\"cpptype\": \"<type>\"}}}}")                \
     X(kUnknownType, "unknown-type", kError, "use one of the type names in VornJsonDbTable.h")     \
-    X(kBadName, "bad-name", kError, "give the member another name")                               \
+    X(kBadName, "bad-name", kError, "give it another name")                                       \
     X(kSameColumn, "same-column", kError, "give one of the two another name")                     \
     X(kUnknownKey, "unknown-key", kError, "name members of the definition in \"key\"")            \
     X(kNamedTwice, "named-twice", kError, "name each member once")                                \

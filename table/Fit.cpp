@@ -217,7 +217,7 @@ Misfit FitJson(const MemberType& Type, const Json::Value& jValue, bool blCompati
                JsonCodec& Codec, std::string& strJson, BoundValue& Out) {
     // mutate(hoisted): what follows gives its own.
     if (jValue.isNull()) {
-        Out.eKind = BoundValue::Kind::kNull;
+        Out.eKind = BoundValue::Kind::kNull;  // mutate(dropped): a new one is of this kind.
         return Misfit::kNone;
     }
     if (Type.Bound.eKind == BoundKind::kJson) {

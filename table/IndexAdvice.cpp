@@ -1,6 +1,6 @@
 #include "IndexAdvice.h"
 
-#include "ConditionNode.h"
+#include "LeafSql.h"
 
 namespace vornjsondb {
 
@@ -11,7 +11,7 @@ using VORN_JSON_DB::Op;
 using Node = Condition::Node;
 
 // Others are true for most records, for none, or for what no order of values brings together.
-bool IsFoundByIndex(const Node& Leaf) {
+bool IsFoundByIndex(const Node& Leaf, const Members& Of, JsonCodec& Codec) {
     switch (Leaf.eOp) {
         case Op::kNotEqual:
         case Op::kNotIn:
@@ -22,21 +22,27 @@ bool IsFoundByIndex(const Node& Leaf) {
             return Leaf.jOperand.asBool();
         case Op::kIn:
             return !Leaf.jOperand.empty();
-        default:
+        default: {
+            BoundSql Sql;
+            Problem None;
+            LeafSql(Of, Codec, Sql).Write(Leaf, None);
             // JSON's true within a value is neither a number nor a text, which an index has.
-            return !Leaf.jOperand.isBool() ||
-                   Leaf.strMember.find_first_of(".[") == std::string::npos;
+            return !Sql.blNoIndex && (!Leaf.jOperand.isBool() ||
+                                      Leaf.strMember.find_first_of(".[") == std::string::npos);
+        }
     }
 }
 
-bool Advise(const Node& Of, std::vector<std::string>& vecMembers);
+bool Advise(const Node& Where, const Members& Of, JsonCodec& Codec,
+            std::vector<std::string>& vecMembers);
 
 // One of the parts is enough where all must hold, and each is needed where any may.
-bool AdviseGroup(const Node& Of, std::vector<std::string>& vecMembers) {
-    const bool blAny = Of.eKind == Node::Kind::kAny;
-    for (const Condition& Part : Of.vecParts) {
+bool AdviseGroup(const Node& Where, const Members& Of, JsonCodec& Codec,
+                 std::vector<std::string>& vecMembers) {
+    const bool blAny = Where.eKind == Node::Kind::kAny;
+    for (const Condition& Part : Where.vecParts) {
         std::vector<std::string> vecOfPart;
-        const bool blPart = Advise(Part.Root(), vecOfPart);
+        const bool blPart = Advise(Part.Root(), Of, Codec, vecOfPart);
         if (blPart) {
             vecMembers.insert(vecMembers.end(), vecOfPart.begin(), vecOfPart.end());
         }
@@ -47,16 +53,17 @@ bool AdviseGroup(const Node& Of, std::vector<std::string>& vecMembers) {
     return blAny;
 }
 
-bool Advise(const Node& Of, std::vector<std::string>& vecMembers) {
-    switch (Of.eKind) {
+bool Advise(const Node& Where, const Members& Of, JsonCodec& Codec,
+            std::vector<std::string>& vecMembers) {
+    switch (Where.eKind) {
         case Node::Kind::kLeaf:
-            if (IsFoundByIndex(Of)) {
-                vecMembers.push_back(Of.strMember);
+            if (IsFoundByIndex(Where, Of, Codec)) {
+                vecMembers.push_back(Where.strMember);
             }
             return !vecMembers.empty();
         case Node::Kind::kAll:
         case Node::Kind::kAny:
-            return AdviseGroup(Of, vecMembers);
+            return AdviseGroup(Where, Of, Codec, vecMembers);
         default:
             return false;
     }
@@ -64,10 +71,11 @@ bool Advise(const Node& Of, std::vector<std::string>& vecMembers) {
 
 }  // namespace
 
-std::vector<std::string> IndexAdvice(const VORN_JSON_DB::Query& Which) {
+std::vector<std::string> IndexAdvice(const VORN_JSON_DB::Query& Which, const Members& Of,
+                                     JsonCodec& Codec) {
     std::vector<std::string> vecMembers;
     for (const Condition& Part : Which.vecWhere) {
-        if (Advise(Part.Root(), vecMembers)) {
+        if (Advise(Part.Root(), Of, Codec, vecMembers)) {
             return vecMembers;
         }
         vecMembers.clear();

@@ -33,6 +33,7 @@ bool IsOfForm(OperandForm eForm, const Json::Value& jOperand) {
 // Whether SQLite may read a number in the text. A date, with its signs behind digits, is none.
 bool MayBeNumber(std::string_view strText) {
     const size_t nSign = strText.find_last_of("+-");
+    // mutate(exchanged): both only look.
     return strText.find_first_not_of("0123456789.+-eE \t\n\v\f\r") == std::string_view::npos &&
            (nSign == std::string_view::npos || nSign == 0 || strText[nSign - 1] > '9' ||
             strText[nSign - 1] < '0');
@@ -114,13 +115,15 @@ bool LeafSql::WriteOperator(const Operator& Row, const Json::Value& jOperand, Pr
     }
 }
 
-// Texts are compared by their bytes, whatever the table says of the column.
+// Texts are compared by their bytes, whatever the table says of the column. So are numbers where
+// texts may be, too: the index has one order for both.
 void LeafSql::AddLeft(ValueKind eKind) {
     if (m_blPath) {
         m_strSql += ValueAt(m_pMember->strColumn, m_Where.strPath);
     } else {
+        const bool blBoth = eKind == ValueKind::kNumber && m_pMember->Kind() == BoundKind::kAny;
         m_strSql += m_pMember->strColumn;
-        m_strSql += eKind == ValueKind::kText ? " COLLATE BINARY" : "";
+        m_strSql += eKind == ValueKind::kText || blBoth ? " COLLATE BINARY" : "";
     }
 }
 
@@ -132,6 +135,7 @@ void LeafSql::AddOrdered(const Operand& What) {
     const bool blConverts =
         blText ? m_pMember->eAffinity > Affinity::kText && MayBeNumber(What.Value.strBytes)
                : m_pMember->eAffinity == Affinity::kText;
+    m_Out.blNoIndex = m_Out.blNoIndex || (blConverts && !m_blPath);
     m_strSql += blConverts && !m_blPath ? "+" : "";
     AddLeft(What.eKind);
 }
@@ -177,9 +181,7 @@ bool LeafSql::WriteEqual(const Operator& Row, const Json::Value& jOperand, Probl
         m_strSql += blNot ? ") IS NOT TRUE" : "";
         return true;
     }
-    const bool blText = m_pMember->Kind() == BoundKind::kAny ? What.eKind == ValueKind::kText
-                                                             : IsOrderedAsText(*m_pMember);
-    AddLeft(blText ? ValueKind::kText : ValueKind::kNumber);
+    AddLeft(IsOrderedAsText(*m_pMember) ? ValueKind::kText : ValueKind::kNumber);
     m_strSql += Row.szSql;
     m_Out.Add(What.Value);
     return true;

@@ -22,6 +22,8 @@ struct BoundSql {
     std::forward_list<std::string> listTexts;  // that values point to
     WriteLiteral pfnLiteral = nullptr;         // nullptr: values are bound
     bool blReadsJson = false;                  // a path or "$contains" is in it
+    bool blNoIndex = false;                    // a condition is in it that no index serves for the
+                                               // affinity of its column
 
     void Add(const BoundValue& Value);
 };

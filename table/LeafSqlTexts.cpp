@@ -73,6 +73,7 @@ bool LeafSql::WriteLike(const Json::Value& jPattern, Problem& Why) {
 }
 
 void LeafSql::WritePrefix(const Json::Value& jPrefix) {
+    // mutate(exchanged): in any order.
     const Operand From{ValueKind::kText, BoundText(BytesOf(jPrefix))};
     const Operand To{ValueKind::kText, Beyond(BytesOf(jPrefix), m_Reader)};
     m_strSql += '(';

@@ -64,6 +64,7 @@ Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
 
 Status Loader::Parts::Write(FindingList& vecFindings) {
     const vornjsondb::Doing What{"load record", &Into.Of.Table(), Now.nRecords};
+    // mutate(doubled): where something is wrong already it tells nothing.
     vornjsondb::CheckEmpty(Values, vecFindings);
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);
@@ -99,6 +100,7 @@ Status Loader::Parts::Fail(const Status& Outcome) {
                        eCode == StatusCode::kConstraint;
     Now.nFailed += blBad ? 1 : 0;
     const bool blGone = All.IsOpen() && sqlite3_get_autocommit(Into.pDb) != 0;
+    // mutate(exchanged): both only look.
     const bool blGoOn = How.blGoOnAfterBad && !Writer.HasStored();
     return blBad && !blGone && blGoOn ? Outcome : End(Outcome);
 }
@@ -193,7 +195,7 @@ Status Loader::Add(const Json::Value& jRecord) {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    if (m_pParts->nWrong > 0) {
+    if (m_pParts->nWrong > 0) {  // mutate(sunk): what is empty stays so.
         // mutate(doubled): the second time there is none.
         m_pParts->TakeWrong(vecFindings);
         vecFindings.clear();
@@ -207,7 +209,7 @@ Status Loader::EndRecord() {
         return NotReady(m_pParts.get());
     }
     FindingList vecFindings;
-    if (m_pParts->nWrong > 0) {  // mutate(true): of none none is taken.
+    if (m_pParts->nWrong > 0) {  // mutate(true, hoisted, sunk): of none none is taken.
         // mutate(doubled): the second time there is none.
         m_pParts->TakeWrong(vecFindings);
     }

@@ -73,6 +73,7 @@ void Set(Parts* pOf, int nMember, Passed eKind, std::int64_t nValue, double dVal
     BoundValue& Out = pOf->Values.Give(Into);
     switch (eKind) {
         case Passed::kBoolean:
+            // mutate(exchanged): the one knows nothing of the other.
             eMisfit = FitBoolean(Type, nValue != 0, Out);
             szShown = nValue != 0 ? "true" : "false";
             break;
@@ -187,6 +188,7 @@ void Loader::SetJson(int nMember, std::string_view strJson) {
         return;
     }
     // The text of an earlier value may be gone; what ends this one early leaves null.
+    // mutate(doubled): null once more.
     m_pParts->Values.Give(Of);
     FindingList vecFindings;
     const vornjsondb::Member& Into = m_pParts->Into.Of.At(nPlace);

@@ -36,6 +36,10 @@ bool Member::IsNumber() const {
 Members::Members(const std::string& strTable, const Json::Value& jDefinition,
                  FindingList& vecFindings) try
     : m_strTable(strTable), m_strQuotedTable(Quoted(strTable)) {
+    if (strTable.find('\0') != std::string::npos) {
+        Report(vecFindings, FindingCode::kBadName, Below("", strTable),
+               Concat({ShownText(strTable), " cannot be a table: it holds a NUL byte"}));
+    }
     const Json::Value& jMembers = DeclaredMembers(jDefinition, strTable);
     if (!jMembers.isObject() || jMembers.empty()) {
         ReportNoDefinition(strTable, vecFindings);

@@ -41,6 +41,7 @@ size_t Slips(std::string_view strLeft, std::string_view strRight, size_t nTooMan
             const bool blSwapped = i > 1 && j > 1 &&
                                    Lower(strLeft[i - 1]) == Lower(strRight[j - 2]) &&
                                    Lower(strLeft[i - 2]) == Lower(strRight[j - 1]);
+            // mutate(exchanged): the row between has no more slips than this one then.
             if (blSwapped) {
                 pRow[j] = std::min(pRow[j], pTwoUp[j - 2] + 1);
             }

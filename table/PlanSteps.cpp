@@ -9,13 +9,19 @@ namespace vornjsondb {
 
 namespace {
 
-// Whether the step is of that kind and of the table. Releases before 3.36 write "SCAN TABLE task".
-bool IsOf(const std::string& strStep, const char* szKind, const std::string& strTable) {
+// Whether the step is of that kind and of one of the tables. Releases before 3.36 write "SCAN TABLE
+// task".
+bool IsOf(const std::string& strStep, const std::string& strKind,
+          const std::vector<std::string>& vecTables) {
     const std::string strFound = strStep.substr(strStep.find_first_not_of(' ')) + " ";
-    const std::string strNew = std::string(szKind) + " " + strTable + " ";
-    const std::string strOld = std::string(szKind) + " TABLE " + strTable + " ";
-    return strFound.compare(0, strNew.size(), strNew) == 0 ||
-           strFound.compare(0, strOld.size(), strOld) == 0;
+    const auto fnBegins = [&strFound](const std::string& strBegin) {
+        return sqlite3_strnicmp(strFound.c_str(), strBegin.c_str(),
+                                static_cast<int>(strBegin.size())) == 0;
+    };
+    return std::any_of(vecTables.begin(), vecTables.end(), [&](const std::string& strTable) {
+        return fnBegins(strKind + " " + strTable + " ") ||
+               fnBegins(strKind + " TABLE " + strTable + " ");
+    });
 }
 
 }  // namespace
@@ -40,15 +46,16 @@ int ReadPlanSteps(sqlite3* pDb, const std::string& strSql, std::vector<std::stri
     return nResult == SQLITE_DONE ? SQLITE_OK : nResult;
 }
 
-bool HasScan(const std::vector<std::string>& vecSteps, const std::string& strTable) {
+bool HasScan(const std::vector<std::string>& vecSteps, const std::vector<std::string>& vecTables) {
     return std::any_of(vecSteps.begin(), vecSteps.end(), [&](const std::string& strStep) {
-        return IsOf(strStep, "SCAN", strTable) && strStep.find(" USING ") == std::string::npos;
+        return IsOf(strStep, "SCAN", vecTables) && strStep.find(" USING ") == std::string::npos;
     });
 }
 
-bool HasOwnIndex(const std::vector<std::string>& vecSteps, const std::string& strTable) {
+bool HasOwnIndex(const std::vector<std::string>& vecSteps,
+                 const std::vector<std::string>& vecTables) {
     return std::any_of(vecSteps.begin(), vecSteps.end(), [&](const std::string& strStep) {
-        return IsOf(strStep, "SEARCH", strTable) &&
+        return IsOf(strStep, "SEARCH", vecTables) &&
                strStep.find(" USING AUTOMATIC ") != std::string::npos;
     });
 }

@@ -52,15 +52,6 @@ int NumberColumn(const OwnStatement& pStatement, int nColumn) {
     return sqlite3_column_int(pStatement.get(), nColumn);
 }
 
-// SQLite finds the table as in statements, in whatever database it is, and gives no metadata of a
-// view.
-int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
-    const int nResult = sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), nullptr,
-                                                      nullptr, nullptr, nullptr, nullptr, nullptr);
-    blView = nResult == SQLITE_ERROR;
-    return blView ? SQLITE_OK : nResult;
-}
-
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
@@ -84,7 +75,33 @@ int FindDatabase(sqlite3* pDb, const std::string& strTable, std::string& strData
                       [&](const OwnStatement& pRow) { strDatabase = TextColumn(pRow, 0); });
 }
 
+bool IsAny(const RealColumn& Column) {
+    return IsSameColumn(Column.strType, "ANY");
+}
+
 }  // namespace
+
+// Releases before 3.37 have no such pragma, and no such tables.
+int IsStrict(sqlite3* pDb, const std::string& strTable, bool& blStrict) {
+    std::string strDatabase;
+    int nResult = FindDatabase(pDb, strTable, strDatabase);
+    if (nResult == SQLITE_OK) {
+        nResult = ForEachRow(pDb,
+                             "SELECT 1 FROM pragma_table_list(?1) WHERE strict AND schema = " +
+                                 Enclosed(strDatabase, '\''),
+                             strTable, [&](const OwnStatement&) { blStrict = true; });
+    }
+    return nResult == SQLITE_ERROR ? SQLITE_OK : nResult;
+}
+
+// SQLite finds the table as in statements, in whatever database it is, and gives no metadata of a
+// view.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView) {
+    const int nResult = sqlite3_table_column_metadata(pDb, nullptr, strTable.c_str(), nullptr,
+                                                      nullptr, nullptr, nullptr, nullptr, nullptr);
+    blView = nResult == SQLITE_ERROR;
+    return blView ? SQLITE_OK : nResult;
+}
 
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     // Hidden columns of virtual tables are no part of a row; generated ones are, of either kind.
@@ -111,6 +128,16 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         // Some builds of SQLite give views a rowid, which is NULL.
         if (!Out.blView) {
             Out.strRowid = NameOfRowid(pDb, strTable, Out);
+        }
+    }
+    // There it keeps all as it is; anywhere else it is one more word for a number.
+    if (nResult == SQLITE_OK && std::any_of(Out.vecColumns.begin(), Out.vecColumns.end(), IsAny)) {
+        bool blStrict = false;
+        nResult = IsStrict(pDb, strTable, blStrict);
+        for (RealColumn& Column : Out.vecColumns) {
+            if (blStrict && IsAny(Column)) {
+                Column.strType.clear();
+            }
         }
     }
     return nResult;

@@ -14,7 +14,7 @@ namespace vornjsondb {
 
 struct RealColumn {
     std::string strName;
-    std::string strType;     // as declared
+    std::string strType;     // as declared; empty, too, where a STRICT table says ANY
     std::string strDefault;  // as SQL; empty: none
     bool blNotNull;
     bool blGenerated;
@@ -46,6 +46,12 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
 // Tells the members of the key how the unique index on it compares texts, which may be in another
 // way than their columns do. Of several the one counts that does as they do.
 int LearnCollations(sqlite3* pDb, Members& Of);
+
+// Whether the table is a STRICT one, where each column has a type and ANY is one.
+int IsStrict(sqlite3* pDb, const std::string& strTable, bool& blStrict);
+
+// Whether the name is a view's.
+int IsView(sqlite3* pDb, const std::string& strTable, bool& blView);
 
 // Whether of a row of "Here", the schema of the table's database and that of temporary things, the
 // SQL expression szWhat is true, in which ?1 is the table's name.

@@ -170,6 +170,9 @@ void RecordValues::Refuse(const Member& Into, Misfit eMisfit, const Json::Value&
 }
 
 void RecordValues::RefuseUnknown(std::string_view strUnknown, FindingList& vecFindings) const {
+    if (vecFindings.size() == kMostFindings) {
+        return;
+    }
     const std::string strName(strUnknown);
     Report(vecFindings, FindingCode::kUnknownMember, Below("", strName),
            Concat({"there is no member ", ShownText(strName), Suggestion(strName, m_Of.Names())}));

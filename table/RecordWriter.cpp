@@ -5,6 +5,7 @@
 
 #include "Concat.h"
 #include "FindingCodes.h"
+#include "RealTable.h"
 
 namespace vornjsondb {
 
@@ -82,6 +83,16 @@ Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What) {
                          "there is no OnDuplicate of this number");
 }
 
+Status CheckTable(const Table::Parts& Of, const Doing& What) {
+    bool blView = false;
+    const int nResult = Of.blView ? SQLITE_OK : IsView(Of.pDb, Of.Of.Table(), blView);
+    if (!blView) {
+        return FromSqlite(Of.pDb, nResult, What);
+    }
+    return Fail(StatusCode::kMisuse, What,
+                "it has become a view, whose triggers may have done something: open it anew");
+}
+
 std::string WhereKey(const Members& Of) {
     std::string strWhere;
     for (const size_t nMember : Of.Key()) {
@@ -140,44 +151,42 @@ int RecordWriter::Run(Verb eVerb, int& nRows) {
     return nResult;
 }
 
-// An upsert updates first: an INSERT would ask for all NOT NULL members even of a record that is
-// there and needs none of them. What replaces looks first, to tell which it was; and so does all in
-// a view, where SQLite counts no changes.
+// What replaces looks first, to tell which it was. So does an upsert: an INSERT would ask for all
+// NOT NULL members even of a record that is there and needs none of them, and of an UPDATE that a
+// trigger has ignored SQLite counts as much as of one that finds nothing.
 Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written& eWritten) {
     struct Mode {
-        Verb eFirst, eThen;  // kInsert: nothing comes first
+        bool blLooks;
+        Verb eNew, eThere;
         Written eFound;
     };
-    static constexpr Mode kModes[] = {{Verb::kInsert, Verb::kInsert, Written::kInserted},
-                                      {Verb::kInsert, Verb::kInsertNew, Written::kSkipped},
-                                      {Verb::kFind, Verb::kReplace, Written::kReplaced},
-                                      {Verb::kUpdate, Verb::kInsert, Written::kUpdated}};
+    static constexpr Mode kModes[] = {
+        {false, Verb::kInsert, Verb::kInsert, Written::kInserted},
+        {false, Verb::kInsertNew, Verb::kInsertNew, Written::kSkipped},
+        {true, Verb::kReplace, Verb::kReplace, Written::kReplaced},
+        {true, Verb::kInsert, Verb::kUpdate, Written::kUpdated}};
     const Mode& Now = kModes[static_cast<size_t>(eOnDuplicate)];
-    int nResult = SQLITE_OK;
     int nFound = 0;
     int nChanged = 0;
-    if (Now.eFirst != Verb::kInsert) {
-        nResult = Run(m_Into.blView ? Verb::kFind : Now.eFirst, nFound);
+    int nResult = Now.blLooks ? Run(Verb::kFind, nFound) : SQLITE_OK;
+    const Verb eVerb = nFound > 0 ? Now.eThere : Now.eNew;
+    if (nResult == SQLITE_OK && eVerb != Verb::kUpdate && m_Values.HasDefaults()) {
+        FindingList vecFindings;
+        if (!m_Values.FillDefaults(vecFindings)) {
+            return FromFindings(std::move(vecFindings), What);
+        }
     }
-    eWritten = nFound > 0 ? Now.eFound : Written::kInserted;
-    if (nResult == SQLITE_OK && eWritten != Written::kUpdated) {
-        if (m_Values.HasDefaults()) {
-            FindingList vecFindings;
-            if (!m_Values.FillDefaults(vecFindings)) {
-                return FromFindings(std::move(vecFindings), What);
-            }
-        }
-        nResult = Run(Now.eThen, nChanged);
-        const bool blSkipped = Now.eThen == Verb::kInsertNew && nChanged == 0;
-        // mutate(exchanged): of a record that failed it is not asked.
-        eWritten = blSkipped ? Now.eFound : eWritten;
-        if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
-            return Fail(StatusCode::kConstraint, What,
-                        "nothing was stored: a trigger or an ON CONFLICT clause of the table has "
-                        "ignored the record");
-        }
-    } else if (nResult == SQLITE_OK && m_Into.blView) {
-        nResult = Run(Verb::kUpdate, nChanged);
+    if (nResult == SQLITE_OK) {
+        nResult = Run(eVerb, nChanged);
+    }
+    const bool blSkipped = eVerb == Verb::kInsertNew && nChanged == 0;
+    eWritten = nFound > 0 || blSkipped ? Now.eFound : Written::kInserted;
+    if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
+        Status Still = CheckTable(m_Into, What);
+        return Still.Ok() ? Fail(StatusCode::kConstraint, What,
+                                 "nothing was stored: a trigger or an ON CONFLICT clause of the "
+                                 "table has ignored the record")
+                          : Still;
     }
     if (nResult == SQLITE_OK) {
         return m_Into.HandsOut(m_Values) ? CheckRowid(What) : Status();

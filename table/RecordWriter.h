@@ -50,6 +50,10 @@ void CheckEmpty(const RecordValues& Values, FindingList& vecFindings);
 // A failure for a number that is none of its values.
 Status CheckMode(OnDuplicate eOnDuplicate, const Doing& What);
 
+// A failure where no row was changed because the table has become a view since it was opened:
+// SQLite counts nothing of what is done to one.
+Status CheckTable(const Table::Parts& Of, const Doing& What);
+
 // " WHERE "task"."id" = ?": parameters in the key's order.
 std::string WhereKey(const Members& Of);
 

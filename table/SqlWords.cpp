@@ -38,25 +38,49 @@ size_t BehindEnclosure(const std::string& strSql, size_t nAt) {
 
 }  // namespace
 
-bool HoldsWord(const std::string& strSql, std::string_view strWord) {
-    size_t nAt = 0;
-    while (nAt < strSql.size()) {
-        const size_t nBehind = BehindEnclosure(strSql, nAt);
-        if (nBehind > nAt) {
-            nAt = nBehind;
+std::vector<SqlWord> WordsOf(const std::string& strSql) {
+    std::vector<SqlWord> vecWords;
+    for (size_t nAt = 0, nEnd = 0; nAt < strSql.size(); nAt = nEnd) {
+        nEnd = BehindEnclosure(strSql, nAt);
+        if (nEnd > nAt) {
+            if (strSql[nAt] != '-' && strSql[nAt] != '/') {
+                vecWords.push_back({strSql.substr(nAt + 1, nEnd - nAt - 2), true});
+            }
             continue;
         }
-        size_t nEnd = nAt;
         while (nEnd < strSql.size() && IsOfWord(strSql[nEnd])) {
             ++nEnd;
         }
-        if (nEnd - nAt == strWord.size() &&
-            sqlite3_strnicmp(&strSql[nAt], strWord.data(), static_cast<int>(strWord.size())) == 0) {
-            return true;
+        nEnd = std::max(nEnd, nAt + 1);
+        if (std::isspace(static_cast<unsigned char>(strSql[nAt])) == 0) {
+            vecWords.push_back({strSql.substr(nAt, nEnd - nAt), false});
         }
-        nAt = std::max(nEnd, nAt + 1);
     }
-    return false;
+    return vecWords;
+}
+
+bool HoldsWord(const std::string& strSql, const char* szWord) {
+    const std::vector<SqlWord> vecWords = WordsOf(strSql);
+    return std::any_of(vecWords.begin(), vecWords.end(), [szWord](const SqlWord& Word) {
+        return !Word.blQuoted && sqlite3_stricmp(Word.strText.c_str(), szWord) == 0;
+    });
+}
+
+std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable) {
+    const auto fnIs = [](const SqlWord& Word, const char* szText) {
+        return sqlite3_stricmp(Word.strText.c_str(), szText) == 0;
+    };
+    std::vector<std::string> vecNames{strTable};
+    std::vector<SqlWord> vecWords = WordsOf(strSql);
+    vecWords.insert(vecWords.begin(), 2, SqlWord());
+    vecWords.insert(vecWords.end(), 2, SqlWord());
+    for (size_t i = 2; i < vecWords.size() - 2; ++i) {
+        if (fnIs(vecWords[i], strTable.c_str())) {
+            vecNames.push_back(vecWords[i - 2].strText + vecWords[i - 1].strText + strTable);
+            vecNames.push_back(vecWords[fnIs(vecWords[i + 1], "AS") ? i + 2 : i + 1].strText);
+        }
+    }
+    return vecNames;
 }
 
 }  // namespace vornjsondb

@@ -35,7 +35,8 @@ Status Run(Parts& Into, const Doing& What, const std::string& strShape,
             nResult = Lent.Finish();
         }
         nRows = sqlite3_changes(Into.pDb);
-        return vornjsondb::FromSqlite(Into.pDb, nResult, What);
+        return nResult == SQLITE_OK && nRows == 0 ? vornjsondb::CheckTable(Into, What)
+                                                  : vornjsondb::FromSqlite(Into.pDb, nResult, What);
     };
     Status Outcome =
         Into.blFails ? vornjsondb::AttemptWhole(Into.pDb, Into.Kept, Into.How.nWaitMs, What, fnRun)

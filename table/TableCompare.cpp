@@ -29,6 +29,10 @@ class TableCompare {
         if (nResult == SQLITE_OK && blFound) {
             nResult = ReadRealIndexes(m_pDb, m_Of.Table(), m_Indexes);
         }
+        // mutate(exchanged): in any order.
+        if (nResult == SQLITE_OK && blFound) {
+            nResult = IsStrict(m_pDb, m_Of.Table(), m_blStrict);
+        }
         // mutate(exchanged, false, || to &&): what was found is told only where all went well.
         if (nResult != SQLITE_OK || !blFound) {
             return nResult;
@@ -121,7 +125,7 @@ class TableCompare {
             const bool blNotNull = Of.blNotNull && !strDefault.empty();
             // mutate(exchanged): statements and findings are told apart.
             m_pvecStatements->push_back("ALTER TABLE " + m_Of.QuotedTable() + " ADD COLUMN " +
-                                        ColumnClause(Of, blNotNull));
+                                        ColumnClause(Of, blNotNull, m_blStrict));
             if (Of.blNotNull && !blNotNull) {
                 Add(LintCode::kNullableColumn, Of,
                     " is \"notNull\" without a default, so that its new column takes NULL");
@@ -205,6 +209,7 @@ class TableCompare {
     std::vector<std::string>* m_pvecStatements;
     FindingList& m_vecFindings;
     RealTable m_Real;
+    bool m_blStrict = false;
     RealIndexes m_Indexes;
     std::vector<std::string> m_vecPlanned;                    // names of indexes
     std::vector<std::vector<std::string>> m_vecUniqueByPlan;  // their columns

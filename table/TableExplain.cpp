@@ -90,8 +90,9 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         if (!Outcome.Ok()) {
             return Outcome;
         }
-        const std::vector<std::string> vecAdvice = vornjsondb::IndexAdvice(Which);
-        if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, Name())) {
+        const std::vector<std::string> vecAdvice =
+            vornjsondb::IndexAdvice(Which, From.Of, From.Codec);
+        if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, {Name()})) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "/where",
                 "all records are looked at, which an index spares on " + Joined(vecAdvice));
@@ -116,9 +117,10 @@ Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
         if (!Outcome.Ok()) {
             return Outcome;
         }
+        const std::vector<std::string> vecNames = vornjsondb::NamesIn(strSql, Name());
         const bool blSearched =
-            vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, Name());
-        if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, Name())) {
+            vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, vecNames);
+        if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, vecNames)) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "",
                 "all records are looked at; an index on what is compared may spare it");

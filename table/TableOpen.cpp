@@ -101,7 +101,7 @@ bool HasTextKey(const vornjsondb::Members& Of) {
 
 bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
                    const vornjsondb::Member& Of) {
-    return IsRowid(Real, Column) && Of.Kind() == vornjsondb::BoundKind::kInteger &&
+    return IsRowid(Real, Column) &&
            vornjsondb::RangeOf(*Of.pType).nMostRead < std::numeric_limits<std::int64_t>::max();
 }
 

@@ -21,6 +21,7 @@ using Parts = Table::Parts;
 Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& jStored) {
     const bool blByRowid = eWritten == Written::kInserted && !From.strRowid.empty();
     FindingList vecMissing;
+    // mutate(exchanged): both only look.
     if (!blByRowid && !From.Values.HasKey(vecMissing)) {
         return vornjsondb::Fail(StatusCode::kNotFound, What,
                                 "the row cannot be told from others: it has no rowid, and the "
@@ -51,12 +52,14 @@ Status ReadBack(Parts& From, Written eWritten, const Doing& What, Json::Value& j
 // A single statement is whole by itself, as long as nothing is looked at behind it.
 bool IsOneStatement(const Parts& Into, OnDuplicate eOnDuplicate, const Json::Value* pjStored) {
     const bool blOne = eOnDuplicate == OnDuplicate::kStop || eOnDuplicate == OnDuplicate::kSkip;
+    // mutate(exchanged): all only look.
     return blOne && pjStored == nullptr && !Into.HandsOut(Into.Values) && !Into.blFails;
 }
 
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
     FindingList vecFindings;
     Into.Values.Take(jRecord, vecFindings);
+    // mutate(doubled): where something is wrong already it tells nothing.
     vornjsondb::CheckEmpty(Into.Values, vecFindings);
     if (vecFindings.empty() && eOnDuplicate != OnDuplicate::kStop) {
         Into.Values.HasKey(vecFindings);

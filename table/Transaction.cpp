@@ -41,6 +41,7 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     if (nPrepared == SQLITE_OK) {
         nPrepared = vornjsondb::Prepare(pDb, m_blSavepoint ? "RELEASE vornjsondb" : "COMMIT", pEnd);
     }
+    // mutate(exchanged): in any order.
     if (nPrepared == SQLITE_OK) {
         nPrepared = vornjsondb::Prepare(pDb, "BEGIN IMMEDIATE", pBegin);
     }
@@ -55,9 +56,11 @@ Status Transaction::Begin(sqlite3* pDb, Mode eMode, int nWaitMs) {
     const auto fnBegin = [&]() -> Status {
         const int nResult = RunOnce(pFirst.get());
         if (nResult != SQLITE_OK) {
+            // mutate(exchanged): an interrupt is told in the same words behind it.
             Status Failed = vornjsondb::FailBySqlite(pDb, nResult, What);
             // A BEGIN may be interrupted when its work is done.
             if (!m_blSavepoint && sqlite3_get_autocommit(pDb) == 0) {
+                // mutate(doubled): what is undone is not there to be undone again.
                 vornjsondb::Undo(pUndo.get(), pBegin.get());
             }
             return Failed;
@@ -80,9 +83,8 @@ int Transaction::Undo() {
 }
 
 void Transaction::Close() {
-    // mutate(exchanged): in any order.
-    sqlite3_finalize(m_pUndo);
-    sqlite3_finalize(m_pEnd);
+    sqlite3_finalize(m_pUndo);  // mutate(exchanged): in any order.
+    sqlite3_finalize(m_pEnd);   // mutate(exchanged): in any order.
     sqlite3_finalize(m_pBegin);
     m_pDb = nullptr;
 }
@@ -112,7 +114,7 @@ Status Transaction::Commit() {
     }
     Status Failed = vornjsondb::FailBySqlite(m_pDb, nResult, What);
     if (nResult != SQLITE_BUSY) {
-        return Failed;
+        return vornjsondb::InTransaction(m_pDb, Failed);
     }
     return vornjsondb::Amended(Failed, Retry::kCall, vornjsondb::WaitedText(m_nWaitMs));
 }

@@ -164,7 +164,7 @@ small() {
 small insert new.db t lines
 same 'exit with a full disk' $? 7
 same 'a full disk' "$(cat err)" \
-    "error: new.db: cannot commit a transaction: disk I/O error; check the disk and the shell's limits (nothing is stored)"
+    "error: new.db: cannot commit a transaction: disk I/O error; the transaction is undone; check the disk and the shell's limits (nothing is stored)"
 same 'no database is left' "$(ls new.db 2>/dev/null)" ''
 for _ in {1..999}; do echo '{"id":'; done >broken.jsonl
 small insert all.db t broken.jsonl --format jsonl --errors bad.jsonl

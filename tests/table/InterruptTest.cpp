@@ -122,6 +122,30 @@ TEST_F(InterruptTest, LeavingATransactionUndoesIt) {
     EXPECT_EQ(Ids(), "1|a");
 }
 
+// All savepoints have one name, and the one around it would be undone.
+TEST_F(InterruptTest, SavepointThatDoesNotBeginUndoesNone) {
+    Transaction Outer, Inner;
+    int nFailed = 0;
+    InterruptEach(
+        [&] {
+            Run("BEGIN");
+            EXPECT_EQ(Text(Outer.Begin(m_pDb)), "ok");
+            Run("INSERT INTO task (id) VALUES (2)");
+        },
+        [&] { return Inner.Begin(m_pDb); },
+        [&](const Status& Begun) {
+            if (Begun.Ok()) {
+                EXPECT_EQ(Text(Inner.Commit()), "ok");
+            } else {
+                ++nFailed;
+            }
+            EXPECT_EQ(Ids(), "open: 1|a;2|NULL");
+            EXPECT_EQ(Text(Outer.Commit()), "ok");
+            Run("ROLLBACK");
+        });
+    EXPECT_GT(nFailed, 0);
+}
+
 TEST_F(InterruptTest, RollbackThatIsInterruptedUndoesAll) {
     for (const char* szBefore : {"SELECT 1", "BEGIN"}) {
         Run(szBefore);

@@ -372,7 +372,10 @@ TEST_F(LoaderTest, WithoutAStartNothingHappens) {
     EXPECT_EQ(strMisuse, Text(Into.Commit()));
     EXPECT_EQ("0 0 0 0 0 0", Counts(Into));
     Table Closed;
-    EXPECT_EQ("misuse: cannot load records into: the table is not open", Text(Into.Start(Closed)));
+    for (const OnDuplicate eMode : {OnDuplicate::kStop, OnDuplicate::kSkip}) {
+        EXPECT_EQ("misuse: cannot load records into: the table is not open",
+                  Text(Into.Start(Closed, {eMode})));
+    }
 }
 
 TEST_F(LoaderTest, CommitWithoutARecordDoesNothing) {

@@ -3,9 +3,11 @@
 
 #ifndef __SANITIZE_ADDRESS__
 
+#include <climits>
 #include <cstdlib>
 #include <functional>
 #include <new>
+#include <utility>
 
 #include "QueryFixture.h"
 
@@ -379,6 +381,22 @@ TEST_F(TableMemoryTest, RecordThatRanOutOfMemoryLeavesNothingToTheNext) {
     }
     EXPECT_TRUE(blUntouched);
     EXPECT_GT(nThrown, 0);
+}
+
+// No nearest name is looked for that nobody is told.
+TEST_F(TableMemoryTest, UnknownNamesBeyondTheLastFindingTakeNothing) {
+    const auto fnCount = [&](int nMembers) {
+        Json::Value jRecord;
+        for (int i = 0; i < nMembers; ++i) {
+            jRecord["name" + std::to_string(1000 + i)] = i;
+        }
+        g_nMallocsUntilFailure = INT_MAX;
+        const Status Outcome = m_Table.Create(jRecord);
+        const int nMallocs = INT_MAX - std::exchange(g_nMallocsUntilFailure, 0);
+        EXPECT_EQ(100U, Outcome.Findings().size());
+        return nMallocs;
+    };
+    EXPECT_EQ(fnCount(100), fnCount(1000));
 }
 
 TEST_F(TableMemoryTest, WhatSpansCalls) {

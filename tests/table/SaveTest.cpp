@@ -294,6 +294,7 @@ TEST_F(SaveTest, NumberOfNoModeIsRefused) {
         EXPECT_EQ(Text(Load.Start(m_Table, {eMode})),
                   "misuse: cannot load records into table \"task\": there is no OnDuplicate of "
                   "this number");
+        EXPECT_EQ(Text(Load.Commit()), "misuse: cannot load records: the loader is not started");
     }
     EXPECT_EQ(Rows("SELECT * FROM task"), "");
 }
@@ -330,6 +331,17 @@ TEST_F(SaveTest, KeyBeyondItsMemberEndsALoad) {
     EXPECT_EQ(Text(Load.Add(Parse(R"({"name": "beyond"})"))), strOut);
     EXPECT_EQ(Text(Load.Commit()), strOut);
     EXPECT_EQ(Rows("SELECT * FROM task"), "");
+}
+
+// A column of whole numbers that is the key is the rowid, whatever its member is.
+TEST_F(SaveTest, KeyThatTheTableHandsOutIsNoFlag) {
+    Open(
+        R"({"t": {"key": "on", "member": {"name": {"cpptype": "string"}, "on": {"cpptype": "bool"}}}})");
+    EXPECT_EQ(Create(R"({"name": "a"})"),
+              "refused: cannot save a record in table \"t\": member \"on\": 1, which the table "
+              "hands out, is another kind of value: expected is true or false [wrong-kind /on]");
+    EXPECT_EQ(Create(R"({"name": "b", "on": true})"), R"({"name":"b","on":true})");
+    EXPECT_EQ(Rows("SELECT * FROM t"), "b|1");
 }
 
 // The rowid is another number there.

@@ -55,7 +55,19 @@ TEST_F(SchemaTest, RecordThatATriggerIgnoresIsNotStored) {
     }
     EXPECT_EQ(Put(R"({"id": 2, "size": 3})", OnDuplicate::kSkip), "ok skipped");
     EXPECT_EQ(Save(R"({"id": 1, "size": 4})", OnDuplicate::kReplace), kIgnored);
+    EXPECT_EQ(Save(R"({"id": 1, "size": 4})", OnDuplicate::kUpsert), kIgnored);
     EXPECT_EQ(Rows("SELECT * FROM item"), "1|a|NULL");
+}
+
+// It would be replaced or stored a second time.
+TEST_F(SchemaTest, UpsertThatATriggerIgnoresInsertsNothing) {
+    for (const char* szKey : {"PRIMARY KEY ON CONFLICT REPLACE", ""}) {
+        Meet(std::string("DROP TABLE IF EXISTS item; CREATE TABLE item (id INT ") + szKey +
+             ", name TEXT, size INT); INSERT INTO item VALUES (1, 'a', 2);"
+             "CREATE TRIGGER u BEFORE UPDATE ON item BEGIN SELECT RAISE(IGNORE); END");
+        EXPECT_EQ(Save(R"({"id": 1, "size": 4})", OnDuplicate::kUpsert), kIgnored);
+        EXPECT_EQ(Rows("SELECT * FROM item"), "1|a|2");
+    }
 }
 
 TEST_F(SchemaTest, RecordThatAClauseIgnoresIsNotStored) {
@@ -194,6 +206,54 @@ TEST_F(SchemaTest, ViewOfAnotherDatabaseIsOneToo) {
         " INSERT INTO base VALUES (new.id, new.name, new.size); END");
     EXPECT_TRUE(m_Table.IsView());
     EXPECT_EQ(Create(R"({"id": 1, "name": "a"})"), R"({"id":1,"name":"a"})");
+}
+
+// What is learned when it is opened is not learned again, and SQLite counts nothing of a view.
+TEST_F(SchemaTest, TableThatHasBecomeAViewSaysSoWhereItIsChanged) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, name TEXT, size INT)");
+    Create(R"({"id": 1, "name": "a"})");
+    Run("ALTER TABLE item RENAME TO base; CREATE VIEW item AS SELECT * FROM base");
+    const auto Says = [](const char* szDo, const char* szWhy) {
+        return "refused: cannot " + std::string(szDo) + " table \"item\": " + szWhy;
+    };
+    const char* const kNoTrigger = "cannot modify item because it is a view";
+    EXPECT_EQ(Create(R"({"id": 2})"), Says("save a record in", kNoTrigger));
+    EXPECT_EQ(Text(m_Table.RemoveAll()), Says("remove all records from", kNoTrigger));
+    Run("CREATE TABLE log (a);"
+        "CREATE TRIGGER i INSTEAD OF INSERT ON item BEGIN"
+        " INSERT INTO base VALUES (new.id, new.name, new.size); END;"
+        "CREATE TRIGGER u INSTEAD OF UPDATE ON item BEGIN INSERT INTO log VALUES (new.id); END;"
+        "CREATE TRIGGER d INSTEAD OF DELETE ON item BEGIN INSERT INTO log VALUES (old.id); END");
+    const auto Misuse = [](const char* szDo) {
+        return "misuse: cannot " + std::string(szDo) +
+               " table \"item\": it has become a view, whose triggers may have done something: "
+               "open it anew";
+    };
+    EXPECT_EQ(Create(R"({"id": 2})"), Misuse("save a record in"));
+    EXPECT_EQ(Save(R"({"id": 1, "size": 2})", OnDuplicate::kUpsert), Misuse("save a record in"));
+    for (const OnDuplicate eMode : {OnDuplicate::kSkip, OnDuplicate::kReplace}) {
+        EXPECT_EQ(Save(R"({"id": 1})", eMode), Says("save a record in", "cannot UPSERT a view"));
+    }
+    EXPECT_EQ(Rows("SELECT * FROM base"), "1|a|NULL");
+    EXPECT_EQ(Rows("SELECT * FROM log"), "");
+    // A single statement is done when it is known.
+    EXPECT_EQ(Put(R"({"id": 3})", OnDuplicate::kStop), Misuse("save a record in"));
+    std::int64_t nRows = 7;
+    EXPECT_EQ(Text(m_Table.Update(Query().Where("id", 1), Parse(R"({"size": 5})"), &nRows)),
+              Misuse("update records of"));
+    EXPECT_EQ(Text(m_Table.Remove(Query().Where("id", 1), &nRows)), Misuse("remove records from"));
+    EXPECT_EQ(Text(m_Table.RemoveAll(&nRows)), Misuse("remove all records from"));
+    EXPECT_EQ(nRows, 7);
+    EXPECT_EQ(Text(m_Table.CreateIndex({"size"}, false)),
+              "refused: cannot create an index on table \"item\": views may not be indexed");
+    SyncReport Report;
+    EXPECT_EQ(Text(m_Table.Sync(SyncMode::kChange, Report)), "ok");
+    EXPECT_STREQ(Report.vecFindings[0].szCode, "view");
+    // What reads has what the view has.
+    EXPECT_EQ(Get("1"), R"({"id":1,"name":"a"})");
+    std::int64_t nRecords = 0;
+    EXPECT_EQ(Text(m_Table.Count(Query(), nRecords)), "ok");
+    EXPECT_EQ(nRecords, 2);
 }
 
 TEST_F(SchemaTest, TableSaysWhetherItIsAView) {

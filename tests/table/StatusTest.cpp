@@ -179,6 +179,7 @@ TEST(NearestTest, SlipsAreUnderstood) {
     EXPECT_EQ("", vornjsondb::Nearest(std::string(65, 'x'), {std::string(65, 'x')}));
     EXPECT_EQ("", vornjsondb::Nearest("zzzzab", {"yyyyba"}));
     EXPECT_EQ("", vornjsondb::Nearest("xyzmore", {"bmore"}));
+    EXPECT_EQ("", vornjsondb::Nearest("12ba", {"34ab"}));
     EXPECT_EQ(" (did you mean \"size\"?)", vornjsondb::Suggestion("szie", vecNames));
     EXPECT_EQ("", vornjsondb::Suggestion("colour", vecNames));
 }

@@ -94,6 +94,34 @@ TEST_F(SyncTest, LintTellsEveryDifference) {
         "have one value");
 }
 
+// In a STRICT table ANY keeps all as it is, and no column is without a type.
+TEST_F(SyncTest, StrictTableHasAnyForAnything) {
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, a any) STRICT",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "any"},
+             "b": {"cpptype": "any", "cppDefaultValue": "007"}, "c": {"cpptype": "string"}}})");
+    EXPECT_EQ(Lint(),
+              "missing-column /item/member/b: member \"b\" has no column; "
+              "missing-column /item/member/c: member \"c\" has no column");
+    EXPECT_EQ(Sync(),
+              "ALTER TABLE \"item\" ADD COLUMN \"b\" ANY DEFAULT '007'\n"
+              "ALTER TABLE \"item\" ADD COLUMN \"c\" TEXT\n");
+    EXPECT_EQ(Create(R"({"id": 1, "a": "007"})"), R"({"a":"007","b":"007","id":1})");
+    EXPECT_EQ(Lint(), "");
+    // The one that a name finds counts.
+    Run("CREATE TEMP TABLE item (id INTEGER PRIMARY KEY, a ANY, b, c TEXT)");
+    EXPECT_EQ(Lint(),
+              "other-affinity /item/member/a: member \"a\" of type \"any\": its column, declared "
+              "as \"ANY\", has numeric affinity and changes what is stored");
+}
+
+// What is not there is not STRICT, either.
+TEST_F(SyncTest, SqliteWithoutAListOfTablesHasNoStrictOnes) {
+    Run("CREATE TEMP TABLE pragma_table_list (hides TEXT)");
+    Meet("CREATE TABLE item (id INTEGER PRIMARY KEY)",
+         R"({"key": "id", "member": {"id": {"cpptype": "int"}, "a": {"cpptype": "any"}}})");
+    EXPECT_EQ(Sync(), "ALTER TABLE \"item\" ADD COLUMN \"a\"\n");
+}
+
 TEST_F(SyncTest, LintComparesDefaultsByTheirValues) {
     Meet(
         "CREATE TABLE item (id INTEGER PRIMARY KEY, a INTEGER DEFAULT 2, b INTEGER DEFAULT (1 - 1),"

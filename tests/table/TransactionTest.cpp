@@ -98,6 +98,26 @@ TEST_F(TransactionTest, CommitThatAForeignKeyForbidsLeavesTheTransaction) {
     EXPECT_EQ("ok", Text(All.Commit()));
 }
 
+TEST_F(TransactionTest, CommitThatAHookForbidsSaysThatAllIsUndone) {
+    Open();
+    sqlite3_commit_hook(
+        m_pDb, [](void*) { return 1; }, nullptr);
+    Transaction All;
+    EXPECT_EQ("ok", Text(All.Begin(m_pDb)));
+    EXPECT_EQ(R"({"done":false,"id":1})", Create(R"({"id": 1})"));
+    const Status Outcome = All.Commit();
+    EXPECT_EQ(
+        "constraint: cannot commit a transaction: constraint failed; the transaction is undone",
+        Text(Outcome));
+    EXPECT_EQ(SQLITE_CONSTRAINT_COMMITHOOK, Outcome.SqliteCode());
+    EXPECT_EQ(Retry::kTransaction, Outcome.Advice());
+    EXPECT_EQ("ok", Text(All.Rollback()));
+    EXPECT_EQ("constraint: cannot save a record in table \"task\": constraint failed",
+              Create(R"({"id": 1})"));
+    sqlite3_commit_hook(m_pDb, nullptr, nullptr);
+    EXPECT_EQ("", Rows("SELECT * FROM task"));
+}
+
 // SQLite has no other way than to undo all when the disk is full, and reports a ROLLBACK of nothing
 // as the next error: what is told is the first one.
 TEST_F(TransactionTest, FullDiskUndoesTheCallersTransactionAndIsTold) {
