@@ -13,6 +13,7 @@
 #include "Sql.h"
 #include "Tables.h"
 #include "input/ByteSource.h"
+#include "input/DumpRow.h"
 #include "input/Interrupt.h"
 #include "input/LineBuffer.h"
 #include "input/LockWait.h"
@@ -27,7 +28,7 @@ constexpr int kVersion = 1;
 // FNV-1a: against accidents, not against people.
 class Checksum {
   public:
-    void Add(const std::string& strLine) {
+    void Add(std::string_view strLine) {
         for (const char c : strLine) {
             m_nHash = (m_nHash ^ static_cast<unsigned char>(c)) * 1099511628211U;
         }
@@ -154,14 +155,19 @@ class LineReader {
         if (m_File.Error() != 0) {
             FailToRead();
         }
-        m_strLine.assign(blThere ? m_Lines.Begin() : "", blThere ? m_Lines.Size() : 0);
         m_nLine += 1;
         return blThere;
     }
 
-    const std::string& Line() const { return m_strLine; }
+    std::string_view Line() { return {m_Lines.Begin(), m_Lines.Size()}; }
     std::string Place() const { return m_File.Name() + ":" + std::to_string(m_nLine); }
-    Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
+    Json::Value Parsed() { return ParseJson(std::string(Line()), Place()); }
+    void BindTo(sqlite3_stmt* pRow) {
+        const std::string strWrong = BindRow(m_Lines, pRow);
+        if (!strWrong.empty()) {
+            FailHere(strWrong);
+        }
+    }
 
     [[noreturn]] void FailHere(const std::string& strWhat) const {
         Fail(kExitBadData, Place() + ": " + strWhat + "; dump the table again");
@@ -175,47 +181,8 @@ class LineReader {
 
     ByteSource m_File;
     LineBuffer m_Lines;
-    std::string m_strLine;
     std::int64_t m_nLine = 0;
 };
-
-void BindMarked(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue,
-                const LineReader& From) {
-    if (jValue.isMember("$real")) {
-        const double dInfinity = std::numeric_limits<double>::infinity();
-        sqlite3_bind_double(pRow, nColumn, jValue["$real"] == "inf" ? dInfinity : -dInfinity);
-        return;
-    }
-    bool blRight = jValue.isMember("encoded") && jValue["encoded"].isString();
-    const std::string strBytes = blRight ? FromBase64(jValue["encoded"].asString(), blRight) : "";
-    if (!blRight) {
-        From.FailHere("a value has an unknown form");
-    }
-    const int nBytes = static_cast<int>(strBytes.size());
-    if (jValue.isMember("$text")) {
-        sqlite3_bind_text(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
-    } else {
-        sqlite3_bind_blob(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
-    }
-}
-
-void Bind(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue, const LineReader& From) {
-    if (jValue.isNull()) {
-        sqlite3_bind_null(pRow, nColumn);
-    } else if (jValue.type() == Json::realValue) {
-        sqlite3_bind_double(pRow, nColumn, jValue.asDouble());
-    } else if (jValue.isInt64()) {
-        sqlite3_bind_int64(pRow, nColumn, jValue.asInt64());
-    } else if (jValue.isString()) {
-        const std::string strText = jValue.asString();
-        sqlite3_bind_text(pRow, nColumn, strText.data(), static_cast<int>(strText.size()),
-                          SQLITE_TRANSIENT);
-    } else if (jValue.isObject()) {
-        BindMarked(pRow, nColumn, jValue, From);
-    } else {
-        From.FailHere("a value is of a kind that no dump has");
-    }
-}
 
 Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
     std::string strNames;
@@ -268,30 +235,27 @@ void CheckEnd(LineReader& From) {
     }
 }
 
+void CheckLast(LineReader& From, std::int64_t nRows, const Checksum& Sum) {
+    const Json::Value jLast = From.Parsed();
+    if (jLast["rows"] != Json::Int64(nRows) || jLast["checksum"] != Sum.Text()) {
+        From.FailHere("count or checksum differ from what is above");
+    }
+    CheckEnd(From);
+}
+
 std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
     const Statement pInsert = PrepareInsert(pDb, jHeader);
     Checksum Sum;
     Sum.Add(From.Line());  // the header
-    std::int64_t nRows = 0;
-    while (From.Next()) {
-        const Json::Value jRow = From.Parsed();
-        if (jRow.isObject()) {
-            if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
-                From.FailHere("count or checksum differ from what is above");
-            }
-            CheckEnd(From);
+    for (std::int64_t nRows = 0; From.Next(); ++nRows) {
+        if (From.Line().substr(0, 1) == "{") {
+            CheckLast(From, nRows, Sum);
             return nRows;
         }
-        if (!jRow.isArray() || jRow.size() != jHeader["columns"].size()) {
-            From.FailHere("a row has not " + std::to_string(jHeader["columns"].size()) + " values");
-        }
-        for (Json::ArrayIndex nAt = 0; nAt < jRow.size(); ++nAt) {
-            Bind(pInsert.get(), static_cast<int>(nAt) + 1, jRow[nAt], From);
-        }
+        Sum.Add(From.Line());
+        From.BindTo(pInsert.get());
         Step(pInsert.get());
         sqlite3_reset(pInsert.get());
-        Sum.Add(From.Line());
-        ++nRows;
     }
     From.FailHere("the end is missing");
 }

@@ -118,6 +118,28 @@ sed '1s/CREATE TABLE odd (a, b)/CREATE TABLE odd (b, a)/' dump >turned
 expect 3 '' 'error: turned:8: count or checksum differ from what is above; dump the table again' -- load third.db turned
 sed '1s/{/{"definition":5,/' dump >defined
 expect 3 '' 'error: defined:1: the definition is no object; dump the table again' -- load fifth.db defined
+# Rows that no dump has.
+row() {
+    printf '%s\n%b\n' "$(head -n 1 dump)" "$2" >rows
+    expect 3 '' "error: rows:2: $1; dump the table again" -- load third.db rows
+}
+for values in 5 '[1]' '[1,2,3,4]' '[]'; do
+    row 'a row has not 3 values' "$values"
+done
+for value in true '[1]' 18446744073709551616; do
+    row 'a value is of a kind that no dump has' "[1,2,$value]"
+done
+for value in '{}' '{"$real":"nan"}' '{"$base64":true}' '{"$base64":true,"encoded":"!"}' '{"encoded":"AA=="}' \
+    '{"$text":{},"encoded":"AA=="}' '{"$x":true,"encoded":"AA=="}' '{"$text":true,"encoded":null}'; do
+    row 'a value has an unknown form' "[1,2,$value]"
+done
+row 'a row has bytes that no dump has' '[1,2,"\0377"]'
+row 'a row has bytes that no dump has' '[1,2,"a\tb"]'
+row 'a number is greater than any double' '[1,2,1e999]'
+row 'a text has no end quote' '[1,2,"'
+row 'something follows the value' '[1,2,3] x'
+same 'no file of them is left' "$(ls third.db 2>/dev/null)" ''
+
 cat single.dump dump >both
 expect 3 '' 'error: both:4: something follows the dump of a table; load each dump by itself' -- load third.db both
 sed '1s/"columns":\[/&{},/' dump >named
