@@ -13,6 +13,7 @@
 #include "Command.h"
 #include "Parse.h"
 #include "Terminal.h"
+#include "input/Interrupt.h"
 
 namespace {
 
@@ -81,9 +82,10 @@ int main(int nArguments, char** pszArguments) {
     }
     if (nExit == kExitInterrupted) {
         // A loop in a shell goes on unless the signal itself ended the command; the shell shows
-        // 130.
-        (void)signal(SIGINT, SIG_DFL);
-        (void)raise(SIGINT);
+        // 130 for Ctrl-C.
+        const int nSignal = Interrupt::Signal();
+        (void)signal(nSignal, SIG_DFL);
+        (void)raise(nSignal);
     }
     return nExit;
 }

@@ -98,7 +98,6 @@ class Import {
 
     Context& m_Call;
     const OnDuplicate m_eOnDuplicate;
-    const Interrupt m_Guard;
     InputFiles m_Files;
     const std::string m_strTable;
     const bool m_blMayGuess;
@@ -499,6 +498,7 @@ int Import::Finish() {
 }  // namespace
 
 int RunInsert(Context& Call) {
+    const Interrupt Guard;
     try {
         return Import(Call, true).Run();
     } catch (const WrongGuess&) {
