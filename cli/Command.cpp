@@ -63,16 +63,20 @@ constexpr RemedyRow kRemedies[] = {
     {"wrong-operator", "$like and $prefix are for texts, $contains is for lists"},
 };
 
-// SQLite's words for a member that the table has no column for.
-constexpr const char* kMissingColumn[] = {"no such column: ", " has no column named "};
+// What SQLite says when it refuses something, and what to do then.
+struct WordsRow {
+    const char* szWords;
+    const char* szHint;
+};
 
-bool IsMissingColumn(const Status& Outcome) {
-    return Outcome.Code() == StatusCode::kRefused &&
-           std::any_of(std::begin(kMissingColumn), std::end(kMissingColumn),
-                       [&](const char* szWords) {
-                           return Outcome.Message().find(szWords) != std::string::npos;
-                       });
-}
+constexpr WordsRow kWords[] = {
+    {"no such column: ", "; vornjsondb sync adds the column"},
+    {" has no column named ", "; vornjsondb sync adds the column"},
+    {" already exists", "; drop or rename what is there, or take another database"},
+    {" because it is a view",
+     "; change the table that it reads, or give the view INSTEAD OF triggers"},
+    {"views may not be indexed", "; create the index on the table that it reads"},
+};
 
 void CheckOutput(bool blWritten) {
     if (!blWritten) {
@@ -140,7 +144,12 @@ std::string RemedyOf(const Finding& Found) {
     return Found.strRemedy;
 }
 
-const char* HintFor(StatusCode eCode) {
+const char* HintFor(StatusCode eCode, const std::string& strMessage) {
+    for (const WordsRow& Row : kWords) {
+        if (eCode == StatusCode::kRefused && strMessage.find(Row.szWords) != std::string::npos) {
+            return Row.szHint;
+        }
+    }
     for (const ExitRow& Row : kExits) {
         if (Row.eCode == eCode) {
             return Row.szHint;
@@ -155,11 +164,9 @@ std::string LineOf(const Status& Outcome) {
             return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
-    if (IsMissingColumn(Outcome)) {
-        return Outcome.Message() + "; vornjsondb sync adds the column";
-    }
     const bool blLocked = Outcome.Code() == StatusCode::kLocked;
-    return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) + HintFor(Outcome.Code());
+    return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) +
+           HintFor(Outcome.Code(), Outcome.Message());
 }
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {

@@ -114,6 +114,13 @@ Described Describe(const Context& Call, sqlite3* pDb) {
               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND sql IS NOT NULL ORDER BY "
               "type <> 'table', type, name",
               strTable));
+    for (const Json::Value& jSql : jHeader["statements"]) {
+        if (!IsUtf8(jSql.asString())) {
+            Fail(kExitBadData,
+                 Call.Db() + ": what creates table \"" + strTable +
+                     "\" is no UTF-8, which a dump cannot hold; rename what is in it");
+        }
+    }
     std::vector<std::string> vecColumns = Texts(
         pDb, "SELECT name FROM pragma_table_xinfo(?1) WHERE hidden = 0 ORDER BY cid", strTable);
     const std::string strRowid = RowidName(pDb, strTable);
@@ -312,10 +319,7 @@ int Load(const Context& Call) {
     const Database pDb = OpenDatabase(Call, Access::kCreate);
     Transaction All;
     BeginChange(Call, pDb.get(), All);
-    if (TableExists(pDb.get(), strTable)) {
-        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + strTable +
-                                 "\" already; load into another database");
-    }
+    CheckFree(Call, pDb.get(), strTable, "load into another database");
     Run(pDb.get(), jHeader["statements"][0].asString());
     const std::int64_t nRows = LoadRows(From, pDb.get(), jHeader);
     for (Json::ArrayIndex nAt = 1; nAt < jHeader["statements"].size(); ++nAt) {
@@ -344,6 +348,10 @@ int RunLoad(Context& Call) {
         return Load(Call);
     } catch (Error& Failed) {
         Failed.strLine += Failed.nExit == kExitInterrupted ? " (nothing is stored)" : "";
+        if (Failed.nExit == kExitUnexpected) {
+            Failed.nExit = kExitBadData;
+            Failed.strLine += "; dump the table again, or load it where SQLite knows all of this";
+        }
         throw;
     }
 }

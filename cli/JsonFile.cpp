@@ -6,6 +6,8 @@
 
 #include "Command.h"
 #include "input/ByteSource.h"
+#include "input/Numbers.h"
+#include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -50,6 +52,10 @@ std::string ReadFile(const std::string& strFile) {
 }
 
 Json::Value ParseJson(const std::string& strText, const std::string& strWhere, int nExit) {
+    const std::size_t nWrong = FindNoUtf8(strText);
+    if (nWrong != std::string::npos) {
+        Fail(nExit, strWhere + ": " + NoUtf8Text(strText, nWrong));
+    }
     Json::CharReaderBuilder Builder;
     Json::CharReaderBuilder::strictMode(&Builder.settings_);
     Builder["strictRoot"] = false;

@@ -58,6 +58,9 @@ Json::Value MembersFromWords(const Context& Call, std::vector<std::string>& vecN
             Fail(kExitUsage, "\"" + strWord + "\" is no member; write member:type");
         }
         const std::string strName = strWord.substr(0, nColon);
+        if (!IsUtf8(strName)) {
+            Fail(kExitUsage, "\"" + strName + "\": the name is no UTF-8; take another");
+        }
         if (jMembers.isMember(strName)) {
             Fail(kExitUsage, "the member \"" + strName + "\" is there twice; name it once");
         }
@@ -193,10 +196,7 @@ int RunInit(Context& Call) {
     CheckEncoding(Call, pDb.get());
     Transaction All;
     BeginChange(Call, pDb.get(), All);
-    if (TableExists(pDb.get(), Call.TableName())) {
-        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + Call.TableName() +
-                                 "\" already; extend it with vornjsondb sync");
-    }
+    CheckFree(Call, pDb.get(), Call.TableName(), "extend it with vornjsondb sync");
     Run(pDb.get(), strSql);
     KeepDefinition(pDb.get(), Call.TableName(), jDefinition);
     Check(All.Commit(), Call.Db());

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "../table/Affinity.h"
+#include "JsonCells.h"
 #include "Sql.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -36,12 +37,31 @@ void CheckNewName(const std::string& strTable) {
     if (strTable.empty()) {
         Fail(kExitUsage, "the name of the new table is empty; give it one");
     }
+    if (!IsUtf8(strTable)) {
+        Fail(kExitUsage, "\"" + strTable + "\": the name is no UTF-8; take another");
+    }
     if (sqlite3_strnicmp(strTable.c_str(), "sqlite_", 7) == 0) {
         Fail(kExitUsage,
              "\"" + strTable + "\": names that begin with sqlite_ are SQLite's own; take another");
     }
     if (SameName(strTable, "vornjsondb_definition")) {
         Fail(kExitUsage, "\"" + strTable + "\": definitions are kept there; take another name");
+    }
+}
+
+void CheckFree(const Context& Call, sqlite3* pDb, const std::string& strTable,
+               const char* szRemedy) {
+    if (TableExists(pDb, strTable)) {
+        Fail(kExitDuplicate,
+             Call.Db() + ": there is a table \"" + strTable + "\" already; " + szRemedy);
+    }
+    const std::vector<std::string> vecOf = Texts(
+        pDb, "SELECT tbl_name FROM sqlite_master WHERE type = 'index' AND name = ?1 COLLATE NOCASE",
+        strTable);
+    if (!vecOf.empty()) {
+        Fail(kExitDuplicate, Call.Db() + ": an index of table \"" + vecOf[0] +
+                                 "\" has the name \"" + strTable +
+                                 "\"; give the new table another name, or drop the index first");
     }
 }
 

@@ -23,6 +23,9 @@ bool TableExists(sqlite3* pDb, const std::string& strTable);
 [[noreturn]] void FailNoTable(const Context& Call, sqlite3* pDb);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
+// Whether it is taken; szRemedy is for a table that has it.
+void CheckFree(const Context& Call, sqlite3* pDb, const std::string& strTable,
+               const char* szRemedy);
 
 // Columns that keep each value as it is although their type has a name: ANY in a STRICT table.
 std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable);

@@ -173,6 +173,7 @@ void Import::FindDefinition() {
     m_blTableThere = TableExists(m_pDb.get(), m_strTable);
     if (!m_blTableThere) {
         CheckNewName(m_strTable);
+        CheckFree(m_Call, m_pDb.get(), m_strTable, "");
     }
     m_jDefinition = CurrentDefinition(m_Call, m_pDb.get(), m_strTable);
     m_blKept = !m_jDefinition.isNull();
