@@ -48,6 +48,10 @@ Json::Value TypedValue(const Table& Of, const std::string& strMember, const std:
     if (strType == "bool" && (strText == "0" || strText == "1")) {
         return strText == "1";
     }
+    double dReal = 0;
+    if (strType == "double" && IsTooWide(strText) && ToReal(strText, dReal)) {
+        return dReal;
+    }
     return LooksLikeJson(strText) ? ParseJson(strText, strMember, kExitUsage)
                                   : Json::Value(strText);
 }

@@ -97,4 +97,10 @@ std::string NumberColumnText(const std::string& strColumn, std::string_view strT
            std::string(strText) + "\" into a number: give a number, or make the column TEXT";
 }
 
+std::string RoundedText(const std::string& strColumn) {
+    return "member \"" + strColumn +
+           "\": with a point or an exponent a whole number from 2^53 on may be rounded: give its "
+           "digits alone";
+}
+
 }  // namespace VORN_JSON_DB::Cli

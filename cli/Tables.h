@@ -32,6 +32,7 @@ std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable);
 // Columns that turn a text into a number if it looks like one. Such a text is refused.
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable);
 std::string NumberColumnText(const std::string& strColumn, std::string_view strText);
+std::string RoundedText(const std::string& strColumn);  // of a column of whole numbers
 
 }  // namespace VORN_JSON_DB::Cli
 

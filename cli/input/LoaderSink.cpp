@@ -100,6 +100,9 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
         case Value::Kind::kInteger:
             return m_Into.SetInteger(Into.nLoader, Given.nInteger);
         case Value::Kind::kReal:
+            if (Into.eKind == BoundKind::kInteger && MayBeRounded(Given.dReal)) {
+                return m_Into.Reject(RoundedText(Into.strName));
+            }
             return m_Into.SetReal(Into.nLoader, Given.dReal);
         case Value::Kind::kWide:
             return SetWide(Into, Given.strText);
