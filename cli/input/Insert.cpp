@@ -242,7 +242,6 @@ void Import::LearnTypes() {
     }
     m_jDefinition = NewDefinition(m_Call, Seen.Members());
     m_vecColumns = Seen.Names();
-    CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
     }
@@ -272,6 +271,7 @@ std::string Import::CreateSql() const {
     std::string strSql;
     Check(CreateStatement(m_strTable, m_jDefinition, strSql, m_vecColumns), m_Call.Db(),
           kExitBadData);
+    CheckDefaults(m_strTable, m_jDefinition);
     return strSql;
 }
 

@@ -168,6 +168,11 @@ sqlite3 gone.db 'ALTER TABLE prod RENAME TO p2'
 expect 0 "table,severity,code,path,message,remedy
 prod,warning,left-over,/prod,\"${left//\"/\"\"}\",$remedy" '' -- lint gone.db --format csv
 
+# A default that its type cannot hold is one of no table.
+echo '{"t": {"member": {"a": {"cpptype": "int", "cppDefaultValue": "x"}}}}' >default.def
+expect 3 '' 'error: default of table "t": member "a" cannot be "x": expected is a whole number from -2147483648 to 2147483647; give one that the type can hold (nothing is stored)' \
+    -- insert default.db t old.json --def default.def
+
 # One that is no JSON is named, with the way out.
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (old.json: JSON)' -- insert bad.db t old.json --key id
 "$VORNJSONDB" schema bad.db t --json >t.def
