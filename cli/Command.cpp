@@ -37,6 +37,13 @@ constexpr ExitRow kExits[] = {
     {StatusCode::kInterrupted, kExitInterrupted, ""},
 };
 
+const ExitRow& RowOf(StatusCode eCode) {
+    static constexpr ExitRow kOther = {StatusCode::kOk, kExitUnexpected, ""};
+    const auto* const pFound = std::find_if(std::begin(kExits), std::end(kExits),
+                                            [&](const auto& Row) { return Row.eCode == eCode; });
+    return pFound == std::end(kExits) ? kOther : *pFound;
+}
+
 // What a finding advises is a call of the library: here is what to type instead.
 struct RemedyRow {
     const char* szCode;
@@ -124,15 +131,7 @@ void FailInterrupted() {
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
-    if (eCode == StatusCode::kRefused) {
-        return nRefused;
-    }
-    for (const ExitRow& Row : kExits) {
-        if (Row.eCode == eCode) {
-            return Row.nExit;
-        }
-    }
-    return kExitUnexpected;
+    return eCode == StatusCode::kRefused ? nRefused : RowOf(eCode).nExit;
 }
 
 std::string RemedyOf(const Finding& Found) {
@@ -150,12 +149,7 @@ const char* HintFor(StatusCode eCode, const std::string& strMessage) {
             return Row.szHint;
         }
     }
-    for (const ExitRow& Row : kExits) {
-        if (Row.eCode == eCode) {
-            return Row.szHint;
-        }
-    }
-    return "";
+    return RowOf(eCode).szHint;
 }
 
 std::string LineOf(const Status& Outcome) {
@@ -176,9 +170,10 @@ void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     }
 }
 
-std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames) {
+std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames,
+                        const std::string& strElse) {
     const std::string strNearest = vornjsondb::Nearest(strWord, vecNames);
-    return strNearest.empty() ? "" : "; did you mean \"" + strNearest + "\"?";
+    return strNearest.empty() ? strElse : "; did you mean \"" + strNearest + "\"?";
 }
 
 std::vector<std::string> Context::WordsFrom(std::size_t nFirst) const {

@@ -27,9 +27,8 @@ std::string BaseOf(const Table& Of, const std::string& strPath) {
 
 void CheckMember(const Table& Of, const std::string& strMember) {
     if (!IsMember(Of, BaseOf(Of, strMember))) {
-        const std::string strHint = NearestHint(strMember, Of.Members());
         Fail(kExitUsage, "table \"" + Of.Name() + "\" has no member \"" + strMember + "\"" +
-                             (strHint.empty() ? "; see vornjsondb schema" : strHint));
+                             NearestHint(strMember, Of.Members(), "; see vornjsondb schema"));
     }
 }
 

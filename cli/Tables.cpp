@@ -28,9 +28,9 @@ bool TableExists(sqlite3* pDb, const std::string& strTable) {
 }
 
 void FailNoTable(const Context& Call, sqlite3* pDb) {
-    const std::string strHint = NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews));
-    Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
-                            (strHint.empty() ? "; see vornjsondb tables" : strHint));
+    Fail(kExitNotFound,
+         Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
+             NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews), "; see vornjsondb tables"));
 }
 
 void CheckNewName(const std::string& strTable) {

@@ -213,7 +213,7 @@ bool LoaderSink::EndRecord(const Place& Where) {
     }
     if (m_blUnknown) {
         m_blUnknown = false;
-        const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members());
+        const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members(), "");
         return BadRecord(Where,
                          "the table has no member \"" + m_strUnknown + "\"" +
                              (strNearest.empty() ? "; --add-members adds it"
