@@ -2,7 +2,6 @@
 // one is a row as a list, and the last one has a count and a checksum, so that a cut file is found.
 
 #include <cstdio>
-#include <cstring>
 #include <limits>
 
 #include "Commands.h"
@@ -14,6 +13,7 @@
 #include "Tables.h"
 #include "input/ByteSource.h"
 #include "input/DumpRow.h"
+#include "input/InputFiles.h"
 #include "input/Interrupt.h"
 #include "input/LineBuffer.h"
 #include "input/LockWait.h"
@@ -46,17 +46,14 @@ class Checksum {
 
 // A name by which the table's rowid can be read; empty when there is none.
 std::string RowidName(sqlite3* pDb, const std::string& strTable) {
+    const std::vector<std::string> vecColumns =
+        Texts(pDb, "SELECT name FROM pragma_table_xinfo(?1)", strTable);
     for (const char* const szName : {"rowid", "_rowid_", "oid"}) {
-        const std::vector<std::string> vecShadows =
-            Texts(pDb,
-                  "SELECT name FROM pragma_table_xinfo(?1) WHERE name = '" + std::string(szName) +
-                      "' COLLATE NOCASE",
-                  strTable);
         const std::string strSql = "SELECT " + std::string(szName) + " FROM " + Quoted(strTable);
         sqlite3_stmt* pStatement = nullptr;
         sqlite3_prepare_v2(pDb, strSql.c_str(), -1, &pStatement, nullptr);
         const Statement pOwner(pStatement);
-        if (vecShadows.empty() && pStatement != nullptr) {
+        if (!HasName(vecColumns, szName) && pStatement != nullptr) {
             return szName;
         }
     }
@@ -150,17 +147,14 @@ class LineReader {
     explicit LineReader(const std::string& strFile)
         : m_Lines(m_File, std::numeric_limits<std::size_t>::max()) {
         if (!m_File.Open(strFile)) {
-            FailToRead();
+            FailToRead(m_File);
         }
     }
 
     bool Next() {
         const bool blThere = m_Lines.Next();
-        if (Interrupt::Came()) {
-            FailInterrupted();
-        }
-        if (m_File.Error() != 0) {
-            FailToRead();
+        if (Interrupt::Came() || m_File.Error() != 0) {
+            FailToRead(m_File);
         }
         m_nLine += 1;
         return blThere;
@@ -181,11 +175,6 @@ class LineReader {
     }
 
   private:
-    [[noreturn]] void FailToRead() const {
-        Fail(kExitIo,
-             m_File.Name() + ": " + std::strerror(m_File.Error()) + "; check name and permissions");
-    }
-
     ByteSource m_File;
     LineBuffer m_Lines;
     std::int64_t m_nLine = 0;

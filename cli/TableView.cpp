@@ -43,23 +43,18 @@ class Cutter {
     explicit Cutter(int nMost) : m_nMost(nMost) {}
 
     void Take(std::string_view strText) {
-        const auto* pBytes = reinterpret_cast<const utf8proc_uint8_t*>(strText.data());
         utf8proc_int32_t nState = 0;
         utf8proc_int32_t nBefore = -1;
         for (std::size_t nAt = 0; nAt < strText.size() && !m_blFull;) {
             utf8proc_int32_t nCode = 0;
-            const auto nLeft = static_cast<utf8proc_ssize_t>(strText.size() - nAt);
-            utf8proc_ssize_t nLength = utf8proc_iterate(pBytes + nAt, nLeft, &nCode);
-            if (nLength <= 0) {
-                nLength = 1;
-                nCode = 0xFFFD;
-            }
+            const std::size_t nLength = ReadCharacter(strText.substr(nAt), nCode);
+            nCode = nCode < 0 ? 0xFFFD : nCode;
             if (nBefore < 0 || utf8proc_grapheme_break_stateful(nBefore, nCode, &nState)) {
                 CloseLetter();
             }
             AddCharacter(nCode);
             nBefore = nCode;
-            nAt += static_cast<std::size_t>(nLength);
+            nAt += nLength;
         }
         CloseLetter();
     }
@@ -107,7 +102,7 @@ class TableWriter : public RecordOutput {
   public:
     explicit TableWriter(bool blHeader)
         : m_blHeader(blHeader),
-          m_nScreen(IsTerminal(stdout) ? TerminalWidth() : 0),
+          m_nScreen(IsTerminal(stdout) ? TerminalWidth(stdout) : 0),
           m_blColour(HasColour(stdout)) {}
 
     void Begin(const std::vector<Column>& vecColumns) override {

@@ -299,20 +299,4 @@ bool JsonHandler::Close(char cBracket) {
     return true;
 }
 
-bool JsonHandler::StartObject() {
-    return Open('{');
-}
-
-bool JsonHandler::EndObject(rapidjson::SizeType) {
-    return Close('}');
-}
-
-bool JsonHandler::StartArray() {
-    return Open('[');
-}
-
-bool JsonHandler::EndArray(rapidjson::SizeType) {
-    return Close(']');
-}
-
 }  // namespace VORN_JSON_DB::Cli
