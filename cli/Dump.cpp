@@ -81,6 +81,14 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
     }
 }
 
+std::string QuotedColumns(const Json::Value& jHeader) {
+    std::string strNames;
+    for (const Json::Value& jColumn : jHeader["columns"]) {
+        strNames += (strNames.empty() ? "" : ", ") + Quoted(jColumn.asString());
+    }
+    return strNames;
+}
+
 struct Described {
     Json::Value jHeader;
     std::string strSelect;
@@ -126,10 +134,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     if (!strRowid.empty() && vecColumns.size() < static_cast<std::size_t>(nMost)) {
         vecColumns.insert(vecColumns.begin(), strRowid);
     }
-    for (const std::string& strColumn : vecColumns) {
-        jHeader["columns"].append(strColumn);
-        Found.strSelect += (Found.strSelect.empty() ? "SELECT " : ", ") + Quoted(strColumn);
-    }
+    jHeader["columns"] = Strings(vecColumns);
     if (TableExists(pDb, "sqlite_sequence")) {
         const Statement pCounter =
             Prepare(pDb, "SELECT seq FROM sqlite_sequence WHERE name = ?1", strTable);
@@ -137,7 +142,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
             jHeader["sequence"] = Json::Int64(sqlite3_column_int64(pCounter.get(), 0));
         }
     }
-    Found.strSelect += " FROM " + Quoted(strTable);
+    Found.strSelect = "SELECT " + QuotedColumns(jHeader) + " FROM " + Quoted(strTable);
     return Found;
 }
 
@@ -181,14 +186,12 @@ class LineReader {
 };
 
 Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
-    std::string strNames;
     std::string strMarks;
-    for (const Json::Value& jColumn : jHeader["columns"]) {
-        strNames += (strNames.empty() ? "" : ", ") + Quoted(jColumn.asString());
-        strMarks += strMarks.empty() ? "?" : ", ?";
+    for (Json::ArrayIndex nAt = 0; nAt < jHeader["columns"].size(); ++nAt) {
+        strMarks += nAt == 0 ? "?" : ", ?";
     }
-    return Prepare(pDb, "INSERT INTO " + Quoted(jHeader["table"].asString()) + " (" + strNames +
-                            ") VALUES (" + strMarks + ")");
+    return Prepare(pDb, "INSERT INTO " + Quoted(jHeader["table"].asString()) + " (" +
+                            QuotedColumns(jHeader) + ") VALUES (" + strMarks + ")");
 }
 
 void CheckHeader(const LineReader& From, const Json::Value& jHeader) {

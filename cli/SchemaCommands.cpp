@@ -21,15 +21,17 @@ constexpr const char* kSeverities[] = {"note", "warning", "error"};
 
 void AppendFindings(const FindingList& vecFindings, const std::string& strTable,
                     Json::Value& jFindings) {
+    if (jFindings.isNull()) {
+        jFindings = Json::Value(Json::arrayValue);
+    }
     for (const Finding& Found : vecFindings) {
-        Json::Value jFinding;
+        Json::Value& jFinding = jFindings.append(Json::Value());
         jFinding["table"] = strTable;
         jFinding["severity"] = kSeverities[static_cast<int>(Found.eSeverity)];
         jFinding["code"] = Found.szCode;
         jFinding["path"] = Found.strPath;
         jFinding["message"] = Found.strMessage;
         jFinding["remedy"] = RemedyOf(Found);
-        jFindings.append(std::move(jFinding));
     }
 }
 
@@ -177,13 +179,10 @@ int RunInit(Context& Call) {
         Fail(kExitUsage, "init takes member:type words or --def FILE; give one of them");
     }
     CheckNewName(Call.TableName());
-    Json::Value jDefinition;
     std::vector<std::string> vecColumns;
-    if (!blFile) {
-        jDefinition = NewDefinition(Call, MembersFromWords(Call, vecColumns));
-    } else {
-        jDefinition = KnownDefinition(Call, nullptr, Call.TableName());
-    }
+    const Json::Value jDefinition = blFile
+                                        ? KnownDefinition(Call, nullptr, Call.TableName())
+                                        : NewDefinition(Call, MembersFromWords(Call, vecColumns));
     std::string strSql;
     Check(CreateStatement(Call.TableName(), jDefinition, strSql, vecColumns), Call.Db(),
           kExitBadData);
@@ -256,7 +255,6 @@ int RunExplain(Context& Call) {
         Json::Value jPlan;
         jPlan["sql"] = Found.strSql;
         jPlan["steps"] = Strings(Found.vecSteps);
-        jPlan["findings"] = Json::Value(Json::arrayValue);
         AppendFindings(Found.vecFindings, Call.TableName(), jPlan["findings"]);
         Put(CompactJson(jPlan) + "\n");
         return kExitFine;
@@ -319,7 +317,6 @@ int RunSync(Context& Call) {
     }
     Json::Value jDone;
     jDone["statements"] = Strings(Done.vecStatements);
-    jDone["findings"] = Json::Value(Json::arrayValue);
     AppendFindings(Done.vecFindings, Call.TableName(), jDone["findings"]);
     const int nExit = ExitBy(jDone["findings"]);
     if (Call.Json()) {
