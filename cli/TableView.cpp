@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <climits>
 #include <cstdio>
+#include <utility>
 
 #include "Output.h"
 #include "Terminal.h"
@@ -61,11 +62,10 @@ class Cutter {
 
     Shown Result() {
         if (m_blFull) {
-            m_Fitting.strText += kEllipsis;
-            ++m_Fitting.nWidth;
-            return m_Fitting;
+            m_All.strText.replace(m_nFitting, std::string::npos, kEllipsis);
+            m_All.nWidth = m_nFittingWidth + 1;
         }
-        return m_All;
+        return std::move(m_All);
     }
 
   private:
@@ -74,7 +74,8 @@ class Cutter {
         if (m_All.nWidth > m_nMost) {
             m_blFull = true;
         } else if (m_All.nWidth < m_nMost) {
-            m_Fitting = m_All;
+            m_nFitting = m_All.strText.size();
+            m_nFittingWidth = m_All.nWidth;
         }
     }
 
@@ -94,8 +95,9 @@ class Cutter {
 
     int m_nMost;
     bool m_blFull = false;
-    Shown m_All;      // as far as it was read
-    Shown m_Fitting;  // the longest beginning that leaves room for the ellipsis
+    Shown m_All;                 // as far as it was read
+    std::size_t m_nFitting = 0;  // its longest beginning that leaves room for the ellipsis
+    int m_nFittingWidth = 0;
 };
 
 class TableWriter : public RecordOutput {
