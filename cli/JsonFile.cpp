@@ -14,6 +14,13 @@ namespace VORN_JSON_DB::Cli {
 
 namespace {
 
+[[noreturn]] void FailTooWide(const std::string& strNumber, const std::string& strWhere,
+                              int nExit) {
+    Fail(nExit, strWhere + ": the number " + strNumber +
+                    " has more than 64 bits; write it as a text, in quotes, or as a real number, "
+                    "with .0 at its end");
+}
+
 // The reader knows infinite numbers by their name only, and rounds whole ones of more than 64 bits.
 std::string Readable(const std::string& strText, const std::string& strWhere, int nExit) {
     std::string strOut;
@@ -26,9 +33,7 @@ std::string Readable(const std::string& strText, const std::string& strWhere, in
         if (nEnd > nAt) {
             const std::string strNumber = strText.substr(nAt, nEnd - nAt);
             if (IsTooWide(strNumber)) {
-                Fail(nExit, strWhere + ": the number " + strNumber +
-                                " has more than 64 bits; write it as a text, in quotes, or as a "
-                                "real number, with .0 at its end");
+                FailTooWide(strNumber, strWhere, nExit);
             }
             strOut += strNumber == "1e999"    ? "Infinity"
                       : strNumber == "-1e999" ? "-Infinity"
