@@ -37,6 +37,13 @@ constexpr ExitRow kExits[] = {
     {StatusCode::kInterrupted, kExitInterrupted, ""},
 };
 
+const ExitRow& RowOf(StatusCode eCode) {
+    static constexpr ExitRow kOther = {StatusCode::kOk, kExitUnexpected, ""};
+    const auto* const pFound = std::find_if(std::begin(kExits), std::end(kExits),
+                                            [&](const auto& Row) { return Row.eCode == eCode; });
+    return pFound == std::end(kExits) ? kOther : *pFound;
+}
+
 // What a finding advises is a call of the library: here is what to type instead.
 struct RemedyRow {
     const char* szCode;
@@ -63,16 +70,20 @@ constexpr RemedyRow kRemedies[] = {
     {"wrong-operator", "$like and $prefix are for texts, $contains is for lists"},
 };
 
-// SQLite's words for a member that the table has no column for.
-constexpr const char* kMissingColumn[] = {"no such column: ", " has no column named "};
+// What SQLite says when it refuses something, and what to do then.
+struct WordsRow {
+    const char* szWords;
+    const char* szHint;
+};
 
-bool IsMissingColumn(const Status& Outcome) {
-    return Outcome.Code() == StatusCode::kRefused &&
-           std::any_of(std::begin(kMissingColumn), std::end(kMissingColumn),
-                       [&](const char* szWords) {
-                           return Outcome.Message().find(szWords) != std::string::npos;
-                       });
-}
+constexpr WordsRow kWords[] = {
+    {"no such column: ", "; vornjsondb sync adds the column"},
+    {" has no column named ", "; vornjsondb sync adds the column"},
+    {" already exists", "; drop or rename what is there, or take another database"},
+    {" because it is a view",
+     "; change the table that it reads, or give the view INSTEAD OF triggers"},
+    {"views may not be indexed", "; create the index on the table that it reads"},
+};
 
 void CheckOutput(bool blWritten) {
     if (!blWritten) {
@@ -120,15 +131,7 @@ void FailInterrupted() {
 }
 
 int ExitOf(StatusCode eCode, int nRefused) {
-    if (eCode == StatusCode::kRefused) {
-        return nRefused;
-    }
-    for (const ExitRow& Row : kExits) {
-        if (Row.eCode == eCode) {
-            return Row.nExit;
-        }
-    }
-    return kExitUnexpected;
+    return eCode == StatusCode::kRefused ? nRefused : RowOf(eCode).nExit;
 }
 
 std::string RemedyOf(const Finding& Found) {
@@ -140,13 +143,13 @@ std::string RemedyOf(const Finding& Found) {
     return Found.strRemedy;
 }
 
-const char* HintFor(StatusCode eCode) {
-    for (const ExitRow& Row : kExits) {
-        if (Row.eCode == eCode) {
+const char* HintFor(StatusCode eCode, const std::string& strMessage) {
+    for (const WordsRow& Row : kWords) {
+        if (eCode == StatusCode::kRefused && strMessage.find(Row.szWords) != std::string::npos) {
             return Row.szHint;
         }
     }
-    return "";
+    return RowOf(eCode).szHint;
 }
 
 std::string LineOf(const Status& Outcome) {
@@ -155,11 +158,9 @@ std::string LineOf(const Status& Outcome) {
             return Outcome.Message() + "; " + RemedyOf(Found);
         }
     }
-    if (IsMissingColumn(Outcome)) {
-        return Outcome.Message() + "; vornjsondb sync adds the column";
-    }
     const bool blLocked = Outcome.Code() == StatusCode::kLocked;
-    return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) + HintFor(Outcome.Code());
+    return (blLocked ? WithWait(Outcome.Message()) : Outcome.Message()) +
+           HintFor(Outcome.Code(), Outcome.Message());
 }
 
 void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
@@ -169,9 +170,10 @@ void Check(const Status& Outcome, const std::string& strWhere, int nRefused) {
     }
 }
 
-std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames) {
+std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames,
+                        const std::string& strElse) {
     const std::string strNearest = vornjsondb::Nearest(strWord, vecNames);
-    return strNearest.empty() ? "" : "; did you mean \"" + strNearest + "\"?";
+    return strNearest.empty() ? strElse : "; did you mean \"" + strNearest + "\"?";
 }
 
 std::vector<std::string> Context::WordsFrom(std::size_t nFirst) const {

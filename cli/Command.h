@@ -49,10 +49,12 @@ void Check(const Status& Outcome, const std::string& strWhere, int nRefused = kE
 int ExitOf(StatusCode eCode, int nRefused = kExitUsage);
 std::string LineOf(const Status& Outcome);
 std::string RemedyOf(const Finding& Found);
-const char* HintFor(StatusCode eCode);  // "; what to do", or nothing
+// "; what to do", or nothing.
+const char* HintFor(StatusCode eCode, const std::string& strMessage);
 
-// "; did you mean "NAME"?" for the nearest of vecNames, or nothing where none is near.
-std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames);
+// "; did you mean "NAME"?" for the nearest of vecNames, or strElse where none is near.
+std::string NearestHint(const std::string& strWord, const std::vector<std::string>& vecNames,
+                        const std::string& strElse);
 
 struct Option {
     const char* szName;     // "--limit"

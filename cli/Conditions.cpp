@@ -27,9 +27,8 @@ std::string BaseOf(const Table& Of, const std::string& strPath) {
 
 void CheckMember(const Table& Of, const std::string& strMember) {
     if (!IsMember(Of, BaseOf(Of, strMember))) {
-        const std::string strHint = NearestHint(strMember, Of.Members());
         Fail(kExitUsage, "table \"" + Of.Name() + "\" has no member \"" + strMember + "\"" +
-                             (strHint.empty() ? "; see vornjsondb schema" : strHint));
+                             NearestHint(strMember, Of.Members(), "; see vornjsondb schema"));
     }
 }
 
@@ -47,6 +46,10 @@ Json::Value TypedValue(const Table& Of, const std::string& strMember, const std:
     }
     if (strType == "bool" && (strText == "0" || strText == "1")) {
         return strText == "1";
+    }
+    double dReal = 0;
+    if (strType == "double" && IsTooWide(strText) && ToReal(strText, dReal)) {
+        return dReal;
     }
     return LooksLikeJson(strText) ? ParseJson(strText, strMember, kExitUsage)
                                   : Json::Value(strText);

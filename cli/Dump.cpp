@@ -2,7 +2,6 @@
 // one is a row as a list, and the last one has a count and a checksum, so that a cut file is found.
 
 #include <cstdio>
-#include <cstring>
 #include <limits>
 
 #include "Commands.h"
@@ -13,6 +12,8 @@
 #include "Sql.h"
 #include "Tables.h"
 #include "input/ByteSource.h"
+#include "input/DumpRow.h"
+#include "input/InputFiles.h"
 #include "input/Interrupt.h"
 #include "input/LineBuffer.h"
 #include "input/LockWait.h"
@@ -27,7 +28,7 @@ constexpr int kVersion = 1;
 // FNV-1a: against accidents, not against people.
 class Checksum {
   public:
-    void Add(const std::string& strLine) {
+    void Add(std::string_view strLine) {
         for (const char c : strLine) {
             m_nHash = (m_nHash ^ static_cast<unsigned char>(c)) * 1099511628211U;
         }
@@ -45,17 +46,14 @@ class Checksum {
 
 // A name by which the table's rowid can be read; empty when there is none.
 std::string RowidName(sqlite3* pDb, const std::string& strTable) {
+    const std::vector<std::string> vecColumns =
+        Texts(pDb, "SELECT name FROM pragma_table_xinfo(?1)", strTable);
     for (const char* const szName : {"rowid", "_rowid_", "oid"}) {
-        const std::vector<std::string> vecShadows =
-            Texts(pDb,
-                  "SELECT name FROM pragma_table_xinfo(?1) WHERE name = '" + std::string(szName) +
-                      "' COLLATE NOCASE",
-                  strTable);
         const std::string strSql = "SELECT " + std::string(szName) + " FROM " + Quoted(strTable);
         sqlite3_stmt* pStatement = nullptr;
         sqlite3_prepare_v2(pDb, strSql.c_str(), -1, &pStatement, nullptr);
         const Statement pOwner(pStatement);
-        if (vecShadows.empty() && pStatement != nullptr) {
+        if (!HasName(vecColumns, szName) && pStatement != nullptr) {
             return szName;
         }
     }
@@ -81,6 +79,14 @@ void AppendColumn(std::string& strOut, sqlite3_stmt* pRow, int nColumn) {
         default:
             strOut += "null";
     }
+}
+
+std::string QuotedColumns(const Json::Value& jHeader) {
+    std::string strNames;
+    for (const Json::Value& jColumn : jHeader["columns"]) {
+        strNames += (strNames.empty() ? "" : ", ") + Quoted(jColumn.asString());
+    }
+    return strNames;
 }
 
 struct Described {
@@ -113,6 +119,13 @@ Described Describe(const Context& Call, sqlite3* pDb) {
               "SELECT sql FROM sqlite_master WHERE tbl_name = ?1 AND sql IS NOT NULL ORDER BY "
               "type <> 'table', type, name",
               strTable));
+    for (const Json::Value& jSql : jHeader["statements"]) {
+        if (!IsUtf8(jSql.asString())) {
+            Fail(kExitBadData,
+                 Call.Db() + ": what creates table \"" + strTable +
+                     "\" is no UTF-8, which a dump cannot hold; rename what is in it");
+        }
+    }
     std::vector<std::string> vecColumns = Texts(
         pDb, "SELECT name FROM pragma_table_xinfo(?1) WHERE hidden = 0 ORDER BY cid", strTable);
     const std::string strRowid = RowidName(pDb, strTable);
@@ -121,10 +134,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
     if (!strRowid.empty() && vecColumns.size() < static_cast<std::size_t>(nMost)) {
         vecColumns.insert(vecColumns.begin(), strRowid);
     }
-    for (const std::string& strColumn : vecColumns) {
-        jHeader["columns"].append(strColumn);
-        Found.strSelect += (Found.strSelect.empty() ? "SELECT " : ", ") + Quoted(strColumn);
-    }
+    jHeader["columns"] = Strings(vecColumns);
     if (TableExists(pDb, "sqlite_sequence")) {
         const Statement pCounter =
             Prepare(pDb, "SELECT seq FROM sqlite_sequence WHERE name = ?1", strTable);
@@ -132,7 +142,7 @@ Described Describe(const Context& Call, sqlite3* pDb) {
             jHeader["sequence"] = Json::Int64(sqlite3_column_int64(pCounter.get(), 0));
         }
     }
-    Found.strSelect += " FROM " + Quoted(strTable);
+    Found.strSelect = "SELECT " + QuotedColumns(jHeader) + " FROM " + Quoted(strTable);
     return Found;
 }
 
@@ -142,90 +152,46 @@ class LineReader {
     explicit LineReader(const std::string& strFile)
         : m_Lines(m_File, std::numeric_limits<std::size_t>::max()) {
         if (!m_File.Open(strFile)) {
-            FailToRead();
+            FailToRead(m_File);
         }
     }
 
     bool Next() {
         const bool blThere = m_Lines.Next();
-        if (Interrupt::Came()) {
-            FailInterrupted();
+        if (Interrupt::Came() || m_File.Error() != 0) {
+            FailToRead(m_File);
         }
-        if (m_File.Error() != 0) {
-            FailToRead();
-        }
-        m_strLine.assign(blThere ? m_Lines.Begin() : "", blThere ? m_Lines.Size() : 0);
         m_nLine += 1;
         return blThere;
     }
 
-    const std::string& Line() const { return m_strLine; }
+    std::string_view Line() { return {m_Lines.Begin(), m_Lines.Size()}; }
     std::string Place() const { return m_File.Name() + ":" + std::to_string(m_nLine); }
-    Json::Value Parsed() const { return ParseJson(m_strLine, Place()); }
+    Json::Value Parsed() { return ParseJson(std::string(Line()), Place()); }
+    void BindTo(sqlite3_stmt* pRow) {
+        const std::string strWrong = BindRow(m_Lines, pRow);
+        if (!strWrong.empty()) {
+            FailHere(strWrong);
+        }
+    }
 
     [[noreturn]] void FailHere(const std::string& strWhat) const {
         Fail(kExitBadData, Place() + ": " + strWhat + "; dump the table again");
     }
 
   private:
-    [[noreturn]] void FailToRead() const {
-        Fail(kExitIo,
-             m_File.Name() + ": " + std::strerror(m_File.Error()) + "; check name and permissions");
-    }
-
     ByteSource m_File;
     LineBuffer m_Lines;
-    std::string m_strLine;
     std::int64_t m_nLine = 0;
 };
 
-void BindMarked(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue,
-                const LineReader& From) {
-    if (jValue.isMember("$real")) {
-        const double dInfinity = std::numeric_limits<double>::infinity();
-        sqlite3_bind_double(pRow, nColumn, jValue["$real"] == "inf" ? dInfinity : -dInfinity);
-        return;
-    }
-    bool blRight = jValue.isMember("encoded") && jValue["encoded"].isString();
-    const std::string strBytes = blRight ? FromBase64(jValue["encoded"].asString(), blRight) : "";
-    if (!blRight) {
-        From.FailHere("a value has an unknown form");
-    }
-    const int nBytes = static_cast<int>(strBytes.size());
-    if (jValue.isMember("$text")) {
-        sqlite3_bind_text(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
-    } else {
-        sqlite3_bind_blob(pRow, nColumn, strBytes.data(), nBytes, SQLITE_TRANSIENT);
-    }
-}
-
-void Bind(sqlite3_stmt* pRow, int nColumn, const Json::Value& jValue, const LineReader& From) {
-    if (jValue.isNull()) {
-        sqlite3_bind_null(pRow, nColumn);
-    } else if (jValue.type() == Json::realValue) {
-        sqlite3_bind_double(pRow, nColumn, jValue.asDouble());
-    } else if (jValue.isInt64()) {
-        sqlite3_bind_int64(pRow, nColumn, jValue.asInt64());
-    } else if (jValue.isString()) {
-        const std::string strText = jValue.asString();
-        sqlite3_bind_text(pRow, nColumn, strText.data(), static_cast<int>(strText.size()),
-                          SQLITE_TRANSIENT);
-    } else if (jValue.isObject()) {
-        BindMarked(pRow, nColumn, jValue, From);
-    } else {
-        From.FailHere("a value is of a kind that no dump has");
-    }
-}
-
 Statement PrepareInsert(sqlite3* pDb, const Json::Value& jHeader) {
-    std::string strNames;
     std::string strMarks;
-    for (const Json::Value& jColumn : jHeader["columns"]) {
-        strNames += (strNames.empty() ? "" : ", ") + Quoted(jColumn.asString());
-        strMarks += strMarks.empty() ? "?" : ", ?";
+    for (Json::ArrayIndex nAt = 0; nAt < jHeader["columns"].size(); ++nAt) {
+        strMarks += nAt == 0 ? "?" : ", ?";
     }
-    return Prepare(pDb, "INSERT INTO " + Quoted(jHeader["table"].asString()) + " (" + strNames +
-                            ") VALUES (" + strMarks + ")");
+    return Prepare(pDb, "INSERT INTO " + Quoted(jHeader["table"].asString()) + " (" +
+                            QuotedColumns(jHeader) + ") VALUES (" + strMarks + ")");
 }
 
 void CheckHeader(const LineReader& From, const Json::Value& jHeader) {
@@ -268,30 +234,27 @@ void CheckEnd(LineReader& From) {
     }
 }
 
+void CheckLast(LineReader& From, std::int64_t nRows, const Checksum& Sum) {
+    const Json::Value jLast = From.Parsed();
+    if (jLast["rows"] != Json::Int64(nRows) || jLast["checksum"] != Sum.Text()) {
+        From.FailHere("count or checksum differ from what is above");
+    }
+    CheckEnd(From);
+}
+
 std::int64_t LoadRows(LineReader& From, sqlite3* pDb, const Json::Value& jHeader) {
     const Statement pInsert = PrepareInsert(pDb, jHeader);
     Checksum Sum;
     Sum.Add(From.Line());  // the header
-    std::int64_t nRows = 0;
-    while (From.Next()) {
-        const Json::Value jRow = From.Parsed();
-        if (jRow.isObject()) {
-            if (jRow["rows"] != Json::Int64(nRows) || jRow["checksum"] != Sum.Text()) {
-                From.FailHere("count or checksum differ from what is above");
-            }
-            CheckEnd(From);
+    for (std::int64_t nRows = 0; From.Next(); ++nRows) {
+        if (From.Line().substr(0, 1) == "{") {
+            CheckLast(From, nRows, Sum);
             return nRows;
         }
-        if (!jRow.isArray() || jRow.size() != jHeader["columns"].size()) {
-            From.FailHere("a row has not " + std::to_string(jHeader["columns"].size()) + " values");
-        }
-        for (Json::ArrayIndex nAt = 0; nAt < jRow.size(); ++nAt) {
-            Bind(pInsert.get(), static_cast<int>(nAt) + 1, jRow[nAt], From);
-        }
+        Sum.Add(From.Line());
+        From.BindTo(pInsert.get());
         Step(pInsert.get());
         sqlite3_reset(pInsert.get());
-        Sum.Add(From.Line());
-        ++nRows;
     }
     From.FailHere("the end is missing");
 }
@@ -348,10 +311,7 @@ int Load(const Context& Call) {
     const Database pDb = OpenDatabase(Call, Access::kCreate);
     Transaction All;
     BeginChange(Call, pDb.get(), All);
-    if (TableExists(pDb.get(), strTable)) {
-        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + strTable +
-                                 "\" already; load into another database");
-    }
+    CheckFree(Call, pDb.get(), strTable, "load into another database");
     Run(pDb.get(), jHeader["statements"][0].asString());
     const std::int64_t nRows = LoadRows(From, pDb.get(), jHeader);
     for (Json::ArrayIndex nAt = 1; nAt < jHeader["statements"].size(); ++nAt) {
@@ -380,6 +340,10 @@ int RunLoad(Context& Call) {
         return Load(Call);
     } catch (Error& Failed) {
         Failed.strLine += Failed.nExit == kExitInterrupted ? " (nothing is stored)" : "";
+        if (Failed.nExit == kExitUnexpected) {
+            Failed.nExit = kExitBadData;
+            Failed.strLine += "; dump the table again, or load it where SQLite knows all of this";
+        }
         throw;
     }
 }

@@ -35,11 +35,7 @@ void AppendReal(std::string& strOut, double dValue) {
 }
 
 void AppendJsonString(std::string& strOut, std::string_view strText) {
-    if (IsUtf8(strText)) {
-        AppendQuoted(strText, strOut);
-    } else {
-        AppendQuoted(WithoutBadBytes(strText), strOut);
-    }
+    AppendQuoted(WithoutBadBytes(strText), strOut);
 }
 
 void AppendJson(std::string& strOut, std::string_view strJson) {

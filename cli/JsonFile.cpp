@@ -1,34 +1,50 @@
 #include "JsonFile.h"
 
+#include <algorithm>
 #include <cstring>
 #include <memory>
 #include <sstream>
 
 #include "Command.h"
 #include "input/ByteSource.h"
+#include "input/Numbers.h"
+#include "input/Utf8.h"
 
 namespace VORN_JSON_DB::Cli {
 
 namespace {
 
-// The reader knows infinite numbers by their name only.
-std::string WithInfinity(const std::string& strText) {
-    constexpr char kTooGreat[] = "1e999";
+[[noreturn]] void FailTooWide(const std::string& strNumber, const std::string& strWhere,
+                              int nExit) {
+    Fail(nExit, strWhere + ": the number " + strNumber +
+                    " has more than 64 bits; write it as a text, in quotes, or as a real number, "
+                    "with .0 at its end");
+}
+
+// The reader knows infinite numbers by their name only, and rounds whole ones of more than 64 bits.
+std::string Readable(const std::string& strText, const std::string& strWhere, int nExit) {
     std::string strOut;
     bool blInText = false;
-    for (std::size_t nAt = 0; nAt < strText.size(); ++nAt) {
+    for (std::size_t nAt = 0; nAt < strText.size();) {
         const char c = strText[nAt];
-        const bool blAlone = nAt == 0 || std::strchr(" \t\n\r:,[-", strText[nAt - 1]) != nullptr;
-        if (!blInText && blAlone && strText.compare(nAt, 5, kTooGreat) == 0) {
-            strOut += "Infinity";
-            nAt += 4;
+        const std::size_t nFound =
+            blInText ? nAt : strText.find_first_not_of("+-.0123456789eE", nAt);
+        const std::size_t nEnd = std::min(nFound, strText.size());
+        if (nEnd > nAt) {
+            const std::string strNumber = strText.substr(nAt, nEnd - nAt);
+            if (IsTooWide(strNumber)) {
+                FailTooWide(strNumber, strWhere, nExit);
+            }
+            strOut += strNumber == "1e999"    ? "Infinity"
+                      : strNumber == "-1e999" ? "-Infinity"
+                                              : strNumber;
+            nAt = nEnd;
             continue;
         }
-        strOut += c;
+        const std::size_t nBytes = blInText && c == '\\' ? 2 : 1;
+        strOut += strText.substr(nAt, nBytes);
+        nAt += nBytes;
         blInText = blInText != (c == '"');
-        if (blInText && c == '\\' && nAt + 1 < strText.size()) {
-            strOut += strText[++nAt];
-        }
     }
     return strOut;
 }
@@ -50,10 +66,14 @@ std::string ReadFile(const std::string& strFile) {
 }
 
 Json::Value ParseJson(const std::string& strText, const std::string& strWhere, int nExit) {
+    const std::size_t nWrong = FindNoUtf8(strText);
+    if (nWrong != std::string::npos) {
+        Fail(nExit, strWhere + ": " + NoUtf8Text(strText, nWrong));
+    }
     Json::CharReaderBuilder Builder;
     Json::CharReaderBuilder::strictMode(&Builder.settings_);
     Builder["strictRoot"] = false;
-    const std::string strRead = WithInfinity(strText);
+    const std::string strRead = Readable(strText, strWhere, nExit);
     Builder["allowSpecialFloats"] = strRead.size() != strText.size();
     Json::Value jValue;
     std::string strErrors;

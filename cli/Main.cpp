@@ -13,6 +13,7 @@
 #include "Command.h"
 #include "Parse.h"
 #include "Terminal.h"
+#include "input/Interrupt.h"
 
 namespace {
 
@@ -39,27 +40,20 @@ void KeepClosed() {
 }
 
 int Run(int nArguments, char** pszArguments) {
-    Context Call;
-    if (!Parse(nArguments, pszArguments, Call)) {
-        return kExitFine;
-    }
-    return Call.pCommand->pfnRun(Call);
-}
-
-int RunGuarded(int nArguments, char** pszArguments) {
-    int nExit = kExitUnexpected;
     try {
-        nExit = Run(nArguments, pszArguments);
+        Context Call;
+        const bool blRun = Parse(nArguments, pszArguments, Call);
+        const int nExit = blRun ? Call.pCommand->pfnRun(Call) : int{kExitFine};
         FlushOutput();
+        return nExit;
     } catch (const Error& Failed) {
-        nExit = Report(Failed.nExit, Failed.strLine);
+        return Report(Failed.nExit, Failed.strLine);
     } catch (const std::bad_alloc&) {
-        nExit = Report(kExitUnexpected, "out of memory; free some, or ask for fewer records");
+        return Report(kExitUnexpected, "out of memory; free some, or ask for fewer records");
     } catch (const std::exception& Failed) {
-        nExit =
-            Report(kExitUnexpected, std::string(Failed.what()) + "; this is a fault of vornjsondb");
+        return Report(kExitUnexpected,
+                      std::string(Failed.what()) + "; this is a fault of vornjsondb");
     }
-    return nExit;
 }
 
 }  // namespace
@@ -73,7 +67,7 @@ int main(int nArguments, char** pszArguments) {
     // file that hits the limit of the shell is a write error like others.
     static_cast<void>(signal(SIGPIPE, SIG_DFL));
     static_cast<void>(signal(SIGXFSZ, SIG_IGN));
-    const int nExit = RunGuarded(nArguments, pszArguments);
+    const int nExit = Run(nArguments, pszArguments);
     // Some file systems report a failed write no sooner than here.
     if (std::fclose(stdout) != 0 && nExit == kExitFine) {
         return Report(kExitIo,
@@ -81,9 +75,10 @@ int main(int nArguments, char** pszArguments) {
     }
     if (nExit == kExitInterrupted) {
         // A loop in a shell goes on unless the signal itself ended the command; the shell shows
-        // 130.
-        (void)signal(SIGINT, SIG_DFL);
-        (void)raise(SIGINT);
+        // 130 for Ctrl-C.
+        const int nSignal = Interrupt::Signal();
+        (void)signal(nSignal, SIG_DFL);
+        (void)raise(nSignal);
     }
     return nExit;
 }

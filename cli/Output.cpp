@@ -98,10 +98,12 @@ Cell CellOf(const Json::Value& jValue, bool blJson, std::string& strText) {
     return Value;
 }
 
-std::unique_ptr<RecordOutput> ChooseOutput(const Context& Call, bool blOne = false) {
-    const std::string strFormat = Call.Text("--format", Call.Json()          ? "json"
-                                                        : IsTerminal(stdout) ? "table"
-                                                                             : "json");
+std::string FormatOf(const Context& Call, bool blForPeople) {
+    return Call.Text("--format", blForPeople && !Call.Json() ? "table" : "json");
+}
+
+std::unique_ptr<RecordOutput> OutputFor(const Context& Call, const std::string& strFormat,
+                                        bool blOne) {
     const bool blHeader = !Call.Has("--no-headers");
     if (strFormat == "csv" || strFormat == "tsv") {
         return SeparatedOutput(strFormat == "csv" ? ',' : '\t', blHeader);
@@ -136,7 +138,8 @@ void AppendPlain(std::string& strOut, const Cell& Value) {
 }
 
 std::int64_t WriteRecords(const Context& Call, Table& From, Query Which, bool blOne) {
-    const std::unique_ptr<RecordOutput> pTo = ChooseOutput(Call, blOne);
+    const std::unique_ptr<RecordOutput> pTo =
+        OutputFor(Call, FormatOf(Call, IsTerminal(stdout)), blOne);
     if (Which.vecMembers.empty()) {
         Which.Members(MembersInColumnOrder(From));
     }
@@ -172,11 +175,9 @@ void WriteObjects(const Context& Call, const Json::Value& jObjects,
         vecShown.push_back({strName, false});
     }
     // Read by people, unless a format is asked for.
-    std::unique_ptr<RecordOutput> pTo = TableOutput(!Call.Has("--no-headers"));
-    if (Call.Json() || Call.Has("--format")) {
-        pTo = ChooseOutput(Call);
-    }
-    const bool blJson = Call.Text("--format", Call.Json() ? "json" : "").compare(0, 4, "json") == 0;
+    const std::string strFormat = FormatOf(Call, true);
+    const std::unique_ptr<RecordOutput> pTo = OutputFor(Call, strFormat, false);
+    const bool blJson = strFormat.compare(0, 4, "json") == 0;
     pTo->Begin(vecShown);
     for (const Json::Value& jObject : jObjects) {
         std::vector<std::string> vecTexts(vecColumns.size());

@@ -92,7 +92,8 @@ const Command* TakeCommand(std::vector<std::string>& vecWords) {
                 for (const Command& Row : AllCommands()) {
                     vecNames.emplace_back(Row.szName);
                 }
-                FailUsage("unknown subcommand \"" + strWord + "\"", NearestHint(strWord, vecNames));
+                FailUsage("unknown subcommand \"" + strWord + "\"",
+                          NearestHint(strWord, vecNames, ""));
             }
             return pFound;
         }
@@ -124,13 +125,12 @@ void CheckOptionName(const std::string& strWord, const Command& Of) {
     const auto itBegun = std::find_if(vecNames.begin(), vecNames.end(), [&](const auto& strEach) {
         return strName.size() > 3 && strEach.compare(0, strName.size(), strName) == 0;
     });
-    const std::string strHint = itBegun != vecNames.end() ? "; did you mean \"" + *itBegun + "\"?"
-                                : blLong                  ? NearestHint(strName, vecNames)
-                                                          : "";
+    const std::string strElse = std::string("; see vornjsondb ") + Of.szName +
+                                " --help, and put -- before words that begin with a dash";
     FailUsage("unknown option \"" + strName + "\" of " + Of.szName,
-              strHint.empty() ? std::string("; see vornjsondb ") + Of.szName +
-                                    " --help, and put -- before words that begin with a dash"
-                              : strHint);
+              itBegun != vecNames.end() ? "; did you mean \"" + *itBegun + "\"?"
+              : blLong                  ? NearestHint(strName, vecNames, strElse)
+                                        : strElse);
 }
 
 // The names of Command::szWords say how many words there may be.

@@ -21,15 +21,17 @@ constexpr const char* kSeverities[] = {"note", "warning", "error"};
 
 void AppendFindings(const FindingList& vecFindings, const std::string& strTable,
                     Json::Value& jFindings) {
+    if (jFindings.isNull()) {
+        jFindings = Json::Value(Json::arrayValue);
+    }
     for (const Finding& Found : vecFindings) {
-        Json::Value jFinding;
+        Json::Value& jFinding = jFindings.append(Json::Value());
         jFinding["table"] = strTable;
         jFinding["severity"] = kSeverities[static_cast<int>(Found.eSeverity)];
         jFinding["code"] = Found.szCode;
         jFinding["path"] = Found.strPath;
         jFinding["message"] = Found.strMessage;
         jFinding["remedy"] = RemedyOf(Found);
-        jFindings.append(std::move(jFinding));
     }
 }
 
@@ -58,6 +60,9 @@ Json::Value MembersFromWords(const Context& Call, std::vector<std::string>& vecN
             Fail(kExitUsage, "\"" + strWord + "\" is no member; write member:type");
         }
         const std::string strName = strWord.substr(0, nColon);
+        if (!IsUtf8(strName)) {
+            Fail(kExitUsage, "\"" + strName + "\": the name is no UTF-8; take another");
+        }
         if (jMembers.isMember(strName)) {
             Fail(kExitUsage, "the member \"" + strName + "\" is there twice; name it once");
         }
@@ -158,13 +163,10 @@ int RunInit(Context& Call) {
         Fail(kExitUsage, "init takes member:type words or --def FILE; give one of them");
     }
     CheckNewName(Call.TableName());
-    Json::Value jDefinition;
     std::vector<std::string> vecColumns;
-    if (!blFile) {
-        jDefinition = NewDefinition(Call, MembersFromWords(Call, vecColumns));
-    } else {
-        jDefinition = KnownDefinition(Call, nullptr, Call.TableName());
-    }
+    const Json::Value jDefinition = blFile
+                                        ? KnownDefinition(Call, nullptr, Call.TableName())
+                                        : NewDefinition(Call, MembersFromWords(Call, vecColumns));
     std::string strSql;
     Check(CreateStatement(Call.TableName(), jDefinition, strSql, vecColumns), Call.Db(),
           kExitBadData);
@@ -177,10 +179,7 @@ int RunInit(Context& Call) {
     CheckEncoding(Call, pDb.get());
     Transaction All;
     BeginChange(Call, pDb.get(), All);
-    if (TableExists(pDb.get(), Call.TableName())) {
-        Fail(kExitDuplicate, Call.Db() + ": there is a table \"" + Call.TableName() +
-                                 "\" already; extend it with vornjsondb sync");
-    }
+    CheckFree(Call, pDb.get(), Call.TableName(), "extend it with vornjsondb sync");
     Run(pDb.get(), strSql);
     KeepDefinition(pDb.get(), Call.TableName(), jDefinition);
     Check(All.Commit(), Call.Db());
@@ -240,7 +239,6 @@ int RunExplain(Context& Call) {
         Json::Value jPlan;
         jPlan["sql"] = Found.strSql;
         jPlan["steps"] = Strings(Found.vecSteps);
-        jPlan["findings"] = Json::Value(Json::arrayValue);
         AppendFindings(Found.vecFindings, Call.TableName(), jPlan["findings"]);
         Put(CompactJson(jPlan) + "\n");
         return kExitFine;
@@ -303,7 +301,6 @@ int RunSync(Context& Call) {
     }
     Json::Value jDone;
     jDone["statements"] = Strings(Done.vecStatements);
-    jDone["findings"] = Json::Value(Json::arrayValue);
     AppendFindings(Done.vecFindings, Call.TableName(), jDone["findings"]);
     const int nExit = ExitBy(jDone["findings"]);
     if (Call.Json()) {

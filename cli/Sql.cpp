@@ -25,7 +25,9 @@ void FailBySqlite(sqlite3* pDb, const std::string& strWhere) {
     if (eCode == StatusCode::kLocked) {
         strLine = WithWait(std::move(strLine));
     }
-    Fail(ExitOf(eCode, kExitUnexpected), strLine + HintFor(eCode));
+    const bool blTaken = strLine.find(" already exists") != std::string::npos;
+    Fail(ExitOf(eCode, blTaken ? kExitDuplicate : kExitUnexpected),
+         strLine + HintFor(eCode, strLine));
 }
 
 Statement Prepare(sqlite3* pDb, const std::string& strSql) {

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <climits>
 #include <cstdio>
+#include <utility>
 
 #include "Output.h"
 #include "Terminal.h"
@@ -43,34 +44,28 @@ class Cutter {
     explicit Cutter(int nMost) : m_nMost(nMost) {}
 
     void Take(std::string_view strText) {
-        const auto* pBytes = reinterpret_cast<const utf8proc_uint8_t*>(strText.data());
         utf8proc_int32_t nState = 0;
         utf8proc_int32_t nBefore = -1;
         for (std::size_t nAt = 0; nAt < strText.size() && !m_blFull;) {
             utf8proc_int32_t nCode = 0;
-            const auto nLeft = static_cast<utf8proc_ssize_t>(strText.size() - nAt);
-            utf8proc_ssize_t nLength = utf8proc_iterate(pBytes + nAt, nLeft, &nCode);
-            if (nLength <= 0) {
-                nLength = 1;
-                nCode = 0xFFFD;
-            }
+            const std::size_t nLength = ReadCharacter(strText.substr(nAt), nCode);
+            nCode = nCode < 0 ? 0xFFFD : nCode;
             if (nBefore < 0 || utf8proc_grapheme_break_stateful(nBefore, nCode, &nState)) {
                 CloseLetter();
             }
             AddCharacter(nCode);
             nBefore = nCode;
-            nAt += static_cast<std::size_t>(nLength);
+            nAt += nLength;
         }
         CloseLetter();
     }
 
     Shown Result() {
         if (m_blFull) {
-            m_Fitting.strText += kEllipsis;
-            ++m_Fitting.nWidth;
-            return m_Fitting;
+            m_All.strText.replace(m_nFitting, std::string::npos, kEllipsis);
+            m_All.nWidth = m_nFittingWidth + 1;
         }
-        return m_All;
+        return std::move(m_All);
     }
 
   private:
@@ -79,7 +74,8 @@ class Cutter {
         if (m_All.nWidth > m_nMost) {
             m_blFull = true;
         } else if (m_All.nWidth < m_nMost) {
-            m_Fitting = m_All;
+            m_nFitting = m_All.strText.size();
+            m_nFittingWidth = m_All.nWidth;
         }
     }
 
@@ -99,15 +95,16 @@ class Cutter {
 
     int m_nMost;
     bool m_blFull = false;
-    Shown m_All;      // as far as it was read
-    Shown m_Fitting;  // the longest beginning that leaves room for the ellipsis
+    Shown m_All;                 // as far as it was read
+    std::size_t m_nFitting = 0;  // its longest beginning that leaves room for the ellipsis
+    int m_nFittingWidth = 0;
 };
 
 class TableWriter : public RecordOutput {
   public:
     explicit TableWriter(bool blHeader)
         : m_blHeader(blHeader),
-          m_nScreen(IsTerminal(stdout) ? TerminalWidth() : 0),
+          m_nScreen(IsTerminal(stdout) ? TerminalWidth(stdout) : 0),
           m_blColour(HasColour(stdout)) {}
 
     void Begin(const std::vector<Column>& vecColumns) override {

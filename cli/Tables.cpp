@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "../table/Affinity.h"
+#include "JsonCells.h"
 #include "Sql.h"
 
 namespace VORN_JSON_DB::Cli {
@@ -27,14 +28,17 @@ bool TableExists(sqlite3* pDb, const std::string& strTable) {
 }
 
 void FailNoTable(const Context& Call, sqlite3* pDb) {
-    const std::string strHint = NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews));
-    Fail(kExitNotFound, Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
-                            (strHint.empty() ? "; see vornjsondb tables" : strHint));
+    Fail(kExitNotFound,
+         Call.Db() + ": there is no table \"" + Call.TableName() + "\"" +
+             NearestHint(Call.TableName(), Texts(pDb, kTablesAndViews), "; see vornjsondb tables"));
 }
 
 void CheckNewName(const std::string& strTable) {
     if (strTable.empty()) {
         Fail(kExitUsage, "the name of the new table is empty; give it one");
+    }
+    if (!IsUtf8(strTable)) {
+        Fail(kExitUsage, "\"" + strTable + "\": the name is no UTF-8; take another");
     }
     if (sqlite3_strnicmp(strTable.c_str(), "sqlite_", 7) == 0) {
         Fail(kExitUsage,
@@ -42,6 +46,22 @@ void CheckNewName(const std::string& strTable) {
     }
     if (SameName(strTable, "vornjsondb_definition")) {
         Fail(kExitUsage, "\"" + strTable + "\": definitions are kept there; take another name");
+    }
+}
+
+void CheckFree(const Context& Call, sqlite3* pDb, const std::string& strTable,
+               const char* szRemedy) {
+    if (TableExists(pDb, strTable)) {
+        Fail(kExitDuplicate,
+             Call.Db() + ": there is a table \"" + strTable + "\" already; " + szRemedy);
+    }
+    const std::vector<std::string> vecOf = Texts(
+        pDb, "SELECT tbl_name FROM sqlite_master WHERE type = 'index' AND name = ?1 COLLATE NOCASE",
+        strTable);
+    if (!vecOf.empty()) {
+        Fail(kExitDuplicate, Call.Db() + ": an index of table \"" + vecOf[0] +
+                                 "\" has the name \"" + strTable +
+                                 "\"; give the new table another name, or drop the index first");
     }
 }
 
@@ -80,6 +100,12 @@ std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable
 std::string NumberColumnText(const std::string& strColumn, std::string_view strText) {
     return "member \"" + strColumn + "\": its column would turn the text \"" +
            std::string(strText) + "\" into a number: give a number, or make the column TEXT";
+}
+
+std::string RoundedText(const std::string& strColumn) {
+    return "member \"" + strColumn +
+           "\": with a point or an exponent a whole number from 2^53 on may be rounded: give its "
+           "digits alone";
 }
 
 }  // namespace VORN_JSON_DB::Cli

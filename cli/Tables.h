@@ -23,10 +23,14 @@ bool TableExists(sqlite3* pDb, const std::string& strTable);
 [[noreturn]] void FailNoTable(const Context& Call, sqlite3* pDb);
 // Whether a new table may bear the name: a variable of a shell that is not set gives an empty one.
 void CheckNewName(const std::string& strTable);
+// Whether it is taken; szRemedy is for a table that has it.
+void CheckFree(const Context& Call, sqlite3* pDb, const std::string& strTable,
+               const char* szRemedy);
 
 // Columns that turn a text into a number if it looks like one. Such a text is refused.
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable);
 std::string NumberColumnText(const std::string& strColumn, std::string_view strText);
+std::string RoundedText(const std::string& strColumn);  // of a column of whole numbers
 
 }  // namespace VORN_JSON_DB::Cli
 

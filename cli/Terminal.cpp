@@ -18,17 +18,19 @@ bool IsTerminal(std::FILE* pStream) {
     return isatty(fileno(pStream)) != 0;
 }
 
-bool HasColour(std::FILE* pStream) {
-    const char* const szNoColour = std::getenv("NO_COLOR");
+bool IsAnimated(std::FILE* pStream) {
     const char* const szTerm = std::getenv("TERM");
-    const bool blRefused = szNoColour != nullptr && *szNoColour != '\0';
-    const bool blDumb = szTerm == nullptr || std::strcmp(szTerm, "dumb") == 0;
-    return IsTerminal(pStream) && !blRefused && !blDumb;
+    return IsTerminal(pStream) && szTerm != nullptr && std::strcmp(szTerm, "dumb") != 0;
 }
 
-int TerminalWidth() {
+bool HasColour(std::FILE* pStream) {
+    const char* const szNoColour = std::getenv("NO_COLOR");
+    return IsAnimated(pStream) && (szNoColour == nullptr || *szNoColour == '\0');
+}
+
+int TerminalWidth(std::FILE* pStream) {
     winsize Size{};
-    if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &Size) == 0 && Size.ws_col > 0) {
+    if (ioctl(fileno(pStream), TIOCGWINSZ, &Size) == 0 && Size.ws_col > 0) {
         return Size.ws_col;
     }
     const char* const szColumns = std::getenv("COLUMNS");

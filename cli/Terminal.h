@@ -8,10 +8,11 @@
 namespace VORN_JSON_DB::Cli {
 
 bool IsTerminal(std::FILE* pStream);
-// Only on a terminal that can, and not where NO_COLOR is set.
+bool IsAnimated(std::FILE* pStream);  // a terminal whose cursor can be moved
+// Only on such a terminal, and not where NO_COLOR is set.
 bool HasColour(std::FILE* pStream);
-// Of standard output: what the terminal says, else COLUMNS, else 80.
-int TerminalWidth();
+// What the terminal says, else COLUMNS, else 80.
+int TerminalWidth(std::FILE* pStream);
 
 }  // namespace VORN_JSON_DB::Cli
 

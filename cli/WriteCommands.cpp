@@ -2,6 +2,7 @@
 
 #include <set>
 
+#include "../src/schema/MemberType.h"
 #include "Commands.h"
 #include "Conditions.h"
 #include "Database.h"
@@ -103,6 +104,16 @@ void CheckStorable(const Table& Of, const Json::Value& jMembers) {
             Fail(kExitUsage, "member \"" + itMember.name() +
                                  "\": bytes are written by insert alone; give it the record on "
                                  "standard input, with --upsert");
+        }
+        const bool blInteger = vornjsondb::TypeOfMember(jTypes[itMember.name()]).Bound.eKind ==
+                               vornjsondb::BoundKind::kInteger;
+        if (blInteger && itMember->type() == Json::realValue &&
+            MayBeRounded(itMember->asDouble())) {
+            Fail(kExitBadData, RoundedText(itMember.name()));
+        }
+        if (itMember->type() == Json::uintValue && !itMember->isInt64() && jType != "double") {
+            Fail(kExitUsage, "member \"" + itMember.name() + "\": " + itMember->asString() +
+                                 " has more than 63 bits; write it as a text, in quotes");
         }
         if (itMember->isString() && (jType == "any" || jType == "string") &&
             HasName(vecNumbers, itMember.name()) && IsNumberToSqlite(itMember->asString())) {

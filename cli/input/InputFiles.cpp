@@ -32,13 +32,6 @@ ReadOptions Named(const std::string& strFormat) {
     Fail(kExitUsage, "--format: there is no \"" + strFormat + "\"; json, jsonl, csv and tsv are");
 }
 
-[[noreturn]] void FailBySystem(const ByteSource& Of) {
-    if (Interrupt::Came()) {
-        Fail(kExitInterrupted, "interrupted");
-    }
-    Fail(kExitIo, Of.Name() + ": " + std::strerror(Of.Error()) + "; check name and permissions");
-}
-
 ReadOptions OptionsFor(ByteSource& From, const Context& Call) {
     // A pipe is not waited for, when it is known what comes.
     ReadOptions How =
@@ -62,6 +55,13 @@ ReadOptions OptionsFor(ByteSource& From, const Context& Call) {
 
 }  // namespace
 
+void FailToRead(const ByteSource& Of) {
+    if (Interrupt::Came()) {
+        FailInterrupted();
+    }
+    Fail(kExitIo, Of.Name() + ": " + std::strerror(Of.Error()) + "; check name and permissions");
+}
+
 void FailAt(const std::string& strInput, std::int64_t nLine, const std::string& strReason,
             const char* szRemedy) {
     Fail(kExitBadData, strInput + ":" + std::to_string(nLine) + ": " + strReason +
@@ -78,7 +78,7 @@ InputFiles::InputFiles(const Context& Call) {
         m_vecInputs.push_back(std::make_unique<Input>());
         Input& Now = *m_vecInputs.back();
         if (!Now.From.Open(strPath)) {
-            FailBySystem(Now.From);
+            FailToRead(Now.From);
         }
         Now.How = OptionsFor(Now.From, Call);
     }
@@ -87,7 +87,7 @@ InputFiles::InputFiles(const Context& Call) {
 bool InputFiles::ReadOne(Input& Now, Sink& To) {
     const ReadOutcome Result = ReadRecords(Now.From, Now.How, To);
     if (Now.From.Error() != 0) {
-        FailBySystem(Now.From);
+        FailToRead(Now.From);
     }
     if (Result.eEnd == ReadOutcome::End::kFailed) {
         FailAt(Now.From.Name(), Result.nLine, Result.strReason, "; correct the input");
@@ -99,7 +99,7 @@ bool InputFiles::ReadOne(Input& Now, Sink& To) {
 bool InputFiles::Read(Sink& To, const Begin& fnBegin, bool blAgain) {
     for (const std::unique_ptr<Input>& pNow : m_vecInputs) {
         if (pNow->From.Error() != 0) {
-            FailBySystem(pNow->From);  // the first look failed
+            FailToRead(pNow->From);  // the first look failed
         }
         const bool blReady = m_blReadBefore ? pNow->From.Rewind() : !blAgain || pNow->From.Spool();
         if (!blReady && !Interrupt::Came()) {
@@ -108,7 +108,7 @@ bool InputFiles::Read(Sink& To, const Begin& fnBegin, bool blAgain) {
                               "; set TMPDIR to a folder with space");
         }
         if (!blReady) {
-            FailBySystem(pNow->From);
+            FailToRead(pNow->From);
         }
     }
     m_blReadBefore = true;

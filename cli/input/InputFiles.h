@@ -14,6 +14,9 @@
 
 namespace VORN_JSON_DB::Cli {
 
+// Ends the call for what the system says of a file, or for the interrupt that ended its reading.
+[[noreturn]] void FailToRead(const ByteSource& Of);
+
 // Ends the call for what is wrong in an input: "FILE:LINE: reason; remedy". Some reasons have a
 // remedy of their own.
 [[noreturn]] void FailAt(const std::string& strInput, std::int64_t nLine,

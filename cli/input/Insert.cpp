@@ -98,7 +98,6 @@ class Import {
 
     Context& m_Call;
     const OnDuplicate m_eOnDuplicate;
-    const Interrupt m_Guard;
     InputFiles m_Files;
     const std::string m_strTable;
     const bool m_blMayGuess;
@@ -174,6 +173,7 @@ void Import::FindDefinition() {
     m_blTableThere = TableExists(m_pDb.get(), m_strTable);
     if (!m_blTableThere) {
         CheckNewName(m_strTable);
+        CheckFree(m_Call, m_pDb.get(), m_strTable, "");
     }
     m_jDefinition = CurrentDefinition(m_Call, m_pDb.get(), m_strTable);
     m_blKept = !m_jDefinition.isNull();
@@ -242,7 +242,6 @@ void Import::LearnTypes() {
     }
     m_jDefinition = NewDefinition(m_Call, Seen.Members());
     m_vecColumns = Seen.Names();
-    CheckDefaults(m_strTable, m_jDefinition);
     if (m_jDefinition[m_strTable]["member"].empty()) {
         Fail(kExitBadData, m_Files.Formats() + ": no record has a member to make a table from");
     }
@@ -272,6 +271,7 @@ std::string Import::CreateSql() const {
     std::string strSql;
     Check(CreateStatement(m_strTable, m_jDefinition, strSql, m_vecColumns), m_Call.Db(),
           kExitBadData);
+    CheckDefaults(m_strTable, m_jDefinition);
     return strSql;
 }
 
@@ -499,6 +499,7 @@ int Import::Finish() {
 }  // namespace
 
 int RunInsert(Context& Call) {
+    const Interrupt Guard;
     try {
         return Import(Call, true).Run();
     } catch (const WrongGuess&) {

@@ -1,6 +1,5 @@
 #include "JsonHandler.h"
 
-#include <charconv>
 #include <utility>
 
 #include "JsonText.h"
@@ -160,9 +159,7 @@ bool JsonHandler::RawNumber(const char* pText, rapidjson::SizeType nText, bool) 
         return Scalar(JsonNumber(strText), "a number");
     }
     // What keeps the list or the object would round it. Most numbers are shorter.
-    std::uint64_t nWide = 0;
-    if (nText > 18 && m_strReason.empty() && JsonNumber(strText).eKind == Value::Kind::kWide &&
-        std::from_chars(pText, pText + nText, nWide).ec != std::errc()) {
+    if (nText > 18 && m_strReason.empty() && IsTooWide(strText)) {
         Blame("in the member \"" + m_Names.Name(m_nMember) + "\" the number " +
               std::string(strText) + " has more than 64 bits; write it as a text");
     }
@@ -300,22 +297,6 @@ bool JsonHandler::Close(char cBracket) {
         m_To.Take(m_nMember, Given);
     }
     return true;
-}
-
-bool JsonHandler::StartObject() {
-    return Open('{');
-}
-
-bool JsonHandler::EndObject(rapidjson::SizeType) {
-    return Close('}');
-}
-
-bool JsonHandler::StartArray() {
-    return Open('[');
-}
-
-bool JsonHandler::EndArray(rapidjson::SizeType) {
-    return Close(']');
 }
 
 }  // namespace VORN_JSON_DB::Cli

@@ -40,10 +40,10 @@ class JsonHandler : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, JsonH
     bool RawNumber(const char* pText, rapidjson::SizeType nText, bool blCopy);
     bool String(const char* pText, rapidjson::SizeType nText, bool blCopy);
     bool Key(const char* pText, rapidjson::SizeType nText, bool blCopy);
-    bool StartObject();
-    bool EndObject(rapidjson::SizeType nMembers);
-    bool StartArray();
-    bool EndArray(rapidjson::SizeType nElements);
+    bool StartObject() { return Open('{'); }
+    bool EndObject(rapidjson::SizeType) { return Close('}'); }
+    bool StartArray() { return Open('['); }
+    bool EndArray(rapidjson::SizeType) { return Close(']'); }
 
     // Whether there may be escapes in what follows.
     void MayHaveEscapes(bool blMay) { m_blEscapes = blMay; }

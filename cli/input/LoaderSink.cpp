@@ -100,6 +100,9 @@ void LoaderSink::Set(const Column& Into, const Value& Given) {
         case Value::Kind::kInteger:
             return m_Into.SetInteger(Into.nLoader, Given.nInteger);
         case Value::Kind::kReal:
+            if (Into.eKind == BoundKind::kInteger && MayBeRounded(Given.dReal)) {
+                return m_Into.Reject(RoundedText(Into.strName));
+            }
             return m_Into.SetReal(Into.nLoader, Given.dReal);
         case Value::Kind::kWide:
             return SetWide(Into, Given.strText);
@@ -210,7 +213,7 @@ bool LoaderSink::EndRecord(const Place& Where) {
     }
     if (m_blUnknown) {
         m_blUnknown = false;
-        const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members());
+        const std::string strNearest = NearestHint(m_strUnknown, m_Of.Members(), "");
         return BadRecord(Where,
                          "the table has no member \"" + m_strUnknown + "\"" +
                              (strNearest.empty() ? "; --add-members adds it"

@@ -11,9 +11,9 @@ namespace {
 
 Json::Value& Find(Json::Value& jMembers, const char* szOption, const std::string& strName) {
     if (!jMembers.isMember(strName)) {
-        const std::string strHint = NearestHint(strName, jMembers.getMemberNames());
-        Fail(kExitUsage, std::string(szOption) + ": there is no member \"" + strName + "\"" +
-                             (strHint.empty() ? "; name one of the new table's" : strHint));
+        Fail(kExitUsage,
+             std::string(szOption) + ": there is no member \"" + strName + "\"" +
+                 NearestHint(strName, jMembers.getMemberNames(), "; name one of the new table's"));
     }
     return jMembers[strName];
 }

@@ -98,6 +98,17 @@ bool IsJsonNumber(std::string_view strText) {
     return nInteger > 0 && (IsPower(strRest) || IsFraction(strRest));
 }
 
+bool MayBeRounded(double dReal) {
+    return std::fabs(dReal) >= static_cast<double>(kMostExact) && std::fabs(dReal) < 0x1p63;
+}
+
+bool IsTooWide(std::string_view strNumber) {
+    std::int64_t nSigned = 0;
+    std::uint64_t nUnsigned = 0;
+    return !strNumber.empty() && IntegerLength(strNumber) == strNumber.size() &&
+           !Converts(strNumber, nSigned) && !Converts(strNumber, nUnsigned);
+}
+
 // Blanks around it, a plus and a point at either end do not matter.
 bool IsNumberToSqlite(std::string_view strText) {
     constexpr char kBlanks[] = " \t\n\v\f\r";

@@ -27,6 +27,12 @@ bool ToReal(std::string_view strNumber, double& dReal);
 // Whether a text is a number as JSON writes it.
 bool IsJsonNumber(std::string_view strText);
 
+// Whether a double, read from digits, may be another whole number of 64 bits than they say.
+bool MayBeRounded(double dReal);
+
+// Whether it is a whole number of more than 64 bits.
+bool IsTooWide(std::string_view strNumber);
+
 // Whether SQLite stores a text as a number in a column of numbers.
 bool IsNumberToSqlite(std::string_view strText);
 

@@ -1,14 +1,11 @@
 #include "Progress.h"
 
-#include <sys/ioctl.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
-#include <cstdlib>
-#include <cstring>
 #include <utility>
+
+#include "../Terminal.h"
 
 namespace VORN_JSON_DB::Cli {
 
@@ -20,12 +17,6 @@ constexpr Seconds kSilent(1.0);
 constexpr Seconds kPause(0.1);
 constexpr double kNewWeight = 0.3;  // of the latest rate in the smoothed one
 constexpr int kBarWidth = 20;
-
-bool IsAnimated() {
-    const char* const szTerminal = std::getenv("TERM");
-    return isatty(STDERR_FILENO) != 0 && szTerminal != nullptr &&
-           std::strcmp(szTerminal, "dumb") != 0;
-}
 
 // 1234567 as 1,234,567
 std::string Grouped(double dNumber) {
@@ -52,12 +43,6 @@ std::string Bar(double dPart) {
            std::to_string(static_cast<int>(dPart * 100)) + " %";
 }
 
-size_t Width() {
-    winsize Size{};
-    const bool blKnown = ioctl(STDERR_FILENO, TIOCGWINSZ, &Size) == 0 && Size.ws_col > 1;
-    return blKnown ? Size.ws_col : 80;
-}
-
 void Write(const std::string& strText) {
     static_cast<void>(std::fwrite(strText.data(), 1, strText.size(), stderr));
     static_cast<void>(std::fflush(stderr));
@@ -66,7 +51,9 @@ void Write(const std::string& strText) {
 }  // namespace
 
 Progress::Progress(std::string strWhat, std::int64_t nAllBytes, bool blQuiet)
-    : m_strWhat(std::move(strWhat)), m_nAllBytes(nAllBytes), m_blShown(!blQuiet && IsAnimated()) {}
+    : m_strWhat(std::move(strWhat)),
+      m_nAllBytes(nAllBytes),
+      m_blShown(!blQuiet && IsAnimated(stderr)) {}
 
 std::string Progress::Line(const std::string& strWhat, std::int64_t nRecords, std::int64_t nBytes,
                            std::int64_t nAllBytes, double dRecordsPerSecond,
@@ -106,7 +93,8 @@ void Progress::Look(std::int64_t nRecords, std::int64_t nBytes) {
     // A line that wraps would stay.
     const std::string strLine =
         Line(m_strWhat, nRecords, nBytes, m_nAllBytes, m_dRecords, m_dBytes);
-    Write("\r" + strLine.substr(0, Width() - 1) + "\x1b[K");
+    const auto nWidth = static_cast<size_t>(TerminalWidth(stderr));
+    Write("\r" + strLine.substr(0, nWidth - 1) + "\x1b[K");
 }
 
 void Progress::Clear() {

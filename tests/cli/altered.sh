@@ -97,6 +97,35 @@ echo '[{"id": 2, "code": "1e3"}]' >strict.json
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (strict.json: JSON)' -- insert number.db strict strict.json
 expect 0 '{"id":2,"code":"1e3"}' '' -- get number.db strict 2
 
+# Nor does a number become another one.
+sqlite3 wide.db 'CREATE TABLE t (id INTEGER PRIMARY KEY, free, whole INTEGER, price REAL, text TEXT, json JSON)'
+wide='the number 18446744073709551616 has more than 64 bits; write it as a text, in quotes, or as a real number, with .0 at its end'
+for member in free whole json; do
+    expect 2 '' "error: $member: $wide" -- upsert wide.db t id=1 $member=18446744073709551616
+    expect 2 '' "error: $member: $wide" -- count wide.db t $member=18446744073709551616
+    expect 2 '' "error: member \"$member\": 18446744073709551615 has more than 63 bits; write it as a text, in quotes" \
+        -- upsert wide.db t id=1 $member=18446744073709551615
+done
+expect 2 '' "error: whole: ${wide/18446744073709551616/-9223372036854775809}" -- \
+    upsert wide.db t id=1 whole=-9223372036854775809
+expect 2 '' "error: record: $wide" -- upsert wide.db t '{"id": 1, "json": [18446744073709551616]}'
+expect 2 '' "error: --where: $wide" -- list wide.db t --where '{"free": {"$in": [1, 18446744073709551616]}}'
+expect 2 '' "error: id: $wide" -- get wide.db t 18446744073709551616
+expect 2 '' "error: --default \"18446744073709551616\": $wide" -- init wide.db u a:any --default a=18446744073709551616
+expect 0 '' 'inserted 1 record' -- upsert wide.db t id=1 free=18446744073709551616.0 \
+    price=-100000000000000000000 text=18446744073709551616 'json=[18446744073709551615,"\"18446744073709551616",1.5]'
+expect 0 '{"id":1,"free":18446744073709551616.0,"price":-1e+20,"text":"18446744073709551616","json":[18446744073709551615,"\"18446744073709551616",1.5]}' \
+    '' -- get wide.db t 1
+expect 0 1 '' -- count wide.db t price=-100000000000000000000
+expect 0 '' 'updated 1 record' -- update wide.db t 1 free=-1e999
+expect 0 1 '' -- count wide.db t free=-1e999
+rounded='member "whole": with a point or an exponent a whole number from 2^53 on may be rounded: give its digits alone'
+expect 3 '' "error: $rounded" -- update wide.db t 1 whole=9007199254740993.0
+echo '{"id": 2, "whole": 9007199254740993.0}' >wide.json
+expect 3 '' "error: wide.json:1: $at$rounded$remedy" -- insert wide.db t wide.json
+expect 0 '' 'updated 1 record' -- update wide.db t 1 whole=9007199254740991.0
+expect 0 '{"whole":9007199254740991}' '' -- get wide.db t 1 --members whole
+
 # A variable that is not set makes neither a database that is gone afterwards nor a table without a name.
 for database in '' :memory: file::memory: 'file:new.db?mode=memory'; do
     for words in 'insert more.json' 'list'; do
@@ -138,6 +167,11 @@ expect 0 '' 'no findings' -- lint gone.db
 sqlite3 gone.db 'ALTER TABLE prod RENAME TO p2'
 expect 0 "table,severity,code,path,message,remedy
 prod,warning,left-over,/prod,\"${left//\"/\"\"}\",$remedy" '' -- lint gone.db --format csv
+
+# A default that its type cannot hold is one of no table.
+echo '{"t": {"member": {"a": {"cpptype": "int", "cppDefaultValue": "x"}}}}' >default.def
+expect 3 '' 'error: default of table "t": member "a" cannot be "x": expected is a whole number from -2147483648 to 2147483647; give one that the type can hold (nothing is stored)' \
+    -- insert default.db t old.json --def default.def
 
 # One that is no JSON is named, with the way out.
 expect 0 '' '1 inserted, 0 replaced, 0 skipped, 0 failed (old.json: JSON)' -- insert bad.db t old.json --key id

@@ -167,6 +167,14 @@ good '{"a":" 1","b":" x "}' '\0357\0273\0277"a",b\n 1, x \n'
 good '{"a":"007","b":"1,5","c":"08E123"}
 {"a":null,"b":"","c":"x"}' 'a;b;c\r\n007;1,5;08E123\r\n;"";x\r\n'
 
+# A long text makes a long line of a table, in a time that grows with it.
+{
+    printf 'id,a\n1,'
+    head -c 4000000 /dev/zero | tr '\0' x
+} >in
+expect 0 '' '' -- insert good.db long in --quiet
+same 'a long line' "$("$VORNJSONDB" list good.db long --format table --no-headers | wc -c)" 4000004
+
 # Columns.
 seq -s , -f 'm%g' 2001 >in && seq -s , 2001 >>in
 expect 3 '' 'error: the records have 2001 different members, and a table has at most 2000 columns (nothing is stored)' \

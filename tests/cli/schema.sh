@@ -118,6 +118,56 @@ sed '1s/CREATE TABLE odd (a, b)/CREATE TABLE odd (b, a)/' dump >turned
 expect 3 '' 'error: turned:8: count or checksum differ from what is above; dump the table again' -- load third.db turned
 sed '1s/{/{"definition":5,/' dump >defined
 expect 3 '' 'error: defined:1: the definition is no object; dump the table again' -- load fifth.db defined
+# Rows that no dump has.
+row() {
+    printf '%s\n%b\n' "$(head -n 1 dump)" "$2" >rows
+    expect 3 '' "error: rows:2: $1; dump the table again" -- load third.db rows
+}
+for values in 5 '[1]' '[1,2,3,4]' '[]'; do
+    row 'a row has not 3 values' "$values"
+done
+for value in true '[1]' 18446744073709551616; do
+    row 'a value is of a kind that no dump has' "[1,2,$value]"
+done
+for value in '{}' '{"$real":"nan"}' '{"$base64":true}' '{"$base64":true,"encoded":"!"}' '{"encoded":"AA=="}' \
+    '{"$text":{},"encoded":"AA=="}' '{"$x":true,"encoded":"AA=="}' '{"$text":true,"encoded":null}'; do
+    row 'a value has an unknown form' "[1,2,$value]"
+done
+row 'a row has bytes that no dump has' '[1,2,"\0377"]'
+row 'a row has bytes that no dump has' '[1,2,"a\tb"]'
+row 'a number is greater than any double' '[1,2,1e999]'
+row 'a text has no end quote' '[1,2,"'
+row 'something follows the value' '[1,2,3] x'
+sed '1s/"table":"odd"/"table":"even"/' dump >even
+expect 3 '' 'error: third.db: no such table: even; dump the table again, or load it where SQLite knows all of this' -- \
+    load third.db even
+same 'no file of them is left' "$(ls third.db 2>/dev/null)" ''
+
+# Names that an index has, and those that are no text, which no definition could keep.
+sqlite3 names.db 'CREATE TABLE a (x); CREATE INDEX taken ON a (x)'
+taken='names.db: an index of table "a" has the name "Taken"; give the new table another name, or drop the index first'
+expect 4 '' "error: $taken" -- init names.db Taken x:int
+echo '{"x": 1}' >x.json
+expect 4 '' "error: $taken (nothing is stored)" -- insert names.db Taken x.json
+"$VORNJSONDB" init has.db taken x:int --quiet && "$VORNJSONDB" dump has.db taken >taken.dump
+expect 4 '' "error: ${taken//Taken/taken}" -- load names.db taken.dump
+sqlite3 has.db 'DROP TABLE taken; CREATE TABLE b (x); CREATE INDEX taken ON b (x)'
+"$VORNJSONDB" dump has.db b >b.dump
+expect 4 '' 'error: names.db: index taken already exists; drop or rename what is there, or take another database' -- \
+    load names.db b.dump
+expect 2 '' 'error: "\xff": the name is no UTF-8; take another' -- init names.db $'\xff' x:int
+expect 2 '' 'error: "\xff": the name is no UTF-8; take another' -- init names.db b $'\xff:int'
+printf '{"b": {"member": {"\xff": {"cpptype": "int"}}}}' >ff.def
+expect 3 '' 'error: ff.def: byte 0xFF is no UTF-8; convert the input with iconv' -- init names.db b --def ff.def
+sqlite3 names.db $'CREATE TABLE "\xff" (x)'
+expect 3 '' 'error: names.db: what creates table "\xff" is no UTF-8, which a dump cannot hold; rename what is in it' -- \
+    dump names.db $'\xff'
+sqlite3 names.db 'CREATE VIEW v AS SELECT x FROM a'
+expect 2 '' 'error: names.db: cannot create an index on table "v": views may not be indexed; create the index on the table that it reads' \
+    -- index names.db v x
+expect 2 '' 'error: names.db: cannot update records of table "v": cannot modify v because it is a view; change the table that it reads, or give the view INSTEAD OF triggers' \
+    -- update names.db v --where '{"x": 1}' x=2
+
 cat single.dump dump >both
 expect 3 '' 'error: both:4: something follows the dump of a table; load each dump by itself' -- load third.db both
 sed '1s/"columns":\[/&{},/' dump >named

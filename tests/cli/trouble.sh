@@ -264,6 +264,43 @@ exec 3>&-
 same 'load after Ctrl-C' "$(cat err)" 'error: interrupted (nothing is stored)'
 same 'load leaves' "$(ls | grep loaded)" ''
 
+# Other signals that end it leave no more behind, and end it; nohup keeps it from hearing of the first.
+cat >end.py <<'END'
+import os, signal, subprocess, sys, time
+ignored, number, words = sys.argv[1] == 'nohup', int(sys.argv[2]), sys.argv[3:]
+command = subprocess.Popen(words, stderr=subprocess.PIPE, text=True,
+    preexec_fn=lambda: signal.signal(signal.SIGHUP, signal.SIG_IGN if ignored else signal.SIG_DFL))
+with open('feed', 'w') as feed:
+    feed.write(''.join(open('t.dump' if 'load' in words else 'lines').readlines()[:3]))
+    feed.flush()
+    while not os.path.exists('ended.db'):
+        time.sleep(0.01)
+    command.send_signal(number)
+    if not ignored:
+        command.wait()
+print(command.wait(), command.stderr.read(), end='')
+END
+for number in 1 15; do
+    for words in 'insert ended.db t feed --key id --format jsonl' 'load ended.db feed'; do
+        # shellcheck disable=SC2086  # several words
+        same "signal $number in ${words%% *}" "$(python3 end.py - $number "$VORNJSONDB" $words)" \
+            "-$number error: interrupted (nothing is stored)"
+        same "what is left of signal $number in ${words%% *}" "$(ls | grep ended.db)" ''
+    done
+done
+same 'nohup' "$(python3 end.py nohup 1 "$VORNJSONDB" insert ended.db t feed --type id=int --format jsonl)" \
+    '0 3 inserted, 0 replaced, 0 skipped, 0 failed (feed: JSON Lines)'
+rm ended.db
+# Nor does a reader of the bad records who goes away.
+{
+    "$VORNJSONDB" insert ended.db t bad --type id=int --errors /dev/stdout 2>err
+    echo $? >code
+} | true
+same 'exit without a reader of bad records' "$(cat code)" 7
+same 'without a reader of bad records' "$(cat err)" \
+    'error: /dev/stdout: cannot write: Broken pipe; free some space, or name another file for --errors (nothing is stored)'
+same 'what is left without a reader' "$(ls | grep ended.db)" ''
+
 # A file that is new to one call may hold what another has stored since: the second waits for its input
 # until then. It neither removes the file nor stores into a table that has other types.
 mkfifo slow
