@@ -30,11 +30,15 @@ void FailBySqlite(sqlite3* pDb, const std::string& strWhere) {
          strLine + HintFor(eCode, strLine));
 }
 
+void FailBySqlite(sqlite3* pDb) {
+    FailBySqlite(pDb, g_strOpened);
+}
+
 Statement Prepare(sqlite3* pDb, const std::string& strSql) {
     sqlite3_stmt* pStatement = nullptr;
     if (sqlite3_prepare_v2(pDb, strSql.c_str(), static_cast<int>(strSql.size()) + 1, &pStatement,
                            nullptr) != SQLITE_OK) {
-        FailBySqlite(pDb, g_strOpened);
+        FailBySqlite(pDb);
     }
     return Statement(pStatement);
 }
@@ -58,7 +62,7 @@ std::vector<std::string> Texts(sqlite3* pDb, const std::string& strSql,
 bool Step(sqlite3_stmt* pStatement) {
     const int nResult = sqlite3_step(pStatement);
     if (nResult != SQLITE_ROW && nResult != SQLITE_DONE) {
-        FailBySqlite(sqlite3_db_handle(pStatement), g_strOpened);
+        FailBySqlite(sqlite3_db_handle(pStatement));
     }
     return nResult == SQLITE_ROW;
 }

@@ -16,6 +16,7 @@ void NameDatabase(const std::string& strFile);
 
 // The last failure of the connection.
 [[noreturn]] void FailBySqlite(sqlite3* pDb, const std::string& strWhere);
+[[noreturn]] void FailBySqlite(sqlite3* pDb);  // in the database that was named
 
 struct FinalizeStatement {
     void operator()(sqlite3_stmt* pStatement) const { sqlite3_finalize(pStatement); }

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "../table/Affinity.h"
+#include "../table/RealTable.h"
 #include "JsonCells.h"
 #include "Sql.h"
 
@@ -65,33 +66,17 @@ void CheckFree(const Context& Call, sqlite3* pDb, const std::string& strTable,
     }
 }
 
-namespace {
-
-// Columns that keep each value as it is although their type has a name: ANY in a STRICT table.
-std::vector<std::string> AnyColumns(sqlite3* pDb, const std::string& strTable) {
-    // A SQLite that knows no such pragma knows no STRICT table, either.
-    const Statement pList = Prepare(pDb, "PRAGMA main.table_list(" + Quoted(strTable) + ")");
-    const bool blStrict = Step(pList.get()) && sqlite3_column_int(pList.get(), 5) != 0;
-    if (!blStrict) {
-        return {};
-    }
-    return Texts(pDb, "SELECT name FROM pragma_table_info(?1) WHERE type = 'ANY' COLLATE NOCASE",
-                 strTable);
-}
-
-}  // namespace
-
 std::vector<std::string> NumberColumns(sqlite3* pDb, const std::string& strTable) {
     using vornjsondb::Affinity;
-    const std::vector<std::string> vecAny = AnyColumns(pDb, strTable);
-    const Statement pLook = Prepare(pDb, "SELECT name, type FROM pragma_table_info(?1)", strTable);
+    vornjsondb::RealTable Real;
+    if (vornjsondb::ReadRealTable(pDb, strTable, Real) != SQLITE_OK) {
+        FailBySqlite(pDb);
+    }
     std::vector<std::string> vecNames;
-    while (Step(pLook.get())) {
-        const std::string strName = ColumnText(pLook.get(), 0);
-        const Affinity eAffinity = vornjsondb::AffinityOf(ColumnText(pLook.get(), 1));
-        if (eAffinity != Affinity::kNone && eAffinity != Affinity::kText &&
-            !HasName(vecAny, strName)) {
-            vecNames.push_back(strName);
+    for (const vornjsondb::RealColumn& Column : Real.vecColumns) {
+        const Affinity eAffinity = vornjsondb::AffinityOf(Column.strType);
+        if (eAffinity != Affinity::kNone && eAffinity != Affinity::kText) {
+            vecNames.push_back(Column.strName);
         }
     }
     return vecNames;

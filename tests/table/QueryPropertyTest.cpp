@@ -139,6 +139,12 @@ class Maker {
         return Pick(s_vecReals);
     }
 
+    // Without a NUL byte, where SQLite ends a text in JSON and finds it by what stands before.
+    std::string TextInJson() {
+        const std::string strText = String();
+        return strText.substr(0, strText.find('\0'));
+    }
+
     Json::Value JsonValue(int nLevels) {
         static const std::vector<std::string> s_vecKeys{"a", "b", "c d", "x'y", "\xc3\xa9", "a]"};
         switch (Below(nLevels > 0 ? 9 : 6)) {
@@ -152,7 +158,7 @@ class Maker {
                 return Real();
             case 4:
             case 5:
-                return String();
+                return TextInJson();
             case 6: {
                 Json::Value jList(Json::arrayValue);
                 for (size_t n = Below(4); n > 0; --n) {
@@ -312,7 +318,7 @@ class Round {
     Json::Value Ordered(const std::string& strType) {
         Json::Value jValue;
         do {
-            jValue = strType.empty() ? InJson(m_Make.JsonValue(0)) : m_Make.ValueOf(strType);
+            jValue = strType.empty() ? m_Make.JsonValue(0) : m_Make.ValueOf(strType);
         } while (!jValue.isString() && !jValue.isNumeric());
         return jValue;
     }
@@ -335,20 +341,11 @@ class Round {
         return strPattern;
     }
 
-    // What is looked for inside of JSON must not have a NUL byte.
-    static Json::Value InJson(const Json::Value& jOperand) {
-        if (!jOperand.isString()) {
-            return jOperand;
-        }
-        const std::string strText = jOperand.asString();
-        return strText.substr(0, strText.find('\0'));
-    }
-
     Json::Value Operators(const std::string& strMember, bool blPath) {
         const std::string strType = blPath ? "" : m_Model.mapTypes[strMember];
         const auto Any = [&] {
             return m_Make.OneIn(8) ? Json::Value()
-                                   : (blPath ? InJson(m_Make.JsonValue(1)) : Operand(strMember));
+                                   : (blPath ? m_Make.JsonValue(1) : Operand(strMember));
         };
         const bool blText = blPath || strType == "string" || strType == "any";
         const bool blJson = strType.compare(0, 6, "Json::") == 0;
@@ -393,14 +390,12 @@ class Round {
                     if (blText) {
                         const bool blPrefix = m_Make.OneIn(2);
                         jOperators[blPrefix ? "$prefix" : "$like"] =
-                            blPrefix
-                                ? (blPath ? InJson(m_Make.String()) : Json::Value(m_Make.String()))
-                                : Pattern();
+                            blPrefix ? (blPath ? m_Make.TextInJson() : m_Make.String()) : Pattern();
                     }
                     break;
                 case 7:
                     if (blList) {
-                        jOperators["$contains"] = InJson(m_Make.JsonValue(1));
+                        jOperators["$contains"] = m_Make.JsonValue(1);
                     }
                     break;
                 default:
