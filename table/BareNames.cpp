@@ -26,7 +26,6 @@ bool IsWord(const std::string& strName) {
 BareNames::BareNames() {
     sqlite3* pDb = nullptr;
     const int nResult = sqlite3_open(":memory:", &pDb);
-    // mutate(exchanged): what is not freed then only AddressSanitizer sees.
     m_pDb.reset(pDb);
     if (nResult != SQLITE_OK) {
         ThrowBadAlloc();

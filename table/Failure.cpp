@@ -128,7 +128,7 @@ Status FromFindings(FindingList&& vecFindings, const Doing& What) {
 bool HasError(const FindingList& vecFindings) {
     bool blError = false;
     for (const Finding& Found : vecFindings) {
-        blError = blError || Found.eSeverity == Severity::kError;
+        blError |= Found.eSeverity == Severity::kError;
     }
     return blError;
 }

@@ -1,8 +1,10 @@
 #include "PlanSteps.h"
 
 #include <algorithm>
+#include <string_view>
 #include <utility>
 
+#include "Concat.h"
 #include "Statements.h"
 
 namespace vornjsondb {
@@ -11,17 +13,18 @@ namespace {
 
 // Whether the step is of that kind and of one of the tables. Releases before 3.36 write "SCAN TABLE
 // task".
-bool IsOf(const std::string& strStep, const std::string& strKind,
+bool IsOf(std::string_view strStep, std::string_view strKind,
           const std::vector<std::string>& vecTables) {
-    const std::string strFound = strStep.substr(strStep.find_first_not_of(' ')) + " ";
-    const auto fnBegins = [&strFound](const std::string& strBegin) {
-        return sqlite3_strnicmp(strFound.c_str(), strBegin.c_str(),
-                                static_cast<int>(strBegin.size())) == 0;
-    };
-    return std::any_of(vecTables.begin(), vecTables.end(), [&](const std::string& strTable) {
-        return fnBegins(strKind + " " + strTable + " ") ||
-               fnBegins(strKind + " TABLE " + strTable + " ");
-    });
+    const std::string strFound = Concat({strStep.substr(strStep.find_first_not_of(' ')), " "});
+    bool blIs = false;
+    for (const std::string& strTable : vecTables) {
+        for (const char* szBefore : {" ", " TABLE "}) {
+            const std::string strBegin = Concat({strKind, szBefore, strTable, " "});
+            const int nSize = static_cast<int>(strBegin.size());
+            blIs |= sqlite3_strnicmp(strFound.c_str(), strBegin.c_str(), nSize) == 0;
+        }
+    }
+    return blIs;
 }
 
 }  // namespace

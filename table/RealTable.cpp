@@ -55,9 +55,10 @@ int NumberColumn(const OwnStatement& pStatement, int nColumn) {
 // The rowid has three names; a WITHOUT ROWID table knows none of them.
 std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTable& Real) {
     for (const char* szName : {"rowid", "_rowid_", "oid"}) {
+        const std::string strName = szName;
         bool blColumn = false;
         for (const RealColumn& Column : Real.vecColumns) {
-            blColumn = blColumn || IsSameColumn(Column.strName, szName);
+            blColumn |= IsSameColumn(Column.strName, strName);
         }
         OwnStatement pStatement;
         const std::string strSql = Concat({"SELECT ", szName, " FROM ", Quoted(strTable)});
@@ -178,8 +179,9 @@ int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out)
         RealIndex& Index = Out.vecAll.back();
         const std::string strColumn = TextColumn(pRow, 2);
         const std::string strOfColumn = CollationOf(pDb, strTable, strColumn);
+        const std::string strOfIndex = TextColumn(pRow, 3);
         // Collations have names like columns.
-        Index.blFiner |= !IsSameColumn(strOfColumn, TextColumn(pRow, 3)) && !IsBinary(strOfColumn);
+        Index.blFiner |= !IsSameColumn(strOfColumn, strOfIndex) && !IsBinary(strOfColumn);
         AddText(Index.vecColumns, strColumn);
     });
 }
@@ -200,10 +202,11 @@ int LearnCollations(sqlite3* pDb, Members& Of) {
             }
             const std::string strColumn = TextColumn(pRow, 1);
             const std::string strCollation = TextColumn(pRow, 2);
+            const std::string strOfColumn = CollationOf(pDb, Of.Table(), strColumn);
             const size_t nMember = Of.FindColumn(strColumn);
             // Collations have names like columns.
             if (nMember != Members::kNone &&
-                (nTry > 0 || IsSameColumn(CollationOf(pDb, Of.Table(), strColumn), strCollation))) {
+                (nTry > 0 || IsSameColumn(strOfColumn, strCollation))) {
                 // mutate(doubled): the same once more.
                 Of.SetCollate(nMember, Concat({" COLLATE ", Quoted(strCollation)}));
             }

@@ -91,7 +91,6 @@ RowReader::RowReader(const Members& Of, const std::vector<size_t>& vecColumns,
         const bool blKeepNull = eNulls == VORN_JSON_DB::Nulls::kKeep ||
                                 (eNulls == VORN_JSON_DB::Nulls::kAsDefined && Shown.blNullSeen);
         // Members are numbered in the order of their names, as those of a record are.
-        // mutate(exchanged): in any order.
         m_vecRead.push_back(Column{&Shown, Shown.Kind(), blKeepNull});
         m_jEmpty[Shown.strName] = Json::Value();
     }

@@ -72,7 +72,6 @@ bool Statements::TakeKept(std::string_view strShape, Statement& Lent) {
     for (auto itKept = m_vecKept.end(); itKept != m_vecKept.begin();) {
         --itKept;
         if ((*itKept)->strShape == strShape) {
-            // mutate(exchanged): in any order.
             Lent.m_pHome = this;
             Lent.m_pLent = std::move(*itKept);
             m_vecKept.erase(itKept);

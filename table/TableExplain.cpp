@@ -92,7 +92,8 @@ Status Table::Explain(const Query& Which, Plan& Found) {
         }
         const std::vector<std::string> vecAdvice =
             vornjsondb::IndexAdvice(Which, From.Of, From.Codec);
-        if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, {Name()})) {
+        const std::vector<std::string> vecNames{Name()};
+        if (!vecAdvice.empty() && vornjsondb::HasScan(Made.vecSteps, vecNames)) {
             vornjsondb::Report(
                 Made.vecFindings, LintCode::kFullScan, "/where",
                 "all records are looked at, which an index spares on " + Joined(vecAdvice));
