@@ -23,6 +23,11 @@ bool IsUsableName(const std::string& strName) {
     return std::string_view(strName).find('\0') == std::string_view::npos && strName[0] != '$';
 }
 
+void Refuse(FindingCode eCode, const std::string& strPath, const std::string& strName,
+            const char* szWhy, FindingList& vecFindings) {
+    Report(vecFindings, eCode, Below(strPath, strName), Concat({ShownText(strName), szWhy}));
+}
+
 }  // namespace
 
 bool Member::IsJson() const {
@@ -37,8 +42,8 @@ Members::Members(const std::string& strTable, const Json::Value& jDefinition,
                  FindingList& vecFindings) try
     : m_strTable(strTable), m_strQuotedTable(Quoted(strTable)) {
     if (strTable.find('\0') != std::string::npos) {
-        Report(vecFindings, FindingCode::kBadName, Below("", strTable),
-               Concat({ShownText(strTable), " cannot be a table: it holds a NUL byte"}));
+        Refuse(FindingCode::kBadName, "", strTable, " cannot be a table: it holds a NUL byte",
+               vecFindings);
     }
     const Json::Value& jMembers = DeclaredMembers(jDefinition, strTable);
     if (!jMembers.isObject() || jMembers.empty()) {
@@ -60,13 +65,11 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
         const std::string strName(NameOf(it).View());
         const MemberType& Type = TypeOfMember(*it);
         if (!IsUsableName(strName)) {
-            Report(vecFindings, FindingCode::kBadName, Below(strPath, strName),
-                   Concat({ShownText(strName),
-                           " cannot be a member: it begins with $ or holds a NUL byte"}));
+            Refuse(FindingCode::kBadName, strPath, strName,
+                   " cannot be a member: it begins with $ or holds a NUL byte", vecFindings);
         } else if (FindColumn(strName) != kNone) {
-            Report(vecFindings, FindingCode::kSameColumn, Below(strPath, strName),
-                   Concat({ShownText(strName),
-                           " is another member's column: letter case makes no difference"}));
+            Refuse(FindingCode::kSameColumn, strPath, strName,
+                   " is another member's column: letter case makes no difference", vecFindings);
         } else if (Type.Bound.eKind == BoundKind::kNone) {
             Report(vecFindings, FindingCode::kUnknownType,
                    Below(Below(strPath, strName), "cpptype"),

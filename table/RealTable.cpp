@@ -76,22 +76,14 @@ int FindDatabase(sqlite3* pDb, const std::string& strTable, std::string& strData
                       [&](const OwnStatement& pRow) { strDatabase = TextColumn(pRow, 0); });
 }
 
-bool IsAny(const RealColumn& Column) {
-    return IsSameColumn(Column.strType, "ANY");
-}
-
 }  // namespace
 
 // Releases before 3.37 have no such pragma, and no such tables.
 int IsStrict(sqlite3* pDb, const std::string& strTable, bool& blStrict) {
-    std::string strDatabase;
-    int nResult = FindDatabase(pDb, strTable, strDatabase);
-    if (nResult == SQLITE_OK) {
-        nResult = ForEachRow(pDb,
-                             "SELECT 1 FROM pragma_table_list(?1) WHERE strict AND schema = " +
-                                 Enclosed(strDatabase, '\''),
-                             strTable, [&](const OwnStatement&) { blStrict = true; });
-    }
+    const std::string strSql = Concat(
+        {"SELECT 1 FROM pragma_table_list(?1) WHERE strict AND schema = (", kDatabaseSql, ")"});
+    const int nResult =
+        ForEachRow(pDb, strSql, strTable, [&](const OwnStatement&) { blStrict = true; });
     return nResult == SQLITE_ERROR ? SQLITE_OK : nResult;
 }
 
@@ -132,11 +124,15 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
         }
     }
     // There it keeps all as it is; anywhere else it is one more word for a number.
-    if (nResult == SQLITE_OK && std::any_of(Out.vecColumns.begin(), Out.vecColumns.end(), IsAny)) {
-        bool blStrict = false;
-        nResult = IsStrict(pDb, strTable, blStrict);
-        for (RealColumn& Column : Out.vecColumns) {
-            if (blStrict && IsAny(Column)) {
+    const std::string strAny = "ANY";
+    bool blAsked = false;
+    bool blStrict = false;
+    for (RealColumn& Column : Out.vecColumns) {
+        if (nResult == SQLITE_OK && IsSameColumn(Column.strType, strAny)) {
+            if (!std::exchange(blAsked, true)) {
+                nResult = IsStrict(pDb, strTable, blStrict);
+            }
+            if (blStrict) {
                 Column.strType.clear();
             }
         }
