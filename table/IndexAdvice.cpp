@@ -27,6 +27,7 @@ bool IsFoundByIndex(const Node& Leaf, const Members& Of, JsonCodec& Codec) {
             Problem None;
             LeafSql(Of, Codec, Sql).Write(Leaf, None);
             // JSON's true within a value is neither a number nor a text, which an index has.
+            // mutate(exchanged): all of them only look.
             return !Sql.blNoIndex && (!Leaf.jOperand.isBool() ||
                                       Leaf.strMember.find_first_of(".[") == std::string::npos);
         }

@@ -44,6 +44,7 @@ std::vector<SqlWord> WordsOf(const std::string& strSql) {
         nEnd = BehindEnclosure(strSql, nAt);
         if (nEnd > nAt) {
             if (strSql[nAt] != '-' && strSql[nAt] != '/') {
+                // mutate(doubled): what is said twice has no other name.
                 vecWords.push_back({strSql.substr(nAt + 1, nEnd - nAt - 2), true});
             }
             continue;
@@ -67,17 +68,18 @@ bool HoldsWord(const std::string& strSql, const char* szWord) {
 }
 
 std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable) {
-    const auto fnIs = [](const SqlWord& Word, const char* szText) {
-        return sqlite3_stricmp(Word.strText.c_str(), szText) == 0;
+    const std::vector<SqlWord> vecWords = WordsOf(strSql);
+    // Before the first word and behind the last one there is none.
+    const auto fnWord = [&](size_t nPlace) {
+        return nPlace < vecWords.size() ? vecWords[nPlace].strText : std::string();
     };
     std::vector<std::string> vecNames{strTable};
-    std::vector<SqlWord> vecWords = WordsOf(strSql);
-    vecWords.insert(vecWords.begin(), 2, SqlWord());
-    vecWords.insert(vecWords.end(), 2, SqlWord());
-    for (size_t i = 2; i < vecWords.size() - 2; ++i) {
-        if (fnIs(vecWords[i], strTable.c_str())) {
-            vecNames.push_back(vecWords[i - 2].strText + vecWords[i - 1].strText + strTable);
-            vecNames.push_back(vecWords[fnIs(vecWords[i + 1], "AS") ? i + 2 : i + 1].strText);
+    for (size_t i = 0; i < vecWords.size(); ++i) {
+        if (sqlite3_stricmp(vecWords[i].strText.c_str(), strTable.c_str()) == 0) {
+            const bool blAs = sqlite3_stricmp(fnWord(i + 1).c_str(), "AS") == 0;
+            // mutate(doubled, exchanged statements): a name counts once, in any order.
+            vecNames.push_back(fnWord(i - 2) + fnWord(i - 1) + strTable);
+            vecNames.push_back(fnWord(blAs ? i + 2 : i + 1));  // mutate(doubled): likewise.
         }
     }
     return vecNames;

@@ -375,6 +375,9 @@ TEST_F(IndexTest, ExplainSqlKnowsTheTableUnderAnyName) {
             ExplainSql(std::string("SELECT * FROM ") + szFrom + " WHERE name = 'a'");
         EXPECT_NE(strPlan.find(kMayScan), std::string::npos) << strPlan;
     }
+    const std::string strUpdate = ExplainSql("UPDATE doc AS x SET size = 1 WHERE name = 'a'");
+    EXPECT_EQ(strUpdate.find("SCAN x\n"), 0U) << strUpdate;
+    EXPECT_NE(strUpdate.find(kMayScan), std::string::npos) << strUpdate;
     // Another table's scan is none of this one.
     for (const char* szSql : {"SELECT x.size FROM big AS x, doc WHERE doc.id = x.size",
                               "SELECT size AS doc FROM big AS x WHERE doc = 1"}) {
