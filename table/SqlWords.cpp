@@ -76,6 +76,7 @@ std::vector<std::string> NamesIn(const std::string& strSql, const std::string& s
     std::vector<std::string> vecNames{strTable};
     for (size_t i = 0; i < vecWords.size(); ++i) {
         if (sqlite3_stricmp(vecWords[i].strText.c_str(), strTable.c_str()) == 0) {
+            // mutate(exchanged statements): in any order.
             const bool blAs = sqlite3_stricmp(fnWord(i + 1).c_str(), "AS") == 0;
             // mutate(doubled, exchanged statements): a name counts once, in any order.
             vecNames.push_back(fnWord(i - 2) + fnWord(i - 1) + strTable);
