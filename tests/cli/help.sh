@@ -24,7 +24,7 @@ same 'bash: choices' "$(in_bash vornjsondb list shop.db price --format js)" 'jso
 same 'bash: shells' "$(in_bash vornjsondb completion f)" 'fish'
 
 # What a table is called is never run: in a real bash, with a key on it that completes, and one that
-# shows the line.
+# shows the line. No other keys begin with that one: after such a key the shells wait for the next.
 sqlite3 evil.db 'CREATE TABLE "$(touch ran) a:b" (a); CREATE TABLE "`touch ran`" (a); CREATE TABLE "it'"'"'s" (a);
     CREATE TABLE "a ""b" (a); CREATE TABLE "plain" (a);' "CREATE TABLE \"x
 \$(touch ran)\" (a)"
@@ -44,9 +44,9 @@ def until(mark):
     while not seen.endswith(mark):
         seen += os.read(terminal, 1)
     return seen
-send("""bind 'set enable-bracketed-paste off'; bind 'set bell-style none'; source script.bash; shown() { printf '\\n<%s>%s\\n' "$READLINE_LINE" done; READLINE_LINE=; READLINE_POINT=0; }; bind -x '"\\C-x": shown'; PS1=$(printf 'rea%s' dy)\n""")
+send("""bind 'set enable-bracketed-paste off'; bind 'set bell-style none'; source script.bash; shown() { printf '\\n<%s>%s\\n' "$READLINE_LINE" done; READLINE_LINE=; READLINE_POINT=0; }; bind -x '"\\C-t": shown'; PS1=$(printf 'rea%s' dy)\n""")
 until(b'ready')  # the prompt: from now on keys are bash's own
-send(sys.argv[1] + '\t\x18')
+send(sys.argv[1] + '\t\x14')
 print(until(b'>done\r\n').decode().rsplit('\n<', 1)[1][:-7])
 END
 typed() {
@@ -90,10 +90,10 @@ cat >zsh.input <<'END'
 zmodload zsh/zpty
 export LINE=$1
 zpty shell 'PS1= zsh -f -i'
-zpty -w shell 'fpath=($PWD/functions $fpath); autoload -Uz compinit; compinit -u -D'
+zpty -w shell 'fpath=($PWD/functions $fpath); autoload -Uz compinit; compinit -u -d $PWD/zsh.dump'
 zpty -w shell 'shown() { BUFFER=$LINE; CURSOR=$#LINE; zle expand-or-complete; print -r -- "<$BUFFER>"; BUFFER= }'
-zpty -w shell 'zle -N shown; bindkey "^X" shown'
-zpty -n -w shell $'\x18'
+zpty -w shell 'zle -N shown; bindkey "^T" shown'
+zpty -n -w shell $'\x14'
 zpty -r shell text "*<vornjsondb*>*"
 print -r -- ${${text##*<}%%>*}
 zpty -d shell

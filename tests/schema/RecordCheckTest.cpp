@@ -7,7 +7,7 @@ namespace {
 
 using RecordCheck = TableTest;
 
-const char* const kValues[] = {
+const char* const kEveryKind[] = {
     "null",      "true", "false", "0",     "3",        "-3", "3000000000", "18446744073709551615",
     "1.5",       "3.0",  "\"\"",  "\"3\"", "\"text\"", "[]", "[1,null]",   "{}",
     "{\"a\":1}",
@@ -52,18 +52,12 @@ const char* const kNotFound[] = {"unsigned int",
                                  "bo",
                                  "unsigned lon"};
 
-Json::Value RecordOf(const char* szJson) {
-    Json::Value jRec(Json::objectValue);
-    jRec["m"] = ParseJson(szJson);
-    return jRec;
-}
-
 }  // namespace
 
 TEST_F(RecordCheck, EveryKnownTypeTakesExactlyItsOwnKinds) {
     for (const Treatment& treatment : kKnown) {
         Open(std::string("m:") + treatment.szType);
-        for (const char* szValue : kValues) {
+        for (const char* szValue : kEveryKind) {
             SCOPED_TRACE(std::string(treatment.szType) + " " + szValue);
             Json::Value jRec = RecordOf(szValue);
             const Json::Value jBefore = jRec;
@@ -83,7 +77,7 @@ TEST_F(RecordCheck, EveryKnownTypeTakesExactlyItsOwnKinds) {
 TEST_F(RecordCheck, TypeNameOutsideItsTableIsNotFoundWhateverTheValue) {
     for (const char* szType : kNotFound) {
         Open(std::string("m:") + szType);
-        for (const char* szValue : kValues) {
+        for (const char* szValue : kEveryKind) {
             SCOPED_TRACE(std::string(szType) + " " + szValue);
             Json::Value jRec = RecordOf(szValue);
             EXPECT_EQ(m_pHandle->checkJsonType(jRec), -1);

@@ -120,12 +120,6 @@ const char* const kRefusedTypes[] = {
     "Json::Value", "uid_t", "time_t", "Int", "int ", "unsigned  int", "", "text", "100%s",
 };
 
-Json::Value RecordOf(const char* szValue) {
-    Json::Value jRec(Json::objectValue);
-    jRec["m"] = ParseJson(szValue);
-    return jRec;
-}
-
 }  // namespace
 
 TEST_F(Values, EveryTypeRendersEveryKindOrNamesTheMember) {

@@ -49,6 +49,13 @@ class TableTest : public ::testing::Test {
     std::unique_ptr<VornJsonDbApi> m_pHandle;
 };
 
+// {"m": what the text holds}.
+inline Json::Value RecordOf(const char* szJson) {
+    Json::Value jRec(Json::objectValue);
+    jRec["m"] = ParseJson(szJson);
+    return jRec;
+}
+
 // A handle's last SQL error. It has no accessor; a refused query shows it in its log lines, and
 // runs no statement.
 std::string SqlErrorOf(VornJsonDbApi& handle);

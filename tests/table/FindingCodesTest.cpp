@@ -236,16 +236,6 @@ class FindingCodesTest : public TableTest {
         return jDefinition;
     }
 
-    static Json::Value Nested(int nLevels) {
-        Json::Value jInner(Json::arrayValue);
-        for (int i = 1; i < nLevels; ++i) {
-            Json::Value jOuter(Json::arrayValue);
-            jOuter.append(std::move(jInner));
-            jInner = std::move(jOuter);
-        }
-        return jInner;
-    }
-
     FindingList BesideReal(const Json::Value& jDefinition, const char* szSql) {
         Run(szSql);
         Table Of;

@@ -27,16 +27,6 @@ class OldRecordLintTest : public OldHandleTest {
 constexpr char kThreeTexts[] =
     R"({"a": {"cpptype": "string"}, "b": {"cpptype": "string"}, "c": {"cpptype": "string"}})";
 
-Json::Value Nested(int nLevels) {
-    Json::Value jInner(Json::arrayValue);
-    for (int i = 1; i < nLevels; ++i) {
-        Json::Value jOuter(Json::arrayValue);
-        jOuter.append(std::move(jInner));
-        jInner = std::move(jOuter);
-    }
-    return jInner;
-}
-
 }  // namespace
 
 TEST_F(OldRecordLintTest, RecordsThatAreStoredAsTheyAreHaveNoFindings) {

@@ -7,6 +7,7 @@
 
 #include <memory>
 #include <string>
+#include <utility>
 
 #include <gtest/gtest.h>
 #include <json/json.h>
@@ -42,6 +43,16 @@ inline std::string Text(const Status& Outcome) {
         strText += std::string(" [") + Found.szCode + " " + Found.strPath + "]";
     }
     return strText;
+}
+
+// An empty list in lists, nLevels of them in all; or jInner in one fewer.
+inline Json::Value Nested(int nLevels, Json::Value jInner = Json::arrayValue) {
+    for (int i = 1; i < nLevels; ++i) {
+        Json::Value jOuter(Json::arrayValue);
+        jOuter.append(std::move(jInner));
+        jInner = std::move(jOuter);
+    }
+    return jInner;
 }
 
 constexpr char kTasks[] = R"({"task": {"key": "id", "member": {

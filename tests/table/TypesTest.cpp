@@ -40,15 +40,6 @@ class TypesTest : public TableTest {
     int m_nTables = 0;
 };
 
-Json::Value Nested(int nLevels, Json::Value jInner = Json::arrayValue) {
-    for (int i = 1; i < nLevels; ++i) {
-        Json::Value jOuter(Json::arrayValue);
-        jOuter.append(std::move(jInner));
-        jInner = std::move(jOuter);
-    }
-    return jInner;
-}
-
 struct Case {
     const char* szType;
     const char* szValue;
