@@ -23,13 +23,15 @@ tells() {
     same "what $file tells with $*" "$(diff guessed.all whole.all | head -n 6)" ''
 }
 
-lines=$(seq 3000 | sed 's/.*/{"id": &, "a": &, "t": "x"}/')
+# The first thousand are looked at; all together are longer than what is read at once.
+long=$(printf 'x%.0s' {1..48})
+lines=$(seq 1500 | sed "s/.*/{\"id\": &, \"a\": &, \"t\": \"$long\"}/")
 # at LINE RECORD: these lines with another one.
 at() {
     sed "$1s/.*/$2/" <<<"$lines"
 }
 names=0
-for line in 500 1000 1001 2500 3000; do
+for line in 500 1000 1001 1250 1500; do
     while read -r record; do
         names=$((names + 1))
         at $line "$record" >"lines$names"
@@ -56,17 +58,17 @@ done
 same 'so many were tried' "$names" 80
 
 # What the guessed types can hold, and all records together would not have told.
-lines=$(seq 3000 | sed 's/.*/{"id": &, "o": {"x": 1}, "d": &.5}/')
+lines=$(seq 1500 | sed "s/.*/{\"id\": &, \"o\": {\"x\": \"$long\"}, \"d\": &.5}/")
 for record in '{"id": 7001, "o": {"$base64": true, "encoded": "AP8="}}' '{"id": 7001, "d": 9007199254740992}' \
     '{"id": 7001, "d": 9007199254740993}' '{"id": 7001, "d": 18446744073709551616}' '{"id": 7001, "o": []}'; do
     names=$((names + 1))
-    at 2500 "$record" >"lines$names"
+    at 1250 "$record" >"lines$names"
     tells lines$names --key id
 done
 
 # Cells are texts unless all of them are numbers.
-cells=$(seq 3000 | sed 's/.*/&,&,x,,&.5/')
-for line in 999 1002 2999; do
+cells=$(seq 1500 | sed "s/.*/&,&,$long,,&.5/")
+for line in 999 1002 1499; do
     for cells_there in 7001,007,y,,1 7001,A7,y,,1 7001,1.5,5,,1 7001,1,y,5,1 7001,1,y,x,1 '7001,"",y,,1' 7001,1,y,,x 7001,1,y; do
         names=$((names + 1))
         {
