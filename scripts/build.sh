@@ -16,6 +16,20 @@ fi
 # shellcheck disable=SC2034  # used by those who source this file
 together=(-DCMAKE_UNITY_BUILD=ON -DCMAKE_UNITY_BUILD_BATCH_SIZE=24 -DCMAKE_CXX_FLAGS_DEBUG=-g1)
 
+# write_unified FOLDER SOURCE...: the same where CMake is not asked, as files that include the sources of a
+# folder, twelve at once. Clang analyses what a file includes as the file's own when it is called
+# UnifiedSource.
+write_unified() {
+    local unified=$1 folder
+    shift
+    rm -rf "$unified"
+    mkdir -p "$unified"
+    printf '%s\n' "${@%/*}" | sort -u | while read -r folder; do
+        printf '%s\n' "$@" | grep "^$folder/[^/]*$" | sed "s|.*|#include \"$PWD/&\"|" |
+            split --lines 12 --additional-suffix .cpp - "$unified/UnifiedSource-${folder//\//-}-"
+    done
+}
+
 # configure NAME [CMAKE-OPTION...] makes build/NAME. Ninja and ccache are used where they are at hand.
 configure() {
     local folder=build/$1

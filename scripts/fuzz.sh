@@ -152,7 +152,8 @@ mapfile -t shared_sources < <(find "${libraries[@]}" fuzz tests/support/JsonHelp
 readers=(ByteSource GuessFormat Inference Interrupt JsonHandler JsonLinesReader JsonReader JsonText LineBuffer
     MemberNames Numbers Readers SeparatedReader Utf8)
 readers=("${readers[@]/#/cli/input/}")
-shared_sources+=("${readers[@]/%/.cpp}")
+write_unified "$folder/unified" "${shared_sources[@]}" "${readers[@]/%/.cpp}"
+shared_sources=("$folder"/unified/*.cpp)
 sources=("${targets[@]/#/fuzz/}")
 each compile "${shared_sources[@]}" "${sources[@]/%/.cpp}"
 each link_target "${targets[@]}"

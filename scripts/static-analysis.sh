@@ -20,23 +20,12 @@ need_packages "${compiler_packages[@]}" "${library_packages[@]}" "${test_package
 mkdir -p build/analysis
 flags=(-std=c++17 -Iinclude -I/usr/include/jsoncpp '-DVORNJSONDB_VERSION="0"')
 
-# write_unified FOLDER: sources that include those of each folder, twelve at once, because reading the same
-# headers for each would be a third of the work. Clang analyses what a file includes as the file's own when
-# it is called UnifiedSource.
-write_unified() {
-    local folder
-    rm -rf "$1"
-    mkdir "$1"
-    find src table cli -name '*.cpp' -printf '%h\n' | sort -u | while read -r folder; do
-        printf '#include "%s"\n' "$PWD/$folder"/*.cpp |
-            split --lines 12 --additional-suffix .cpp - "$1/UnifiedSource-${folder//\//-}-"
-    done
-}
-
 # Calls into templates of the standard library are not followed: that takes half of the time, and what is
 # found there is not ours.
 run_clang() {
-    write_unified build/analysis/unified
+    local -a sources
+    mapfile -t sources < <(find src table cli -name '*.cpp' | sort)
+    write_unified build/analysis/unified "${sources[@]}"
     printf '%s\0' build/analysis/unified/* | xargs -0 -n 1 -P "$jobs" clang++-14 --analyze \
         --analyzer-output text "${flags[@]}" -Werror -Xclang -analyzer-werror \
         -Xclang -analyzer-config -Xclang aggressive-binary-operation-simplification=true \

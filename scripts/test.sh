@@ -36,4 +36,5 @@ build "$name"
 
 export UBSAN_OPTIONS=print_stacktrace=1
 cd "build/$name"
-ctest --output-on-failure --parallel "$jobs" "$@"
+# One more than there are processors, because some tests mostly wait.
+ctest --output-on-failure --parallel "$((jobs + 1))" "$@"
