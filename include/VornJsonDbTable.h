@@ -301,7 +301,8 @@ enum class Nulls {
 enum class OnDuplicate {
     kStop,     // kDuplicate
     kSkip,     // leave the stored record as it is, and hand it out
-    kReplace,  // give it all members anew: those that are absent get their defaults
+    kReplace,  // give it all members anew: those that are absent get their defaults, but a rowid
+               // stays
     kUpsert    // change the given members alone
 };
 

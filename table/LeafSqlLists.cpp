@@ -2,14 +2,26 @@
 
 #include <utility>
 
+#include "Affinity.h"
 #include "Concat.h"
 #include "LeafSql.h"
 
 namespace vornjsondb {
 
+namespace {
+
+// What a column makes texts of it does not compare with the numbers of a list inside of JSON.
+bool HoldsNumbersAsTexts(const Member& Of) {
+    return Of.eAffinity == Affinity::kText && !Keeps(Affinity::kText, Of.Kind());
+}
+
+}  // namespace
+
 bool LeafSql::WriteIn(const Operator& Row, const Json::Value& jList, Problem& Why) {
     ListOperand List;
-    if (!ReadList(m_Where, jList, m_Out.pfnLiteral != nullptr, m_Reader, List, Why)) {
+    const bool blOneByOne =
+        m_Out.pfnLiteral != nullptr || (!m_blPath && HoldsNumbersAsTexts(*m_pMember));
+    if (!ReadList(m_Where, jList, blOneByOne, m_Reader, List, Why)) {
         return false;
     }
     const char* szBefore = "(";

@@ -80,7 +80,7 @@ void Members::AddAll(const Json::Value& jMembers, FindingList& vecFindings) {
             m_vecAll.push_back(
                 Member{strName, strQuoted, Concat({m_strQuotedTable, ".", strQuoted}), &Type,
                        FindMember(*it, "cppDefaultValue"), false, IsSet(*it, "notNull"),
-                       IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false, ""});
+                       IsSet(*it, "unique"), IsSet(*it, "nullSeen"), false, false, ""});
             m_vecByColumn.insert(PlaceOfColumn(strName), m_vecNames.size());
             AddText(m_vecNames, strName);
         }

@@ -28,6 +28,7 @@ struct Member {
     bool blUnique;
     bool blNullSeen;
     bool blGenerated;        // computed by the real table: can be read, not written
+    bool blRowid;            // the row's number, which the real table hands out
     std::string strCollate;  // " COLLATE ...", as the key's index compares texts; empty: none does
     Affinity eAffinity = Affinity::kNone;  // of the real column
 
@@ -68,6 +69,7 @@ class Members {
     // What only the real table tells. A key of which not all columns are members is none.
     void SetKey(const std::vector<std::string>& vecColumns);
     void SetGenerated(size_t nMember) { m_vecAll[nMember].blGenerated = true; }
+    void SetRowid(size_t nMember) { m_vecAll[nMember].blRowid = true; }
     void SetCollate(size_t nMember, std::string strCollate) {
         m_vecAll[nMember].strCollate = std::move(strCollate);
     }

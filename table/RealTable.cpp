@@ -17,10 +17,11 @@ constexpr char kColumnsSql[] =
     "SELECT name, type, dflt_value, pk, \"notnull\", hidden FROM pragma_table_xinfo(?1)";
 
 // A name finds a temporary table first, then one of the main database, then of the others in turn.
+// The inner LIMIT has SQLite look no further: a view that it cannot read may stand there.
 constexpr char kDatabaseSql[] =
-    "SELECT Db.name FROM pragma_database_list AS Db"
-    " WHERE EXISTS (SELECT 1 FROM pragma_table_xinfo(?1, Db.name))"
-    " ORDER BY Db.name <> 'temp', Db.seq LIMIT 1";
+    "SELECT Db.name FROM (SELECT name FROM pragma_database_list"
+    " ORDER BY name <> 'temp', seq LIMIT 99) AS Db"
+    " WHERE EXISTS (SELECT 1 FROM pragma_table_xinfo(?1, Db.name)) LIMIT 1";
 
 // In any database: a statement that names one of them looks for clashes in others, too.
 constexpr char kNameSql[] =
@@ -70,13 +71,12 @@ std::string NameOfRowid(sqlite3* pDb, const std::string& strTable, const RealTab
     return {};
 }
 
-// The database that holds the table; strDatabase stays as it is where none does.
+}  // namespace
+
 int FindDatabase(sqlite3* pDb, const std::string& strTable, std::string& strDatabase) {
     return ForEachRow(pDb, kDatabaseSql, strTable,
                       [&](const OwnStatement& pRow) { strDatabase = TextColumn(pRow, 0); });
 }
-
-}  // namespace
 
 // Releases before 3.37 have no such pragma, and no such tables.
 int IsStrict(sqlite3* pDb, const std::string& strTable, bool& blStrict) {

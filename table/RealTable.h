@@ -43,6 +43,9 @@ struct RealIndexes {
 int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out);
 int ReadRealIndexes(sqlite3* pDb, const std::string& strTable, RealIndexes& Out);
 
+// The database that holds the table; strDatabase stays as it is where none does.
+int FindDatabase(sqlite3* pDb, const std::string& strTable, std::string& strDatabase);
+
 // Tells the members of the key how the unique index on it compares texts, which may be in another
 // way than their columns do. Of several the one counts that does as they do.
 int LearnCollations(sqlite3* pDb, Members& Of);

@@ -39,16 +39,19 @@ std::string SetOrKey(const Members& Of, const std::string& strSet) {
     return strSet.empty() ? Concat({strKey, "=", strKey}) : strSet;
 }
 
-// What the INSERT does with a key that is there already: all other members anew, or nothing.
-std::string OnConflict(const Members& Of, bool blReplace) {
+// What the INSERT does with a key that is there already: all other members anew, or nothing. The
+// table would hand out another rowid, and what refers to the row would lose it.
+std::string OnConflict(const Members& Of, const RecordValues& Values, bool blReplace) {
     const std::string strHead = Concat({" ON CONFLICT ", KeyList(Of), " DO "});
     if (!blReplace) {
         return Concat({strHead, "NOTHING"});
     }
     std::string strSet;
-    for (const Member& Other : Of.All()) {
+    for (size_t i = 0; i < Of.Size(); ++i) {
+        const Member& Other = Of.At(i);
         // "excluded" holds the column's default where the record has no value.
-        if (!Other.blKey && !Other.blGenerated) {
+        // mutate(exchanged): all only look.
+        if (!Other.blKey && !Other.blGenerated && (!Other.blRowid || Values.Has(i))) {
             // mutate(doubled): a column may be set twice.
             Append(strSet,
                    {strSet.empty() ? "" : ", ", Other.strQuoted, "=excluded.", Other.strQuoted});
@@ -108,8 +111,8 @@ std::string RecordWriter::Sql(Verb eVerb) const {
             return InsertSql(m_Into.Of, m_Values);
         case Verb::kInsertNew:
         case Verb::kReplace:
-            return Concat(
-                {InsertSql(m_Into.Of, m_Values), OnConflict(m_Into.Of, eVerb == Verb::kReplace)});
+            return Concat({InsertSql(m_Into.Of, m_Values),
+                           OnConflict(m_Into.Of, m_Values, eVerb == Verb::kReplace)});
         case Verb::kUpdate:
             return UpdateSql(m_Into.Of, m_Values);
         default:
@@ -189,7 +192,10 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
                           : Still;
     }
     if (nResult == SQLITE_OK) {
-        return m_Into.HandsOut(m_Values) ? CheckRowid(What) : Status();
+        // What is there already has got its rowid from another statement than the last one.
+        // mutate(exchanged): both only look.
+        const bool blHandedOut = eWritten == Written::kInserted && m_Into.HandsOut(m_Values);
+        return blHandedOut ? CheckRowid(What) : Status();
     }
     const Status Failed = FailBySqlite(m_Into.pDb, nResult, What);
     return Failed.Code() == StatusCode::kDuplicate ? WithValues(Failed) : Failed;

@@ -67,20 +67,25 @@ bool HoldsWord(const std::string& strSql, const char* szWord) {
     });
 }
 
-std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable) {
+std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable,
+                                 const std::string& strDatabase) {
     const std::vector<SqlWord> vecWords = WordsOf(strSql);
     // Before the first word and behind the last one there is none.
     const auto fnWord = [&](size_t nPlace) {
         return nPlace < vecWords.size() ? vecWords[nPlace].strText : std::string();
     };
-    std::vector<std::string> vecNames{strTable};
+    const auto fnIs = [&](size_t nPlace, const char* szName) {
+        return sqlite3_stricmp(fnWord(nPlace).c_str(), szName) == 0;
+    };
+    const std::string strOwn = strDatabase + "." + strTable;
+    std::vector<std::string> vecNames{strTable, strOwn};
     for (size_t i = 0; i < vecWords.size(); ++i) {
-        if (sqlite3_stricmp(vecWords[i].strText.c_str(), strTable.c_str()) == 0) {
-            // mutate(exchanged statements): in any order.
-            const bool blAs = sqlite3_stricmp(fnWord(i + 1).c_str(), "AS") == 0;
-            // mutate(doubled, exchanged statements): a name counts once, in any order.
-            vecNames.push_back(fnWord(i - 2) + fnWord(i - 1) + strTable);
-            vecNames.push_back(fnWord(blAs ? i + 2 : i + 1));  // mutate(doubled): likewise.
+        // Of another database, or a column.
+        const bool blOther = fnIs(i - 1, ".") && !fnIs(i - 2, strDatabase.c_str());
+        // mutate(exchanged): both only look.
+        if (fnIs(i, strTable.c_str()) && !blOther) {
+            // mutate(doubled): a name counts once.
+            vecNames.push_back(fnWord(fnIs(i + 1, "AS") ? i + 2 : i + 1));
         }
     }
     return vecNames;

@@ -19,9 +19,10 @@ std::vector<SqlWord> WordsOf(const std::string& strSql);
 // comments and other words.
 bool HoldsWord(const std::string& strSql, const char* szWord);
 
-// The names by which a plan of the SQL text may call a table: its own, with its database's before
-// it, and what may be its alias.
-std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable);
+// The names by which a plan of the SQL text may call a table of that database: its own, with the
+// database's before it, and what may be its alias.
+std::vector<std::string> NamesIn(const std::string& strSql, const std::string& strTable,
+                                 const std::string& strDatabase);
 
 }  // namespace vornjsondb
 

@@ -8,6 +8,7 @@
 #include "LintCodes.h"
 #include "PlanSteps.h"
 #include "QueryPlan.h"
+#include "RealTable.h"
 #include "SelectSql.h"
 #include "SqlWords.h"
 #include "TableParts.h"
@@ -111,6 +112,11 @@ Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
         Made.strSql = strSql;
         Status Outcome = vornjsondb::Attempt(From.pDb, From.How.nWaitMs,
                                              [&] { return CheckOne(From, What, strSql); });
+        std::string strDatabase = "main";
+        if (Outcome.Ok()) {
+            const int nResult = vornjsondb::FindDatabase(From.pDb, Name(), strDatabase);
+            Outcome = vornjsondb::FromSqlite(From.pDb, nResult, What);
+        }
         if (Outcome.Ok()) {
             Outcome = ReadPlan(From, What, Made);
         }
@@ -118,7 +124,7 @@ Status Table::ExplainSql(const std::string& strSql, Plan& Found) {
         if (!Outcome.Ok()) {
             return Outcome;
         }
-        const std::vector<std::string> vecNames = vornjsondb::NamesIn(strSql, Name());
+        const std::vector<std::string> vecNames = vornjsondb::NamesIn(strSql, Name(), strDatabase);
         const bool blSearched =
             vornjsondb::HoldsWord(strSql, "WHERE") && vornjsondb::HasScan(Made.vecSteps, vecNames);
         if (blSearched || vornjsondb::HasOwnIndex(Made.vecSteps, vecNames)) {

@@ -99,10 +99,8 @@ bool HasTextKey(const vornjsondb::Members& Of) {
     return blText;
 }
 
-bool IsNarrowRowid(const RealTable& Real, const vornjsondb::RealColumn& Column,
-                   const vornjsondb::Member& Of) {
-    return IsRowid(Real, Column) &&
-           vornjsondb::RangeOf(*Of.pType).nMostRead < std::numeric_limits<std::int64_t>::max();
+bool IsNarrow(const vornjsondb::Member& Of) {
+    return vornjsondb::RangeOf(*Of.pType).nMostRead < std::numeric_limits<std::int64_t>::max();
 }
 
 }  // namespace
@@ -183,8 +181,10 @@ void Table::Parts::Learn(const RealTable& Real) {
             Of.SetGenerated(nMember);
             Values.RefuseAlways(nMember);
         }
-        if (IsNarrowRowid(Real, Column, Of.At(nMember))) {
-            nHandedOut = nMember;
+        if (IsRowid(Real, Column)) {
+            // mutate(exchanged): in any order.
+            Of.SetRowid(nMember);
+            nHandedOut = IsNarrow(Of.At(nMember)) ? nMember : nHandedOut;
         }
     }
 }

@@ -129,6 +129,31 @@ TEST_F(EdgesTest, NumbersInAColumnOfTextsAreNone) {
     EXPECT_EQ(Ids(Query().Where("a", 12)), "2");
 }
 
+// They are found as by "$eq", and left out as by "$ne".
+TEST_F(EdgesTest, ListsFindTheNumbersInAColumnOfTexts) {
+    const std::pair<const char*, const char*> kTypes[] = {{"int", "(7), (12), (-1)"},
+                                                          {"any", "(7), (12), (-1)"},
+                                                          {"double", "(7.0), (12.0), (-1.5)"}};
+    for (const char* szColumn : {"TEXT", "TEXT UNIQUE", "VARCHAR COLLATE NOCASE"}) {
+        for (const auto& Type : kTypes) {
+            Meet(std::string("DROP TABLE IF EXISTS item;"
+                             "CREATE TABLE item (id INTEGER PRIMARY KEY, a ") +
+                     szColumn + ")",
+                 std::string(R"({"member": {"id": {"cpptype": "int"}, "a": {"cpptype": ")") +
+                     Type.first + "\"}}}");
+            Run(std::string("INSERT INTO item (a) VALUES ") + Type.second);
+            const Json::Value jValues = std::string(Type.first) == "double"
+                                            ? Parse("[12.0, 7.0, null]")
+                                            : Parse("[12, 7, null]");
+            EXPECT_EQ(Ids(Query().Where("a", jValues[0U])), "2");
+            EXPECT_EQ(Ids(Query().Where("a", Op::kIn, jValues).Sort("id")), "1,2");
+            std::int64_t nRows = 0;
+            EXPECT_EQ(Text(m_Table.Remove(Query().Where("a", Op::kNotIn, jValues), &nRows)), "ok");
+            EXPECT_EQ(Rows("SELECT id FROM item ORDER BY id"), "1;2");
+        }
+    }
+}
+
 TEST_F(EdgesTest, OrderOfDatesKeepsItsIndex) {
     Meet("CREATE TABLE item (id INTEGER PRIMARY KEY, day DATE)",
          R"({"member": {"id": {"cpptype": "int"}, "day": {"cpptype": "string"}}})");

@@ -125,6 +125,22 @@ TEST_F(IndexTest, TableOfAnAttachedDatabaseGetsItsIndexThere) {
     EXPECT_EQ(Index({"name"}), strSql);
 }
 
+// What a statement says of another table of that name is no matter of this one.
+TEST_F(IndexTest, ExplainSqlKnowsTheTableFromOthersOfItsName) {
+    Run("ATTACH ':memory:' AS other; CREATE TABLE other.doc (id INTEGER PRIMARY KEY, size INT)");
+    for (const char* szOfOther : {"SELECT * FROM other.doc WHERE size = 5",
+                                  "SELECT * FROM \"Other\".doc AS o WHERE size = 5",
+                                  "SELECT o.id FROM doc AS d, other.doc o WHERE d.id = 5"}) {
+        EXPECT_EQ(ExplainSql(szOfOther).find("full-scan"), std::string::npos) << szOfOther;
+    }
+    for (const char* szOfThis :
+         {"SELECT * FROM doc WHERE size = 5", "SELECT * FROM Main.doc WHERE size = 5",
+          "SELECT * FROM main.doc AS d WHERE size = 5",
+          "SELECT o.id FROM doc AS d, other.doc o WHERE o.id = d.size"}) {
+        EXPECT_NE(ExplainSql(szOfThis).find("full-scan"), std::string::npos) << szOfThis;
+    }
+}
+
 // In CREATE INDEX SQLite takes the name of no column for a text: one row would be all that such a
 // unique index lets in.
 TEST_F(IndexTest, ColumnThatIsNotThereIsNotIndexed) {

@@ -333,6 +333,54 @@ TEST_F(SaveTest, KeyBeyondItsMemberEndsALoad) {
     EXPECT_EQ(Rows("SELECT * FROM task"), "");
 }
 
+// By which others may refer to it.
+TEST_F(SaveTest, ReplacedRecordKeepsItsRowid) {
+    Options How;
+    How.strSqlCreate = "CREATE TABLE t (id INTEGER PRIMARY KEY, mail TEXT UNIQUE, size INT)";
+    for (const char* szType : {"int", "long long"}) {
+        Run("DROP TABLE IF EXISTS t");
+        Open(std::string(R"({"t": {"key": "mail", "member": {"id": {"cpptype": ")") + szType +
+                 R"("}, "mail": {"cpptype": "string"}, "size": {"cpptype": "int"}}}})",
+             How);
+        Create(R"({"id": 5, "mail": "a", "size": 1})");
+        Create(R"({"id": 7, "mail": "b", "size": 1})");
+        EXPECT_EQ(Save(R"({"mail": "a"})", OnDuplicate::kReplace),
+                  R"(replaced {"id":5,"mail":"a"})");
+        EXPECT_EQ(Save(R"({"id": 6, "mail": "a"})", OnDuplicate::kReplace),
+                  R"(replaced {"id":6,"mail":"a"})");
+        EXPECT_EQ(Save(R"({"mail": "c"})", OnDuplicate::kReplace),
+                  R"(inserted {"id":8,"mail":"c"})");
+        EXPECT_EQ(Rows("SELECT * FROM t"), "6|a|NULL;7|b|1;8|c|NULL");
+    }
+}
+
+// The rowid that was handed out last is another table's.
+TEST_F(SaveTest, RecordThatIsThereIsHandedNoKey) {
+    Options How;
+    How.strSqlCreate =
+        "CREATE TABLE t (id INTEGER PRIMARY KEY, mail TEXT UNIQUE, size INT);"
+        "CREATE TABLE other (id INTEGER PRIMARY KEY)";
+    Open(R"({"t": {"key": "mail", "member": {"id": {"cpptype": "int"},
+             "mail": {"cpptype": "string"}, "size": {"cpptype": "int"}}}})",
+         How);
+    Create(R"({"id": 1, "mail": "a", "size": 1})");
+    Run("INSERT INTO other VALUES (1099511627776)");
+    EXPECT_EQ(Save(R"({"mail": "a", "size": 2})", OnDuplicate::kSkip),
+              R"(skipped {"id":1,"mail":"a","size":1})");
+    EXPECT_EQ(Save(R"({"mail": "a", "size": 3})", OnDuplicate::kUpsert),
+              R"(updated {"id":1,"mail":"a","size":3})");
+    EXPECT_EQ(Save(R"({"mail": "a", "size": 4})", OnDuplicate::kReplace),
+              R"(replaced {"id":1,"mail":"a","size":4})");
+    LoadOptions Upsert;
+    Upsert.eOnDuplicate = OnDuplicate::kUpsert;
+    Loader Load;
+    EXPECT_EQ(Text(Load.Start(m_Table, Upsert)), "ok");
+    EXPECT_EQ(Text(Load.Add(Parse(R"({"mail": "a", "size": 5})"))), "ok");
+    EXPECT_EQ(Text(Load.Add(Parse(R"({"mail": "b", "size": 6})"))), "ok");
+    EXPECT_EQ(Text(Load.Commit()), "ok");
+    EXPECT_EQ(Rows("SELECT * FROM t"), "1|a|5;2|b|6");
+}
+
 // A column of whole numbers that is the key is the rowid, whatever its member is.
 TEST_F(SaveTest, KeyThatTheTableHandsOutIsNoFlag) {
     Open(
