@@ -240,7 +240,12 @@ class Condition {
 //    Query().Where("size", Op::kGreaterOrEqual, 5).Sort("-size").Limit(10)
 //
 struct Query {
-    Query() = default;
+    Query();
+    ~Query();
+    Query(const Query& Other);
+    Query(Query&& Other) noexcept;
+    Query& operator=(const Query& Other);
+    Query& operator=(Query&& Other) noexcept;
 
     // Reads the notation above. What is wrong with jQuery goes to vecFindings, and every call with
     // this query returns it instead of running.

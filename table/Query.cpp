@@ -37,6 +37,14 @@ Condition::Condition(std::string strMember, Json::Value jValue)
 Condition::Condition(std::string strMember, Op eOp, Json::Value jOperand)
     : m_pNode(Leaf(strMember, eOp, jOperand)) {}
 
+// Here, and not at each place that has one.
+Query::Query() = default;
+Query::~Query() = default;
+Query::Query(const Query& Other) = default;
+Query::Query(Query&& Other) noexcept = default;
+Query& Query::operator=(const Query& Other) = default;
+Query& Query::operator=(Query&& Other) noexcept = default;
+
 Query::Query(const Json::Value& jQuery) : Query(vornjsondb::ParseQuery(jQuery, false)) {}
 
 Query Query::ValuesOnly(const Json::Value& jQuery) {
