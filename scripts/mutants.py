@@ -46,7 +46,8 @@ OTHER = {
 CONDITION = re.compile(r"\b(?:if|while|VORN_FAIL_IF|VORN_WARN_IF|VORN_FAIL_IF_TEXT) ?\(")
 # Calls that change nothing when they are made twice.
 TWICE_IS_ONCE = re.compile(
-    r"(?:clear|Clear|fill|reset|resize|assign|exceptions|removeMember|getString|snprintf|throwLogicError"
+    r"(?:clear|Clear|CheckEmpty|Forget\w*|fill|reset|resize|assign|exceptions|removeMember|getString|snprintf"
+    r"|throwLogicError|RefuseAlways|SetAffinity|SetGenerated"
     r"|Set|Fill|FillDefaults|pfnRead|Read|SetRight|SetUnknown|SetNull|SetText|GiveInteger|GiveText|WritePlain|Judge|strictMode"
     r"|sqlite3_reset|sqlite3_clear_bindings|sqlite3_table_column_metadata)$"
 )

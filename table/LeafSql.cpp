@@ -70,22 +70,22 @@ void BoundSql::Add(const BoundValue& Value) {
 }
 
 bool LeafSql::Write(const VORN_JSON_DB::Condition::Node& Leaf, Problem& Why) {
+    if (!IsOperator(Leaf.eOp)) {
+        return Why.Tell(FindingCode::kUnknownOperator, "there is no operator of this number");
+    }
     if (!FindPlace(m_Of, Leaf.strMember, m_Where, Why)) {
         return false;
     }
     m_pMember = &m_Of.At(m_Where.nMember);
     m_blPath = !m_Where.strPath.empty();
-    if (!IsOperator(Leaf.eOp)) {
-        return Why.Tell(FindingCode::kUnknownOperator, "there is no operator of this number");
-    }
     const Operator& Row = RowOf(Leaf.eOp);
-    m_Out.blReadsJson = m_Out.blReadsJson || m_blPath || Leaf.eOp == Op::kContains;
     if ((Row.nKinds & (m_blPath ? kPathBit : BitOf(m_pMember->Kind()))) == 0) {
         return Why.Tell(
             FindingCode::kWrongOperator,
             Concat({Quoted(Row.szName), " is not for member ", Quoted(m_pMember->strName),
                     " of type ", Quoted(m_pMember->pType->szName)}));
     }
+    m_Out.blReadsJson = m_Out.blReadsJson || m_blPath || Leaf.eOp == Op::kContains;
     return IsOfForm(Row.eForm, Leaf.jOperand) ? WriteOperator(Row, Leaf.jOperand, Why)
                                               : RefuseOperand(Row, Leaf.jOperand, Why);
 }

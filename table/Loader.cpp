@@ -64,7 +64,6 @@ Status Loader::Parts::Begin(const vornjsondb::Doing& What) {
 
 Status Loader::Parts::Write(FindingList& vecFindings) {
     const vornjsondb::Doing What{"load record", &Into.Of.Table(), Now.nRecords};
-    // mutate(doubled): where something is wrong already it tells nothing.
     vornjsondb::CheckEmpty(Values, vecFindings);
     if (vecFindings.empty() && How.eOnDuplicate != OnDuplicate::kStop) {
         Values.HasKey(vecFindings);

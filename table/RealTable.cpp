@@ -129,6 +129,7 @@ int ReadRealTable(sqlite3* pDb, const std::string& strTable, RealTable& Out) {
     bool blStrict = false;
     for (RealColumn& Column : Out.vecColumns) {
         if (nResult == SQLITE_OK && IsSameColumn(Column.strType, strAny)) {
+            // mutate(hoisted, sunk): asked again it says the same.
             if (!std::exchange(blAsked, true)) {
                 nResult = IsStrict(pDb, strTable, blStrict);
             }

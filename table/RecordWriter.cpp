@@ -123,10 +123,8 @@ std::string RecordWriter::Sql(Verb eVerb) const {
 // The statement for the members of this record, in the place of the last one.
 int RecordWriter::Take(Verb eVerb, Statement& Held) {
     Held = Statement();
-    std::string strShape(1, LetterOf(eVerb));
-    strShape += m_Values.Given();
     return m_Into.Kept.Take(
-        strShape, [&] { return Sql(eVerb); }, Held);
+        Concat({LetterOf(eVerb), m_Values.Given()}), [&] { return Sql(eVerb); }, Held);
 }
 
 // Runs one statement to its end. nRows, 0 before: how many it found or changed.
@@ -183,6 +181,7 @@ Status RecordWriter::Write(OnDuplicate eOnDuplicate, const Doing& What, Written&
         nResult = Run(eVerb, nChanged);
     }
     const bool blSkipped = eVerb == Verb::kInsertNew && nChanged == 0;
+    // mutate(exchanged): after a failure nobody asks for it.
     eWritten = nFound > 0 || blSkipped ? Now.eFound : Written::kInserted;
     if (nResult == SQLITE_OK && nChanged == 0 && !blSkipped && !m_Into.blView) {
         Status Still = CheckTable(m_Into, What);

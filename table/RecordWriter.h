@@ -4,6 +4,7 @@
 #define VORN_TABLE_RECORD_WRITER_H
 
 #include <string>
+#include <string_view>
 
 #include "RecordValues.h"
 #include "TableParts.h"
@@ -29,7 +30,9 @@ class RecordWriter {
 
   private:
     enum class Verb { kInsert, kInsertNew, kReplace, kUpdate, kFind };
-    static char LetterOf(Verb eVerb) { return "INRUF"[static_cast<size_t>(eVerb)]; }
+    static std::string_view LetterOf(Verb eVerb) {
+        return {&"INRUF"[static_cast<size_t>(eVerb)], 1};
+    }
 
     int Run(Verb eVerb, int& nRows);
     int Take(Verb eVerb, Statement& Held);

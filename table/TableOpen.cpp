@@ -175,7 +175,9 @@ void Table::Parts::Learn(const RealTable& Real) {
         if (nMember == vornjsondb::Members::kNone) {
             continue;
         }
+        // mutate(exchanged): in any order.
         Of.SetAffinity(nMember, vornjsondb::AffinityOf(Column.strType));
+        // mutate(exchanged): in any order.
         if (Column.blGenerated) {
             // mutate(exchanged): in any order.
             Of.SetGenerated(nMember);

@@ -64,6 +64,7 @@ Status SelectRecords(Parts& From, const Query& Which, const Doing& What,
         const bool blAll = &vecColumns == &From.WholeRow.Columns();
         // mutate(hoisted, sunk): each new one reads alike.
         if (!blAll && !Some) {
+            // mutate(doubled): each new one reads alike.
             Some.emplace(From.Of, vecColumns, From.How.eNulls);
         }
         Json::Value jRecord = (blAll ? From.WholeRow : *Some).Read(pStatement, From.Codec);

@@ -59,7 +59,6 @@ bool IsOneStatement(const Parts& Into, OnDuplicate eOnDuplicate, const Json::Val
 Status Take(Parts& Into, const Json::Value& jRecord, OnDuplicate eOnDuplicate, const Doing& What) {
     FindingList vecFindings;
     Into.Values.Take(jRecord, vecFindings);
-    // mutate(doubled): where something is wrong already it tells nothing.
     vornjsondb::CheckEmpty(Into.Values, vecFindings);
     if (vecFindings.empty() && eOnDuplicate != OnDuplicate::kStop) {
         Into.Values.HasKey(vecFindings);

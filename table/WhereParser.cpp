@@ -203,7 +203,8 @@ class WhereParser {
         if (m_blValuesOnly) {
             Report(m_vecFindings, FindingCode::kOperatorRefused, strPath,
                    Concat({strShown, " is an operator, and this query takes plain values"}));
-        } else if (FindOperator(strKey) != nullptr || FindGroupKey(strKey) != nullptr) {
+        } else if (FindOperator(strKey) != nullptr ||  // mutate(exchanged): both only look.
+                   FindGroupKey(strKey) != nullptr) {
             Report(m_vecFindings, FindingCode::kMisplacedOperator, strPath,
                    Concat({strShown, " cannot stand here"}));
         } else {

@@ -54,6 +54,13 @@ TEST_F(DecimalPointTest, WhatLooksIntoNoJsonIsFree) {
     EXPECT_EQ(CountOf(Query().Where("rate", Op::kIn, Parse("[1.5, 2, 2.5]")).Sort("size")), "1");
 }
 
+TEST_F(DecimalPointTest, OperatorThatTheMemberCannotHaveReadsNone) {
+    const FakeLocale Comma;
+    EXPECT_EQ(CountOf(Query().Where("size", Op::kContains, 1)),
+              "refused: cannot count records of table \"doc\": \"$contains\" is not for member "
+              "\"size\" of type \"long long\" [wrong-operator /where/size/$contains]");
+}
+
 TEST_F(DecimalPointTest, IndexOnAPathIsRefused) {
     const FakeLocale Comma;
     EXPECT_EQ(Text(m_Table.CreateIndex({"size", "map.a"}, false)),

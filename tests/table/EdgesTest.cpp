@@ -127,6 +127,9 @@ TEST_F(EdgesTest, NumbersInAColumnOfTextsAreNone) {
     }
     EXPECT_EQ(Ids(Query().Where("a", Op::kBetween, Parse("[1, 8]"))), "");
     EXPECT_EQ(Ids(Query().Where("a", 12)), "2");
+    Plan Found;
+    EXPECT_EQ(Text(m_Table.Explain(Query().Where("a", Op::kLess, 8), Found)), "ok");
+    EXPECT_EQ(Found.strSql, R"(SELECT "item"."a", "item"."id" FROM "item" WHERE +"item"."a" < ?)");
 }
 
 // They are found as by "$eq", and left out as by "$ne".

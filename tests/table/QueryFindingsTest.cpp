@@ -84,6 +84,9 @@ TEST_F(QueryFindings, NumberOfNoOperatorIsNone) {
                   "refused: cannot list records of table \"doc\": there is no operator of this "
                   "number [unknown-operator /where/id]");
     }
+    EXPECT_EQ(Text(m_Table.List(Query().Where("nmae", static_cast<Op>(13), 1), jFound)),
+              "refused: cannot list records of table \"doc\": there is no operator of this number "
+              "[unknown-operator /where/nmae]");
 }
 
 TEST_F(QueryFindings, FindingsOfTheNotation) {

@@ -114,6 +114,14 @@ TEST_F(SyncTest, StrictTableHasAnyForAnything) {
               "as \"ANY\", has numeric affinity and changes what is stored");
 }
 
+TEST_F(SyncTest, OtherColumnsOfAStrictTableConvert) {
+    Meet("CREATE TABLE item (a ANY, b INTEGER) STRICT",
+         R"({"member": {"a": {"cpptype": "any"}, "b": {"cpptype": "string"}}})");
+    EXPECT_EQ(Lint(),
+              "other-affinity /item/member/b: member \"b\" of type \"string\": its column, "
+              "declared as \"INTEGER\", has integer affinity and changes what is stored");
+}
+
 // What is not there is not STRICT, either.
 TEST_F(SyncTest, SqliteWithoutAListOfTablesHasNoStrictOnes) {
     Run("CREATE TEMP TABLE pragma_table_list (hides TEXT)");
