@@ -50,7 +50,6 @@ std::string OnConflict(const Members& Of, const RecordValues& Values, bool blRep
     for (size_t i = 0; i < Of.Size(); ++i) {
         const Member& Other = Of.At(i);
         // "excluded" holds the column's default where the record has no value.
-        // mutate(exchanged): all only look.
         if (!Other.blKey && !Other.blGenerated && (!Other.blRowid || Values.Has(i))) {
             // mutate(doubled): a column may be set twice.
             Append(strSet,

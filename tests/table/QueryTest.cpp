@@ -1,5 +1,7 @@
 // What queries mean.
 
+#include <utility>
+
 #include "../../table/Operand.h"
 #include "QueryFixture.h"
 
@@ -365,6 +367,18 @@ TEST_F(Queries, SignsMayBeginANameInAPath) {
     Fill("map", {R"({"+": 1})", R"({"-1": 2})"});
     EXPECT_EQ("1", IdsWhere(R"({"map.+": 1})"));
     EXPECT_EQ("2", IdsWhere(R"({"map.-1": 2})"));
+}
+
+TEST_F(Queries, AssignedOnesAreTheirOwn) {
+    Fill("size", {"1", "2", "3"});
+    Query Large = Query().Where("size", Op::kGreater, 1).Sort("-id");
+    Query Few;
+    Few = Large;
+    Few.Limit(1);
+    EXPECT_EQ("3", Ids(Few));
+    EXPECT_EQ("3,2", Ids(Large));
+    Large = std::move(Few);
+    EXPECT_EQ("3", Ids(Large));
 }
 
 }  // namespace VORN_JSON_DB
