@@ -291,11 +291,16 @@ done
 same 'nohup' "$(python3 end.py nohup 1 "$VORNJSONDB" insert ended.db t feed --type id=int --format jsonl)" \
     '0 3 inserted, 0 replaced, 0 skipped, 0 failed (feed: JSON Lines)'
 rm ended.db
-# Nor does a reader of the bad records who goes away.
+# Nor does a reader of the bad records who goes away, which is waited for.
+mkfifo gone
 {
+    read -r <gone
     "$VORNJSONDB" insert ended.db t bad --type id=int --errors /dev/stdout 2>err
     echo $? >code
-} | true
+} | {
+    exec <&-
+    : >gone
+}
 same 'exit without a reader of bad records' "$(cat code)" 7
 same 'without a reader of bad records' "$(cat err)" \
     'error: /dev/stdout: cannot write: Broken pipe; free some space, or name another file for --errors (nothing is stored)'
